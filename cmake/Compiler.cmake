@@ -1,0 +1,14 @@
+# Warnings, sanitizers and the compiler cache: the same for every target.
+
+add_compile_options(-Wall -Wextra -Wpedantic -Wshadow -Wnon-virtual-dtor -Wsuggest-override -Werror)
+
+find_program(CCACHE ccache)
+if(CCACHE)
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${CCACHE})
+endif()
+
+set(CMAKE_CXX_FLAGS_SANITIZE "-O1 -g1 -fno-omit-frame-pointer")
+if(TALIX_SANITIZE)
+  add_compile_options(-fsanitize=${TALIX_SANITIZE} -fno-sanitize-recover=all)
+  add_link_options(-fsanitize=${TALIX_SANITIZE})
+endif()
