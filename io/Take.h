@@ -5,12 +5,12 @@
 // Positions are in the file's own axes. Frame numbers are the file's own.
 #pragma once
 
-#include <optional>
 #include <string>
 #include <vector>
 
 #include "host/animation/KeyTrack.h"
 #include "host/math/Vec3.h"
+#include "host/time/Ticks.h"
 
 namespace talix {
 
@@ -87,8 +87,5 @@ struct Take {
   std::string variant;               // what a person may want to know: "Intel, integer" ...
   std::vector<TakeNote> notes;
 };
-
-// Ticks a frame at a rate: the nearest whole number of 1/705,600,000 s.
-int64 ticksPerFrameAt(double rate);
 
 }  // namespace talix

@@ -1,0 +1,17 @@
+// The time unit. A tick is 1/705,600,000 s: every usual frame rate has a whole number of ticks per frame.
+#pragma once
+
+#include <cmath>
+
+#include "host/base/Types.h"
+
+inline constexpr int64 kTicksPerSecond = 705'600'000;
+
+// The end of the time line, in ticks: times reach from -kForever to kForever.
+inline constexpr int64 kForever = (int64{1} << 62) - 1;
+
+// Ticks per frame at a rate in frames per second (above 0): the nearest whole number, at least 1.
+inline int64 ticksPerFrameAt(double rate) {
+  const int64 ticks = std::llround(static_cast<double>(kTicksPerSecond) / rate);
+  return ticks < 1 ? 1 : ticks;
+}

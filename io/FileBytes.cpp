@@ -1,0 +1,81 @@
+#include "io/FileBytes.h"
+
+#include <fcntl.h>
+#include <sys/mman.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+
+#include "io/FileError.h"
+
+namespace talix {
+
+namespace {
+
+std::string systemReason() { return std::strerror(errno); }
+
+// Closes the file at the end of a scope.
+struct Descriptor {
+  int fd;
+  ~Descriptor() {
+    if (fd >= 0) ::close(fd);
+  }
+};
+
+}  // namespace
+
+FileBytes::FileBytes(const std::string& path) : m_path(path) {
+  Descriptor file{::open(path.c_str(), O_RDONLY | O_CLOEXEC)};
+  if (file.fd < 0) throw FileError(path, errno == ENOENT ? "there is no such file" : "cannot be read: " + systemReason());
+  struct stat status {};
+  if (::fstat(file.fd, &status) != 0) throw FileError(path, "cannot be read: " + systemReason());
+  if (S_ISDIR(status.st_mode)) throw FileError(path, "is a folder, not a file");
+  if (!S_ISREG(status.st_mode)) throw FileError(path, "is not a regular file");
+  if (status.st_size == 0) throw FileError(path, "the file is empty");
+  m_size = static_cast<size_t>(status.st_size);
+  void* data = ::mmap(nullptr, m_size, PROT_READ, MAP_PRIVATE, file.fd, 0);
+  if (data == MAP_FAILED) throw FileError(path, "cannot be read: " + systemReason());
+  ::madvise(data, m_size, MADV_SEQUENTIAL);
+  m_data = static_cast<const char*>(data);
+}
+
+FileBytes::~FileBytes() {
+  if (m_data) ::munmap(const_cast<char*>(m_data), m_size);
+}
+
+void FileBytes::release(size_t offset) const {
+  const size_t page = static_cast<size_t>(::sysconf(_SC_PAGESIZE));
+  const size_t whole = offset / page * page;
+  if (whole) ::madvise(const_cast<char*>(m_data), whole, MADV_DONTNEED);
+}
+
+void writeFileAtomically(const std::string& path, const std::function<void(std::ostream&)>& write) {
+  std::string temporary = path + ".XXXXXX";
+  Descriptor file{::mkstemp(temporary.data())};
+  if (file.fd < 0) throw FileError(path, "cannot be written: " + systemReason());
+  try {
+    {
+      std::ofstream out(temporary, std::ios::binary | std::ios::trunc);
+      write(out);
+      out.flush();
+      if (!out) throw FileError(path, "cannot be written: " + systemReason());
+    }
+    // A new file gets the rights that the user's mask allows, as if it had been created under its own name.
+    struct stat status {};
+    const mode_t mask = ::umask(0);
+    ::umask(mask);
+    ::fchmod(file.fd, ::stat(path.c_str(), &status) == 0 ? status.st_mode & 07777 : 0666 & ~mask);
+    if (::fsync(file.fd) != 0) throw FileError(path, "cannot be written: " + systemReason());
+    if (::rename(temporary.c_str(), path.c_str()) != 0)
+      throw FileError(path, "cannot be written: " + systemReason());
+  } catch (...) {
+    ::unlink(temporary.c_str());
+    throw;
+  }
+}
+
+}  // namespace talix
