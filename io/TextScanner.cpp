@@ -132,7 +132,7 @@ bool equalsIgnoringCase(std::string_view text, std::string_view lowerCase) {
   return text.size() == lowerCase.size() && startsIgnoringCase(text, lowerCase);
 }
 
-std::string quoted(std::string_view text) {
+std::string shown(std::string_view text) {
   constexpr size_t kLongest = 40;
   size_t length = text.size();
   if (length > kLongest) {
@@ -147,7 +147,7 @@ std::string quoted(std::string_view text) {
   return result + (length < text.size() ? "...\"" : "\"");
 }
 
-std::string found(std::string_view word) { return word.empty() ? "the end of the file" : quoted(word); }
+std::string found(std::string_view word) { return word.empty() ? "the end of the file" : shown(word); }
 
 std::string shortNumber(double value) {
   char text[32];

@@ -60,8 +60,8 @@ std::string_view trimmed(std::string_view text);
 bool equalsIgnoringCase(std::string_view text, std::string_view lowerCase);
 bool startsIgnoringCase(std::string_view text, std::string_view lowerCase);
 // For error texts: in quotes, cut when long, unprintable bytes as "?".
-std::string quoted(std::string_view text);
-// For error texts: quoted(word), or "the end of the file" when empty.
+std::string shown(std::string_view text);
+// For error texts: shown(word), or "the end of the file" when empty.
 std::string found(std::string_view word);
 // A number as short as it can be told apart, for notes and errors.
 std::string shortNumber(double value);

@@ -65,8 +65,8 @@ class HierarchyReader {
   [[noreturn]] void failInside(std::string_view word, bool inEndSite) {
     const Open& open = m_open.back();
     const std::string expected = inEndSite ? "OFFSET or \"}\"" : "OFFSET, CHANNELS, JOINT, End Site or \"}\"";
-    m_scanner.fail(expected + " expected, not " + found(word) + "; " + quoted(joint(open).name) +
-                   " of line " + std::to_string(open.line) + " is still open");
+    m_scanner.fail(expected + " expected, not " + found(word) + "; " + shown(joint(open).name) + " of line " +
+                   std::to_string(open.line) + " is still open");
   }
 
   void openJoint(int parent) {
@@ -87,7 +87,7 @@ class HierarchyReader {
 
   void open(TakeJoint added, int64 line) {
     if (const auto word = m_scanner.takeWord(); word != "{")
-      m_scanner.fail("\"{\" expected after " + quoted(added.name) + ", not " + found(word));
+      m_scanner.fail("\"{\" expected after " + shown(added.name) + ", not " + found(word));
     if (m_open.size() == kDeepestBvhNesting)
       m_scanner.failAt(line, "joints nested deeper than " + std::to_string(kDeepestBvhNesting));
     m_open.push_back({.joint = static_cast<int>(m_result.joints.size()), .line = line});
@@ -99,7 +99,7 @@ class HierarchyReader {
     const Open& closed = m_open.back();
     if (!closed.hasOffset)
       m_result.notes.push_back({TakeNote::Level::Warning, "line " + std::to_string(closed.line) + ": " +
-                                                              quoted(joint(closed).name) +
+                                                              shown(joint(closed).name) +
                                                               " has no OFFSET; 0 0 0 assumed"});
     m_open.pop_back();
   }

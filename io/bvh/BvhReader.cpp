@@ -127,7 +127,7 @@ class MotionReader {
       m_bytes.release(m_scanner.offset());
     }
     if (!m_scanner.atEnd())
-      failCount("the motion goes on with " + quoted(m_scanner.peekWord()) + " after them");
+      failCount("the motion goes on with " + shown(m_scanner.peekWord()) + " after them");
   }
 
  private:
@@ -142,7 +142,7 @@ class MotionReader {
         m_scanner.fail("a number expected, not " + found(word) + ", in frame " + std::to_string(frame + 1));
       }
       if (!std::isfinite(*number * millimetres))
-        m_scanner.fail("a finite number expected, not " + quoted(word) + ", in frame " +
+        m_scanner.fail("a finite number expected, not " + shown(word) + ", in frame " +
                        std::to_string(frame + 1));
       value = *number;
     }
@@ -170,7 +170,7 @@ class MotionReader {
     const double rate = rateFromFrameTime(*frameTime, printedPrecision(word));
     if (!isFrameRate(rate))
       m_scanner.fail("a frame time that makes " + std::string(kFrameRateExpected) + " expected, not " +
-                     quoted(word));
+                     shown(word));
     if (std::abs(rate - asPrinted) > 1e-9 * rate)
       notes.push_back({TakeNote::Level::Info, "the frame time " + word + " s was taken as " +
                                                   shortNumber(rate) + " frames a second"});
@@ -205,7 +205,7 @@ void setUnit(Take& take, const std::string& path, const ReadOptions& options) {
   take.fileUnit = take.unitAssumed ? "cm" : options.unit;
   take.unitInMillimetres = millimetresPerUnit(take.fileUnit);
   if (!(take.unitInMillimetres > 0))
-    throw FileError(path, "the unit " + quoted(options.unit) + " is not known");
+    throw FileError(path, "the unit " + shown(options.unit) + " is not known");
   if (take.unitAssumed)
     take.notes.push_back({TakeNote::Level::Info, "the file names no length unit; centimetres were assumed"});
 }
@@ -228,7 +228,7 @@ Take readBVH(const std::string& path, const ReadOptions& options) {
   for (TakeJoint& joint : take.joints) {
     joint.offset *= take.unitInMillimetres;
     if (!std::isfinite(joint.offset.x) || !std::isfinite(joint.offset.y) || !std::isfinite(joint.offset.z))
-      throw FileError(path, "the OFFSET of " + quoted(joint.name) + " is too large");
+      throw FileError(path, "the OFFSET of " + shown(joint.name) + " is too large");
   }
 
   MotionReader motion(bytes, scanner, hierarchy.channelCount);

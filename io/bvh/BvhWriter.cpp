@@ -117,7 +117,7 @@ class BvhWriter {
     for (size_t i = 0; i < take.joints.size(); ++i) {
       const int parent = take.joints[i].parent;
       if (parent >= static_cast<int>(i))
-        throw FileError(path, "joint " + quoted(take.joints[i].name) + " comes before its parent");
+        throw FileError(path, "joint " + shown(take.joints[i].name) + " comes before its parent");
       if (parent >= 0) m_children[static_cast<size_t>(parent)].push_back(i);
     }
   }
@@ -168,7 +168,7 @@ class BvhWriter {
     const bool endSite = isEndSite(index);
     const std::string name = fileName(joint.name);
     if (!endSite && name != joint.name)
-      warn("the name " + quoted(joint.name) + " was written as " + quoted(name));
+      warn("the name " + shown(joint.name) + " was written as " + shown(name));
     if (endSite && joint.name.rfind(m_take.joints[static_cast<size_t>(joint.parent)].name + "_end", 0) != 0)
       ++m_endSiteNames;
     m_hierarchy += indent + (endSite ? "End Site" : (joint.parent < 0 ? "ROOT " : "JOINT ") + name) + "\n" +
@@ -191,7 +191,7 @@ class BvhWriter {
     auto channels = namedChannels(joint);
     if (!channels.empty()) return channels;
     if (!joint.channels.empty())
-      warn("the channels of " + quoted(joint.name) + " were replaced by the usual ones");
+      warn("the channels of " + shown(joint.name) + " were replaced by the usual ones");
     return usualChannels(joint);
   }
 
@@ -251,7 +251,7 @@ class BvhWriter {
     for (const JointWriter& joint : m_joints)
       if ((joint.turns() && joint.lostTurn() > kVisible) ||
           (!joint.turns() && !joint.joint().rotations.empty()))
-        warn(quoted(joint.joint().name) + " turns about an axis that has no channel; that turn was left out");
+        warn(shown(joint.joint().name) + " turns about an axis that has no channel; that turn was left out");
   }
 
   const Take& m_take;

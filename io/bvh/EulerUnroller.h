@@ -17,7 +17,7 @@ class EulerUnroller {
   Vec3 next(const double* quaternion);
 
  private:
-  void keepFirstAngle(const double* quaternion, Vec3& angles) const;
+  void keepFirstAngle(const TalixRotation&, Vec3& angles) const;
 
   int m_order;
   bool m_keepsAll;

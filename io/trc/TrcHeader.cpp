@@ -72,13 +72,13 @@ void readValues(TextScanner& scanner, TrcHeader& header) {
   takeRow("the line of header names beginning with DataRate");
   const Cells names = cellsOf(row);
   if (!hasName(names, "datarate"))
-    scanner.failAt(line, "the header names, DataRate among them, expected, not " + quoted(row));
+    scanner.failAt(line, "the header names, DataRate among them, expected, not " + shown(row));
   takeRow("the line of header values (DataRate ...)");
   const HeaderValues values(names, row);
   header.rate = values.number("datarate").value_or(0);
   if (!isFrameRate(header.rate))
     scanner.failAt(line, "a DataRate that is " + std::string(kFrameRateExpected) + " expected, not " +
-                             quoted(values.text("datarate")));
+                             shown(values.text("datarate")));
   header.unit = values.text("units");
   header.frameCount = values.number("numframes");
   header.markerCount = values.number("nummarkers");
@@ -94,7 +94,7 @@ void readNames(TextScanner& scanner, TrcHeader& header) {
   if (!startsIgnoringCase(cells[0], "frame") || cells.size() < kFirst ||
       !startsIgnoringCase(cells[1], "time"))
     scanner.failAt(line,
-                   "the line of marker names beginning with Frame# and Time expected, not " + quoted(row));
+                   "the line of marker names beginning with Frame# and Time expected, not " + shown(row));
   for (size_t i = kFirst; i < cells.size(); ++i)
     if (!cells[i].empty() && (i - kFirst) % 3 != 0) header.namesInOrder = true;
   for (size_t i = kFirst; i < cells.size(); header.namesInOrder ? ++i : i += 3)

@@ -124,16 +124,16 @@ class RowReader {
     } else {
       const auto number = parseNumber(cell);
       if (!number || *number != std::floor(*number))
-        m_scanner.failAt(m_line, "a whole frame number expected, not " + quoted(cell));
+        m_scanner.failAt(m_line, "a whole frame number expected, not " + shown(cell));
       if (!(std::abs(*number) <= m_lastFrame))
         m_scanner.failAt(
-            m_line, "a frame number up to " + shortNumber(m_lastFrame) + " expected, not " + quoted(cell));
+            m_line, "a frame number up to " + shortNumber(m_lastFrame) + " expected, not " + shown(cell));
       m_frame = static_cast<int64>(*number);
     }
     if (m_rows == 0) m_firstFrame = m_frame;
     if (m_rows > 0 && m_frame <= before)
       m_scanner.failAt(m_line,
-                       "a frame number after " + std::to_string(before) + " expected, not " + quoted(cell));
+                       "a frame number after " + std::to_string(before) + " expected, not " + shown(cell));
     if (static_cast<double>(m_frame) > m_lastFrame)
       m_scanner.failAt(m_line, "the frame numbers run too high");
   }
@@ -141,7 +141,7 @@ class RowReader {
   void readTime(std::string_view cell) {
     if (cell.empty()) return;
     const auto seconds = parseNumber(cell);
-    if (!seconds) m_scanner.failAt(m_line, "a time in seconds expected, not " + quoted(cell));
+    if (!seconds) m_scanner.failAt(m_line, "a time in seconds expected, not " + shown(cell));
     if (!m_timed) m_firstTime = {m_frame, *seconds};
     m_timed = true;
     m_lastTime = {m_frame, *seconds};
@@ -172,7 +172,7 @@ class RowReader {
     const double millimetres = number.value_or(INFINITY) * m_take.unitInMillimetres;
     if (!std::isfinite(millimetres))
       m_scanner.failAt(m_line,
-                       "a number expected in column " + std::to_string(m_column) + ", not " + quoted(cell));
+                       "a number expected in column " + std::to_string(m_column) + ", not " + shown(cell));
     coordinate = millimetres;
     return true;
   }
@@ -271,13 +271,13 @@ void setUnit(Take& take, const std::string& path, const std::string& given, cons
   take.fileUnit = unit.empty() ? "mm" : unit;
   take.unitInMillimetres = millimetresPerUnit(take.fileUnit);
   if (take.unitInMillimetres > 0 && !unit.empty()) return;
-  if (!wanted.empty()) throw FileError(path, "the unit " + quoted(wanted) + " is not known");
+  if (!wanted.empty()) throw FileError(path, "the unit " + shown(wanted) + " is not known");
   take.unitInMillimetres = 1;
   take.unitAssumed = true;
   take.notes.push_back({TakeNote::Level::Warning,
                         unit.empty()
                             ? "the file names no length unit; millimetres were assumed"
-                            : "the length unit " + quoted(unit) + " is not known; millimetres were assumed"});
+                            : "the length unit " + shown(unit) + " is not known; millimetres were assumed"});
 }
 
 void setUpAxis(Take& take) {
