@@ -71,18 +71,23 @@ class HierarchyReader {
 
   void openJoint(int parent) {
     const int64 line = m_scanner.line();
-    const std::string name(m_scanner.takeRestOfLine());
-    if (name.empty()) m_scanner.failAt(line, "a joint name expected");
-    open({.name = name, .parent = parent}, line);
+    TakeJoint added;
+    added.name = m_scanner.takeRestOfLine();
+    if (added.name.empty()) m_scanner.failAt(line, "a joint name expected");
+    added.parent = parent;
+    open(std::move(added), line);
   }
 
   void openEndSite() {
     Open& parent = m_open.back();
     const int64 line = m_scanner.line();
     m_scanner.takeRestOfLine();  // "Site"
-    std::string name = joint(parent).name + "_end";
-    if (++parent.endSites > 1) name += std::to_string(parent.endSites);
-    open({.name = name, .parent = parent.joint, .endSite = true}, line);
+    TakeJoint added;
+    added.name = joint(parent).name + "_end";
+    if (++parent.endSites > 1) added.name += std::to_string(parent.endSites);
+    added.parent = parent.joint;
+    added.endSite = true;
+    open(std::move(added), line);
   }
 
   void open(TakeJoint added, int64 line) {
