@@ -1,0 +1,87 @@
+// One array of a key leaf. Erasing at the front moves an offset; growth doubles, up to a limit that a full
+// leaf meets exactly.
+#pragma once
+
+#include <algorithm>
+#include <cstring>
+#include <memory>
+#include <type_traits>
+
+#include "host/base/Types.h"
+
+template <class T>
+class KeyColumn {
+  static_assert(std::is_trivially_copyable_v<T>);
+
+ public:
+  KeyColumn() = default;
+  KeyColumn(KeyColumn const& o) { insert(0, o.data(), o.m_size, o.m_size); }
+  KeyColumn& operator=(KeyColumn&& o) noexcept = default;
+
+  int size() const { return m_size; }
+  bool empty() const { return m_size == 0; }
+  T* data() { return m_data.get() + m_begin; }
+  const T* data() const { return m_data.get() + m_begin; }
+  T& operator[](int i) { return data()[i]; }
+  T const& operator[](int i) const { return data()[i]; }
+  int64 bytes() const { return static_cast<int64>(m_capacity) * static_cast<int64>(sizeof(T)); }
+
+  void clear() {
+    m_data.reset();
+    m_begin = m_size = m_capacity = 0;
+  }
+
+  // Opens a gap of n elements at `at` and answers its start. The limit bounds the capacity.
+  T* open(int at, int n, int limit) {
+    if (at == 0 && m_begin >= n) {
+      m_begin -= n;
+    } else {
+      if (m_begin + m_size + n > m_capacity) makeRoom(n, limit);
+      move(data() + at + n, data() + at, m_size - at);
+    }
+    m_size += n;
+    return data() + at;
+  }
+
+  void insert(int at, const T* from, int n, int limit) {
+    if (n > 0) move(open(at, n, limit), from, n);
+  }
+
+  void erase(int from, int to) {
+    if (from == 0) {
+      m_begin += to;
+    } else {
+      move(data() + from, data() + to, m_size - to);
+    }
+    m_size -= to - from;
+    if (m_size < m_capacity / 4) reallocate(m_size);
+  }
+
+ private:
+  static void move(T* to, const T* from, int n) {
+    if (n > 0) std::memmove(to, from, static_cast<size_t>(n) * sizeof(T));
+  }
+
+  void makeRoom(int n, int limit) {
+    const int needed = m_size + n;
+    if (needed <= m_capacity) {
+      move(m_data.get(), data(), m_size);
+      m_begin = 0;
+      return;
+    }
+    reallocate(std::max(needed, std::min(2 * m_size, limit)));
+  }
+
+  void reallocate(int capacity) {
+    auto fresh = std::make_unique_for_overwrite<T[]>(static_cast<size_t>(capacity));
+    move(fresh.get(), data(), m_size);
+    m_data = std::move(fresh);
+    m_begin = 0;
+    m_capacity = capacity;
+  }
+
+  std::unique_ptr<T[]> m_data;
+  int m_begin = 0;
+  int m_size = 0;
+  int m_capacity = 0;
+};

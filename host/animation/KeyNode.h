@@ -1,0 +1,104 @@
+// What the nodes of a key track's tree have in common: a reference count, a level and the counts of their
+// keys. Nodes are shared between snapshots; only a node with a single reference may be changed
+// (KeyNodeRef::own). The count is not atomic: tracks that share nodes belong to one thread.
+#pragma once
+
+#include <utility>
+
+#include "host/base/Types.h"
+
+// What lies below a node, by components: x 0, y 1, z 2.
+struct KeyCounts {
+  int64 keys = 0;
+  int64 whole = 0;           // keys that hold every component
+  int64 selected = 0;        // keys selected on any component
+  int64 held[3] = {};        // keys that hold the component
+  int64 selectedOn[3] = {};  // keys selected on the component
+
+  // One more (by 1) or one less (by -1) key with these flags.
+  void count(unsigned components, unsigned selection, int by) {
+    keys += by;
+    whole += components == 7 ? by : 0;
+    selected += selection ? by : 0;
+    for (int c = 0; c < 3; ++c) {
+      held[c] += components >> c & 1 ? by : 0;
+      selectedOn[c] += selection >> c & 1 ? by : 0;
+    }
+  }
+
+  void operator+=(KeyCounts const& o) {
+    keys += o.keys, whole += o.whole, selected += o.selected;
+    for (int c = 0; c < 3; ++c) held[c] += o.held[c], selectedOn[c] += o.selectedOn[c];
+  }
+  void operator-=(KeyCounts const& o) {
+    keys -= o.keys, whole -= o.whole, selected -= o.selected;
+    for (int c = 0; c < 3; ++c) held[c] -= o.held[c], selectedOn[c] -= o.selectedOn[c];
+  }
+  bool operator==(KeyCounts const&) const = default;
+
+  // Whether some key holds (is selected on) any component of the mask.
+  bool holdsAny(unsigned mask) const { return anyOf(held, mask); }
+  bool selectedAny(unsigned mask) const { return anyOf(selectedOn, mask); }
+
+ private:
+  static bool anyOf(const int64 (&by)[3], unsigned mask) {
+    return (mask & 1 && by[0]) || (mask & 2 && by[1]) || (mask & 4 && by[2]);
+  }
+};
+
+class KeyNode {
+ public:
+  KeyCounts counts;
+
+  bool isLeaf() const { return m_level == 0; }
+  int level() const { return m_level; }  // 0 for leaves
+
+  KeyNode& operator=(KeyNode const&) = delete;
+
+ protected:
+  explicit KeyNode(int level) : m_level(level) {}
+  KeyNode(KeyNode const& o) : counts(o.counts), m_level(o.m_level) {}
+  ~KeyNode() = default;
+
+ private:
+  friend class KeyNodeRef;
+  int m_references = 0;
+  int m_level;
+};
+
+// One reference to a node, or none.
+class KeyNodeRef {
+ public:
+  KeyNodeRef() = default;
+  explicit KeyNodeRef(KeyNode* node) : m_node(node) { hold(); }
+  KeyNodeRef(KeyNodeRef const& o) : m_node(o.m_node) { hold(); }
+  KeyNodeRef(KeyNodeRef&& o) noexcept : m_node(std::exchange(o.m_node, nullptr)) {}
+  KeyNodeRef& operator=(KeyNodeRef o) noexcept {
+    std::swap(m_node, o.m_node);
+    return *this;
+  }
+  ~KeyNodeRef() {
+    if (m_node && --m_node->m_references == 0) destroy(m_node);
+  }
+
+  KeyNode* get() const { return m_node; }
+  KeyNode* operator->() const { return m_node; }
+  explicit operator bool() const { return m_node != nullptr; }
+  bool operator==(KeyNodeRef const&) const = default;
+
+  void reset() { *this = KeyNodeRef(); }
+
+  // Replaces a node that others share by a copy, so that it may be changed.
+  void own() {
+    if (m_node->m_references > 1) *this = KeyNodeRef(clone(*m_node));
+  }
+
+ private:
+  void hold() {
+    if (m_node) ++m_node->m_references;
+  }
+  static void destroy(KeyNode*);
+  static KeyNode* clone(KeyNode const&);
+
+  KeyNode* m_node = nullptr;
+};
