@@ -69,7 +69,7 @@ class KeyColumn {
       m_begin = 0;
       return;
     }
-    reallocate(std::max(needed, std::min(2 * m_size, limit)));
+    reallocate(std::max(needed, std::min(m_size + m_size / 2, limit)));
   }
 
   void reallocate(int capacity) {

@@ -28,7 +28,7 @@ bool fitFloats(const double* values, int n) {
 int KeyLeaf::lowerBound(int64 time) const {
   if (time > lastTime()) return m_size;
   if (time <= firstTime()) return 0;
-  if (evenTimes()) return static_cast<int>((time - m_start + m_period - 1) / m_period);
+  if (evenTimes()) return static_cast<int>((time - m_start - 1) / m_period + 1);
   return static_cast<int>(std::lower_bound(m_times.data(), m_times.data() + m_size, time) - m_times.data());
 }
 
@@ -39,15 +39,12 @@ int KeyLeaf::lastAtOrBefore(int64 time) const {
          1;
 }
 
-void KeyLeaf::values(int slot, double* out) const {
-  for (int c = 0; c < m_width; ++c) out[c] = value(slot, c);
-}
-
 void KeyLeaf::insert(int slot, int64 time, const double* values, unsigned components, unsigned selection) {
   insertTimes(slot, time, 0, 1);
   insertValues(slot, values, 1);
   insertFlags(slot, components | selection << kSelectionShift, 1);
   ++m_size;
+  evenOutTimes();
 }
 
 void KeyLeaf::append(int64 start, int64 period, const double* values, int n) {
@@ -82,6 +79,7 @@ void KeyLeaf::erase(int first, int last) {
   if (!plain()) m_flags.erase(first, last);
   m_size -= last - first;
   dropIdleFlags();
+  evenOutTimes();
 }
 
 void KeyLeaf::setFlags(int slot, unsigned components, unsigned selection) {
@@ -198,6 +196,20 @@ void KeyLeaf::putValues(int slot, const double* values) {
 void KeyLeaf::spellOutTimes() {
   int64* times = m_times.open(0, m_size, m_limit);
   for (int i = 0; i < m_size; ++i) times[i] = m_start + m_period * i;
+}
+
+// The ends tell almost always whether the times are even, so that asking after every edit costs next to
+// nothing.
+void KeyLeaf::evenOutTimes() {
+  if (evenTimes() || m_size == 0) return;
+  const int64 period = m_size > 1 ? m_times[1] - m_times[0] : 0;
+  if (m_size > 2 && (lastTime() - firstTime()) % (m_size - 1) != 0) return;
+  if (m_size > 2 && (lastTime() - firstTime()) / (m_size - 1) != period) return;
+  for (int i = 2; i < m_size; ++i)
+    if (m_times[i] - m_times[i - 1] != period) return;
+  m_start = firstTime();
+  m_period = period;
+  m_times.clear();
 }
 
 void KeyLeaf::spellOutFlags() {
