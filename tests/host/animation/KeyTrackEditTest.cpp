@@ -88,13 +88,17 @@ class RandomEdits : public testing::TestWithParam<Setup> {
   }
 
   void changeRange() {
-    const int64 first = time(), last = first + (oneIn(4) ? GetParam().span : upTo(GetParam().span / 8));
+    const int64 first = time(), last = first + (oneIn(12) ? GetParam().span : upTo(GetParam().span / 24));
     const unsigned m = mask();
     switch (upTo(8)) {
       case 0:
         ASSERT_EQ(track.eraseRange(first, last, m), model.eraseRange(first, last, m));
         break;
       case 1:
+        track.deselect(last, INT64_MAX, 7);  // else it would soon erase everything
+        model.deselect(last, INT64_MAX, 7);
+        track.deselect(0, first, 7);
+        model.deselect(0, first, 7);
         ASSERT_EQ(track.eraseSelected(m), model.eraseSelected(m));
         break;
       case 2:
@@ -132,8 +136,8 @@ class RandomEdits : public testing::TestWithParam<Setup> {
       for (int64 i = upTo(20); i >= 0; --i) setOne(start + i);
     } else if (what < 47 && !large) {
       appendRun();
-    } else if (what < 75) {
-      for (int64 i = large ? 8 : 1; i >= 0; --i) eraseOne();
+    } else if (what < 70) {
+      for (int64 i = large ? 20 : 0; i >= 0; --i) eraseOne();
     } else if (what < 85) {
       setSelected();
     } else {
