@@ -26,6 +26,8 @@ struct RealTake {
   std::map<std::string, int> channelLists;  // joints by their channels' initials
 };
 
+void PrintTo(const RealTake& take, std::ostream* out) { *out << take.file; }
+
 class BvhRealTake : public testing::TestWithParam<RealTake> {};
 
 TEST_P(BvhRealTake, HasTheFileFigures) {
