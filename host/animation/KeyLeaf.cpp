@@ -23,24 +23,26 @@ bool fitFloats(const double* values, int n) {
   return true;
 }
 
+// How many of the ascending times lie before the time. Halves without branches, which could not be predicted.
+int countBefore(const int64* times, int n, int64 time) {
+  const int64* from = times;
+  for (; n > 1; n -= n / 2) from += from[n / 2 - 1] < time ? n / 2 : 0;
+  return static_cast<int>(from - times) + (n == 1 && *from < time);
+}
+
 }  // namespace
 
 int KeyLeaf::lowerBound(int64 time) const {
   if (time > lastTime()) return m_size;
   if (time <= firstTime()) return 0;
-  if (evenTimes()) return static_cast<int>((time - m_start + m_period - 1) / m_period);
-  return static_cast<int>(std::lower_bound(m_times.data(), m_times.data() + m_size, time) - m_times.data());
+  if (evenTimes()) return static_cast<int>((time - m_start - 1) / m_period + 1);
+  return countBefore(m_times.data(), m_size, time);
 }
 
 int KeyLeaf::lastAtOrBefore(int64 time) const {
   if (time >= lastTime()) return m_size - 1;
   if (evenTimes()) return static_cast<int>((time - m_start) / m_period);
-  return static_cast<int>(std::upper_bound(m_times.data(), m_times.data() + m_size, time) - m_times.data()) -
-         1;
-}
-
-void KeyLeaf::values(int slot, double* out) const {
-  for (int c = 0; c < m_width; ++c) out[c] = value(slot, c);
+  return countBefore(m_times.data(), m_size, time + 1) - 1;
 }
 
 void KeyLeaf::insert(int slot, int64 time, const double* values, unsigned components, unsigned selection) {
@@ -48,6 +50,7 @@ void KeyLeaf::insert(int slot, int64 time, const double* values, unsigned compon
   insertValues(slot, values, 1);
   insertFlags(slot, components | selection << kSelectionShift, 1);
   ++m_size;
+  evenOutTimes();
 }
 
 void KeyLeaf::append(int64 start, int64 period, const double* values, int n) {
@@ -82,6 +85,7 @@ void KeyLeaf::erase(int first, int last) {
   if (!plain()) m_flags.erase(first, last);
   m_size -= last - first;
   dropIdleFlags();
+  evenOutTimes();
 }
 
 void KeyLeaf::setFlags(int slot, unsigned components, unsigned selection) {
@@ -198,6 +202,20 @@ void KeyLeaf::putValues(int slot, const double* values) {
 void KeyLeaf::spellOutTimes() {
   int64* times = m_times.open(0, m_size, m_limit);
   for (int i = 0; i < m_size; ++i) times[i] = m_start + m_period * i;
+}
+
+// The ends tell almost always whether the times are even, so that asking after every edit costs next to
+// nothing.
+void KeyLeaf::evenOutTimes() {
+  if (evenTimes() || m_size == 0) return;
+  const int64 period = m_size > 1 ? m_times[1] - m_times[0] : 0;
+  const auto length = static_cast<uint64>(lastTime() - firstTime());
+  if (length != static_cast<uint64>(period) * static_cast<uint64>(m_size - 1)) return;
+  for (int i = 2; i < m_size; ++i)
+    if (m_times[i] - m_times[i - 1] != period) return;
+  m_start = firstTime();
+  m_period = period;
+  m_times.clear();
 }
 
 void KeyLeaf::spellOutFlags() {

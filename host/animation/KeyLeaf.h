@@ -46,7 +46,14 @@ class KeyLeaf final : public KeyNode {
     if (m_form == Form::Float) return static_cast<double>(m_floats[slot * m_width + component]);
     return m_doubles[component];
   }
-  void values(int slot, double* out) const;
+  void values(int slot, double* out) const {
+    if (m_form == Form::Float) {
+      for (int c = 0; c < m_width; ++c) out[c] = static_cast<double>(m_floats[slot * m_width + c]);
+    } else {
+      const double* from = m_doubles.data() + (m_form == Form::One ? 0 : slot * m_width);
+      for (int c = 0; c < m_width; ++c) out[c] = from[c];
+    }
+  }
 
   // The first slot at or after (last at or before) `slot` that holds, or is selected on, a component of the
   // mask; -1 when there is none.
@@ -94,6 +101,7 @@ class KeyLeaf final : public KeyNode {
   void eraseTimes(int first, int last);
   bool continuesEvenly(int slot, int64 start, int64 period, int n);
   void spellOutTimes();
+  void evenOutTimes();
   void spellOutFlags();
   void spellOutValues(bool asFloats);
   void widen();

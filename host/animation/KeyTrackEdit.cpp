@@ -2,6 +2,7 @@
 // brings the counts above up to date on the way back.
 #include <algorithm>
 #include <atomic>
+#include <cassert>
 
 #include "host/animation/KeyTrackPlace.h"
 
@@ -159,6 +160,7 @@ KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, int64 time, Values const& value
 
 void KeyTrack::append(int64 start, int64 period, const double* values, int64 n) {
   if (n <= 0) return;
+  assert((n == 1 || period > 0) && (empty() || start > timeAt(count() - 1)));
   changed();
   while (n > 0) {
     const Place last = placeAt(count() - 1);
@@ -202,7 +204,9 @@ KeyNodeRef KeyTrack::appendBelow(KeyNodeRef& node, int64 start, int64 period, co
 }
 
 int64 KeyTrack::edit(int64 firstIndex, int64 lastIndex, LeafEdit& what) {
-  if (!m_root || firstIndex >= lastIndex || what.skips(*m_root.get())) return 0;
+  firstIndex = std::max<int64>(firstIndex, 0);
+  lastIndex = std::min(lastIndex, count());
+  if (firstIndex >= lastIndex || what.skips(*m_root.get())) return 0;
   changed();
   editBelow(m_root, firstIndex, lastIndex, what);
   while (m_root && !m_root->isLeaf() && asInner(*m_root.get()).size() == 1) {

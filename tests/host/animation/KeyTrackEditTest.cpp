@@ -40,6 +40,11 @@ struct Setup {
   unsigned seed;
 };
 
+void PrintTo(Setup const& setup, std::ostream* out) {
+  *out << "width " << static_cast<int>(setup.shape) << ", " << setup.limits.leafKeys
+       << " keys in a leaf, fanout " << setup.limits.fanout << ", seed " << setup.seed;
+}
+
 class RandomEdits : public testing::TestWithParam<Setup> {
  protected:
   RandomEdits()
@@ -88,13 +93,17 @@ class RandomEdits : public testing::TestWithParam<Setup> {
   }
 
   void changeRange() {
-    const int64 first = time(), last = first + (oneIn(4) ? GetParam().span : upTo(GetParam().span / 8));
+    const int64 first = time(), last = first + (oneIn(12) ? GetParam().span : upTo(GetParam().span / 24));
     const unsigned m = mask();
     switch (upTo(8)) {
       case 0:
         ASSERT_EQ(track.eraseRange(first, last, m), model.eraseRange(first, last, m));
         break;
       case 1:
+        track.deselect(last, INT64_MAX, 7);  // else it would soon erase everything
+        model.deselect(last, INT64_MAX, 7);
+        track.deselect(0, first, 7);
+        model.deselect(0, first, 7);
         ASSERT_EQ(track.eraseSelected(m), model.eraseSelected(m));
         break;
       case 2:
@@ -132,8 +141,8 @@ class RandomEdits : public testing::TestWithParam<Setup> {
       for (int64 i = upTo(20); i >= 0; --i) setOne(start + i);
     } else if (what < 47 && !large) {
       appendRun();
-    } else if (what < 75) {
-      for (int64 i = large ? 8 : 1; i >= 0; --i) eraseOne();
+    } else if (what < 70) {
+      for (int64 i = large ? 20 : 0; i >= 0; --i) eraseOne();
     } else if (what < 85) {
       setSelected();
     } else {
@@ -146,7 +155,7 @@ class RandomEdits : public testing::TestWithParam<Setup> {
     for (unsigned m = 0; m < 8; ++m) {
       ASSERT_EQ(track.countHolding(m), model.countHolding(m)) << m;
       ASSERT_EQ(track.countSelected(m), model.countSelected(m)) << m;
-      const int64 i = upTo(model.size() + 1) - 1;
+      const int64 i = upTo(model.size() + 3) - 2;
       ASSERT_EQ(track.nextHolding(i, m), model.walk(i, 1, &Key::components, m)) << i << " " << m;
       ASSERT_EQ(track.nextSelected(i, m), model.walk(i, 1, &Key::selected, m)) << i << " " << m;
       ASSERT_EQ(track.previousHolding(i, m), model.walk(i, -1, &Key::components, m)) << i << " " << m;
@@ -166,6 +175,9 @@ class RandomEdits : public testing::TestWithParam<Setup> {
     }
     if (model.keys.empty()) return;
     const int64 i = upTo(model.size() - 1);
+    int64 k = i;
+    track.forEach(i, std::min(i + 20, model.size()),
+                  [&](Key const& key) { ASSERT_EQ(key.time, model.at(k++).time); });
     ASSERT_EQ(track.timeAt(i), model.at(i).time);
     ASSERT_EQ(track.at(i).values, model.at(i).values);
   }
