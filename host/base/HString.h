@@ -7,9 +7,9 @@
 #include "host/base/Types.h"
 
 #if defined(__GNUC__)
-#define TALIX_PRINTF(formatAt, firstAt) __attribute__((format(printf, formatAt, firstAt)))
+#define TALIX_PRINTF(text, first) __attribute__((format(printf, text, first)))
 #else
-#define TALIX_PRINTF(formatAt, firstAt)
+#define TALIX_PRINTF(text, first)
 #endif
 
 class HString {
