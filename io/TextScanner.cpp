@@ -151,7 +151,7 @@ std::string found(std::string_view word) { return word.empty() ? "the end of the
 
 std::string shortNumber(double value) {
   char text[32];
-  const auto end = std::to_chars(text, text + sizeof text, value, std::chars_format::general, 9).ptr;
+  const auto end = std::to_chars(text, text + sizeof text, value, std::chars_format::general, 10).ptr;
   return {text, end};
 }
 

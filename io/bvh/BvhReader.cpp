@@ -138,6 +138,7 @@ class MotionReader {
       if (firstLine == 0) firstLine = m_scanner.line();
       const auto number = parseNumber(word);
       if (!number) {
+        if (m_oddLine == 0 && &value != row.data()) m_oddLine = firstLine;
         if (word.empty()) failCount("the motion ends in frame " + std::to_string(frame + 1));
         m_scanner.fail("a number expected, not " + found(word) + ", in frame " + std::to_string(frame + 1));
       }

@@ -109,10 +109,11 @@ class JointWriter {
 class BvhWriter {
  public:
   BvhWriter(const Take& take, const std::string& path, std::vector<TakeNote>& notes)
-      : m_take(take), m_path(path), m_notes(notes), m_period(ticksPerFrameAt(take.rate)) {
+      : m_take(take), m_path(path), m_notes(notes) {
     if (take.joints.empty()) throw FileError(path, "BVH holds joints only, and the take has none");
     if (!(take.rate > 0) || !(take.unitInMillimetres > 0))
       throw FileError(path, "the take has no rate or no unit");
+    m_period = ticksPerFrameAt(take.rate);
     m_children.resize(take.joints.size());
     for (size_t i = 0; i < take.joints.size(); ++i) {
       const int parent = take.joints[i].parent;
@@ -257,7 +258,7 @@ class BvhWriter {
   const Take& m_take;
   const std::string& m_path;
   std::vector<TakeNote>& m_notes;
-  int64 m_period;
+  int64 m_period = 0;
   std::vector<std::vector<size_t>> m_children;  // by joint
   std::string m_hierarchy;
   std::vector<JointWriter> m_joints;  // in the order of the file

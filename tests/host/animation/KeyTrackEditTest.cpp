@@ -40,6 +40,11 @@ struct Setup {
   unsigned seed;
 };
 
+void PrintTo(Setup const& setup, std::ostream* out) {
+  *out << "width " << static_cast<int>(setup.shape) << ", " << setup.limits.leafKeys
+       << " keys in a leaf, fanout " << setup.limits.fanout << ", seed " << setup.seed;
+}
+
 class RandomEdits : public testing::TestWithParam<Setup> {
  protected:
   RandomEdits()
@@ -150,7 +155,7 @@ class RandomEdits : public testing::TestWithParam<Setup> {
     for (unsigned m = 0; m < 8; ++m) {
       ASSERT_EQ(track.countHolding(m), model.countHolding(m)) << m;
       ASSERT_EQ(track.countSelected(m), model.countSelected(m)) << m;
-      const int64 i = upTo(model.size() + 1) - 1;
+      const int64 i = upTo(model.size() + 3) - 2;
       ASSERT_EQ(track.nextHolding(i, m), model.walk(i, 1, &Key::components, m)) << i << " " << m;
       ASSERT_EQ(track.nextSelected(i, m), model.walk(i, 1, &Key::selected, m)) << i << " " << m;
       ASSERT_EQ(track.previousHolding(i, m), model.walk(i, -1, &Key::components, m)) << i << " " << m;
@@ -170,6 +175,9 @@ class RandomEdits : public testing::TestWithParam<Setup> {
     }
     if (model.keys.empty()) return;
     const int64 i = upTo(model.size() - 1);
+    int64 k = i;
+    track.forEach(i, std::min(i + 20, model.size()),
+                  [&](Key const& key) { ASSERT_EQ(key.time, model.at(k++).time); });
     ASSERT_EQ(track.timeAt(i), model.at(i).time);
     ASSERT_EQ(track.at(i).values, model.at(i).values);
   }
