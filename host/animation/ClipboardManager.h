@@ -1,0 +1,36 @@
+// The key clipboard. One that was never filled fits every channel and holds no keys.
+#pragma once
+
+#include <vector>
+
+#include "host/time/HTimeRange.h"
+
+class ClipboardManager {
+ public:
+  enum ClipboardDataType { NoData = 0, ModuleData = 1, ControllerData = 2 };
+  enum ControllerDataType { OtherKeys = 0, FloatKeys = 1, Vec3Keys = 2, RotKeys = 3, BoolKeys = 4 };
+
+  struct tagKey {
+    int64 time = 0;      // ticks
+    double x = 0, y = 0, z = 0;  // one-valued channels use x; rotations are Euler radians in the source's order
+    unsigned components = 0;     // 1 x, 2 y, 4 z
+    unsigned flags = 0;          // the key's own, as its channel reports them
+  };
+
+  // What is added until finishClipboardCopy replaces the content; keep: false takes the copy back.
+  void startClipboardCopy(ClipboardDataType data, ControllerDataType type);
+  void addKey(tagKey key) { m_incoming.push_back(key); }
+  void finishClipboardCopy(bool keep);
+
+  bool isEmpty() const { return !m_filled; }
+  ControllerDataType getControllerDataType() const { return m_type; }
+  int getNumControllerKeys() const { return static_cast<int>(m_keys.size()); }
+  tagKey getControllerKey(int i) const { return m_keys[static_cast<size_t>(i)]; }
+  // From the earliest to the latest key; empty without keys.
+  HTimeRange getControllerDataRange() const;
+
+ private:
+  std::vector<tagKey> m_keys, m_incoming;
+  ControllerDataType m_type = OtherKeys, m_incomingType = OtherKeys;
+  bool m_filled = false;
+};

@@ -1,0 +1,234 @@
+// An animated channel of a module: a default value and, for each clip and layer, a track of keys.
+//
+//  1. With no active clip (the base clip) a channel reads as its default value and holds no keys.
+//  2. The lowest layer of the active clip gives the value; each further layer with keys adds to it (numbers) or
+//     composes on the right (rotations). A lowest layer without keys gives the default value.
+//  3. Key operations read and edit the active layer of the active clip.
+//  4. Every change of keys stands between beginDataEdit and endDataEdit.
+//
+// Times are ticks, angles radians, lengths millimetres. Masks: 1 x, 2 y, 4 z, 7 all; one-valued channels use 1 or 7.
+#pragma once
+
+#include <memory>
+#include <vector>
+
+#include "host/animation/DataSource.h"
+#include "host/animation/KeyTrack.h"
+#include "host/base/HString.h"
+#include "host/base/Variable.h"
+#include "host/control/ControlID.h"
+#include "host/math/TalixRotation.h"
+#include "host/math/Vec3.h"
+#include "host/time/HTimeRange.h"
+
+class Module;
+class NLEClip;
+
+class Controller : public DataSource {
+  H_DECLARE_CLASS(Controller, DataSource)
+
+ public:
+  using Values = KeyTrack::Values;
+
+  // --- names ---------------------------------------------------------------------------------------------------
+  static PropertyType mapToPropertyType(HString const& name);
+  static PropertyType mapToPropertyType(unsigned id);
+  static HString mapPropertyId(unsigned id);
+  static unsigned mapPropertyName(HString const& name);  // 0: no channel
+  // Trims blanks, restores a known name's case (with a component as well: "translation.y" -> "Translation.y"),
+  // expands tx ty tz rx ry rz sx sy sz.
+  static void fixChannelStr(HString& text);
+
+  // A new channel of a kind; its module gives it an owner and a name.
+  static std::unique_ptr<Controller> create(PropertyType type);
+
+  HString getName() const { return mapPropertyId(m_propertyId); }
+  unsigned getPropertyId() const { return m_propertyId; }
+  virtual PropertyType getPropertyType() const = 0;
+  Module* getModule() const { return m_module; }
+  ControlID getID() const { return m_id; }
+
+  // --- editing -------------------------------------------------------------------------------------------------
+  // When a clip is active that holds keys, and neither the clip, nor the layer, nor the module, nor the channel is
+  // locked.
+  bool isEditable() const override;
+  bool isLocked() const { return m_locked; }
+  void setLocked(bool locked);
+
+  virtual void beginDefaultEdit();
+  virtual void beginDataEdit(HTimeRange const& range);
+  virtual void endDataEdit();
+
+  // --- keys of the active layer --------------------------------------------------------------------------------
+  virtual int getNumKeys() const;
+  virtual int getNumKeys(unsigned mask) const;
+  virtual int getNumSelectedKeys() const;
+  virtual int getNumSelectedKeys(unsigned mask) const;
+  virtual int getSelectedKeyIndex(int i) const;
+  virtual unsigned getSelectedKeyFlags(int i) const;
+  virtual int64 getKeyTime(int key) const;
+  virtual bool keyHasComponents(int key, unsigned mask) const;
+  virtual bool hasKeyAt(int64 time) const;                  // any components
+  virtual bool hasKeyAt(int64 time, unsigned mask) const;   // all of these
+  virtual bool isKeySelectedAt(int64 time, unsigned mask) const;
+  // From the first to the last key; empty without keys.
+  virtual HTimeRange getKeyRange() const;
+
+  virtual int selectKeys(HTimeRange const& range, unsigned mask);
+  virtual int deselectKeys(HTimeRange const& range, unsigned mask);
+  // These answer how many keys lost something. allLayers: in every layer of the active clip.
+  virtual int deleteKey(int64 time, unsigned mask);
+  virtual int deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers);
+  virtual int deleteSelectedKeys(unsigned mask);
+
+  // Raw values: 1, 3 or 4 doubles (a rotation's quaternion), as KeyTrack holds them.
+  void readKey(int key, Values& values) const;
+  void writeKey(int key, Values const& values, unsigned mask);
+  void writeKeyAt(int64 time, Values const& values, unsigned mask);
+  void evaluate(int64 time, Values& values) const;
+  // The value of the active layer alone, to which a relative edit adds.
+  void evaluateLayer(int64 time, Values& values) const;
+  Values const& getDefaultValues() const { return m_default; }
+  void setDefaultValues(Values const& values);
+
+  // --- interpolation -------------------------------------------------------------------------------------------
+  virtual int getNumInterpTypes() const;
+  virtual char const* getInterpTypeName(int i) const;
+  virtual void setInterpType(int i);
+  Interpolation getInterpolation() const { return m_interpolation; }
+
+  // --- clips and layers ----------------------------------------------------------------------------------------
+  // The keys in a clip and layer; null when it has none there.
+  KeyTrack const* findTrack(NLEClip const* clip, int layer) const;
+  KeyTrack const* findActiveTrack() const;
+  // Replaces the keys in a clip and layer: how importers, copies and undo put whole tracks in place.
+  void setTrack(NLEClip* clip, int layer, KeyTrack track);
+  bool hasKeysInClip(NLEClip const* clip) const;
+  HTimeRange getKeyRangeInClip(NLEClip const* clip) const;
+  void forgetClip(NLEClip const* clip);
+
+  // Copies default value, interpolation and the keys of the active clip from a channel of the same kind. False when
+  // the kinds differ or this channel is not editable.
+  virtual bool copyFrom(Controller const* source, bool keys, bool selectionToo);
+
+  // The shape that keys of a kind of channel have.
+  static KeyTrack::Shape shapeOf(PropertyType type);
+
+ protected:
+  Controller(Interpolation interpolation, int numInterpTypes)
+      : m_interpolation(interpolation), m_numInterpTypes(static_cast<unsigned char>(numInterpTypes)) {}
+  // Layers above the lowest: adds `layer` to `values`.
+  virtual void compose(Values& values, Values const& layer) const;
+  // Clips of a blend: the weighted mean of `count` values; weights sum to 1.
+  virtual void blend(Values const* values, double const* weights, int count, Values& out) const;
+
+  Values m_default{};
+
+ private:
+  friend class Module;
+
+  struct ClipTrack {
+    NLEClip* clip;
+    int layer;
+    KeyTrack track;
+    mutable KeyTrack::Cursor cursor;
+  };
+  ClipTrack const* find(NLEClip const* clip, int layer) const;
+  // The mutator of keys: the track of the active layer, made when there is none. Null on the base clip.
+  KeyTrack* editTrack();
+  KeyTrack* editTrack(NLEClip* clip, int layer);
+  void evaluateInClip(NLEClip const* clip, int64 time, Values& values) const;
+  void changed();
+
+  Module* m_module = nullptr;
+  ControlID m_id{ControlID::CreateUnique};
+  unsigned m_propertyId = 0;
+  Interpolation m_interpolation;
+  unsigned char m_numInterpTypes;  // the first so many of Constant, Linear, Cubic
+  bool m_locked = false;
+  int m_editDepth = 0;
+  std::vector<ClipTrack> m_tracks;
+};
+
+class FloatController : public Controller {
+  H_DECLARE_CLASS(FloatController, Controller)
+
+ public:
+  FloatController() : Controller(Interpolation::Linear, 3) {}
+  PropertyType getPropertyType() const override { return FloatProperty; }
+  double getValue(int64 time) const;
+  double getKeyValue(int key) const;
+  void setKeyValue(int key, double value, unsigned mask);
+  void setKey(int64 time, double value, unsigned mask);
+  double getConstValue() const { return m_default[0]; }
+  void setConstValue(double value, bool notify);
+};
+
+class IntController : public Controller {
+  H_DECLARE_CLASS(IntController, Controller)
+
+ public:
+  IntController() : Controller(Interpolation::Constant, 3) {}
+  PropertyType getPropertyType() const override { return IntProperty; }
+  int getValue(int64 time) const;  // rounded to the nearest
+  int getKeyValue(int key) const;
+  void setKeyValue(int key, int value, unsigned mask);
+  void setKey(int64 time, int value, unsigned mask);
+  int getConstValue() const { return static_cast<int>(m_default[0]); }
+  void setConstValue(int value, bool notify);
+};
+
+class BoolController : public Controller {
+  H_DECLARE_CLASS(BoolController, Controller)
+
+ public:
+  BoolController() : Controller(Interpolation::Constant, 1) {}
+  PropertyType getPropertyType() const override { return BoolProperty; }
+  bool getValue(int64 time) const;
+  bool getKeyValue(int key) const;
+  void setKeyValue(int key, bool value, unsigned mask);
+  void setKey(int64 time, bool value, unsigned mask);
+  bool getConstValue() const { return m_default[0] != 0; }
+  void setConstValue(bool value, bool notify);
+
+ protected:
+  // A later layer's value replaces the one below.
+  void compose(Values& values, Values const& layer) const override;
+};
+
+class Vec3Controller : public Controller {
+  H_DECLARE_CLASS(Vec3Controller, Controller)
+
+ public:
+  Vec3Controller() : Controller(Interpolation::Linear, 3) {}
+  PropertyType getPropertyType() const override { return Vec3Property; }
+  Vec3 getValue(int64 time) const;
+  double getComponentValue(int64 time, unsigned mask) const;  // mask 1, 2 or 4
+  Vec3 getKeyValue(int key) const;
+  double getKeyComponentValue(int key, unsigned mask) const;
+  void setKeyValue(int key, Vec3 const& value, unsigned mask);
+  void setKeyComponentValue(int key, double value, unsigned mask);
+  void setKey(int64 time, Vec3 const& value, unsigned mask);
+  void setComponentKey(int64 time, double value, unsigned mask);
+  Vec3 getConstValue() const { return Vec3(m_default.data()); }
+  // Answers whether the value was taken: a vector that is not finite is not.
+  bool setConstValue(Vec3 value, bool notify, bool force);
+};
+
+class RotController : public Controller {
+  H_DECLARE_CLASS(RotController, Controller)
+
+ public:
+  RotController() : Controller(Interpolation::Linear, 3) { m_default[3] = 1; }
+  PropertyType getPropertyType() const override { return RotProperty; }
+  TalixRotation getValue(int64 time) const;
+  TalixRotation getKeyValue(int key) const;
+  void setKeyValue(int key, TalixRotation const& value, unsigned mask);
+  void setKey(int64 time, TalixRotation const& value, unsigned mask);
+  TalixRotation getConstValue() const;
+  void setConstValue(TalixRotation const& value, bool notify);
+
+ protected:
+  void compose(Values& values, Values const& layer) const override;
+  void blend(Values const* values, double const* weights, int count, Values& out) const override;
+};

@@ -1,0 +1,69 @@
+// Base class of every script command.
+//
+// The host checks the arguments first (checkArgSyntax); execute runs only when they are accepted. It answers true on
+// success and false on failure, after at least one error line; `result` stays unset on failure. Commands are
+// reference-counted and keep no state between runs. Everything happens on the main thread.
+#pragma once
+
+#include <memory>
+#include <vector>
+
+#include "host/base/HObject.h"
+#include "host/base/TArray.h"
+#include "host/command/CommandOption.h"
+
+class Command : public HObject {
+  // Every command answers this record: commands declare none of their own.
+  H_DECLARE_CLASS(Command, HObject)
+
+ public:
+  // The third text is unused; it is part of the host's interface. A new command holds one reference.
+  Command(HString const& scriptName, HString const& displayName, HString const& unused);
+  ~Command() override;
+  void deleteThis() override { unref(); }
+
+  virtual bool execute(TArray<CommandOption> const& givenOptions, TArray<Variable> const& args, Variable& result) = 0;
+  // The text for the arguments, as help shows it. The host's default is no text.
+  virtual void getArgSyntaxString(HString& out) const;
+  // Whether these arguments are accepted. The host's default accepts none.
+  virtual bool checkArgSyntax(TArray<Variable> const& args, TArray<CommandOption> const& options) const;
+  // Whether the command makes sense without arguments and options: for interfaces. The host's default is true.
+  virtual bool canExecuteSolo() const;
+  // The host's default is Variable::None.
+  virtual Variable::VarType getReturnType();
+  // The index of the option of that name (without "-"), its argument count and type; -1 when there is none.
+  virtual int getOptionSyntax(char const* name, int& argCount, Variable::VarType& type) const;
+  // Whether running it is a step of undo. The host's default is true.
+  virtual bool isUndoable() const;
+
+  HString const& getName() const { return m_name; }
+  HString const& getDisplayName() const { return m_displayName; }
+  HString const& getCategory() const { return m_category; }
+  HString const& getSubCategory() const { return m_subCategory; }
+  // What it is for, in one line.
+  HString const& getPurpose() const { return m_purpose; }
+
+  int getNumOptions() const { return static_cast<int>(m_options.size()); }
+  CommandOption const& getOption(int i) const { return *m_options[static_cast<size_t>(i)]; }
+
+  void ref() { ++m_references; }
+  // Lets go of one reference; with the last the command is destroyed, and the answer is true.
+  bool unref();
+
+  // One line to the log; printf-style.
+  static void logError(char const* format, ...) TALIX_PRINTF(1, 2);
+  static void logWarning(char const* format, ...) TALIX_PRINTF(1, 2);
+  static void logInfo(char const* format, ...) TALIX_PRINTF(1, 2);
+
+ protected:
+  void setCommandCategory(HString category, HString subCategory);
+  void setPurpose(HString const& purpose) { m_purpose = purpose; }
+  // Declares the next option, which the command owns from then on. mask: bits, by index, of the options it
+  // excludes. hidden: accepted, but not shown in help.
+  CommandOption* addOption(CommandOption* option, uint64 mask, bool hidden);
+
+ private:
+  HString m_name, m_displayName, m_category, m_subCategory, m_purpose;
+  std::vector<std::unique_ptr<CommandOption>> m_options;
+  int m_references = 1;
+};

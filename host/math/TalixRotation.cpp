@@ -1,0 +1,133 @@
+#include "host/math/TalixRotation.h"
+
+#include <ImathQuat.h>
+#include <ImathVec.h>
+
+#include <algorithm>
+#include <cmath>
+#include <numbers>
+
+namespace {
+
+using Quat = Imath::Quatd;
+
+// The axes of each order, first applied first.
+constexpr int kAxes[6][3] = {{0, 1, 2}, {0, 2, 1}, {1, 0, 2}, {1, 2, 0}, {2, 0, 1}, {2, 1, 0}};
+
+// +1 when the axes of the order follow each other as x, y, z do.
+constexpr double parity(const int (&axes)[3]) { return (axes[1] - axes[0] + 3) % 3 == 1 ? 1.0 : -1.0; }
+
+Quat aboutAxis(int axis, double angle) {
+  Imath::V3d v(0);
+  v[axis] = std::sin(angle / 2);
+  return Quat(std::cos(angle / 2), v);
+}
+
+}  // namespace
+
+TalixRotation& TalixRotation::operator*=(TalixRotation const& o) {
+  const Quat product = Quat(m_w, m_x, m_y, m_z) * Quat(o.m_w, o.m_x, o.m_y, o.m_z);
+  const double xyzw[4] = {product.v.x, product.v.y, product.v.z, product.r};
+  setQuaternion(xyzw);
+  return *this;
+}
+
+TalixRotation TalixRotation::inverse() const {
+  TalixRotation result = *this;
+  result.m_x = -m_x, result.m_y = -m_y, result.m_z = -m_z;
+  return result;
+}
+
+Vec3 TalixRotation::rotate(Vec3 const& v) const {
+  const Vec3 axis(m_x, m_y, m_z);
+  const Vec3 t = axis.cross(v) * 2.0;
+  return v + t * m_w + axis.cross(t);
+}
+
+void TalixRotation::setAsEuler(RotOrder order, Vec3 const& angles) {
+  const auto& axes = kAxes[order];
+  const Quat q = aboutAxis(axes[2], angles[axes[2]]) * aboutAxis(axes[1], angles[axes[1]]) *
+                 aboutAxis(axes[0], angles[axes[0]]);
+  const double xyzw[4] = {q.v.x, q.v.y, q.v.z, q.r};
+  setQuaternion(xyzw);
+}
+
+void TalixRotation::getAsEuler(RotOrder order, Vec3& angles) const {
+  // R = R_k(c) R_j(b) R_i(a) for the order i, j, k. With s the order's parity, the entries that name one or two
+  // angles are R[k][i] = -s sin b, R[k][j] / R[k][k] = s tan a, R[j][i] / R[i][i] = s tan c.
+  const auto& [i, j, k] = kAxes[order];
+  const double s = parity(kAxes[order]);
+  Vec3 columns[3];
+  for (int axis = 0; axis < 3; ++axis) {
+    Vec3 unit;
+    unit[axis] = 1;
+    columns[axis] = rotate(unit);
+  }
+  const auto entry = [&](int row, int column) { return columns[column][row]; };
+  const double cosB = std::hypot(entry(i, i), entry(j, i));
+  angles[j] = std::atan2(-s * entry(k, i), cosB);
+  if (cosB > 1e-9) {
+    angles[i] = std::atan2(s * entry(k, j), entry(k, k));
+    angles[k] = std::atan2(s * entry(j, i), entry(i, i));
+  } else {
+    angles[i] = std::atan2(-s * entry(j, k), entry(j, j));
+    angles[k] = 0;
+  }
+}
+
+void TalixRotation::setAsVector(Vec3 rotationVector) {
+  const double angle = rotationVector.length();
+  // sin(angle / 2) / angle, by its series where the quotient loses digits.
+  const double factor = angle < 1e-4 ? 0.5 - angle * angle / 48 : std::sin(angle / 2) / angle;
+  const double xyzw[4] = {rotationVector.x * factor, rotationVector.y * factor, rotationVector.z * factor,
+                          std::cos(angle / 2)};
+  setQuaternion(xyzw);
+}
+
+void TalixRotation::getAsVector(Vec3& rotationVector) const {
+  const double sign = m_w < 0 ? -1 : 1;
+  const Vec3 axis(m_x * sign, m_y * sign, m_z * sign);
+  const double sine = axis.length();
+  const double angle = 2 * std::atan2(sine, m_w * sign);
+  rotationVector = axis * (sine < 1e-9 ? 2.0 : angle / sine);
+}
+
+void TalixRotation::setQuaternion(double const* xyzw) {
+  const double length = std::sqrt(xyzw[0] * xyzw[0] + xyzw[1] * xyzw[1] + xyzw[2] * xyzw[2] + xyzw[3] * xyzw[3]);
+  if (!(length > 0) || !std::isfinite(length)) return makeIdentity();
+  // A quaternion that is of unit length to the last digits is kept as it is, so that what was stored reads back.
+  const double scale = std::abs(length - 1) < 1e-15 ? 1 : 1 / length;
+  m_x = xyzw[0] * scale, m_y = xyzw[1] * scale, m_z = xyzw[2] * scale, m_w = xyzw[3] * scale;
+}
+
+void TalixRotation::getQuaternion(double* xyzw) const { xyzw[0] = m_x, xyzw[1] = m_y, xyzw[2] = m_z, xyzw[3] = m_w; }
+
+TalixRotation TalixRotation::slerp(TalixRotation const& a, TalixRotation const& b, double part) {
+  const Quat q = Imath::slerpShortestArc(Quat(a.m_w, a.m_x, a.m_y, a.m_z), Quat(b.m_w, b.m_x, b.m_y, b.m_z), part);
+  const double xyzw[4] = {q.v.x, q.v.y, q.v.z, q.r};
+  TalixRotation result;
+  result.setQuaternion(xyzw);
+  return result;
+}
+
+double unrolled(double angle, double near) {
+  constexpr double turn = 2 * std::numbers::pi;
+  return angle + std::round((near - angle) / turn) * turn;
+}
+
+Vec3 unrolledEuler(TalixRotation::RotOrder order, Vec3 const& angles, Vec3 const& near) {
+  const auto& [i, j, k] = kAxes[order];
+  Vec3 other;  // the second solution turns the outer axes by half a turn and mirrors the middle angle
+  other[i] = angles[i] + std::numbers::pi;
+  other[j] = std::numbers::pi - angles[j];
+  other[k] = angles[k] + std::numbers::pi;
+  Vec3 best, second;
+  double bestWay = 0, secondWay = 0;
+  for (int axis = 0; axis < 3; ++axis) {
+    best[axis] = unrolled(angles[axis], near[axis]);
+    second[axis] = unrolled(other[axis], near[axis]);
+    bestWay += std::abs(best[axis] - near[axis]);
+    secondWay += std::abs(second[axis] - near[axis]);
+  }
+  return secondWay < bestWay ? second : best;
+}

@@ -1,0 +1,144 @@
+// The scene, reached through g_db: modules by path, index, identifier and selection; clips; active properties;
+// scene-wide settings. All changes of membership, hierarchy and selection pass through it.
+#pragma once
+
+#include <memory>
+#include <vector>
+
+#include "host/animation/Clips.h"
+#include "host/scene/Selection.h"
+#include "host/services/Log.h"
+
+class CalibrationMgr;
+class ClipboardManager;
+class SceneIndex;
+class SubjectManager;
+
+class Database {
+ public:
+  Database();
+  ~Database();
+  Database(Database const&) = delete;
+  Database& operator=(Database const&) = delete;
+
+  // An empty scene, with a new time manager's settings and the built-in channels only.
+  void newScene();
+
+  // --- modules -------------------------------------------------------------------------------------------------
+  // A module of a class, with a name that its siblings do not have ("a", then "a_1"; empty: the class name), in the
+  // scene. The first clip becomes active. Null for an abstract class or one that is no module class, a name that
+  // cannot stand, a 32nd clip, a second module of a single-instance class, a parent that refuses.
+  Module* createModule(HRuntimeClass* type, char const* name, Module* parent);
+  // Puts a module made by createInstance into the scene, which owns it from then on. `uniqueName`: it gets a name
+  // that its siblings do not have. `character` (may be null) becomes its parent. select: it becomes selected.
+  // False, and the caller keeps the module, when createModule would refuse.
+  bool addToScene(Module* module, bool uniqueName, Character const* character, bool select, bool notify);
+  // Takes the module and all below it out of the scene, with every reference to them. It lives on until
+  // releaseRemoved. False when it is not in the scene. The flags: with its children, from the selection, undoable,
+  // notify; children always go with it.
+  bool removeFromScene(Module* module, bool children, bool deselect, bool undoable, bool notify);
+  // Destroys what was removed since; whoever runs commands calls it after each line.
+  void releaseRemoved();
+
+  int getNumModules() const { return m_modules.getCount(); }
+  Module* getModule(int i) const { return m_modules.at(i); }  // in order of creation
+  Module* getModule(ControlID& id) const;
+  Module* getModule(HString& path) const { return getModuleWithPath(path, nullptr, false); }
+  // The module that a full path or a suffix of one names, among those of a class (null: any). A suffix that fits
+  // several names the one below the priority module, if that is one. priorityOnly: only the priority module's tree
+  // is searched, or everything when there is none.
+  Module* getModuleWithPath(HString const& path, HRuntimeClass const* filter, bool priorityOnly) const;
+  int getNumNodes() const { return m_nodes.getCount(); }
+  Node* getNode(int i) const { return m_nodes.at(i); }
+  TSimpleArray<Marker*> getMarkers() const;
+  TSimpleArray<Module*> getModulesOfType(HRuntimeClass const* type) const;  // and of its subclasses
+  bool moduleOfTypeExists(HRuntimeClass const* type) const;
+  SceneIndex& getIndex() const { return *m_index; }
+
+  // --- selection -----------------------------------------------------------------------------------------------
+  Module* getPrimarySelectedModule() const { return m_selection.getPrimary(); }
+  bool setPrimarySelectedModule(Module* module);  // selects it when need be; null: none. False: not in the scene
+  int getNumSelectedModules() const { return m_selection.getCount(); }
+  Module* getSelectedModule(int i) const { return m_selection.at(i); }
+  int getNumSelectedNodes() const { return m_selection.getNumNodes(); }
+  Node* getSelectedNode(int i) const { return m_selection.getNode(i); }
+  int getNumSelectedMarkers() const { return m_selection.getNumMarkers(); }
+  Marker* getSelectedMarker(int i) const { return m_selection.getMarker(i); }
+  LabelingBone* getSelectedLabelingBone(int i) const;  // null beyond them
+  void selectAllModules(bool select);
+  Selection& getSelection() { return m_selection; }
+
+  // --- priority ------------------------------------------------------------------------------------------------
+  Module* getPriorityModule() const { return m_priority; }
+  void setPrioritySearchModule(Module* module) { m_priority = module; }
+
+  // --- clips and layers ----------------------------------------------------------------------------------------
+  int getNumClips() const { return m_clips.getCount(); }
+  NLEClip* getHeadClip() const { return m_clips.getCount() ? m_clips.at(0) : nullptr; }
+  NLEClip* getClipAfter(NLEClip const* clip) const;
+  NLEClip* getActiveClip() const { return m_activeClip; }  // null: the base clip
+  void setActiveClip(NLEClip* clip);                       // its lowest layer becomes active
+  int getActiveLayer() const { return m_activeClip ? m_activeLayer : -1; }
+  bool setActiveLayer(int layer);  // false: the active clip has no such layer
+
+  // --- active properties: channels, or components of channels, that key commands work on ------------------------
+  int getNumActiveProperties() const { return static_cast<int>(m_activeProperties.size()); }
+  // A property id with its component bits (PropertyTable).
+  unsigned int getActiveProperty(int i) const { return m_activeProperties[static_cast<size_t>(i)]; }
+  void setActiveProperties(std::vector<unsigned> ids);
+  // Whether active properties follow what is keyed; off at start.
+  bool getAutoUpdateProperties() const { return m_autoUpdateProperties; }
+  void setAutoUpdateProperties(bool on) { m_autoUpdateProperties = on; }
+  // Drops active properties that no module has any more. notify: views are told.
+  void syncActiveProperties(bool notify);
+
+  // --- settings ------------------------------------------------------------------------------------------------
+  static bool isDevOnlyMode();
+  static void setDevOnlyMode(bool on);
+  bool getUpdateSolversBeforeClips() const { return m_solversBeforeClips; }
+  void setUpdateSolversBeforeClips(bool on) { m_solversBeforeClips = on; }
+  // Red, green and blue, 0 to 255.
+  static Vec3 const& getDefaultModColor();
+  static Vec3 const& getPrimSelModColor();
+  static Vec3 const& getSelModColor();
+  // The axis that points up: 0 x, 1 y, 2 z; -1 until a take or the user sets it.
+  int getUpAxis() const { return m_upAxis; }
+  void setUpAxis(int axis) { m_upAxis = axis; }
+
+  CalibrationMgr* getCalibrationMgr() const { return m_calibration.get(); }
+  ClipboardManager* getClipboardManager() const { return m_clipboard.get(); }
+  SubjectManager* getSubjectManager() const { return m_subjects.get(); }
+
+  void logError(char const* format, ...) TALIX_PRINTF(2, 3);
+  void logInfo(char const* format, ...) TALIX_PRINTF(2, 3);
+
+ private:
+  friend class Module;
+
+  bool mayJoin(Module const* module) const;
+  // Mutators of membership: put a set-up module with its name and parent into every index, and take it out.
+  void enter(Module* module);
+  void leave(Module* module);
+
+  OrderedList<Module, &Module::m_sceneSlot> m_modules;
+  OrderedList<Node, &Node::m_nodeSlot> m_nodes;
+  OrderedList<NLEClip, &NLEClip::m_clipSlot> m_clips;
+  std::unordered_map<ControlID, Module*> m_byId;
+  std::unordered_map<HRuntimeClass const*, int> m_countByClass;
+  std::unique_ptr<SceneIndex> m_index;
+  std::vector<std::unique_ptr<Module>> m_removed;
+  uint64 m_created = 0;
+  Selection m_selection;
+  Module* m_priority = nullptr;
+  NLEClip* m_activeClip = nullptr;
+  int m_activeLayer = 0;
+  std::vector<unsigned> m_activeProperties;
+  bool m_autoUpdateProperties = false;
+  bool m_solversBeforeClips = false;
+  int m_upAxis = -1;
+  std::unique_ptr<CalibrationMgr> m_calibration;
+  std::unique_ptr<ClipboardManager> m_clipboard;
+  std::unique_ptr<SubjectManager> m_subjects;
+};
+
+extern Database* g_db;

@@ -1,0 +1,166 @@
+// A scene object: name and paths, parent and children, attributes, channels.
+//
+// The Database owns modules; a module owns its channels and attributes; parent and child links do not own. Names are
+// not empty and hold no backslash; siblings may share one.
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "host/animation/Controller.h"
+#include "host/base/TArray.h"
+#include "host/base/TSimpleArray.h"
+#include "host/scene/Attribute.h"
+#include "host/scene/OrderedList.h"
+
+class Character;
+class NLEClip;
+class Node;
+
+// Someone who points at modules and must let go of one that leaves the scene.
+class ModuleReferrer {
+ public:
+  virtual void forget(Module* module) = 0;
+
+ protected:
+  ~ModuleReferrer() = default;
+};
+
+class Module : public HObject {
+  H_DECLARE_CLASS(Module, HObject)
+
+ public:
+  enum EPathType { NameOnly = 0, ShortestPath = 1, FullPath = 3 };
+
+  ~Module() override;
+
+  // --- names and paths -----------------------------------------------------------------------------------------
+  virtual HString getName() const { return m_name; }
+  ControlID getID() const { return m_id; }
+  // Whether a name can stand: not empty, no backslash.
+  static bool isValidName(HString const& name);
+  // False for a name that cannot stand. Siblings' names are not looked at.
+  bool setName(HString const& name);
+  HString getPath(EPathType type) const;
+  // The names from the root, each after a backslash.
+  HString getFullPathString() const;
+  // The shortest suffix of the full path that names this module alone. withinPriority: alone below the priority
+  // module, when this module lies below it.
+  HString getMinimumPathString(bool withinPriority) const;
+
+  // --- namespaces: the prefixes of a name, joined by ":", outermost first ----------------------------------------
+  virtual void getNamespace(HString& out) const;
+  virtual void getNamespaces(TArray<HString>& out) const;
+  virtual bool addNamespace(HString const& name);
+  virtual bool removeNamespace(HString const& name);
+  virtual bool replaceNamespace(HString const& former, HString const& name);
+
+  // --- hierarchy -----------------------------------------------------------------------------------------------
+  Module* getParent() const { return m_parent; }
+  int getNumChildren() const;
+  Module* getChild(int i) const;
+  // The nearest ancestor that is a node.
+  Node* getNodeParent() const;
+  int getNumNodeChildren() const;
+  Node* getNodeChild(int i) const;
+  Character* getCharacterParent() const;  // the nearest ancestor that is a character
+  bool isDescendedFrom(Module const* ancestor) const;
+  // This module and all below it, parents first.
+  void getModAndDecedents(TSimpleArray<Module*>& out);
+  // Takes the child from its present parent. Refused: a module below itself, one that is not in the scene, a
+  // character (it stays a root).
+  virtual bool addChild(Module* child);
+  // The child becomes a root. keepPlace: the scene's order stays as it is.
+  virtual bool removeChild(Module* child, bool keepPlace);
+
+  // --- attributes ----------------------------------------------------------------------------------------------
+  int getNumAttributes() const { return static_cast<int>(m_attributes.size()); }
+  Attribute* getAttribute(int i) const { return m_attributes[static_cast<size_t>(i)].get(); }
+  Attribute* getAttribute(char const* name) const;  // exact case; null: none
+  Attribute* getAttribute(ControlID id) const;
+  // Adds a custom attribute. Null when the name is taken by an attribute or channel or cannot stand.
+  Attribute* addCustomAttribute(std::unique_ptr<Attribute> attribute);
+
+  // --- channels ------------------------------------------------------------------------------------------------
+  int getNumChannels() const { return static_cast<int>(m_channels.size()); }
+  Controller* getChannel(int i) const { return m_channels[static_cast<size_t>(i)].get(); }
+  Controller* getChannel(char const* name) const;
+  Controller* getChannel(ControlID id) const;
+  Controller* getProperty(HString const& name) const { return getChannel(name.GetStr()); }
+  Controller* getProperty(unsigned id) const;  // component bits do not matter
+  // The module's channel of that name, added when it has none. Null when the name has another kind, is taken by an
+  // attribute, or cannot stand.
+  Controller* addChannel(HString const& name, DataSource::PropertyType type);
+  // The channel's or attribute's number into `value`: empty on success, else the text to show. byDefault: the
+  // channel's default value instead of that at the current time. A name may end in ".x", ".y", ".z".
+  HString getPropertyVal(HString const& name, double& value, bool byDefault) const;
+
+  // Names of channels and attributes hold no dot and no backslash and are not empty.
+  static bool isValidPropertyName(HString const& name);
+
+  // --- data ----------------------------------------------------------------------------------------------------
+  virtual bool hasKeysInClip(NLEClip const* clip, bool allLayers) const;
+  virtual void addToClip(NLEClip* clip);
+  // From the first to the last key of all channels in the active clip.
+  virtual HTimeRange getDataRange() const;
+  virtual void beginDataEdit(HTimeRange const& range);
+  virtual void endDataEdit();
+  virtual void discardDataEdit();  // restores what was there when the edit began
+
+  // --- state ---------------------------------------------------------------------------------------------------
+  bool isVisible() const;
+  void setVisible(bool visible, bool notify);
+  bool isLocked() const;
+  virtual bool isSelected() const { return m_selectionSlot != kNoSlot; }
+  virtual void setSelected(bool selected);
+  bool isInScene() const { return m_sceneSlot != kNoSlot; }
+
+ protected:
+  Module();
+  // Gives the module its built-in attributes and channels; called once, by the database, before it enters the scene.
+  // A subclass calls its base first.
+  virtual void setUp();
+  Attribute* addAttribute(std::unique_ptr<Attribute> attribute, Attribute::Reaction reaction = nullptr);
+  template <class T, class... Args>
+  T* addBuiltIn(char const* name, Args&&... args) {
+    auto attribute = std::make_unique<T>(std::forward<Args>(args)...);
+    attribute->m_name = name;
+    return static_cast<T*>(addAttribute(std::move(attribute)));
+  }
+  void setReaction(Attribute* attribute, Attribute::Reaction reaction) { attribute->m_reaction = reaction; }
+  // Something that shows in the module's value at a time has changed.
+  virtual void dataChanged(Controller const*) {}
+
+ private:
+  friend class Attribute;
+  friend class Controller;
+  friend class Database;
+  friend class NameAttribute;
+  friend class NodeGraph;
+  friend class SceneIndex;
+  friend class SceneReferences;
+  friend class Selection;
+
+  void storeName(HString const& name);   // mutator
+  void storeParent(Module* parent);      // mutator: unlinks, links at the end
+  std::string suffixText(int levels) const;
+
+  struct Children;
+  Children& children();
+
+  HString m_name;
+  ControlID m_id{ControlID::CreateUnique};
+  Module* m_parent = nullptr;
+  std::unique_ptr<Children> m_children;  // null: none yet
+  uint32 m_childSlot = kNoSlot;
+  uint32 m_nodeChildSlot = kNoSlot;
+  uint32 m_sceneSlot = kNoSlot;
+  uint32 m_selectionSlot = kNoSlot;
+  uint64 m_order = 0;  // of creation
+  std::vector<std::unique_ptr<Attribute>> m_attributes;
+  std::vector<std::unique_ptr<Controller>> m_channels;
+  std::vector<ModuleReferrer*> m_referrers;
+  struct DataEdit;
+  std::unique_ptr<DataEdit> m_dataEdit;  // only while an edit is open
+};

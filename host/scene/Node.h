@@ -1,0 +1,127 @@
+// A module with a transform.
+//
+// Parent-space position = pre-translation + pre-rotation * translation; orientation = pre-rotation * rotation; scale
+// as is. "Local" means the channel's own value. World space composes through the nearest node ancestors; a parent's
+// scale moves its children, and world scale is the product by component. Lengths are millimetres, times ticks.
+// "Const" operations use default values throughout.
+#pragma once
+
+#include <vector>
+
+#include "host/scene/MarkerConnection.h"
+#include "host/scene/Module.h"
+
+// Where a node's frame lies in another one.
+struct Placement {
+  Vec3 position;
+  TalixRotation rotation;
+  Vec3 scale{1, 1, 1};
+};
+
+class Node : public Module, private ModuleReferrer {
+  H_DECLARE_CLASS(Node, Module)
+
+ public:
+  ~Node() override;
+
+  Vec3Controller* getTranslationChannel() const { return m_translation; }
+  RotController* getRotationChannel() const { return m_rotation; }
+  Vec3Controller* getScaleChannel() const { return m_scale; }
+  // The channel that key searches of a node look at: "Translation".
+  Controller* getTransformChannel() const { return m_translation; }
+
+  TalixRotation::RotOrder getRotationOrder() const;
+  bool setRotationOrder(TalixRotation::RotOrder order);
+  virtual int getNumDofs() const { return 0; }
+
+  // --- reading -------------------------------------------------------------------------------------------------
+  Vec3 getLocalPos(int64 time) const;
+  TalixRotation getLocalRot(int64 time) const;
+  Vec3 getLocalScale(int64 time) const;
+  Vec3 getWSPos(int64 time) const;
+  TalixRotation getWSRot(int64 time) const;
+  Vec3 getWSScale(int64 time) const;
+  // As seen from another node; null is the world.
+  Vec3 getPosInSpaceOfNode(int64 time, Node* space) const;
+  TalixRotation getRotInSpaceOfNode(int64 time, Node* space) const;
+  Vec3 getScaleInSpaceOfNode(int64 time, Node* space) const;
+  Placement getWorldPlacement(int64 time) const;
+
+  Vec3 getConstLocalPos() const;
+  // withoutPre: the channel's own default; else the pre-rotation before it.
+  TalixRotation getConstLocalRot(bool withoutPre) const;
+  Vec3 getConstLocalScale() const;
+  Vec3 getConstWSPos() const;
+  TalixRotation getConstWSRot() const;
+  Vec3 getConstWSScale() const;
+  Vec3 getConstPosInSpaceOfNode(Node const* space) const;
+  TalixRotation getConstRotInSpaceOfNode(Node const* space) const;
+  Vec3 getConstScaleInSpaceOfNode(Node const* space) const;
+
+  // World and other spaces see the pre-transform at the current time.
+  Vec3 getPreTranslation() const { return m_preTranslation; }
+  TalixRotation getPreRotation() const { return m_preRotation; }
+  Vec3 getPreTranslationWS() const;
+  TalixRotation getPreRotationWS() const;
+  Vec3 getPreTranslationInSpaceOfNode(Node* space) const;
+  TalixRotation getPreRotationInSpaceOfNode(Node* space) const;
+
+  // --- writing -------------------------------------------------------------------------------------------------
+  // Setters at a time write a key in the active clip, so that the sum of its layers is right; with no active clip
+  // they write the default value. World setters find the local value below the present parent.
+  virtual void setLocalPos(int64 time, Vec3 const& position);
+  virtual void setWSPos(int64 time, Vec3 const& position);
+  virtual void setLocalRot(int64 time, TalixRotation const& rotation);
+  virtual void setWSRot(int64 time, TalixRotation const& rotation);
+  virtual void setLocalScale(int64 time, Vec3 const& scale);
+  virtual void setWSScale(int64 time, Vec3 const& scale);
+  virtual void setConstLocalPos(Vec3 const& position);
+  virtual void setConstWSPos(Vec3 const& position);
+  virtual void setConstLocalRot(TalixRotation const& rotation, bool withoutPre);
+  virtual void setConstWSRot(TalixRotation const& rotation);
+  virtual void setConstLocalScale(Vec3 const& scale);
+  virtual void setConstWSScale(Vec3 const& scale);
+
+  // False for values that are not finite. keepWorld: the default rotation turns so that the node stays as it is.
+  bool setPreRotation(TalixRotation const& rotation, bool keepWorld);
+  bool setPreTranslation(Vec3 const& translation);
+  void setPreRotationWS(TalixRotation const& rotation);
+  void setPreTranslationWS(Vec3 const& translation);
+
+  // --- connecting lines ----------------------------------------------------------------------------------------
+  bool isConnectedTo(Node const* target) const { return findLine(target) != nullptr; }
+  MarkerConnection* getConnectionTo(Node const* target);
+  // Replaces a line to the same target.
+  void addConnectingLine(MarkerConnection const& line);
+  void removeConnectingLine(MarkerConnection const& line);
+  void removeConnectingLine(Node* target);
+  void resetAllLines();
+
+ protected:
+  Node() = default;
+  friend class Database;
+  void setUp() override;
+  void dataChanged(Controller const* channel) override;
+
+ private:
+  friend class NodeGraph;
+  void forget(Module* module) override;
+  MarkerConnection const* findLine(Node const* target) const;
+  void storePreTransform(Vec3 const& translation, TalixRotation const& rotation);  // mutator
+  void storeLines(std::vector<MarkerConnection> lines);                             // mutator
+  Placement constWorld() const;
+  Placement inParent(int64 time) const;
+
+  Vec3Controller* m_translation = nullptr;
+  RotController* m_rotation = nullptr;
+  Vec3Controller* m_scale = nullptr;
+  EnumAttribute* m_rotationOrder = nullptr;
+  Vec3 m_preTranslation;
+  TalixRotation m_preRotation;
+  std::vector<MarkerConnection> m_lines;
+
+  mutable Placement m_world;          // at the cache's time
+  mutable uint64 m_worldEpoch = 0;    // of the cache; m_world holds when they are equal
+  uint32 m_nodeSlot = kNoSlot;
+  uint32 m_selectedNodeSlot = kNoSlot;
+};

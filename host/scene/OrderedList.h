@@ -1,0 +1,101 @@
+// Objects in order: the i-th one, appending and removing cost at most logarithmic time, however many there are.
+//
+// Each object remembers its slot in a member that the list is told of, so an object can stand in several lists.
+// Removing leaves a hole; a Fenwick tree counts what lies before a slot, and the list closes its holes when they
+// outnumber the objects.
+#pragma once
+
+#include <bit>
+#include <vector>
+
+#include "host/base/Types.h"
+
+inline constexpr uint32 kNoSlot = 0xffffffff;
+
+template <class T, auto Slot>
+class OrderedList {
+ public:
+  int getCount() const { return m_count; }
+  static bool contains(T const* object) { return object->*Slot != kNoSlot; }
+
+  // The i-th object; i must lie in the list.
+  T* at(int i) const { return m_objects[holes() == 0 ? static_cast<size_t>(i) : slotOf(i)]; }
+  // How many objects stand before this one.
+  int indexOf(T const* object) const { return countBefore(object->*Slot); }
+
+  void append(T* object) {
+    object->*Slot = static_cast<uint32>(m_objects.size());
+    m_objects.push_back(object);
+    ++m_count;
+    if (!m_sums.empty()) appendSum();
+  }
+
+  void remove(T* object) {
+    if (m_sums.empty()) buildSums();
+    const uint32 slot = object->*Slot;
+    object->*Slot = kNoSlot;
+    m_objects[slot] = nullptr;
+    --m_count;
+    for (size_t i = slot + 1; i < m_sums.size(); i += i & -i) --m_sums[i];
+    if (holes() > 32 && holes() > m_count) assign(toVector());
+    if (m_count == 0) clear();
+  }
+
+  // The objects in order.
+  std::vector<T*> toVector() const {
+    std::vector<T*> all;
+    all.reserve(static_cast<size_t>(m_count));
+    for (T* object : m_objects)
+      if (object) all.push_back(object);
+    return all;
+  }
+  // Puts these objects in place of the present ones.
+  void assign(std::vector<T*> const& objects) {
+    clear();
+    for (T* object : objects) append(object);
+  }
+  void clear() {
+    for (T* object : m_objects)
+      if (object) object->*Slot = kNoSlot;
+    m_objects.clear();
+    m_sums.clear();
+    m_count = 0;
+  }
+
+ private:
+  int holes() const { return static_cast<int>(m_objects.size()) - m_count; }
+
+  // Fenwick tree from 1: m_sums[i] counts the objects in the (i & -i) slots up to slot i - 1. Made at the first
+  // hole: most lists never have one.
+  void buildSums() {
+    m_sums.assign(1, 0);
+    m_sums.reserve(m_objects.size() + 1);
+    for (size_t i = 0; i < m_objects.size(); ++i) appendSum();
+  }
+  void appendSum() {
+    const size_t i = m_sums.size();
+    int sum = m_objects[i - 1] ? 1 : 0;
+    for (size_t k = 1; k < (i & -i); k *= 2) sum += m_sums[i - k];
+    m_sums.push_back(sum);
+  }
+  int countBefore(uint32 slot) const {
+    if (holes() == 0) return static_cast<int>(slot);
+    int sum = 0;
+    for (size_t i = slot; i > 0; i -= i & -i) sum += m_sums[i];
+    return sum;
+  }
+  size_t slotOf(int index) const {
+    size_t slot = 0;
+    for (size_t step = std::bit_floor(m_sums.size()); step > 0; step /= 2) {
+      if (slot + step < m_sums.size() && m_sums[slot + step] <= index) {
+        slot += step;
+        index -= m_sums[slot];
+      }
+    }
+    return slot;
+  }
+
+  std::vector<T*> m_objects;
+  std::vector<int> m_sums;
+  int m_count = 0;
+};

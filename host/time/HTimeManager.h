@@ -1,0 +1,61 @@
+// Scene time: frame rate, current time, play, animation and selected ranges. Times are ticks.
+#pragma once
+
+#include <vector>
+
+#include "host/time/HFrameRate.h"
+#include "host/time/HTimeRange.h"
+
+class HTimeManager {
+ public:
+  enum ERoundDirection { RoundDown, RoundNearest, RoundUp };
+
+  // A new scene's: 120 frames a second, "Custom", time 0, play and animation ranges 0 to 100 frames.
+  HTimeManager();
+  static HTimeManager* getInstance();
+  void reset();
+
+  HFrameRate const& getFrameRate() const { return m_rate; }
+  // Changes the rate only: times, ranges and keys stay where they are in ticks.
+  void setFrameRate(HFrameRate const& rate) { m_rate = rate; }
+  int64 getTicksPerFrame() const { return m_rate.getTicksPerFrame(); }
+
+  // Current time.
+  int64 getTime() const { return m_time; }
+  // The time of a frame.
+  int64 getTime(int frame) const { return frame * getTicksPerFrame(); }
+  // Moves the current time. `notify` tells listeners of the scene.
+  void setTime(int64 time, bool notify);
+
+  // Ticks over ticks per frame, truncated toward zero.
+  int getFrame(int64 time) const;
+  double getFrameDouble(int64 time) const;
+  // The nearest tick; beyond the time line it is the time line's end.
+  int64 getTimeFromFrameDouble(double frame) const;
+  // The time of the frame boundary next to `time` in a direction, counted from `origin`.
+  int64 frameTime(int64 time, ERoundDirection direction, int64 origin) const;
+  // Rounds the ends to frame boundaries counted from `origin`: outward, or inward.
+  void frameRange(HTimeRange& range, bool outward, int64 origin);
+
+  // Frames from a text: a number of frames or timecode; 0 for other texts. `relative` reads timecode as a length
+  // of time, of which drop-frame counting leaves nothing out.
+  double stringToFrameDouble(HString const& text, bool relative) const;
+
+  HTimeRange getAnimRange() const { return m_animRange; }
+  HTimeRange getPlayRange() const { return m_playRange; }
+  void setAnimRange(HTimeRange range) { m_animRange = range; }
+  // `keepTime`: the current time stays although it lies outside.
+  void setPlayRange(HTimeRange range, bool keepTime);
+
+  // The selected ranges, sorted and disjoint.
+  int getNumSelectedRanges() const { return static_cast<int>(m_selected.size()); }
+  HTimeRange getSelectedTimeRange(int i) const { return m_selected[static_cast<size_t>(i)]; }
+  void addSelectedTimeRange(HTimeRange range);
+  void clearSelectedTimeRanges() { m_selected.clear(); }
+
+ private:
+  HFrameRate m_rate;
+  int64 m_time = 0;
+  HTimeRange m_animRange, m_playRange;
+  std::vector<HTimeRange> m_selected;
+};
