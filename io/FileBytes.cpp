@@ -1,14 +1,13 @@
 #include "io/FileBytes.h"
 
+#include <cerrno>
+#include <cstring>
 #include <fcntl.h>
+#include <filesystem>
+#include <fstream>
 #include <sys/mman.h>
 #include <sys/stat.h>
 #include <unistd.h>
-
-#include <cerrno>
-#include <cstring>
-#include <filesystem>
-#include <fstream>
 
 #include "io/FileError.h"
 
@@ -30,7 +29,8 @@ struct Descriptor {
 
 FileBytes::FileBytes(const std::string& path) : m_path(path) {
   Descriptor file{::open(path.c_str(), O_RDONLY | O_CLOEXEC)};
-  if (file.fd < 0) throw FileError(path, errno == ENOENT ? "there is no such file" : "cannot be read: " + systemReason());
+  if (file.fd < 0)
+    throw FileError(path, errno == ENOENT ? "there is no such file" : "cannot be read: " + systemReason());
   struct stat status {};
   if (::fstat(file.fd, &status) != 0) throw FileError(path, "cannot be read: " + systemReason());
   if (S_ISDIR(status.st_mode)) throw FileError(path, "is a folder, not a file");

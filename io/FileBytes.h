@@ -8,8 +8,8 @@
 
 namespace talix {
 
-// A file's content, mapped read-only, so that reading it takes no memory of its own. Throws FileError when the file
-// is missing, is a folder, is empty, or cannot be read, each with its own text.
+// A file's content, mapped read-only, so that reading it takes no memory of its own. Throws FileError when
+// the file is missing, is a folder, is empty, or cannot be read, each with its own text.
 class FileBytes {
  public:
   explicit FileBytes(const std::string& path);
@@ -28,8 +28,9 @@ class FileBytes {
   size_t m_size = 0;
 };
 
-// Writes a file under a temporary name in the same folder and renames it once `write` has returned and all is on
-// disk. Throws FileError, and leaves no temporary file, when anything fails; what stood at `path` is then untouched.
+// Writes a file under a temporary name in the same folder and renames it once `write` has returned and all is
+// on disk. Throws FileError, and leaves no temporary file, when anything fails; what stood at `path` is then
+// untouched.
 void writeFileAtomically(const std::string& path, const std::function<void(std::ostream&)>& write);
 
 }  // namespace talix

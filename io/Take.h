@@ -1,8 +1,8 @@
-// One recorded take as a file holds it, before it is put into a scene: what all readers make, all writers take,
-// and "talix info" shows. Key data lies in KeyTracks, so moving it into the scene copies nothing.
+// One recorded take as a file holds it, before it is put into a scene: what all readers make, all writers
+// take, and "talix info" shows. Key data lies in KeyTracks, so moving it into the scene copies nothing.
 //
-// Lengths are millimetres and angles radians, whatever the file says; fileUnit names the file's own length unit.
-// Positions are in the file's own axes. Frame numbers are the file's own.
+// Lengths are millimetres and angles radians, whatever the file says; fileUnit names the file's own length
+// unit. Positions are in the file's own axes. Frame numbers are the file's own.
 #pragma once
 
 #include <string>
@@ -23,8 +23,8 @@ struct TakeNote {
 };
 
 struct TakePoint {
-  std::string subject;     // empty: none given by the file
-  std::string label;       // without the subject; empty for a point without a real label
+  std::string subject;  // empty: none given by the file
+  std::string label;    // without the subject; empty for a point without a real label
   std::string description;
   KeyTrack positions{KeyTrack::Shape::Vector};  // no key at a frame where the point was not seen
   KeyTrack residuals{KeyTrack::Shape::Scalar};  // mm, a key where positions has one; empty: none recorded
@@ -44,19 +44,20 @@ struct TakeAnalogChannel {
   std::string unit;
   std::string description;
   KeyTrack samples{KeyTrack::Shape::Scalar};  // in the unit; keys at the analog rate
-  double scale = 1;                            // file value to unit, as the file had it
+  double scale = 1;                           // file value to unit, as the file had it
   double offset = 0;
 };
 
 struct TakeJoint {
   std::string name;
-  int parent = -1;                 // index into joints, always smaller than the own; -1: a root
+  int parent = -1;  // index into joints, always smaller than the own; -1: a root
   bool endSite = false;
-  Vec3 offset;                     // to the parent, mm
-  int rotationOrder = 0;           // 0 to 5: XYZ XZY YXZ YZX ZXY ZYX, the first axis is applied first
-  std::vector<std::string> channels;               // the file's, in its order
-  KeyTrack translations{KeyTrack::Shape::Vector};  // mm, the file's channel values (with the offset); may be empty
-  KeyTrack rotations{KeyTrack::Shape::Rotation};   // may be empty
+  Vec3 offset;                        // to the parent, mm
+  int rotationOrder = 0;              // 0 to 5: XYZ XZY YXZ YZX ZXY ZYX, the first axis is applied first
+  std::vector<std::string> channels;  // the file's, in its order
+  KeyTrack translations{
+      KeyTrack::Shape::Vector};  // mm, the file's channel values (with the offset); may be empty
+  KeyTrack rotations{KeyTrack::Shape::Rotation};  // may be empty
 };
 
 struct TakeEvent {
@@ -64,27 +65,27 @@ struct TakeEvent {
   std::string context;  // "Left", "Right", "General", ...
   std::string subject;
   std::string description;
-  double seconds = 0;   // from the start of the recording, as the file gives it
+  double seconds = 0;  // from the start of the recording, as the file gives it
 };
 
 struct Take {
-  std::string format;                // "C3D", "BVH", "TRC"
-  std::string name;                  // the file's name without folder and suffix
-  double rate = 120;                 // frames a second
+  std::string format;  // "C3D", "BVH", "TRC"
+  std::string name;    // the file's name without folder and suffix
+  double rate = 120;   // frames a second
   int64 firstFrame = 0;
   int64 frameCount = 0;
-  std::string fileUnit = "mm";       // "mm", "cm", "m", "in", "ft" or the file's own word
-  double unitInMillimetres = 1;      // how many mm one file unit is
-  bool unitAssumed = false;          // the file does not say
+  std::string fileUnit = "mm";   // "mm", "cm", "m", "in", "ft" or the file's own word
+  double unitInMillimetres = 1;  // how many mm one file unit is
+  bool unitAssumed = false;      // the file does not say
   Axis up = Axis::Z;
   bool upAssumed = false;
   std::vector<TakePoint> points;
   std::vector<TakeOutput> outputs;
   std::vector<TakeAnalogChannel> analog;
-  double analogRate = 0;             // samples a second, 0: no analog data
-  std::vector<TakeJoint> joints;     // parents before children, siblings in file order
+  double analogRate = 0;          // samples a second, 0: no analog data
+  std::vector<TakeJoint> joints;  // parents before children, siblings in file order
   std::vector<TakeEvent> events;
-  std::string variant;               // what a person may want to know: "Intel, integer" ...
+  std::string variant;  // what a person may want to know: "Intel, integer" ...
   std::vector<TakeNote> notes;
 };
 

@@ -1,8 +1,9 @@
-// The take file formats. The reader is chosen by content where the format has a mark, else by the file's suffix.
+// The take file formats. The reader is chosen by content where the format has a mark, else by the file's
+// suffix.
 //
-// Readers throw FileError with one clear text; they check every count and offset from a file against the file's
-// size before trusting it. Writers write to a temporary name and rename; what a format cannot hold is added to
-// `notes` as a warning, never dropped silently.
+// Readers throw FileError with one clear text; they check every count and offset from a file against the
+// file's size before trusting it. Writers write to a temporary name and rename; what a format cannot hold is
+// added to `notes` as a warning, never dropped silently.
 #pragma once
 
 #include <string>
@@ -13,7 +14,8 @@
 namespace talix {
 
 struct ReadOptions {
-  std::string unit;  // "mm", "cm", "m", "in" or "ft": the file's length unit, over what the file says; empty: as it says
+  std::string unit;  // "mm", "cm", "m", "in" or "ft": the file's length unit, over what the file says; empty:
+                     // as it says
 };
 
 Take readC3D(const std::string& path, const ReadOptions& = {});
@@ -28,7 +30,8 @@ Take readTake(const std::string& path, const ReadOptions& = {});
 // By suffix (.c3d, .bvh).
 void writeTake(const Take&, const std::string& path, std::vector<TakeNote>& notes);
 
-// How many millimetres a length unit is; accepts the usual spellings ("mm", "Meters", "inch"); 0 when unknown.
+// How many millimetres a length unit is; accepts the usual spellings ("mm", "Meters", "inch"); 0 when
+// unknown.
 double millimetresPerUnit(const std::string& unit);
 
 }  // namespace talix

@@ -8,17 +8,17 @@
 
 namespace talix {
 
-// Adds a take to the scene as a new clip, which becomes active, and modules. A subject, marker or bone that the scene
-// already has under its name gets the take's motion in the new clip instead of a double. The first take sets rate,
-// ranges and up axis; `up` (0 x, 1 y, 2 z; -1: as it is) sets the scene's up axis first. A take with another up
-// axis than the scene's is turned.
+// Adds a take to the scene as a new clip, which becomes active, and modules. A subject, marker or bone that
+// the scene already has under its name gets the take's motion in the new clip instead of a double. The first
+// take sets rate, ranges and up axis; `up` (0 x, 1 y, 2 z; -1: as it is) sets the scene's up axis first. A
+// take with another up axis than the scene's is turned.
 //
-// Every conversion and assumption is a line of `notes`, the take's own included. Throws FileError, with the scene
-// as it was, when the take cannot be added (32nd clip, channel kinds that clash beyond mending).
+// Every conversion and assumption is a line of `notes`, the take's own included. Throws FileError, with the
+// scene as it was, when the take cannot be added (32nd clip, channel kinds that clash beyond mending).
 void importTake(Take take, const std::string& path, int up, Database& scene, std::vector<TakeNote>& notes);
 
-// The active clip of the scene (the default values when none is active) as a take over the animation range, one
-// value a frame. What a take cannot hold is added to `notes` as a warning.
+// The active clip of the scene (the default values when none is active) as a take over the animation range,
+// one value a frame. What a take cannot hold is added to `notes` as a warning.
 Take exportTake(Database& scene, std::vector<TakeNote>& notes);
 
 }  // namespace talix

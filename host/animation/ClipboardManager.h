@@ -11,10 +11,11 @@ class ClipboardManager {
   enum ControllerDataType { OtherKeys = 0, FloatKeys = 1, Vec3Keys = 2, RotKeys = 3, BoolKeys = 4 };
 
   struct tagKey {
-    int64 time = 0;      // ticks
-    double x = 0, y = 0, z = 0;  // one-valued channels use x; rotations are Euler radians in the source's order
-    unsigned components = 0;     // 1 x, 2 y, 4 z
-    unsigned flags = 0;          // the key's own, as its channel reports them
+    int64 time = 0;  // ticks
+    double x = 0, y = 0,
+           z = 0;             // one-valued channels use x; rotations are Euler radians in the source's order
+    unsigned components = 0;  // 1 x, 2 y, 4 z
+    unsigned flags = 0;       // the key's own, as its channel reports them
   };
 
   // What is added until finishClipboardCopy replaces the content; keep: false takes the copy back.

@@ -10,7 +10,8 @@ class NLEClip : public Module {
   static constexpr int kMaximum = 31;  // in a scene
 
   bool isActive() const;
-  NLEClip* getNext() const;  // in the scene's list of clips, which Database::getHeadClip starts; null at the end
+  NLEClip* getNext()
+      const;  // in the scene's list of clips, which Database::getHeadClip starts; null at the end
 
   // Layers count from 0; every clip has at least one. Channels hold keys by layer.
   int getNumLayers() const { return static_cast<int>(m_layerLocks.size()); }

@@ -1,12 +1,14 @@
 // An animated channel of a module: a default value and, for each clip and layer, a track of keys.
 //
 //  1. With no active clip (the base clip) a channel reads as its default value and holds no keys.
-//  2. The lowest layer of the active clip gives the value; each further layer with keys adds to it (numbers) or
+//  2. The lowest layer of the active clip gives the value; each further layer with keys adds to it (numbers)
+//  or
 //     composes on the right (rotations). A lowest layer without keys gives the default value.
 //  3. Key operations read and edit the active layer of the active clip.
 //  4. Every change of keys stands between beginDataEdit and endDataEdit.
 //
-// Times are ticks, angles radians, lengths millimetres. Masks: 1 x, 2 y, 4 z, 7 all; one-valued channels use 1 or 7.
+// Times are ticks, angles radians, lengths millimetres. Masks: 1 x, 2 y, 4 z, 7 all; one-valued channels use
+// 1 or 7.
 #pragma once
 
 #include <memory>
@@ -30,13 +32,14 @@ class Controller : public DataSource {
  public:
   using Values = KeyTrack::Values;
 
-  // --- names ---------------------------------------------------------------------------------------------------
+  // --- names
+  // ---------------------------------------------------------------------------------------------------
   static PropertyType mapToPropertyType(HString const& name);
   static PropertyType mapToPropertyType(unsigned id);
   static HString mapPropertyId(unsigned id);
   static unsigned mapPropertyName(HString const& name);  // 0: no channel
-  // Trims blanks, restores a known name's case (with a component as well: "translation.y" -> "Translation.y"),
-  // expands tx ty tz rx ry rz sx sy sz.
+  // Trims blanks, restores a known name's case (with a component as well: "translation.y" ->
+  // "Translation.y"), expands tx ty tz rx ry rz sx sy sz.
   static void fixChannelStr(HString& text);
 
   // A new channel of a kind; its module gives it an owner and a name.
@@ -48,8 +51,9 @@ class Controller : public DataSource {
   Module* getModule() const { return m_module; }
   ControlID getID() const { return m_id; }
 
-  // --- editing -------------------------------------------------------------------------------------------------
-  // When a clip is active that holds keys, and neither the clip, nor the layer, nor the module, nor the channel is
+  // --- editing
+  // ------------------------------------------------------------------------------------------------- When a
+  // clip is active that holds keys, and neither the clip, nor the layer, nor the module, nor the channel is
   // locked.
   bool isEditable() const override;
   bool isLocked() const { return m_locked; }
@@ -59,7 +63,8 @@ class Controller : public DataSource {
   virtual void beginDataEdit(HTimeRange const& range);
   virtual void endDataEdit();
 
-  // --- keys of the active layer --------------------------------------------------------------------------------
+  // --- keys of the active layer
+  // --------------------------------------------------------------------------------
   virtual int getNumKeys() const;
   virtual int getNumKeys(unsigned mask) const;
   virtual int getNumSelectedKeys() const;
@@ -68,8 +73,8 @@ class Controller : public DataSource {
   virtual unsigned getSelectedKeyFlags(int i) const;
   virtual int64 getKeyTime(int key) const;
   virtual bool keyHasComponents(int key, unsigned mask) const;
-  virtual bool hasKeyAt(int64 time) const;                  // any components
-  virtual bool hasKeyAt(int64 time, unsigned mask) const;   // all of these
+  virtual bool hasKeyAt(int64 time) const;                 // any components
+  virtual bool hasKeyAt(int64 time, unsigned mask) const;  // all of these
   virtual bool isKeySelectedAt(int64 time, unsigned mask) const;
   // From the first to the last key; empty without keys.
   virtual HTimeRange getKeyRange() const;
@@ -88,17 +93,21 @@ class Controller : public DataSource {
   void evaluate(int64 time, Values& values) const;
   // The value of the active layer alone, to which a relative edit adds.
   void evaluateLayer(int64 time, Values& values) const;
+  // The value that the active layer must have at a time for all layers together to give `wanted`.
+  virtual Values solveLayer(int64 time, Values const& wanted) const;
   Values const& getDefaultValues() const { return m_default; }
   void setDefaultValues(Values const& values);
 
-  // --- interpolation -------------------------------------------------------------------------------------------
+  // --- interpolation
+  // -------------------------------------------------------------------------------------------
   virtual int getNumInterpTypes() const;
   virtual char const* getInterpTypeName(int i) const;
   virtual void setInterpType(int i);
   Interpolation getInterpolation() const { return m_interpolation; }
 
-  // --- clips and layers ----------------------------------------------------------------------------------------
-  // The keys in a clip and layer; null when it has none there.
+  // --- clips and layers
+  // ---------------------------------------------------------------------------------------- The keys in a
+  // clip and layer; null when it has none there.
   KeyTrack const* findTrack(NLEClip const* clip, int layer) const;
   KeyTrack const* findActiveTrack() const;
   // Replaces the keys in a clip and layer: how importers, copies and undo put whole tracks in place.
@@ -107,20 +116,26 @@ class Controller : public DataSource {
   HTimeRange getKeyRangeInClip(NLEClip const* clip) const;
   void forgetClip(NLEClip const* clip);
 
-  // Copies default value, interpolation and the keys of the active clip from a channel of the same kind. False when
-  // the kinds differ or this channel is not editable.
+  // Copies default value, interpolation and the keys of the active clip from a channel of the same kind.
+  // False when the kinds differ or this channel is not editable.
   virtual bool copyFrom(Controller const* source, bool keys, bool selectionToo);
 
   // The shape that keys of a kind of channel have.
   static KeyTrack::Shape shapeOf(PropertyType type);
 
  protected:
+  // Adds nothing in a layer above the lowest.
+  virtual Values neutral() const { return {}; }
   Controller(Interpolation interpolation, int numInterpTypes)
       : m_interpolation(interpolation), m_numInterpTypes(static_cast<unsigned char>(numInterpTypes)) {}
   // Layers above the lowest: adds `layer` to `values`.
   virtual void compose(Values& values, Values const& layer) const;
   // Clips of a blend: the weighted mean of `count` values; weights sum to 1.
   virtual void blend(Values const* values, double const* weights, int count, Values& out) const;
+
+  // What a layer of a clip gives at a time; false, and the value that changes nothing, when it holds no keys
+  // and is not the lowest.
+  bool evaluateLayer(NLEClip const* clip, int layer, int64 time, Values& values) const;
 
   Values m_default{};
 
@@ -190,9 +205,10 @@ class BoolController : public Controller {
   void setKey(int64 time, bool value, unsigned mask);
   bool getConstValue() const { return m_default[0] != 0; }
   void setConstValue(bool value, bool notify);
+  // A later layer's value replaces the one below.
+  Values solveLayer(int64, Values const& wanted) const override { return wanted; }
 
  protected:
-  // A later layer's value replaces the one below.
   void compose(Values& values, Values const& layer) const override;
 };
 
@@ -228,7 +244,10 @@ class RotController : public Controller {
   TalixRotation getConstValue() const;
   void setConstValue(TalixRotation const& value, bool notify);
 
+  Values solveLayer(int64 time, Values const& wanted) const override;
+
  protected:
+  Values neutral() const override { return {0, 0, 0, 1}; }
   void compose(Values& values, Values const& layer) const override;
   void blend(Values const* values, double const* weights, int count, Values& out) const override;
 };

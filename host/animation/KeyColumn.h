@@ -1,5 +1,5 @@
-// One array of a key leaf. Erasing at the front moves an offset; growth doubles, up to a limit that a full
-// leaf meets exactly.
+// One array of a key leaf. Erasing moves the shorter side, so at the front an offset; growth doubles, up to a
+// limit that a full leaf meets exactly.
 #pragma once
 
 #include <algorithm>
@@ -48,8 +48,9 @@ class KeyColumn {
   }
 
   void erase(int from, int to) {
-    if (from == 0) {
-      m_begin += to;
+    if (from < m_size - to) {
+      move(data() + to - from, data(), from);
+      m_begin += to - from;
     } else {
       move(data() + from, data() + to, m_size - to);
     }

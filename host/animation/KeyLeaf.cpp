@@ -23,20 +23,26 @@ bool fitFloats(const double* values, int n) {
   return true;
 }
 
+// How many of the ascending times lie before the time. Halves without branches, which could not be predicted.
+int countBefore(const int64* times, int n, int64 time) {
+  const int64* from = times;
+  for (; n > 1; n -= n / 2) from += from[n / 2 - 1] < time ? n / 2 : 0;
+  return static_cast<int>(from - times) + (n == 1 && *from < time);
+}
+
 }  // namespace
 
 int KeyLeaf::lowerBound(int64 time) const {
   if (time > lastTime()) return m_size;
   if (time <= firstTime()) return 0;
   if (evenTimes()) return static_cast<int>((time - m_start - 1) / m_period + 1);
-  return static_cast<int>(std::lower_bound(m_times.data(), m_times.data() + m_size, time) - m_times.data());
+  return countBefore(m_times.data(), m_size, time);
 }
 
 int KeyLeaf::lastAtOrBefore(int64 time) const {
   if (time >= lastTime()) return m_size - 1;
   if (evenTimes()) return static_cast<int>((time - m_start) / m_period);
-  return static_cast<int>(std::upper_bound(m_times.data(), m_times.data() + m_size, time) - m_times.data()) -
-         1;
+  return countBefore(m_times.data(), m_size, time + 1) - 1;
 }
 
 void KeyLeaf::insert(int slot, int64 time, const double* values, unsigned components, unsigned selection) {
@@ -203,8 +209,8 @@ void KeyLeaf::spellOutTimes() {
 void KeyLeaf::evenOutTimes() {
   if (evenTimes() || m_size == 0) return;
   const int64 period = m_size > 1 ? m_times[1] - m_times[0] : 0;
-  if (m_size > 2 && (lastTime() - firstTime()) % (m_size - 1) != 0) return;
-  if (m_size > 2 && (lastTime() - firstTime()) / (m_size - 1) != period) return;
+  const auto length = static_cast<uint64>(lastTime() - firstTime());
+  if (length != static_cast<uint64>(period) * static_cast<uint64>(m_size - 1)) return;
   for (int i = 2; i < m_size; ++i)
     if (m_times[i] - m_times[i - 1] != period) return;
   m_start = firstTime();

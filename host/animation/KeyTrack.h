@@ -100,7 +100,7 @@ class KeyTrack {
 
   // Erasing on a mask removes these components; a key left without any goes. They answer the number of keys
   // that lost something. Ranges include both ends; the cost of a range is that of the leaves it touches.
-  int64 erase(int64 index, unsigned mask = kAll);
+  int64 erase(int64 index, unsigned mask = kAll);  // an index outside the track erases nothing
   int64 eraseRange(int64 first, int64 last, unsigned mask = kAll);
   int64 eraseSelected(unsigned mask = kAll);  // of each key the components of the mask that are selected
   void clear();

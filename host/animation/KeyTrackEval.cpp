@@ -6,20 +6,21 @@
 
 namespace {
 
-// The times of four keys in a row around a time. The outer ones may be absent.
-struct Span {
-  double before = 0, length = 0, after = 0;  // ticks between the keys; 0: there is no such key
-  double at = 0;                             // where the time lies between the inner keys, 0 to 1
-};
+// The slope at the key between two intervals, of the parabola through its three keys, times the length of one
+// interval: weights for the differences over that interval and over the other one.
+struct Tangent {
+  double own = 1, other = 0;  // one-sided
 
-// The slope at the key between two intervals, of the parabola through its three keys, times the middle
-// interval's length. `middle` and `outer` are the differences over the intervals. One-sided without an outer
-// key.
-template <class T>
-T scaledTangent(T const& middle, double length, T const& outer, double outerLength) {
-  if (outerLength == 0) return middle;
-  return (middle * outerLength + outer * (length * length / outerLength)) * (1 / (length + outerLength));
-}
+  Tangent() = default;
+  Tangent(double ownLength, double otherLength)
+      : own(otherLength / (ownLength + otherLength)),
+        other(ownLength * ownLength / (otherLength * (ownLength + otherLength))) {}
+
+  template <class T>
+  T operator()(T const& ownDifference, T const& otherDifference) const {
+    return ownDifference * own + otherDifference * other;
+  }
+};
 
 double hermite(double u, double p0, double m0, double p1, double m1) {
   const double d = p1 - p0;
@@ -29,29 +30,18 @@ double hermite(double u, double p0, double m0, double p1, double m1) {
 using Quat = Imath::Quatd;
 using V3 = Imath::V3d;
 
-Quat quatOf(KeyTrack::Values const& v) { return {v[3], v[0], v[1], v[2]}; }
-
 // The rotation from a to b as axis times half the angle, and back.
 V3 logBetween(Quat const& a, Quat const& b) { return (~a * b).log().v; }
 Quat turned(Quat const& q, V3 const& by) { return q * Quat(0, by).exp(); }
 
 Quat nearest(Quat const& q, Quat const& to) { return (q ^ to) < 0 ? -q : q; }
 
-Quat squad(Span const& span, Quat before, Quat const& a, Quat const& b, Quat after) {
-  const V3 middle = logBetween(a, b);
-  Quat nearA = a, nearB = b;
-  if (span.before > 0) {
-    before = nearest(before, a);
-    const V3 tangent = scaledTangent(middle, span.length, -logBetween(a, before), span.before);
-    nearA = turned(a, (tangent - middle) * 0.5);
-  }
-  if (span.after > 0) {
-    after = nearest(after, b);
-    const V3 back = -logBetween(b, a);
-    const V3 tangent = scaledTangent(back, span.length, logBetween(b, after), span.after);
-    nearB = turned(b, (back - tangent) * 0.5);
-  }
-  const double u = span.at;
+Quat squad(double u, Tangent const& leaving, Tangent const& arriving, Quat const& before, Quat const& a,
+           Quat const& b, Quat const& after) {
+  const V3 forth = logBetween(a, b), back = -logBetween(b, a);
+  const V3 start = leaving(forth, -logBetween(a, nearest(before, a)));
+  const V3 end = arriving(back, logBetween(b, nearest(after, b)));
+  const Quat nearA = turned(a, (start - forth) * 0.5), nearB = turned(b, (back - end) * 0.5);
   return Imath::slerp(Imath::slerp(a, b, u), Imath::slerp(nearA, nearB, u), 2 * u * (1 - u));
 }
 
@@ -115,26 +105,27 @@ void KeyTrack::evaluateAt(int64 time, Interpolation interpolation, unsigned mask
   const Place b = neighbour(a, 1, mask, cursor);
   if (!b) return hold(a);
 
-  Span span;
-  span.length = static_cast<double>(b.time() - a.time());
-  span.at = static_cast<double>(time - a.time()) / span.length;
+  const auto length = static_cast<double>(b.time() - a.time());
+  const double u = static_cast<double>(time - a.time()) / length;
   Place before, after;
+  Tangent leaving, arriving;
   if (interpolation == Interpolation::Cubic) {
     before = neighbour(a, -1, mask, cursor);
     after = neighbour(b, 1, mask, cursor);
-    if (before) span.before = static_cast<double>(a.time() - before.time());
-    if (after) span.after = static_cast<double>(after.time() - b.time());
+    if (before) leaving = {length, static_cast<double>(a.time() - before.time())};
+    if (after) arriving = {length, static_cast<double>(after.time() - b.time())};
+    if (!before) before = a;
+    if (!after) after = b;
   }
 
   if (m_shape == Shape::Rotation) {
-    const auto read = [](Place const& key) {
-      Values v{0, 0, 0, 1};
-      if (key) key.leaf->values(key.slot, v.data());
-      return quatOf(v);
+    const auto quatAt = [](Place const& key) {
+      return Quat(key.value(3), key.value(0), key.value(1), key.value(2));
     };
-    const Quat qa = read(a), qb = nearest(read(b), qa);
-    const Quat q = interpolation == Interpolation::Linear ? Imath::slerp(qa, qb, span.at)
-                                                          : squad(span, read(before), qa, qb, read(after));
+    const Quat qa = quatAt(a), qb = nearest(quatAt(b), qa);
+    const Quat q = interpolation == Interpolation::Linear
+                       ? Imath::slerp(qa, qb, u)
+                       : squad(u, leaving, arriving, quatAt(before), qa, qb, quatAt(after));
     values = {q.v.x, q.v.y, q.v.z, q.r};
     return;
   }
@@ -143,11 +134,9 @@ void KeyTrack::evaluateAt(int64 time, Interpolation interpolation, unsigned mask
     const double pa = a.value(c), pb = b.value(c), d = pb - pa;
     double& out = values[static_cast<size_t>(c)];
     if (interpolation == Interpolation::Linear) {
-      out = pa + d * span.at;
+      out = pa + d * u;
     } else {
-      const double ma = scaledTangent(d, span.length, before ? pa - before.value(c) : 0, span.before);
-      const double mb = scaledTangent(d, span.length, after ? after.value(c) - pb : 0, span.after);
-      out = hermite(span.at, pa, ma, pb, mb);
+      out = hermite(u, pa, leaving(d, pa - before.value(c)), pb, arriving(d, after.value(c) - pb));
     }
   }
 }

@@ -1,6 +1,7 @@
 // Channel names, their ids and kinds. A channel name has one kind everywhere.
 //
-// An id is a small number (low 16 bits, from 1) to which the component bits of an active property may be added.
+// An id is a small number (low 16 bits, from 1) to which the component bits of an active property may be
+// added.
 #pragma once
 
 #include <optional>
@@ -28,11 +29,12 @@ class PropertyTable {
   HString getName(unsigned id) const;  // empty when unknown
   DataSource::PropertyType getType(unsigned id) const;
 
-  // The id of a channel name, which is added when it is new. 0 when the name is known with another kind, is empty,
-  // holds a dot or a backslash, or the table is full (65,535 names).
+  // The id of a channel name, which is added when it is new. 0 when the name is known with another kind, is
+  // empty, holds a dot or a backslash, or the table is full (65,535 names).
   unsigned add(HString const& name, DataSource::PropertyType type);
 
-  // The known name that is equal but for case; empty when there is none, or none in exact case and several others.
+  // The known name that is equal but for case; empty when there is none, or none in exact case and several
+  // others.
   HString restoreCase(HString const& name) const;
 
  private:

@@ -1,5 +1,5 @@
-// Run-time classes: one constant record per class of host object. Type tests take constant time, because a record
-// knows its depth in the class tree and its ancestors.
+// Run-time classes: one constant record per class of host object. Type tests take constant time, because a
+// record knows its depth in the class tree and its ancestors.
 #pragma once
 
 #include <array>
@@ -13,9 +13,13 @@ class HRuntimeClass {
   enum Instances : bool { any, single };
 
   template <size_t Depth>
-  constexpr HRuntimeClass(char const* name, std::array<HRuntimeClass const*, Depth> const& ancestors, Create create,
-                          Instances instances)
-      : m_name(name), m_ancestors(ancestors.data()), m_depth(Depth), m_create(create), m_single(instances == single) {}
+  constexpr HRuntimeClass(char const* name, std::array<HRuntimeClass const*, Depth> const& ancestors,
+                          Create create, Instances instances)
+      : m_name(name),
+        m_ancestors(ancestors.data()),
+        m_depth(Depth),
+        m_create(create),
+        m_single(instances == single) {}
 
   char const* getName() const { return m_name; }
   HRuntimeClass const* getBaseClass() const { return m_depth ? m_ancestors[m_depth - 1] : nullptr; }
@@ -56,18 +60,23 @@ struct HClassAncestors {
 };
 
 // In a class: declares its record s_classNAME and the virtual that answers it.
-#define H_DECLARE_CLASS(Name, Base)                              \
- public:                                                         \
-  using ClassBase = Base;                                        \
-  static constexpr size_t kClassDepth = Base::kClassDepth + 1;   \
-  static HRuntimeClass s_class##Name;                            \
+#define H_DECLARE_CLASS(Name, Base)                                       \
+ public:                                                                  \
+  using ClassBase = Base;                                                 \
+  static constexpr size_t kClassDepth = Base::kClassDepth + 1;            \
+  static HRuntimeClass s_class##Name;                                     \
   static constexpr HRuntimeClass& staticClass() { return s_class##Name; } \
   HRuntimeClass* getRuntimeClass() const override { return &s_class##Name; }
 
-// In one source file: defines the record of an abstract class, a class that can be created, a class of which a
-// scene holds one.
-#define H_DEFINE_CLASS_(Name, create, instances)                                                              \
-  constinit HRuntimeClass Name::s_class##Name(#Name, HClassAncestors<Name::ClassBase>::value, create, instances)
+// In one source file: defines the record of an abstract class, a class that can be created, a class of which
+// a scene holds one.
+#define H_DEFINE_CLASS_(Name, create, instances)                                                      \
+  constinit HRuntimeClass Name::s_class##Name(#Name, HClassAncestors<Name::ClassBase>::value, create, \
+                                              instances)
 #define H_DEFINE_ABSTRACT_CLASS(Name) H_DEFINE_CLASS_(Name, nullptr, HRuntimeClass::any)
-#define H_DEFINE_CLASS(Name) H_DEFINE_CLASS_(Name, []() -> HObject* { return new Name; }, HRuntimeClass::any)
-#define H_DEFINE_SINGLE_CLASS(Name) H_DEFINE_CLASS_(Name, []() -> HObject* { return new Name; }, HRuntimeClass::single)
+#define H_DEFINE_CLASS(Name) \
+  H_DEFINE_CLASS_(           \
+      Name, []() -> HObject* { return new Name; }, HRuntimeClass::any)
+#define H_DEFINE_SINGLE_CLASS(Name) \
+  H_DEFINE_CLASS_(                  \
+      Name, []() -> HObject* { return new Name; }, HRuntimeClass::single)

@@ -7,9 +7,9 @@
 #include "host/base/Types.h"
 
 #if defined(__GNUC__)
-#define TALIX_PRINTF(format, first) __attribute__((format(printf, format, first)))
+#define TALIX_PRINTF(text, first) __attribute__((format(printf, text, first)))
 #else
-#define TALIX_PRINTF(format, first)
+#define TALIX_PRINTF(text, first)
 #endif
 
 class HString {

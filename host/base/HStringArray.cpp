@@ -22,8 +22,8 @@ std::string_view trimmed(std::string_view piece) {
 
 }  // namespace
 
-void HStringArray::Tokenize(HString const& text, HStringArray const& delimiters, HStringArray& out, bool keepEmpty,
-                            bool trim) {
+void HStringArray::Tokenize(HString const& text, HStringArray const& delimiters, HStringArray& out,
+                            bool keepEmpty, bool trim) {
   out.clear();
   const std::string_view all = text.GetString();
   size_t start = 0;

@@ -1,5 +1,5 @@
-// The host's growable array of plain values: the elements are copied bit by bit, it never shrinks, and it owns
-// nothing that its elements point to.
+// The host's growable array of plain values: the elements are copied bit by bit, it never shrinks, and it
+// owns nothing that its elements point to.
 #pragma once
 
 #include <algorithm>

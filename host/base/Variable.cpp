@@ -12,7 +12,8 @@ inline constexpr bool isVector<std::vector<T>> = true;
 
 Vec3 const kZero;
 
-// Calls read(element) with the single value or element i of the array; answers `otherwise` when there is none.
+// Calls read(element) with the single value or element i of the array; answers `otherwise` when there is
+// none.
 template <class Value, class Result, class Read>
 Result readElement(Value const& value, int i, Result otherwise, Read read) {
   return std::visit(
@@ -29,8 +30,8 @@ Result readElement(Value const& value, int i, Result otherwise, Read read) {
 }
 
 template <class T>
-inline constexpr bool isNumeric = std::is_same_v<T, int> || std::is_same_v<T, double> ||
-                                  std::is_same_v<T, Variable::BoolType>;
+inline constexpr bool isNumeric =
+    std::is_same_v<T, int> || std::is_same_v<T, double> || std::is_same_v<T, Variable::BoolType>;
 
 // A double outside the range of int is its nearest int; casting it would be undefined.
 int truncated(double value) {
@@ -48,24 +49,45 @@ std::string numberText(double value) {
 Variable::Variable(VarType type, int count) {
   const size_t n = count > 0 ? static_cast<size_t>(count) : 0;
   switch (type) {
-    case None: break;
-    case Int: m_value = 0; break;
-    case Float: m_value = 0.0; break;
-    case String: m_value = HString(); break;
-    case Bool: m_value = False; break;
-    case Vector: m_value = Vec3(); break;
-    case IntArray: m_value = Ints(n); break;
-    case FloatArray: m_value = Floats(n); break;
-    case StringArray: m_value = Strings(n); break;
-    case BoolArray: m_value = Bools(n); break;
-    case VectorArray: m_value = Vectors(n); break;
+    case None:
+      break;
+    case Int:
+      m_value = 0;
+      break;
+    case Float:
+      m_value = 0.0;
+      break;
+    case String:
+      m_value = HString();
+      break;
+    case Bool:
+      m_value = False;
+      break;
+    case Vector:
+      m_value = Vec3();
+      break;
+    case IntArray:
+      m_value = Ints(n);
+      break;
+    case FloatArray:
+      m_value = Floats(n);
+      break;
+    case StringArray:
+      m_value = Strings(n);
+      break;
+    case BoolArray:
+      m_value = Bools(n);
+      break;
+    case VectorArray:
+      m_value = Vectors(n);
+      break;
   }
 }
 
 Variable::~Variable() = default;
 
 Variable::VarType Variable::getType() const {
-  static constexpr VarType types[] = {None,   Int,      Float,      String,      Bool,     Vector,
+  static constexpr VarType types[] = {None,     Int,        Float,       String,    Bool,       Vector,
                                       IntArray, FloatArray, StringArray, BoolArray, VectorArray};
   return types[m_value.index()];
 }

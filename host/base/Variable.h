@@ -1,8 +1,8 @@
 // A script value: an argument or a result.
 //
-// The index of the readers and setters is -1 for a single value, else that of an array's element; an index outside
-// the array reads as nothing (0, empty) and sets nothing. Numbers convert into each other when read: a double is
-// truncated toward zero, a boolean is its number.
+// The index of the readers and setters is -1 for a single value, else that of an array's element; an index
+// outside the array reads as nothing (0, empty) and sets nothing. Numbers convert into each other when read:
+// a double is truncated toward zero, a boolean is its number.
 #pragma once
 
 #include <variant>
@@ -63,8 +63,8 @@ class Variable {
   void setValue(char const* value, int i);
   void setValue(Vec3 const& value, int i);
 
-  // Converts in place where nothing is lost: integers and booleans to doubles, anything single to a string, an
-  // array by its elements. A value that cannot be converted stays as it is.
+  // Converts in place where nothing is lost: integers and booleans to doubles, anything single to a string,
+  // an array by its elements. A value that cannot be converted stays as it is.
   void convertToType(VarType type);
 
  private:
@@ -77,5 +77,6 @@ class Variable {
   void setElement(int i, Set set);
 
   // In the order of VarType: scalars, then arrays.
-  std::variant<std::monostate, int, double, HString, BoolType, Vec3, Ints, Floats, Strings, Bools, Vectors> m_value;
+  std::variant<std::monostate, int, double, HString, BoolType, Vec3, Ints, Floats, Strings, Bools, Vectors>
+      m_value;
 };

@@ -1,8 +1,8 @@
 // Base class of every script command.
 //
-// The host checks the arguments first (checkArgSyntax); execute runs only when they are accepted. It answers true on
-// success and false on failure, after at least one error line; `result` stays unset on failure. Commands are
-// reference-counted and keep no state between runs. Everything happens on the main thread.
+// The host checks the arguments first (checkArgSyntax); execute runs only when they are accepted. It answers
+// true on success and false on failure, after at least one error line; `result` stays unset on failure.
+// Commands are reference-counted and keep no state between runs. Everything happens on the main thread.
 #pragma once
 
 #include <memory>
@@ -22,12 +22,14 @@ class Command : public HObject {
   ~Command() override;
   void deleteThis() override { unref(); }
 
-  virtual bool execute(TArray<CommandOption> const& givenOptions, TArray<Variable> const& args, Variable& result) = 0;
+  virtual bool execute(TArray<CommandOption> const& givenOptions, TArray<Variable> const& args,
+                       Variable& result) = 0;
   // The text for the arguments, as help shows it. The host's default is no text.
   virtual void getArgSyntaxString(HString& out) const;
   // Whether these arguments are accepted. The host's default accepts none.
   virtual bool checkArgSyntax(TArray<Variable> const& args, TArray<CommandOption> const& options) const;
-  // Whether the command makes sense without arguments and options: for interfaces. The host's default is true.
+  // Whether the command makes sense without arguments and options: for interfaces. The host's default is
+  // true.
   virtual bool canExecuteSolo() const;
   // The host's default is Variable::None.
   virtual Variable::VarType getReturnType();

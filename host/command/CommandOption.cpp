@@ -5,7 +5,8 @@ CommandOption::CommandOption(HString const& name, int argCount, Variable::VarTyp
 
 CommandOption::~CommandOption() = default;
 
-CommandOption* CommandOption::createInstance(HString const& name, int argCount, Variable::VarType type, bool listed) {
+CommandOption* CommandOption::createInstance(HString const& name, int argCount, Variable::VarType type,
+                                             bool listed) {
   return new CommandOption(name, argCount, type, listed);
 }
 

@@ -14,7 +14,8 @@ class CommandOption {
   CommandOption& operator=(CommandOption const&) = default;
   virtual ~CommandOption();
 
-  static CommandOption* createInstance(HString const& name, int argCount, Variable::VarType type, bool listed);
+  static CommandOption* createInstance(HString const& name, int argCount, Variable::VarType type,
+                                       bool listed);
 
   HString const& getName() const { return m_name; }
   int getArgCount() const { return m_argCount; }

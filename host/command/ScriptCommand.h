@@ -1,5 +1,5 @@
-// Commands by declaration. A command's names, options, arguments, result and purpose are one constant record at the
-// top of its file; ScriptCommand turns the record into what the host asks for.
+// Commands by declaration. A command's names, options, arguments, result and purpose are one constant record
+// at the top of its file; ScriptCommand turns the record into what the host asks for.
 //
 //   class GetNumKeysCmd final : public ScriptCommand<GetNumKeysCmd> {
 //    public:
@@ -36,7 +36,7 @@ struct ArgsInfo {
   char const* syntax = nullptr;  // null: the host's default text
   int least = kHostDefault;
   int most = 0;
-  Variable::VarType types[6] = {};   // of the first arguments; None: any type
+  Variable::VarType types[6] = {};            // of the first arguments; None: any type
   Variable::VarType others = Variable::None;  // of those beyond them; None: any type
 };
 
@@ -72,9 +72,9 @@ inline bool fits(ArgsInfo const& info, Args const& args) {
   const int count = args.getCount();
   if (count < info.least || count > info.most) return false;
   for (int i = 0; i < count; ++i) {
-    const Variable::VarType wanted = i < static_cast<int>(std::size(info.types)) && info.types[i] != Variable::None
-                                         ? info.types[i]
-                                         : info.others;
+    const Variable::VarType wanted =
+        i < static_cast<int>(std::size(info.types)) && info.types[i] != Variable::None ? info.types[i]
+                                                                                       : info.others;
     if (wanted != Variable::None && args[i].getType() != wanted) return false;
   }
   return true;
@@ -84,7 +84,8 @@ template <class Self>
 class ScriptCommand : public Command {
  public:
   void getArgSyntaxString(HString& out) const override {
-    Self::info.args.syntax ? static_cast<void>(out = Self::info.args.syntax) : Command::getArgSyntaxString(out);
+    Self::info.args.syntax ? static_cast<void>(out = Self::info.args.syntax)
+                           : Command::getArgSyntaxString(out);
   }
   bool checkArgSyntax(Args const& args, Given const& options) const override {
     if (Self::info.args.least == ArgsInfo::kHostDefault) return Command::checkArgSyntax(args, options);

@@ -1,5 +1,5 @@
-// Identifier of a module, channel or attribute, unique for the life of the scene. Its text is a decimal number; 0
-// is blank and names nothing.
+// Identifier of a module, channel or attribute, unique for the life of the scene. Its text is a decimal
+// number; 0 is blank and names nothing.
 #pragma once
 
 #include <functional>

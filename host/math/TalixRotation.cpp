@@ -2,7 +2,6 @@
 
 #include <ImathQuat.h>
 #include <ImathVec.h>
-
 #include <algorithm>
 #include <cmath>
 #include <numbers>
@@ -53,8 +52,8 @@ void TalixRotation::setAsEuler(RotOrder order, Vec3 const& angles) {
 }
 
 void TalixRotation::getAsEuler(RotOrder order, Vec3& angles) const {
-  // R = R_k(c) R_j(b) R_i(a) for the order i, j, k. With s the order's parity, the entries that name one or two
-  // angles are R[k][i] = -s sin b, R[k][j] / R[k][k] = s tan a, R[j][i] / R[i][i] = s tan c.
+  // R = R_k(c) R_j(b) R_i(a) for the order i, j, k. With s the order's parity, the entries that name one or
+  // two angles are R[k][i] = -s sin b, R[k][j] / R[k][k] = s tan a, R[j][i] / R[i][i] = s tan c.
   const auto& [i, j, k] = kAxes[order];
   const double s = parity(kAxes[order]);
   Vec3 columns[3];
@@ -93,17 +92,22 @@ void TalixRotation::getAsVector(Vec3& rotationVector) const {
 }
 
 void TalixRotation::setQuaternion(double const* xyzw) {
-  const double length = std::sqrt(xyzw[0] * xyzw[0] + xyzw[1] * xyzw[1] + xyzw[2] * xyzw[2] + xyzw[3] * xyzw[3]);
+  const double length =
+      std::sqrt(xyzw[0] * xyzw[0] + xyzw[1] * xyzw[1] + xyzw[2] * xyzw[2] + xyzw[3] * xyzw[3]);
   if (!(length > 0) || !std::isfinite(length)) return makeIdentity();
-  // A quaternion that is of unit length to the last digits is kept as it is, so that what was stored reads back.
+  // A quaternion that is of unit length to the last digits is kept as it is, so that what was stored reads
+  // back.
   const double scale = std::abs(length - 1) < 1e-15 ? 1 : 1 / length;
   m_x = xyzw[0] * scale, m_y = xyzw[1] * scale, m_z = xyzw[2] * scale, m_w = xyzw[3] * scale;
 }
 
-void TalixRotation::getQuaternion(double* xyzw) const { xyzw[0] = m_x, xyzw[1] = m_y, xyzw[2] = m_z, xyzw[3] = m_w; }
+void TalixRotation::getQuaternion(double* xyzw) const {
+  xyzw[0] = m_x, xyzw[1] = m_y, xyzw[2] = m_z, xyzw[3] = m_w;
+}
 
 TalixRotation TalixRotation::slerp(TalixRotation const& a, TalixRotation const& b, double part) {
-  const Quat q = Imath::slerpShortestArc(Quat(a.m_w, a.m_x, a.m_y, a.m_z), Quat(b.m_w, b.m_x, b.m_y, b.m_z), part);
+  const Quat q =
+      Imath::slerpShortestArc(Quat(a.m_w, a.m_x, a.m_y, a.m_z), Quat(b.m_w, b.m_x, b.m_y, b.m_z), part);
   const double xyzw[4] = {q.v.x, q.v.y, q.v.z, q.r};
   TalixRotation result;
   result.setQuaternion(xyzw);

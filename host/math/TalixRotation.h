@@ -1,7 +1,7 @@
 // A rotation: a unit quaternion with its other forms. Angles are radians.
 //
-// Column vectors: (a * b) turns by b first, then by a. A vector of Euler angles always holds the angle about x in
-// x, whatever the order; the first axis of an order is applied first, so XYZ is Rz * Ry * Rx.
+// Column vectors: (a * b) turns by b first, then by a. A vector of Euler angles always holds the angle about
+// x in x, whatever the order; the first axis of an order is applied first, so XYZ is Rz * Ry * Rx.
 #pragma once
 
 #include "host/math/Vec3.h"
@@ -45,6 +45,6 @@ class TalixRotation {
 
 // The angle about `axis` (0 x, 1 y, 2 z) that is next to `near` and equal to `angle` but for whole turns.
 double unrolled(double angle, double near);
-// Euler angles equal to `angles` in `order` (whole turns, and the second solution of the middle axis) that lie
-// closest to `near`: for curves without jumps.
+// Euler angles equal to `angles` in `order` (whole turns, and the second solution of the middle axis) that
+// lie closest to `near`: for curves without jumps.
 Vec3 unrolledEuler(TalixRotation::RotOrder order, Vec3 const& angles, Vec3 const& near);

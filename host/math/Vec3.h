@@ -29,7 +29,9 @@ class Vec3 {
   constexpr bool operator==(Vec3 const& o) const { return x == o.x && y == o.y && z == o.z; }
 
   constexpr double dot(Vec3 const& o) const { return x * o.x + y * o.y + z * o.z; }
-  constexpr Vec3 cross(Vec3 const& o) const { return {y * o.z - z * o.y, z * o.x - x * o.z, x * o.y - y * o.x}; }
+  constexpr Vec3 cross(Vec3 const& o) const {
+    return {y * o.z - z * o.y, z * o.x - x * o.z, x * o.y - y * o.x};
+  }
   double length() const { return std::hypot(x, y, z); }
 
   // Gives the vector length 1 and answers its former length. A zero vector becomes not-a-number.

@@ -1,8 +1,8 @@
 // A static value of a module: one class for each of the seventeen kinds.
 //
-// Setters end with four flags, true unless a caller has a reason: undoable (the journal records the change), notify
-// (views are told), react (the module takes the change on, as a changed name renames it) and markSet (the attribute
-// counts as set from now on). Those that answer a bool answer whether the value was taken.
+// Setters end with four flags, true unless a caller has a reason: undoable (the journal records the change),
+// notify (views are told), react (the module takes the change on, as a changed name renames it) and markSet
+// (the attribute counts as set from now on). Those that answer a bool answer whether the value was taken.
 #pragma once
 
 #include <memory>
@@ -16,13 +16,14 @@
 #include "host/math/Matrix.h"
 #include "host/math/TalixRotation.h"
 #include "host/math/Vec3.h"
+#include "host/scene/ModuleReferrer.h"
 
-class Module;
-
-class Attribute : public HObject {
+class Attribute : public HObject, private ModuleReferrer {
   H_DECLARE_CLASS(Attribute, HObject)
 
  public:
+  ~Attribute() override;
+
   enum Type {
     Integer = 0,
     Enumeration = 1,
@@ -45,8 +46,8 @@ class Attribute : public HObject {
   using Labels = std::shared_ptr<std::vector<HString> const>;
   using Bits = std::vector<bool>;
   using Modules = std::vector<Module*>;
-  using Value = std::variant<std::monostate, int, double, HString, bool, Vec3, Bits, TalixRotation, int64, Module*,
-                             Modules, Matrix>;
+  using Value = std::variant<std::monostate, int, double, HString, bool, Vec3, Bits, TalixRotation, int64,
+                             Module*, Modules, Matrix>;
   // What a module does when one of its attributes has changed.
   using Reaction = void (*)(Module&, Attribute&);
 
@@ -71,7 +72,7 @@ class Attribute : public HObject {
   Value const& getRawValue() const { return m_value; }
   Value const& getRawDefault() const { return m_default; }
   // The mutator: every change of any attribute passes here.
-  void store(Value value, bool set, bool react);
+  virtual void store(Value value, bool set, bool react);
 
  protected:
   explicit Attribute(Value initial) : m_value(initial), m_default(std::move(initial)) {}
@@ -84,7 +85,10 @@ class Attribute : public HObject {
 
  private:
   friend class Module;
-  friend class SceneReferences;
+
+  void forget(Module* module) override;
+  void referTo(Value const& value);
+  void releaseFrom(Value const& value);
 
   HString m_name;
   ControlID m_id{ControlID::CreateUnique};
@@ -154,7 +158,8 @@ class StringAttribute : public Attribute {
   Type getType() const override { return String; }
   virtual HString getValue() const { return valueAs<HString>(); }
   // The number is unused; it is part of the host's interface.
-  virtual bool setValue(HString const& value, bool undoable, bool notify, int number, bool react, bool markSet);
+  virtual bool setValue(HString const& value, bool undoable, bool notify, int number, bool react,
+                        bool markSet);
 };
 
 // The name of its module: setting it renames. Refuses names that cannot stand.
@@ -163,7 +168,8 @@ class NameAttribute final : public StringAttribute {
 
  public:
   HString getValue() const override;
-  bool setValue(HString const& value, bool undoable, bool notify, int number, bool react, bool markSet) override;
+  bool setValue(HString const& value, bool undoable, bool notify, int number, bool react,
+                bool markSet) override;
 };
 
 // Text of several lines.
@@ -208,7 +214,7 @@ class BitFieldAttribute : public Attribute {
   HString getLabel(int field) const { return (*m_labels)[static_cast<size_t>(field)]; }
   Labels const& getLabels() const { return m_labels; }
   int findLabel(HString const& label) const;  // exact case; -1: none
-  bool getField(int field) const;              // false outside the fields
+  bool getField(int field) const;             // false outside the fields
   bool getField(HString const& label) const { return getField(findLabel(label)); }
   bool setValue(HString const& label, bool on, bool undoable, bool notify, bool react, bool markSet);
 
@@ -234,8 +240,8 @@ class TimeAttribute : public Attribute {
   explicit TimeAttribute(int64 ticks = 0, bool relative = false) : Attribute(ticks), m_relative(relative) {}
   Type getType() const override { return Time; }
   int64 getTime() const { return valueAs<int64>(); }
-  double getValue() const;           // frames at the scene's rate
-  HString getStringValue() const;    // timecode of the whole frames
+  double getValue() const;                        // frames at the scene's rate
+  HString getStringValue() const;                 // timecode of the whole frames
   bool isRelative() const { return m_relative; }  // a length of time rather than a moment
   void setValue(int64 ticks, bool undoable, bool notify, bool react, bool markSet);
 

@@ -54,8 +54,8 @@ class LabelingCluster : public Node {
   H_DECLARE_CLASS(LabelingCluster, Node)
 
  public:
-  // The default positions of the cluster's markers in its space, in the order of "Markers"; the zero vector for an
-  // entry that is no node.
+  // The default positions of the cluster's markers in its space, in the order of "Markers"; the zero vector
+  // for an entry that is no node.
   TSimpleArray<Vec3> getMarkerOffsets() const;
 
  protected:

@@ -1,5 +1,5 @@
-// The scene, reached through g_db: modules by path, index, identifier and selection; clips; active properties;
-// scene-wide settings. All changes of membership, hierarchy and selection pass through it.
+// The scene, reached through g_db: modules by path, index, identifier and selection; clips; active
+// properties; scene-wide settings. All changes of membership, hierarchy and selection pass through it.
 #pragma once
 
 #include <memory>
@@ -24,18 +24,19 @@ class Database {
   // An empty scene, with a new time manager's settings and the built-in channels only.
   void newScene();
 
-  // --- modules -------------------------------------------------------------------------------------------------
-  // A module of a class, with a name that its siblings do not have ("a", then "a_1"; empty: the class name), in the
-  // scene. The first clip becomes active. Null for an abstract class or one that is no module class, a name that
-  // cannot stand, a 32nd clip, a second module of a single-instance class, a parent that refuses.
+  // --- modules
+  // ------------------------------------------------------------------------------------------------- A
+  // module of a class, with a name that its siblings do not have ("a", then "a_1"; empty: the class name), in
+  // the scene. The first clip becomes active. Null for an abstract class or one that is no module class, a
+  // name that cannot stand, a 32nd clip, a second module of a single-instance class, a parent that refuses.
   Module* createModule(HRuntimeClass* type, char const* name, Module* parent);
-  // Puts a module made by createInstance into the scene, which owns it from then on. `uniqueName`: it gets a name
-  // that its siblings do not have. `character` (may be null) becomes its parent. select: it becomes selected.
-  // False, and the caller keeps the module, when createModule would refuse.
+  // Puts a module made by createInstance into the scene, which owns it from then on. `uniqueName`: it gets a
+  // name that its siblings do not have. `character` (may be null) becomes its parent. select: it becomes
+  // selected. False, and the caller keeps the module, when createModule would refuse.
   bool addToScene(Module* module, bool uniqueName, Character const* character, bool select, bool notify);
   // Takes the module and all below it out of the scene, with every reference to them. It lives on until
-  // releaseRemoved. False when it is not in the scene. The flags: with its children, from the selection, undoable,
-  // notify; children always go with it.
+  // releaseRemoved. False when it is not in the scene. The flags: with its children, from the selection,
+  // undoable, notify; children always go with it.
   bool removeFromScene(Module* module, bool children, bool deselect, bool undoable, bool notify);
   // Destroys what was removed since; whoever runs commands calls it after each line.
   void releaseRemoved();
@@ -44,9 +45,9 @@ class Database {
   Module* getModule(int i) const { return m_modules.at(i); }  // in order of creation
   Module* getModule(ControlID& id) const;
   Module* getModule(HString& path) const { return getModuleWithPath(path, nullptr, false); }
-  // The module that a full path or a suffix of one names, among those of a class (null: any). A suffix that fits
-  // several names the one below the priority module, if that is one. priorityOnly: only the priority module's tree
-  // is searched, or everything when there is none.
+  // The module that a full path or a suffix of one names, among those of a class (null: any). A suffix that
+  // fits several names the one below the priority module, if that is one. priorityOnly: only the priority
+  // module's tree is searched, or everything when there is none.
   Module* getModuleWithPath(HString const& path, HRuntimeClass const* filter, bool priorityOnly) const;
   int getNumNodes() const { return m_nodes.getCount(); }
   Node* getNode(int i) const { return m_nodes.at(i); }
@@ -55,9 +56,11 @@ class Database {
   bool moduleOfTypeExists(HRuntimeClass const* type) const;
   SceneIndex& getIndex() const { return *m_index; }
 
-  // --- selection -----------------------------------------------------------------------------------------------
+  // --- selection
+  // -----------------------------------------------------------------------------------------------
   Module* getPrimarySelectedModule() const { return m_selection.getPrimary(); }
-  bool setPrimarySelectedModule(Module* module);  // selects it when need be; null: none. False: not in the scene
+  bool setPrimarySelectedModule(
+      Module* module);  // selects it when need be; null: none. False: not in the scene
   int getNumSelectedModules() const { return m_selection.getCount(); }
   Module* getSelectedModule(int i) const { return m_selection.at(i); }
   int getNumSelectedNodes() const { return m_selection.getNumNodes(); }
@@ -68,11 +71,13 @@ class Database {
   void selectAllModules(bool select);
   Selection& getSelection() { return m_selection; }
 
-  // --- priority ------------------------------------------------------------------------------------------------
+  // --- priority
+  // ------------------------------------------------------------------------------------------------
   Module* getPriorityModule() const { return m_priority; }
   void setPrioritySearchModule(Module* module) { m_priority = module; }
 
-  // --- clips and layers ----------------------------------------------------------------------------------------
+  // --- clips and layers
+  // ----------------------------------------------------------------------------------------
   int getNumClips() const { return m_clips.getCount(); }
   NLEClip* getHeadClip() const { return m_clips.getCount() ? m_clips.at(0) : nullptr; }
   NLEClip* getClipAfter(NLEClip const* clip) const;
@@ -81,7 +86,8 @@ class Database {
   int getActiveLayer() const { return m_activeClip ? m_activeLayer : -1; }
   bool setActiveLayer(int layer);  // false: the active clip has no such layer
 
-  // --- active properties: channels, or components of channels, that key commands work on ------------------------
+  // --- active properties: channels, or components of channels, that key commands work on
+  // ------------------------
   int getNumActiveProperties() const { return static_cast<int>(m_activeProperties.size()); }
   // A property id with its component bits (PropertyTable).
   unsigned int getActiveProperty(int i) const { return m_activeProperties[static_cast<size_t>(i)]; }
@@ -92,7 +98,8 @@ class Database {
   // Drops active properties that no module has any more. notify: views are told.
   void syncActiveProperties(bool notify);
 
-  // --- settings ------------------------------------------------------------------------------------------------
+  // --- settings
+  // ------------------------------------------------------------------------------------------------
   static bool isDevOnlyMode();
   static void setDevOnlyMode(bool on);
   bool getUpdateSolversBeforeClips() const { return m_solversBeforeClips; }
@@ -119,6 +126,7 @@ class Database {
   // Mutators of membership: put a set-up module with its name and parent into every index, and take it out.
   void enter(Module* module);
   void leave(Module* module);
+  void removeAll();
 
   OrderedList<Module, &Module::m_sceneSlot> m_modules;
   OrderedList<Node, &Node::m_nodeSlot> m_nodes;

@@ -1,31 +1,24 @@
 // A scene object: name and paths, parent and children, attributes, channels.
 //
-// The Database owns modules; a module owns its channels and attributes; parent and child links do not own. Names are
-// not empty and hold no backslash; siblings may share one.
+// The Database owns modules; a module owns its channels and attributes; parent and child links do not own.
+// Names are not empty and hold no backslash; siblings may share one.
 #pragma once
 
 #include <memory>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "host/animation/Controller.h"
 #include "host/base/TArray.h"
 #include "host/base/TSimpleArray.h"
 #include "host/scene/Attribute.h"
+#include "host/scene/ModuleReferrer.h"
 #include "host/scene/OrderedList.h"
 
 class Character;
 class NLEClip;
 class Node;
-
-// Someone who points at modules and must let go of one that leaves the scene.
-class ModuleReferrer {
- public:
-  virtual void forget(Module* module) = 0;
-
- protected:
-  ~ModuleReferrer() = default;
-};
 
 class Module : public HObject {
   H_DECLARE_CLASS(Module, HObject)
@@ -35,7 +28,8 @@ class Module : public HObject {
 
   ~Module() override;
 
-  // --- names and paths -----------------------------------------------------------------------------------------
+  // --- names and paths
+  // -----------------------------------------------------------------------------------------
   virtual HString getName() const { return m_name; }
   ControlID getID() const { return m_id; }
   // Whether a name can stand: not empty, no backslash.
@@ -45,18 +39,20 @@ class Module : public HObject {
   HString getPath(EPathType type) const;
   // The names from the root, each after a backslash.
   HString getFullPathString() const;
-  // The shortest suffix of the full path that names this module alone. withinPriority: alone below the priority
-  // module, when this module lies below it.
+  // The shortest suffix of the full path that names this module alone. withinPriority: alone below the
+  // priority module, when this module lies below it.
   HString getMinimumPathString(bool withinPriority) const;
 
-  // --- namespaces: the prefixes of a name, joined by ":", outermost first ----------------------------------------
+  // --- namespaces: the prefixes of a name, joined by ":", outermost first
+  // ----------------------------------------
   virtual void getNamespace(HString& out) const;
   virtual void getNamespaces(TArray<HString>& out) const;
   virtual bool addNamespace(HString const& name);
   virtual bool removeNamespace(HString const& name);
   virtual bool replaceNamespace(HString const& former, HString const& name);
 
-  // --- hierarchy -----------------------------------------------------------------------------------------------
+  // --- hierarchy
+  // -----------------------------------------------------------------------------------------------
   Module* getParent() const { return m_parent; }
   int getNumChildren() const;
   Module* getChild(int i) const;
@@ -74,7 +70,8 @@ class Module : public HObject {
   // The child becomes a root. keepPlace: the scene's order stays as it is.
   virtual bool removeChild(Module* child, bool keepPlace);
 
-  // --- attributes ----------------------------------------------------------------------------------------------
+  // --- attributes
+  // ----------------------------------------------------------------------------------------------
   int getNumAttributes() const { return static_cast<int>(m_attributes.size()); }
   Attribute* getAttribute(int i) const { return m_attributes[static_cast<size_t>(i)].get(); }
   Attribute* getAttribute(char const* name) const;  // exact case; null: none
@@ -82,15 +79,16 @@ class Module : public HObject {
   // Adds a custom attribute. Null when the name is taken by an attribute or channel or cannot stand.
   Attribute* addCustomAttribute(std::unique_ptr<Attribute> attribute);
 
-  // --- channels ------------------------------------------------------------------------------------------------
+  // --- channels
+  // ------------------------------------------------------------------------------------------------
   int getNumChannels() const { return static_cast<int>(m_channels.size()); }
   Controller* getChannel(int i) const { return m_channels[static_cast<size_t>(i)].get(); }
   Controller* getChannel(char const* name) const;
   Controller* getChannel(ControlID id) const;
   Controller* getProperty(HString const& name) const { return getChannel(name.GetStr()); }
   Controller* getProperty(unsigned id) const;  // component bits do not matter
-  // The module's channel of that name, added when it has none. Null when the name has another kind, is taken by an
-  // attribute, or cannot stand.
+  // The module's channel of that name, added when it has none. Null when the name has another kind, is taken
+  // by an attribute, or cannot stand.
   Controller* addChannel(HString const& name, DataSource::PropertyType type);
   // The channel's or attribute's number into `value`: empty on success, else the text to show. byDefault: the
   // channel's default value instead of that at the current time. A name may end in ".x", ".y", ".z".
@@ -99,7 +97,8 @@ class Module : public HObject {
   // Names of channels and attributes hold no dot and no backslash and are not empty.
   static bool isValidPropertyName(HString const& name);
 
-  // --- data ----------------------------------------------------------------------------------------------------
+  // --- data
+  // ----------------------------------------------------------------------------------------------------
   virtual bool hasKeysInClip(NLEClip const* clip, bool allLayers) const;
   virtual void addToClip(NLEClip* clip);
   // From the first to the last key of all channels in the active clip.
@@ -108,7 +107,8 @@ class Module : public HObject {
   virtual void endDataEdit();
   virtual void discardDataEdit();  // restores what was there when the edit began
 
-  // --- state ---------------------------------------------------------------------------------------------------
+  // --- state
+  // ---------------------------------------------------------------------------------------------------
   bool isVisible() const;
   void setVisible(bool visible, bool notify);
   bool isLocked() const;
@@ -118,8 +118,8 @@ class Module : public HObject {
 
  protected:
   Module();
-  // Gives the module its built-in attributes and channels; called once, by the database, before it enters the scene.
-  // A subclass calls its base first.
+  // Gives the module its built-in attributes and channels; called once, by the database, before it enters the
+  // scene. A subclass calls its base first.
   virtual void setUp();
   Attribute* addAttribute(std::unique_ptr<Attribute> attribute, Attribute::Reaction reaction = nullptr);
   template <class T, class... Args>
@@ -137,14 +137,14 @@ class Module : public HObject {
   friend class Controller;
   friend class Database;
   friend class NameAttribute;
-  friend class NodeGraph;
+  friend class ModuleReferrer;
   friend class SceneIndex;
-  friend class SceneReferences;
   friend class Selection;
 
-  void storeName(HString const& name);   // mutator
-  void storeParent(Module* parent);      // mutator: unlinks, links at the end
-  std::string suffixText(int levels) const;
+  void storeName(HString const& name);       // mutator
+  void storeParent(Module* parent);          // mutator: unlinks, links at the end
+  void forgetByAll();                        // every referrer lets go
+  std::string suffixText(int levels) const;  // the last `levels` names of the path
 
   struct Children;
   Children& children();
@@ -160,7 +160,8 @@ class Module : public HObject {
   uint64 m_order = 0;  // of creation
   std::vector<std::unique_ptr<Attribute>> m_attributes;
   std::vector<std::unique_ptr<Controller>> m_channels;
-  std::vector<ModuleReferrer*> m_referrers;
+  // With the number of references that each holds; null: none yet.
+  std::unique_ptr<std::unordered_map<ModuleReferrer*, int>> m_referrers;
   struct DataEdit;
   std::unique_ptr<DataEdit> m_dataEdit;  // only while an edit is open
 };

@@ -1,9 +1,9 @@
 // A module with a transform.
 //
-// Parent-space position = pre-translation + pre-rotation * translation; orientation = pre-rotation * rotation; scale
-// as is. "Local" means the channel's own value. World space composes through the nearest node ancestors; a parent's
-// scale moves its children, and world scale is the product by component. Lengths are millimetres, times ticks.
-// "Const" operations use default values throughout.
+// Parent-space position = pre-translation + pre-rotation * translation; orientation = pre-rotation *
+// rotation; scale as is. "Local" means the channel's own value. World space composes through the nearest node
+// ancestors; a parent's scale moves its children, and world scale is the product by component. Lengths are
+// millimetres, times ticks. "Const" operations use default values throughout.
 #pragma once
 
 #include <vector>
@@ -16,6 +16,12 @@ struct Placement {
   Vec3 position;
   TalixRotation rotation;
   Vec3 scale{1, 1, 1};
+
+  // A frame given in this one, in the frame that this one is given in.
+  Placement operator*(Placement const& inner) const;
+  // A frame given beside this one, as seen from this one. Along an axis of scale 0 everything is at 0.
+  Placement seen(Placement const& other) const;
+  Vec3 seen(Vec3 const& point) const { return seen(Placement{point, {}, {1, 1, 1}}).position; }
 };
 
 class Node : public Module, private ModuleReferrer {
@@ -27,6 +33,11 @@ class Node : public Module, private ModuleReferrer {
   Vec3Controller* getTranslationChannel() const { return m_translation; }
   RotController* getRotationChannel() const { return m_rotation; }
   Vec3Controller* getScaleChannel() const { return m_scale; }
+  // Forgets every cached world placement: what is active has changed.
+  static void forgetWorldCache();
+  // Marks the nodes at and below a module as moved, stopping where that is known already.
+  static void markMoved(Module* module);
+
   // The channel that key searches of a node look at: "Translation".
   Controller* getTransformChannel() const { return m_translation; }
 
@@ -34,7 +45,8 @@ class Node : public Module, private ModuleReferrer {
   bool setRotationOrder(TalixRotation::RotOrder order);
   virtual int getNumDofs() const { return 0; }
 
-  // --- reading -------------------------------------------------------------------------------------------------
+  // --- reading
+  // -------------------------------------------------------------------------------------------------
   Vec3 getLocalPos(int64 time) const;
   TalixRotation getLocalRot(int64 time) const;
   Vec3 getLocalScale(int64 time) const;
@@ -66,8 +78,9 @@ class Node : public Module, private ModuleReferrer {
   Vec3 getPreTranslationInSpaceOfNode(Node* space) const;
   TalixRotation getPreRotationInSpaceOfNode(Node* space) const;
 
-  // --- writing -------------------------------------------------------------------------------------------------
-  // Setters at a time write a key in the active clip, so that the sum of its layers is right; with no active clip
+  // --- writing
+  // ------------------------------------------------------------------------------------------------- Setters
+  // at a time write a key in the active clip, so that the sum of its layers is right; with no active clip
   // they write the default value. World setters find the local value below the present parent.
   virtual void setLocalPos(int64 time, Vec3 const& position);
   virtual void setWSPos(int64 time, Vec3 const& position);
@@ -82,13 +95,15 @@ class Node : public Module, private ModuleReferrer {
   virtual void setConstLocalScale(Vec3 const& scale);
   virtual void setConstWSScale(Vec3 const& scale);
 
-  // False for values that are not finite. keepWorld: the default rotation turns so that the node stays as it is.
+  // False for values that are not finite. keepWorld: the default rotation turns so that the node stays as it
+  // is.
   bool setPreRotation(TalixRotation const& rotation, bool keepWorld);
   bool setPreTranslation(Vec3 const& translation);
   void setPreRotationWS(TalixRotation const& rotation);
   void setPreTranslationWS(Vec3 const& translation);
 
-  // --- connecting lines ----------------------------------------------------------------------------------------
+  // --- connecting lines
+  // ----------------------------------------------------------------------------------------
   bool isConnectedTo(Node const* target) const { return findLine(target) != nullptr; }
   MarkerConnection* getConnectionTo(Node const* target);
   // Replaces a line to the same target.
@@ -99,18 +114,26 @@ class Node : public Module, private ModuleReferrer {
 
  protected:
   Node() = default;
-  friend class Database;
   void setUp() override;
   void dataChanged(Controller const* channel) override;
 
  private:
-  friend class NodeGraph;
+  friend class Database;
+  friend class Selection;
+
   void forget(Module* module) override;
   MarkerConnection const* findLine(Node const* target) const;
   void storePreTransform(Vec3 const& translation, TalixRotation const& rotation);  // mutator
-  void storeLines(std::vector<MarkerConnection> lines);                             // mutator
-  Placement constWorld() const;
+  void storeLines(std::vector<MarkerConnection> lines);                            // mutator
+  // The frame of this node in its parent node's frame.
   Placement inParent(int64 time) const;
+  Placement constInParent() const;
+  Placement constWorld() const;
+  // The world frame of the parent node; the world itself without one.
+  Placement parentWorld(int64 time) const;
+  Placement constParentWorld() const;
+  Vec3 translationFor(Vec3 const& inParent) const;
+  void writeAt(Controller* channel, int64 time, Controller::Values const& values);
 
   Vec3Controller* m_translation = nullptr;
   RotController* m_rotation = nullptr;
@@ -120,8 +143,8 @@ class Node : public Module, private ModuleReferrer {
   TalixRotation m_preRotation;
   std::vector<MarkerConnection> m_lines;
 
-  mutable Placement m_world;          // at the cache's time
-  mutable uint64 m_worldEpoch = 0;    // of the cache; m_world holds when they are equal
+  mutable Placement m_world;        // at the cache's time
+  mutable uint64 m_worldEpoch = 0;  // of the cache; m_world holds when they are equal
   uint32 m_nodeSlot = kNoSlot;
   uint32 m_selectedNodeSlot = kNoSlot;
 };

@@ -1,8 +1,9 @@
-// Objects in order: the i-th one, appending and removing cost at most logarithmic time, however many there are.
+// Objects in order: the i-th one, appending and removing cost at most logarithmic time, however many there
+// are.
 //
-// Each object remembers its slot in a member that the list is told of, so an object can stand in several lists.
-// Removing leaves a hole; a Fenwick tree counts what lies before a slot, and the list closes its holes when they
-// outnumber the objects.
+// Each object remembers its slot in a member that the list is told of, so an object can stand in several
+// lists. Removing leaves a hole; a Fenwick tree counts what lies before a slot, and the list closes its holes
+// when they outnumber the objects.
 #pragma once
 
 #include <bit>
@@ -65,8 +66,8 @@ class OrderedList {
  private:
   int holes() const { return static_cast<int>(m_objects.size()) - m_count; }
 
-  // Fenwick tree from 1: m_sums[i] counts the objects in the (i & -i) slots up to slot i - 1. Made at the first
-  // hole: most lists never have one.
+  // Fenwick tree from 1: m_sums[i] counts the objects in the (i & -i) slots up to slot i - 1. Made at the
+  // first hole: most lists never have one.
   void buildSums() {
     m_sums.assign(1, 0);
     m_sums.reserve(m_objects.size() + 1);

@@ -15,18 +15,18 @@ class SceneIndex {
 
   // The module that a full path (from a backslash on) names: the first created of those that have it.
   Module* findFull(std::string_view path, HRuntimeClass const* filter, Module const* below) const;
-  // The one module with this suffix of a full path; null when none or several fit. `below` (may be null) limits
-  // the search to it and its descendants.
+  // The one module with this suffix of a full path; null when none or several fit. `below` (may be null)
+  // limits the search to it and its descendants.
   Module* findSuffix(std::string_view path, HRuntimeClass const* filter, Module const* below) const;
 
   // The first created child of `parent` (null: root) with that name.
   Module* findChild(Module const* parent, std::string_view name) const;
-  // A name for a new child of `parent` that its siblings do not have: `wanted`, else wanted_1, wanted_2, the lowest
-  // free number.
+  // A name for a new child of `parent` that its siblings do not have: `wanted`, else wanted_1, wanted_2, the
+  // lowest free number.
   HString freeName(Module const* parent, HString const& wanted);
 
-  // How many names, from the module's own upward, tell it from all others (only from those below `below` when that
-  // is not null); 0 when not even the full path does.
+  // How many names, from the module's own upward, tell it from all others (only from those below `below` when
+  // that is not null); 0 when not even the full path does.
   int levelsToTell(Module const* module, Module const* below) const;
 
  private:

@@ -1,5 +1,5 @@
-// The selected modules: an ordered list without repeats, and a primary one. Nodes, markers, characters and labelling
-// bones among them are found as fast as any.
+// The selected modules: an ordered list without repeats, and a primary one. Nodes, markers, characters and
+// labelling bones among them are found as fast as any.
 #pragma once
 
 #include "host/scene/Bones.h"

@@ -19,8 +19,8 @@ class ParameterizedSetup : public Module {
   H_DECLARE_CLASS(ParameterizedSetup, Module)
 
  public:
-  // The custom integer, float and boolean attributes, in the order in which they were added. The setup owns what it
-  // answers, until a parameter is next asked for.
+  // The custom integer, float and boolean attributes, in the order in which they were added. The setup owns
+  // what it answers, until a parameter is next asked for.
   int getNumParameters() const;
   Parameter* getParameter(int i);
   Parameter* getParameter(HString name);

@@ -13,6 +13,7 @@ class LogSink {
   virtual void write(LogLevel level, std::string_view text) = 0;
 };
 
-// Where lines go from now on, null for standard error ("error: TEXT"); answers the former sink. The caller owns it.
+// Where lines go from now on, null for standard error ("error: TEXT"); answers the former sink. The caller
+// owns it.
 LogSink* setLogSink(LogSink* sink);
 void writeLog(LogLevel level, std::string_view text);

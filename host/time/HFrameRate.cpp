@@ -11,11 +11,15 @@ struct Standard {
   double rate;  // 0: any
 };
 // In the order of ETimecodeStandard.
-constexpr Standard kStandards[] = {{"ntsc", 30000.0 / 1001},     {"ntscDrop", 30000.0 / 1001}, {"pal", 25},
-                                   {"film", 24}, {"filmNtsc", 24000.0 / 1001}, {"Custom", 0}};
+constexpr Standard kStandards[] = {{"ntsc", 30000.0 / 1001},
+                                   {"ntscDrop", 30000.0 / 1001},
+                                   {"pal", 25},
+                                   {"film", 24},
+                                   {"filmNtsc", 24000.0 / 1001},
+                                   {"Custom", 0}};
 
-// Drop-frame timecode leaves out the numbers of the first frames of every minute but each tenth: 2 for each 30
-// counted frames a second.
+// Drop-frame timecode leaves out the numbers of the first frames of every minute but each tenth: 2 for each
+// 30 counted frames a second.
 struct DropCount {
   int64 perSecond, dropped, perMinute, perTenMinutes;
   explicit DropCount(int64 counted)
@@ -52,9 +56,13 @@ bool HFrameRate::getTimecodeStandardFromString(HString const& name, ETimecodeSta
   return false;
 }
 
-char const* HFrameRate::getTimecodeStandardName(ETimecodeStandard standard) { return kStandards[standard].name; }
+char const* HFrameRate::getTimecodeStandardName(ETimecodeStandard standard) {
+  return kStandards[standard].name;
+}
 
-int64 HFrameRate::countedFrames() const { return std::max<int64>(1, static_cast<int64>(std::ceil(m_rate - 1e-6))); }
+int64 HFrameRate::countedFrames() const {
+  return std::max<int64>(1, static_cast<int64>(std::ceil(m_rate - 1e-6)));
+}
 
 HString HFrameRate::timecodeFromFrame(int64 frame) const {
   const int64 counted = countedFrames();
@@ -65,8 +73,8 @@ HString HFrameRate::timecodeFromFrame(int64 frame) const {
   const int64 seconds = number / counted;
   HString text;
   text.Format("%s%02lld:%02lld:%02lld%c%02lld", sign, static_cast<long long>(seconds / 3600),
-              static_cast<long long>(seconds / 60 % 60), static_cast<long long>(seconds % 60), drop ? ';' : ':',
-              static_cast<long long>(number % counted));
+              static_cast<long long>(seconds / 60 % 60), static_cast<long long>(seconds % 60),
+              drop ? ';' : ':', static_cast<long long>(number % counted));
   return text;
 }
 

@@ -16,7 +16,8 @@ class HFrameRate {
   double getFrameRate() const { return m_rate; }
   int64 getTicksPerFrame() const { return m_ticks; }
 
-  // Takes on the standard's own rate; a custom standard keeps the rate. False for a number that is no standard.
+  // Takes on the standard's own rate; a custom standard keeps the rate. False for a number that is no
+  // standard.
   bool setTimecodeStandard(ETimecodeStandard standard);
   // Frames a second, above 0 and at most kMaximum; other rates are not taken.
   void setFrameRate(double rate);
@@ -25,8 +26,8 @@ class HFrameRate {
   static bool getTimecodeStandardFromString(HString const& name, ETimecodeStandard& standard);
   static char const* getTimecodeStandardName(ETimecodeStandard standard);
 
-  // The frame number as HH:MM:SS:FF at this rate (";" before the frames of drop-frame timecode), with a sign when
-  // negative.
+  // The frame number as HH:MM:SS:FF at this rate (";" before the frames of drop-frame timecode), with a sign
+  // when negative.
   HString timecodeFromFrame(int64 frame) const;
   // False when the text is no timecode, or names a frame that drop-frame timecode leaves out.
   bool frameFromTimecode(HString const& text, int64& frame) const;

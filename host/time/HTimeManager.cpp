@@ -43,7 +43,8 @@ int64 HTimeManager::frameTime(int64 time, ERoundDirection direction, int64 origi
   const int64 way = time - origin;
   int64 down = way / ticks * ticks;
   if (down > way) down -= ticks;
-  const bool up = way != down && (direction == RoundUp || (direction == RoundNearest && way - down >= ticks - (way - down)));
+  const bool up = way != down &&
+                  (direction == RoundUp || (direction == RoundNearest && way - down >= ticks - (way - down)));
   return origin + down + (up ? ticks : 0);
 }
 

@@ -37,8 +37,8 @@ class HTimeManager {
   // Rounds the ends to frame boundaries counted from `origin`: outward, or inward.
   void frameRange(HTimeRange& range, bool outward, int64 origin);
 
-  // Frames from a text: a number of frames or timecode; 0 for other texts. `relative` reads timecode as a length
-  // of time, of which drop-frame counting leaves nothing out.
+  // Frames from a text: a number of frames or timecode; 0 for other texts. `relative` reads timecode as a
+  // length of time, of which drop-frame counting leaves nothing out.
   double stringToFrameDouble(HString const& text, bool relative) const;
 
   HTimeRange getAnimRange() const { return m_animRange; }

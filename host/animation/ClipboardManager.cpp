@@ -1,0 +1,21 @@
+#include "host/animation/ClipboardManager.h"
+
+void ClipboardManager::startClipboardCopy(ClipboardDataType, ControllerDataType type) {
+  m_incoming.clear();
+  m_incomingType = type;
+}
+
+void ClipboardManager::finishClipboardCopy(bool keep) {
+  if (keep) {
+    m_keys.swap(m_incoming);
+    m_type = m_incomingType;
+    m_filled = true;
+  }
+  m_incoming.clear();
+}
+
+HTimeRange ClipboardManager::getControllerDataRange() const {
+  HTimeRange range;
+  for (tagKey const& key : m_keys) range.include(key.time);
+  return range;
+}

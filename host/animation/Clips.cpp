@@ -1,0 +1,44 @@
+#include "host/animation/Clips.h"
+
+#include "host/scene/Database.h"
+
+H_DEFINE_ABSTRACT_CLASS(NLEClip);
+H_DEFINE_CLASS(Clip);
+H_DEFINE_CLASS(BlendClip);
+
+void NLEClip::setUp() {
+  Module::setUp();
+  m_weight = static_cast<FloatController*>(addChannel("Weight", DataSource::FloatProperty));
+  m_weight->setConstValue(1, false);
+}
+
+bool NLEClip::isActive() const { return g_db->getActiveClip() == this; }
+
+NLEClip* NLEClip::getNext() const { return g_db->getClipAfter(this); }
+
+int NLEClip::addLayer() {
+  m_layerLocks.push_back(false);
+  return getNumLayers() - 1;
+}
+
+bool NLEClip::isLayerLocked(int layer) const {
+  return layer >= 0 && layer < getNumLayers() && m_layerLocks[static_cast<size_t>(layer)];
+}
+
+void NLEClip::setLayerLocked(int layer, bool locked) {
+  if (layer >= 0 && layer < getNumLayers()) m_layerLocks[static_cast<size_t>(layer)] = locked;
+}
+
+void Clip::setUp() {
+  NLEClip::setUp();
+  m_smpteOffset = addBuiltIn<TimeAttribute>("SmpteOffset");
+}
+
+Clip* Clip::createInstance() { return new Clip; }
+
+void Clip::setSmpteOffset(int64 ticks) { m_smpteOffset->setValue(ticks, true, true, true, true); }
+
+void BlendClip::setUp() {
+  NLEClip::setUp();
+  m_sources = addBuiltIn<MultiModAttribute>("Sources");
+}

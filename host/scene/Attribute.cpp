@@ -1,0 +1,245 @@
+#include "host/scene/Attribute.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
+
+H_DEFINE_ABSTRACT_CLASS(Attribute);
+H_DEFINE_CLASS(IntAttribute);
+H_DEFINE_CLASS(TemperatureAttribute);
+H_DEFINE_CLASS(EnumAttribute);
+H_DEFINE_CLASS(FloatAttribute);
+H_DEFINE_CLASS(StringAttribute);
+H_DEFINE_CLASS(NameAttribute);
+H_DEFINE_CLASS(MultiStringAttribute);
+H_DEFINE_CLASS(BoolAttribute);
+H_DEFINE_CLASS(VectorAttribute);
+H_DEFINE_CLASS(BitFieldAttribute);
+H_DEFINE_CLASS(RotationAttribute);
+H_DEFINE_CLASS(TimeAttribute);
+H_DEFINE_CLASS(ColorAttribute);
+H_DEFINE_CLASS(EventAttribute);
+H_DEFINE_CLASS(NoneAttribute);
+H_DEFINE_CLASS(ModAttribute);
+H_DEFINE_CLASS(MatrixAttribute);
+H_DEFINE_CLASS(MultiModAttribute);
+
+std::unique_ptr<Attribute> Attribute::create(Type type, HString const& name, Labels labels) {
+  std::unique_ptr<Attribute> attribute;
+  switch (type) {
+    case Integer:
+      attribute = std::make_unique<IntAttribute>();
+      break;
+    case Enumeration:
+      attribute = std::make_unique<EnumAttribute>(std::move(labels));
+      break;
+    case Float:
+      attribute = std::make_unique<FloatAttribute>();
+      break;
+    case String:
+      attribute = std::make_unique<StringAttribute>();
+      break;
+    case MultiString:
+      attribute = std::make_unique<MultiStringAttribute>();
+      break;
+    case Boolean:
+      attribute = std::make_unique<BoolAttribute>();
+      break;
+    case Vector:
+      attribute = std::make_unique<VectorAttribute>();
+      break;
+    case BitField:
+      attribute = std::make_unique<BitFieldAttribute>(std::move(labels));
+      break;
+    case Rotation:
+      attribute = std::make_unique<RotationAttribute>();
+      break;
+    case Time:
+      attribute = std::make_unique<TimeAttribute>();
+      break;
+    case Color:
+      attribute = std::make_unique<ColorAttribute>(Database::getDefaultModColor());
+      break;
+    case Event:
+      attribute = std::make_unique<EventAttribute>();
+      break;
+    case ModuleReference:
+      attribute = std::make_unique<ModAttribute>();
+      break;
+    case NoKind:
+      attribute = std::make_unique<NoneAttribute>();
+      break;
+    case MatrixKind:
+      attribute = std::make_unique<MatrixAttribute>();
+      break;
+    case MultiModule:
+      attribute = std::make_unique<MultiModAttribute>();
+      break;
+    case Temperature:
+      attribute = std::make_unique<TemperatureAttribute>();
+      break;
+  }
+  attribute->m_name = name;
+  return attribute;
+}
+
+Attribute::~Attribute() { releaseFrom(m_value); }
+
+void Attribute::referTo(Value const& value) {
+  if (auto* module = std::get_if<Module*>(&value)) refer(*module);
+  if (auto* modules = std::get_if<Modules>(&value))
+    for (Module* module : *modules) refer(module);
+}
+
+void Attribute::releaseFrom(Value const& value) {
+  if (auto* module = std::get_if<Module*>(&value)) release(*module);
+  if (auto* modules = std::get_if<Modules>(&value))
+    for (Module* module : *modules) release(module);
+}
+
+void Attribute::store(Value value, bool set, bool react) {
+  referTo(value);
+  releaseFrom(m_value);
+  m_value = std::move(value);
+  m_set = set;
+  if (react && m_reaction && m_module) m_reaction(*m_module, *this);
+}
+
+void Attribute::change(Value value, bool, bool react, bool markSet) {
+  store(std::move(value), m_set || markSet, react);
+}
+
+void Attribute::unset(bool, bool, bool react) { store(m_default, false, react); }
+
+void Attribute::forget(Module* module) {
+  if (auto* modules = std::get_if<Modules>(&m_value)) {
+    Modules others;
+    std::copy_if(modules->begin(), modules->end(), std::back_inserter(others),
+                 [&](Module* other) { return other != module; });
+    store(std::move(others), m_set, true);
+  } else {
+    store(static_cast<Module*>(nullptr), m_set, true);
+  }
+}
+
+bool IntAttribute::setValue(int value, bool, bool notify, bool react, bool markSet) {
+  change(value, notify, react, markSet);
+  return true;
+}
+
+bool TemperatureAttribute::setValue(int value, bool, bool notify, bool react, bool markSet) {
+  change(value, notify, react, markSet);
+  return true;
+}
+
+namespace {
+
+int indexOf(Attribute::Labels const& labels, HString const& label) {
+  if (!labels) return -1;
+  const auto found = std::find(labels->begin(), labels->end(), label);
+  return found == labels->end() ? -1 : static_cast<int>(found - labels->begin());
+}
+
+bool isFinite(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
+
+}  // namespace
+
+HString EnumAttribute::getEnumValue() const {
+  const int index = getIndex();
+  return index >= 0 && index < getNumItems() ? (*m_labels)[static_cast<size_t>(index)] : HString();
+}
+
+int EnumAttribute::findLabel(HString const& label) const { return indexOf(m_labels, label); }
+
+bool EnumAttribute::setValue(HString const& label, bool undoable, bool notify, bool react, bool markSet) {
+  return setIndex(findLabel(label), undoable, notify, react, markSet);
+}
+
+bool EnumAttribute::setIndex(int index, bool, bool notify, bool react, bool markSet) {
+  if (index < 0 || index >= getNumItems()) return false;
+  change(index, notify, react, markSet);
+  return true;
+}
+
+bool FloatAttribute::setValue(double value, bool, bool notify, bool react, bool markSet) {
+  if (!std::isfinite(value)) return false;
+  change(value, notify, react, markSet);
+  return true;
+}
+
+bool StringAttribute::setValue(HString const& value, bool, bool notify, int, bool react, bool markSet) {
+  change(value, notify, react, markSet);
+  return true;
+}
+
+HString NameAttribute::getValue() const { return getModule()->getName(); }
+
+bool NameAttribute::setValue(HString const& value, bool, bool, int, bool, bool) {
+  return getModule()->setName(value);
+}
+
+void MultiStringAttribute::setValue(HString const& value, bool, bool notify, bool react, bool markSet) {
+  change(value, notify, react, markSet);
+}
+
+void BoolAttribute::setValue(bool value, bool, bool notify, bool react, bool markSet) {
+  change(value, notify, react, markSet);
+}
+
+void VectorAttribute::setValue(Vec3 const& value, bool, bool notify, bool react, bool markSet) {
+  if (isFinite(value)) change(value, notify, react, markSet);
+}
+
+int BitFieldAttribute::findLabel(HString const& label) const { return indexOf(m_labels, label); }
+
+bool BitFieldAttribute::getField(int field) const {
+  return field >= 0 && field < getNumFields() && valueAs<Bits>()[static_cast<size_t>(field)];
+}
+
+bool BitFieldAttribute::setValue(HString const& label, bool on, bool, bool notify, bool react, bool markSet) {
+  const int field = findLabel(label);
+  if (field < 0) return false;
+  Bits bits = valueAs<Bits>();
+  bits[static_cast<size_t>(field)] = on;
+  change(std::move(bits), notify, react, markSet);
+  return true;
+}
+
+void RotationAttribute::setValue(TalixRotation const& value, bool, bool notify, bool react, bool markSet) {
+  change(value, notify, react, markSet);
+}
+
+double TimeAttribute::getValue() const { return HTimeManager::getInstance()->getFrameDouble(getTime()); }
+
+HString TimeAttribute::getStringValue() const {
+  HTimeManager const* time = HTimeManager::getInstance();
+  HFrameRate rate = time->getFrameRate();
+  if (m_relative && rate.getTimecodeStandard() == NTSC_DROP) rate.setTimecodeStandard(NTSC);
+  return rate.timecodeFromFrame(time->getFrame(getTime()));
+}
+
+void TimeAttribute::setValue(int64 ticks, bool, bool notify, bool react, bool markSet) {
+  change(std::clamp(ticks, -kForever, kForever), notify, react, markSet);
+}
+
+void ColorAttribute::setValue(Vec3 const& value, bool, bool notify, bool react, bool markSet) {
+  if (isFinite(value)) change(value, notify, react, markSet);
+}
+
+void ColorAttribute::setDefaultMode(bool undoable, bool notify) { unset(undoable, notify, true); }
+
+void EventAttribute::doCallBack() { change(std::monostate(), true, true, true); }
+
+void ModAttribute::setValue(Module* value, bool, bool notify, bool react, bool markSet) {
+  change(value, notify, react, markSet);
+}
+
+void MatrixAttribute::setValue(Matrix const& value, bool, bool notify, bool react, bool markSet) {
+  change(value, notify, react, markSet);
+}
+
+void MultiModAttribute::setValue(TSimpleArray<Module*>& value, bool, bool notify, bool react, bool markSet) {
+  change(Modules(value.begin(), value.end()), notify, react, markSet);
+}

@@ -1,0 +1,261 @@
+#include "host/scene/Database.h"
+
+#include <cstdarg>
+
+#include "host/animation/ClipboardManager.h"
+#include "host/animation/PropertyTable.h"
+#include "host/base/Text.h"
+#include "host/scene/CalibrationMgr.h"
+#include "host/scene/SceneIndex.h"
+#include "host/scene/SubjectManager.h"
+#include "host/time/HTimeManager.h"
+
+namespace {
+
+Database s_database;
+bool s_devOnlyMode = false;
+
+}  // namespace
+
+Database* g_db = &s_database;
+
+Database::Database()
+    : m_index(std::make_unique<SceneIndex>()),
+      m_calibration(std::make_unique<CalibrationMgr>()),
+      m_clipboard(std::make_unique<ClipboardManager>()),
+      m_subjects(std::make_unique<SubjectManager>()) {}
+
+// Not more: the tables that a new scene resets may be gone already when the program ends.
+Database::~Database() { removeAll(); }
+
+void Database::removeAll() {
+  for (Module* module : m_modules.toVector())
+    if (!module->getParent()) removeFromScene(module, true, true, false, true);
+  releaseRemoved();
+}
+
+void Database::newScene() {
+  removeAll();
+  m_activeProperties.clear();
+  m_autoUpdateProperties = false;
+  m_solversBeforeClips = false;
+  m_upAxis = -1;
+  m_created = 0;
+  *m_index = SceneIndex();
+  *m_clipboard = ClipboardManager();
+  PropertyTable::getInstance().reset();
+  HTimeManager::getInstance()->reset();
+}
+
+// --- modules
+// ---------------------------------------------------------------------------------------------------
+
+bool Database::mayJoin(Module const* module) const {
+  HRuntimeClass const* type = module->getRuntimeClass();
+  if (type->isDerivedFrom(&NLEClip::s_classNLEClip) && getNumClips() >= NLEClip::kMaximum) return false;
+  return !type->isSingleInstance() || !moduleOfTypeExists(type);
+}
+
+Module* Database::createModule(HRuntimeClass* type, char const* name, Module* parent) {
+  if (!type || !type->isDerivedFrom(&Module::s_classModule) || !type->getCreateFunction()) return nullptr;
+  const HString wanted = name && *name ? name : type->getName();
+  if (!Module::isValidName(wanted) || (parent && !parent->isInScene())) return nullptr;
+  if (parent && type->isDerivedFrom(&Character::s_classCharacter)) return nullptr;
+  std::unique_ptr<Module> module(static_cast<Module*>(type->getCreateFunction()()));
+  if (!mayJoin(module.get())) return nullptr;
+  module->setUp();
+  module->m_name = m_index->freeName(parent, wanted);
+  Module* entered = module.release();
+  enter(entered);
+  if (parent) entered->storeParent(parent);
+  return entered;
+}
+
+bool Database::addToScene(Module* module, bool uniqueName, Character const* character, bool select, bool) {
+  if (!module || module->isInScene() || !mayJoin(module) || (character && !character->isInScene()))
+    return false;
+  if (character && module->isKindOf(&Character::s_classCharacter)) return false;
+  if (module->m_name.IsEmpty()) module->m_name = module->getRuntimeClass()->getName();
+  auto* parent = const_cast<Character*>(character);
+  if (uniqueName) module->m_name = m_index->freeName(parent, module->m_name);
+  enter(module);
+  if (parent) module->storeParent(parent);
+  if (select) module->setSelected(true);
+  return true;
+}
+
+void Database::enter(Module* module) {
+  module->m_order = ++m_created;
+  m_modules.append(module);
+  m_byId.emplace(module->getID(), module);
+  ++m_countByClass[module->getRuntimeClass()];
+  m_index->add(module);
+  if (auto* node = objectAs<Node>(module)) m_nodes.append(node);
+  if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.append(character);
+  if (auto* clip = objectAs<NLEClip>(module)) {
+    m_clips.append(clip);
+    if (getNumClips() == 1) setActiveClip(clip);
+  }
+}
+
+void Database::leave(Module* module) {
+  m_selection.remove(module);
+  if (m_priority == module) m_priority = nullptr;
+  module->forgetByAll();
+  if (auto* node = objectAs<Node>(module)) m_nodes.remove(node);
+  if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.remove(character);
+  if (auto* clip = objectAs<NLEClip>(module)) {
+    m_clips.remove(clip);
+    if (m_activeClip == clip) setActiveClip(nullptr);
+    for (Module* other : m_modules.toVector())
+      for (int i = 0; i < other->getNumChannels(); ++i) other->getChannel(i)->forgetClip(clip);
+  }
+  m_index->remove(module);
+  --m_countByClass[module->getRuntimeClass()];
+  m_byId.erase(module->getID());
+  m_modules.remove(module);
+}
+
+bool Database::removeFromScene(Module* module, bool, bool, bool, bool) {
+  if (!module || !module->isInScene()) return false;
+  TSimpleArray<Module*> all(64, 4096);
+  module->getModAndDecedents(all);
+  if (module->getParent()) module->storeParent(nullptr);
+  // Children first, so that a module never outlives its parent in the scene.
+  for (int i = all.getCount() - 1; i >= 0; --i) {
+    leave(all[i]);
+    m_removed.emplace_back(all[i]);
+  }
+  return true;
+}
+
+void Database::releaseRemoved() {
+  // Children stand before their parents.
+  while (!m_removed.empty()) m_removed.pop_back();
+}
+
+Module* Database::getModule(ControlID& id) const {
+  const auto found = m_byId.find(id);
+  return found == m_byId.end() ? nullptr : found->second;
+}
+
+Module* Database::getModuleWithPath(HString const& path, HRuntimeClass const* filter,
+                                    bool priorityOnly) const {
+  Module const* below = priorityOnly ? m_priority : nullptr;
+  std::string const& text = path.GetString();
+  if (text.empty()) return nullptr;
+  if (text.front() == '\\') return m_index->findFull(text, filter, below);
+  Module* found = m_index->findSuffix(text, filter, below);
+  return found || !m_priority || below ? found : m_index->findSuffix(text, filter, m_priority);
+}
+
+TSimpleArray<Marker*> Database::getMarkers() const {
+  TSimpleArray<Marker*> markers(16, 4096);
+  for (int i = 0; i < getNumNodes(); ++i)
+    if (auto* marker = objectAs<Marker>(getNode(i))) markers.add(marker);
+  return markers;
+}
+
+TSimpleArray<Module*> Database::getModulesOfType(HRuntimeClass const* type) const {
+  TSimpleArray<Module*> modules(16, 4096);
+  for (int i = 0; i < getNumModules(); ++i)
+    if (getModule(i)->isKindOf(type)) modules.add(getModule(i));
+  return modules;
+}
+
+bool Database::moduleOfTypeExists(HRuntimeClass const* type) const {
+  for (auto const& [known, count] : m_countByClass)
+    if (count > 0 && known->isDerivedFrom(type)) return true;
+  return false;
+}
+
+// --- selection
+// -------------------------------------------------------------------------------------------------
+
+bool Database::setPrimarySelectedModule(Module* module) {
+  if (module && !module->isInScene()) return false;
+  m_selection.setPrimary(module);
+  return true;
+}
+
+LabelingBone* Database::getSelectedLabelingBone(int i) const {
+  return i >= 0 && i < m_selection.getNumLabelingBones() ? m_selection.getLabelingBone(i) : nullptr;
+}
+
+void Database::selectAllModules(bool select) {
+  if (!select) return m_selection.clear();
+  for (int i = 0; i < getNumModules(); ++i) m_selection.add(getModule(i));
+}
+
+// --- clips and layers
+// ------------------------------------------------------------------------------------------
+
+NLEClip* Database::getClipAfter(NLEClip const* clip) const {
+  if (!m_clips.contains(clip)) return nullptr;
+  const int next = m_clips.indexOf(clip) + 1;
+  return next < getNumClips() ? m_clips.at(next) : nullptr;
+}
+
+void Database::setActiveClip(NLEClip* clip) {
+  m_activeClip = clip;
+  m_activeLayer = 0;
+  Node::forgetWorldCache();
+}
+
+bool Database::setActiveLayer(int layer) {
+  if (!m_activeClip || layer < 0 || layer >= m_activeClip->getNumLayers()) return false;
+  m_activeLayer = layer;
+  return true;
+}
+
+// --- active properties
+// -----------------------------------------------------------------------------------------
+
+void Database::setActiveProperties(std::vector<unsigned> ids) { m_activeProperties = std::move(ids); }
+
+void Database::syncActiveProperties(bool) {
+  std::vector<bool> held(PropertyTable::kIdMask + 1);
+  for (int i = 0; i < getNumModules(); ++i)
+    for (int k = 0; k < getModule(i)->getNumChannels(); ++k)
+      held[getModule(i)->getChannel(k)->getPropertyId()] = true;
+  std::vector<unsigned> kept;
+  for (const unsigned id : m_activeProperties)
+    if (held[id & PropertyTable::kIdMask]) kept.push_back(id);
+  setActiveProperties(std::move(kept));
+}
+
+// --- settings
+// --------------------------------------------------------------------------------------------------
+
+bool Database::isDevOnlyMode() { return s_devOnlyMode; }
+
+void Database::setDevOnlyMode(bool on) { s_devOnlyMode = on; }
+
+Vec3 const& Database::getDefaultModColor() {
+  static constexpr Vec3 grey(160, 160, 160);
+  return grey;
+}
+
+Vec3 const& Database::getPrimSelModColor() {
+  static constexpr Vec3 green(64, 255, 64);
+  return green;
+}
+
+Vec3 const& Database::getSelModColor() {
+  static constexpr Vec3 white(255, 255, 255);
+  return white;
+}
+
+void Database::logError(char const* format, ...) {
+  va_list args;
+  va_start(args, format);
+  writeLog(LogLevel::Error, formatted(format, args));
+  va_end(args);
+}
+
+void Database::logInfo(char const* format, ...) {
+  va_list args;
+  va_start(args, format);
+  writeLog(LogLevel::Info, formatted(format, args));
+  va_end(args);
+}

@@ -1,0 +1,306 @@
+#include "host/scene/Module.h"
+
+#include <algorithm>
+
+#include "host/scene/Database.h"
+#include "host/scene/SceneIndex.h"
+#include "host/time/HTimeManager.h"
+
+H_DEFINE_ABSTRACT_CLASS(Module);
+
+// Children in order; the nodes among them have a list of their own once there is a child that is none.
+struct Module::Children {
+  OrderedList<Module, &Module::m_childSlot> all;
+  OrderedList<Module, &Module::m_nodeChildSlot> nodes;
+};
+
+struct Module::DataEdit {
+  int depth = 0;
+  struct Before {
+    Controller* channel;
+    decltype(Controller::m_tracks) tracks;  // snapshots
+    Controller::Values byDefault;
+    Interpolation interpolation;
+  };
+  std::vector<Before> before;
+};
+
+void ModuleReferrer::refer(Module* module) {
+  if (!module) return;
+  if (!module->m_referrers)
+    module->m_referrers = std::make_unique<std::unordered_map<ModuleReferrer*, int>>();
+  ++(*module->m_referrers)[this];
+}
+
+void ModuleReferrer::release(Module* module) {
+  if (!module) return;
+  const auto found = module->m_referrers->find(this);
+  if (--found->second == 0) module->m_referrers->erase(found);
+}
+
+void Module::forgetByAll() {
+  while (m_referrers && !m_referrers->empty()) m_referrers->begin()->first->forget(this);
+}
+
+Module::Module() = default;
+
+Module::~Module() { forgetByAll(); }
+
+void Module::setUp() {
+  addBuiltIn<NameAttribute>("Name");
+  addBuiltIn<BoolAttribute>("Visible", true);
+  addBuiltIn<BoolAttribute>("Locked");
+  addBuiltIn<ColorAttribute>("Color", Database::getDefaultModColor());
+}
+
+// --- names
+// -----------------------------------------------------------------------------------------------------
+
+bool Module::isValidName(HString const& name) {
+  return !name.IsEmpty() && name.GetString().find('\\') == std::string::npos;
+}
+
+bool Module::setName(HString const& name) {
+  if (!isValidName(name)) return false;
+  if (name != m_name) storeName(name);
+  return true;
+}
+
+void Module::storeName(HString const& name) {
+  const bool indexed = isInScene();
+  if (indexed) g_db->getIndex().remove(this);
+  m_name = name;
+  if (indexed) g_db->getIndex().add(this);
+}
+
+HString Module::getPath(EPathType type) const {
+  switch (type) {
+    case NameOnly:
+      return getName();
+    case FullPath:
+      return getFullPathString();
+    case ShortestPath:
+      break;
+  }
+  return getMinimumPathString(false);
+}
+
+std::string Module::suffixText(int levels) const {
+  std::vector<Module const*> chain;
+  for (Module const* module = this; module && static_cast<int>(chain.size()) < levels;
+       module = module->m_parent)
+    chain.push_back(module);
+  std::string text;
+  for (auto module = chain.rbegin(); module != chain.rend(); ++module) {
+    if (!text.empty()) text += '\\';
+    text += (*module)->m_name.GetString();
+  }
+  return text;
+}
+
+HString Module::getFullPathString() const { return HString("\\" + suffixText(INT32_MAX)); }
+
+HString Module::getMinimumPathString(bool withinPriority) const {
+  Module const* priority = withinPriority ? g_db->getPriorityModule() : nullptr;
+  if (priority && priority != this && !isDescendedFrom(priority)) priority = nullptr;
+  const int levels = g_db->getIndex().levelsToTell(this, priority);
+  return levels == 0 ? getFullPathString() : HString(suffixText(levels));
+}
+
+// --- hierarchy
+// -------------------------------------------------------------------------------------------------
+
+Module::Children& Module::children() {
+  if (!m_children) m_children = std::make_unique<Children>();
+  return *m_children;
+}
+
+int Module::getNumChildren() const { return m_children ? m_children->all.getCount() : 0; }
+
+Module* Module::getChild(int i) const { return m_children->all.at(i); }
+
+int Module::getNumNodeChildren() const { return m_children ? m_children->nodes.getCount() : 0; }
+
+Node* Module::getNodeChild(int i) const { return static_cast<Node*>(m_children->nodes.at(i)); }
+
+Node* Module::getNodeParent() const {
+  Module* ancestor = m_parent;
+  while (ancestor && !ancestor->isKindOf(&Node::s_classNode)) ancestor = ancestor->m_parent;
+  return static_cast<Node*>(ancestor);
+}
+
+Character* Module::getCharacterParent() const {
+  Module* ancestor = m_parent;
+  while (ancestor && !ancestor->isKindOf(&Character::s_classCharacter)) ancestor = ancestor->m_parent;
+  return static_cast<Character*>(ancestor);
+}
+
+bool Module::isDescendedFrom(Module const* ancestor) const {
+  Module const* module = m_parent;
+  while (module && module != ancestor) module = module->m_parent;
+  return module != nullptr && ancestor != nullptr;
+}
+
+void Module::getModAndDecedents(TSimpleArray<Module*>& out) {
+  out.add(this);
+  for (int i = 0; i < getNumChildren(); ++i) getChild(i)->getModAndDecedents(out);
+}
+
+bool Module::addChild(Module* child) {
+  if (!child || child == this || isDescendedFrom(child) || !isInScene() || !child->isInScene() ||
+      child->isKindOf(&Character::s_classCharacter))
+    return false;
+  if (child->m_parent != this) child->storeParent(this);
+  return true;
+}
+
+bool Module::removeChild(Module* child, bool) {
+  if (!child || child->m_parent != this) return false;
+  child->storeParent(nullptr);
+  return true;
+}
+
+void Module::storeParent(Module* parent) {
+  const bool indexed = isInScene();
+  if (indexed) g_db->getIndex().remove(this);
+  const bool node = isKindOf(&Node::s_classNode);
+  if (m_parent) {
+    m_parent->m_children->all.remove(this);
+    if (node) m_parent->m_children->nodes.remove(this);
+  }
+  m_parent = parent;
+  if (m_parent) {
+    m_parent->children().all.append(this);
+    if (node) m_parent->children().nodes.append(this);
+  }
+  if (indexed) g_db->getIndex().add(this);
+  Node::markMoved(this);
+}
+
+// --- attributes
+// ------------------------------------------------------------------------------------------------
+
+Attribute* Module::getAttribute(char const* name) const {
+  for (auto const& attribute : m_attributes)
+    if (attribute->getName() == name) return attribute.get();
+  return nullptr;
+}
+
+Attribute* Module::getAttribute(ControlID id) const {
+  for (auto const& attribute : m_attributes)
+    if (attribute->getID() == id) return attribute.get();
+  return nullptr;
+}
+
+Attribute* Module::addAttribute(std::unique_ptr<Attribute> attribute, Attribute::Reaction reaction) {
+  const Attribute::Type type = attribute->getType();
+  attribute->m_module = this;
+  attribute->m_reaction = reaction;
+  attribute->m_canBeUnset = attribute->m_custom || type == Attribute::Color ||
+                            type == Attribute::ModuleReference || type == Attribute::MultiModule;
+  // What can be unset starts so; the others always are set.
+  attribute->m_set = !attribute->m_canBeUnset;
+  m_attributes.push_back(std::move(attribute));
+  return m_attributes.back().get();
+}
+
+Attribute* Module::addCustomAttribute(std::unique_ptr<Attribute> attribute) {
+  HString const& name = attribute->getName();
+  if (!isValidPropertyName(name) || getAttribute(name.GetStr()) || getChannel(name.GetStr())) return nullptr;
+  attribute->m_custom = true;
+  return addAttribute(std::move(attribute));
+}
+
+bool Module::isValidPropertyName(HString const& name) {
+  return !name.IsEmpty() && name.GetString().find_first_of(".\\") == std::string::npos;
+}
+
+// --- channels
+// --------------------------------------------------------------------------------------------------
+
+Controller* Module::getChannel(char const* name) const {
+  return getProperty(Controller::mapPropertyName(HString(name)));
+}
+
+Controller* Module::getChannel(ControlID id) const {
+  for (auto const& channel : m_channels)
+    if (channel->getID() == id) return channel.get();
+  return nullptr;
+}
+
+Controller* Module::getProperty(unsigned id) const {
+  id &= 0xffff;
+  if (id == 0) return nullptr;
+  for (auto const& channel : m_channels)
+    if (channel->getPropertyId() == id) return channel.get();
+  return nullptr;
+}
+
+// --- data
+// ------------------------------------------------------------------------------------------------------
+
+bool Module::hasKeysInClip(NLEClip const* clip, bool) const {
+  return std::any_of(m_channels.begin(), m_channels.end(),
+                     [&](auto const& channel) { return channel->hasKeysInClip(clip); });
+}
+
+// Channels make their tracks at the first key, so there is nothing to prepare.
+void Module::addToClip(NLEClip*) {}
+
+HTimeRange Module::getDataRange() const {
+  HTimeRange range;
+  NLEClip const* clip = g_db->getActiveClip();
+  for (auto const& channel : m_channels) range.include(channel->getKeyRangeInClip(clip));
+  return range;
+}
+
+void Module::beginDataEdit(HTimeRange const& range) {
+  if (!m_dataEdit) {
+    m_dataEdit = std::make_unique<DataEdit>();
+    for (auto const& channel : m_channels)
+      m_dataEdit->before.push_back(
+          {channel.get(), channel->m_tracks, channel->m_default, channel->m_interpolation});
+  }
+  ++m_dataEdit->depth;
+  for (DataEdit::Before const& before : m_dataEdit->before) before.channel->beginDataEdit(range);
+}
+
+void Module::endDataEdit() {
+  if (!m_dataEdit) return;
+  // Not the channels that were added meanwhile: their edit did not begin.
+  for (DataEdit::Before const& before : m_dataEdit->before) before.channel->endDataEdit();
+  if (--m_dataEdit->depth == 0) m_dataEdit.reset();
+}
+
+void Module::discardDataEdit() {
+  if (!m_dataEdit) return;
+  for (DataEdit::Before& before : m_dataEdit->before) {
+    before.channel->m_tracks = before.tracks;
+    before.channel->m_default = before.byDefault;
+    before.channel->m_interpolation = before.interpolation;
+  }
+  endDataEdit();
+}
+
+// --- state
+// -----------------------------------------------------------------------------------------------------
+
+namespace {
+
+// The built-in switches stand at these places in every module.
+enum { kVisible = 1, kLocked = 2 };
+
+}  // namespace
+
+bool Module::isVisible() const { return static_cast<BoolAttribute*>(getAttribute(kVisible))->getValue(); }
+
+void Module::setVisible(bool visible, bool notify) {
+  static_cast<BoolAttribute*>(getAttribute(kVisible))->setValue(visible, true, notify, true, true);
+}
+
+bool Module::isLocked() const { return static_cast<BoolAttribute*>(getAttribute(kLocked))->getValue(); }
+
+void Module::setSelected(bool selected) {
+  if (!isInScene()) return;
+  selected ? g_db->getSelection().add(this) : g_db->getSelection().remove(this);
+}

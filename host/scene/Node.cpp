@@ -1,0 +1,343 @@
+#include "host/scene/Node.h"
+
+#include <cmath>
+
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
+
+H_DEFINE_CLASS(Node);
+
+// --- placements and their cache
+// --------------------------------------------------------------------------------
+
+namespace {
+
+// World placements are cached for one time, that of the last question: the current time when a scene is
+// looked at, each frame in turn when something walks through time. A node's placement holds while its epoch
+// is the cache's. A node that holds has ancestors that hold.
+struct WorldCache {
+  int64 time = 0;
+  uint64 epoch = 1;
+} s_cache;
+
+double quotient(double a, double b) { return b == 0 ? 0 : a / b; }
+
+Vec3 quotients(Vec3 const& a, Vec3 const& b) {
+  return {quotient(a.x, b.x), quotient(a.y, b.y), quotient(a.z, b.z)};
+}
+
+bool isFinite(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
+
+int64 now() { return HTimeManager::getInstance()->getTime(); }
+
+Controller::Values raw(Vec3 const& v) { return {v.x, v.y, v.z}; }
+
+Controller::Values raw(TalixRotation const& rotation) {
+  Controller::Values values;
+  rotation.getQuaternion(values.data());
+  return values;
+}
+
+}  // namespace
+
+Placement Placement::operator*(Placement const& inner) const {
+  return {position + rotation.rotate(scaled(inner.position, scale)), rotation * inner.rotation,
+          scaled(scale, inner.scale)};
+}
+
+Placement Placement::seen(Placement const& other) const {
+  const TalixRotation back = rotation.inverse();
+  return {quotients(back.rotate(other.position - position), scale), back * other.rotation,
+          quotients(other.scale, scale)};
+}
+
+void Node::forgetWorldCache() { ++s_cache.epoch; }
+
+void Node::markMoved(Module* module) {
+  std::vector<Module*> open{module};
+  while (!open.empty()) {
+    Module* next = open.back();
+    open.pop_back();
+    if (auto* node = objectAs<Node>(next)) {
+      if (node->m_worldEpoch != s_cache.epoch) continue;
+      node->m_worldEpoch = 0;
+    }
+    for (int i = 0; i < next->getNumChildren(); ++i) open.push_back(next->getChild(i));
+  }
+}
+
+Placement Node::getWorldPlacement(int64 time) const {
+  if (time != s_cache.time) {
+    s_cache.time = time;
+    ++s_cache.epoch;
+  }
+  if (m_worldEpoch == s_cache.epoch) return m_world;
+  std::vector<Node const*> chain;
+  Node const* known = this;
+  while (known && known->m_worldEpoch != s_cache.epoch) {
+    chain.push_back(known);
+    known = known->getNodeParent();
+  }
+  for (auto node = chain.rbegin(); node != chain.rend(); ++node) {
+    const Placement own = (*node)->inParent(time);
+    (*node)->m_world = known ? known->m_world * own : own;
+    (*node)->m_worldEpoch = s_cache.epoch;
+    known = *node;
+  }
+  return m_world;
+}
+
+// --- life
+// ------------------------------------------------------------------------------------------------------
+
+Node::~Node() {
+  for (MarkerConnection const& line : m_lines) release(line.getTarget());
+}
+
+void Node::setUp() {
+  Module::setUp();
+  static const Attribute::Labels orders = std::make_shared<std::vector<HString> const>(
+      std::vector<HString>{"XYZ", "XZY", "YXZ", "YZX", "ZXY", "ZYX"});
+  m_translation = static_cast<Vec3Controller*>(addChannel("Translation", DataSource::Vec3Property));
+  m_rotation = static_cast<RotController*>(addChannel("Rotation", DataSource::RotProperty));
+  m_scale = static_cast<Vec3Controller*>(addChannel("Scale", DataSource::Vec3Property));
+  m_scale->setConstValue({1, 1, 1}, false, false);
+  m_rotationOrder = addBuiltIn<EnumAttribute>("RotationOrder", orders);
+}
+
+void Node::dataChanged(Controller const* channel) {
+  if (!channel || channel == m_translation || channel == m_rotation || channel == m_scale) markMoved(this);
+}
+
+TalixRotation::RotOrder Node::getRotationOrder() const {
+  return static_cast<TalixRotation::RotOrder>(m_rotationOrder->getIndex());
+}
+
+bool Node::setRotationOrder(TalixRotation::RotOrder order) {
+  return m_rotationOrder->setIndex(order, true, true, true, true);
+}
+
+// --- reading
+// ---------------------------------------------------------------------------------------------------
+
+Vec3 Node::getLocalPos(int64 time) const { return m_translation->getValue(time); }
+TalixRotation Node::getLocalRot(int64 time) const { return m_rotation->getValue(time); }
+Vec3 Node::getLocalScale(int64 time) const { return m_scale->getValue(time); }
+
+Placement Node::inParent(int64 time) const {
+  return {m_preTranslation + m_preRotation.rotate(getLocalPos(time)), m_preRotation * getLocalRot(time),
+          getLocalScale(time)};
+}
+
+Placement Node::parentWorld(int64 time) const {
+  Node const* parent = getNodeParent();
+  return parent ? parent->getWorldPlacement(time) : Placement();
+}
+
+Vec3 Node::getWSPos(int64 time) const { return getWorldPlacement(time).position; }
+TalixRotation Node::getWSRot(int64 time) const { return getWorldPlacement(time).rotation; }
+Vec3 Node::getWSScale(int64 time) const { return getWorldPlacement(time).scale; }
+
+namespace {
+
+// What `space` (null: the world) sees of a world placement.
+Placement seenFrom(Node const* space, int64 time, Placement const& world) {
+  return space ? space->getWorldPlacement(time).seen(world) : world;
+}
+
+}  // namespace
+
+Vec3 Node::getPosInSpaceOfNode(int64 time, Node* space) const {
+  return seenFrom(space, time, getWorldPlacement(time)).position;
+}
+
+TalixRotation Node::getRotInSpaceOfNode(int64 time, Node* space) const {
+  return seenFrom(space, time, getWorldPlacement(time)).rotation;
+}
+
+Vec3 Node::getScaleInSpaceOfNode(int64 time, Node* space) const {
+  return seenFrom(space, time, getWorldPlacement(time)).scale;
+}
+
+Vec3 Node::getConstLocalPos() const { return m_translation->getConstValue(); }
+
+TalixRotation Node::getConstLocalRot(bool withoutPre) const {
+  return withoutPre ? m_rotation->getConstValue() : m_preRotation * m_rotation->getConstValue();
+}
+
+Vec3 Node::getConstLocalScale() const { return m_scale->getConstValue(); }
+
+Placement Node::constInParent() const {
+  return {m_preTranslation + m_preRotation.rotate(getConstLocalPos()), getConstLocalRot(false),
+          getConstLocalScale()};
+}
+
+Placement Node::constWorld() const {
+  Placement world = constInParent();
+  for (Node const* node = getNodeParent(); node; node = node->getNodeParent())
+    world = node->constInParent() * world;
+  return world;
+}
+
+Placement Node::constParentWorld() const {
+  Node const* parent = getNodeParent();
+  return parent ? parent->constWorld() : Placement();
+}
+
+Vec3 Node::getConstWSPos() const { return constWorld().position; }
+TalixRotation Node::getConstWSRot() const { return constWorld().rotation; }
+Vec3 Node::getConstWSScale() const { return constWorld().scale; }
+
+Vec3 Node::getConstPosInSpaceOfNode(Node const* space) const {
+  return space ? space->constWorld().seen(constWorld()).position : getConstWSPos();
+}
+
+TalixRotation Node::getConstRotInSpaceOfNode(Node const* space) const {
+  return space ? space->constWorld().seen(constWorld()).rotation : getConstWSRot();
+}
+
+Vec3 Node::getConstScaleInSpaceOfNode(Node const* space) const {
+  return space ? space->constWorld().seen(constWorld()).scale : getConstWSScale();
+}
+
+Vec3 Node::getPreTranslationWS() const { return getPreTranslationInSpaceOfNode(nullptr); }
+
+TalixRotation Node::getPreRotationWS() const { return getPreRotationInSpaceOfNode(nullptr); }
+
+Vec3 Node::getPreTranslationInSpaceOfNode(Node* space) const {
+  return seenFrom(space, now(), parentWorld(now()) * Placement{m_preTranslation, {}, {1, 1, 1}}).position;
+}
+
+TalixRotation Node::getPreRotationInSpaceOfNode(Node* space) const {
+  return seenFrom(space, now(), parentWorld(now()) * Placement{{}, m_preRotation, {1, 1, 1}}).rotation;
+}
+
+// --- writing
+// ---------------------------------------------------------------------------------------------------
+
+Vec3 Node::translationFor(Vec3 const& inParent) const {
+  return m_preRotation.inverse().rotate(inParent - m_preTranslation);
+}
+
+void Node::writeAt(Controller* channel, int64 time, Controller::Values const& values) {
+  if (!g_db->getActiveClip()) {
+    channel->beginDefaultEdit();
+    channel->setDefaultValues(values);
+    channel->endDataEdit();
+  } else if (channel->isEditable()) {
+    channel->beginDataEdit(HTimeRange(time, time));
+    channel->writeKeyAt(time, channel->solveLayer(time, values), KeyTrack::kAll);
+    channel->endDataEdit();
+  }
+}
+
+void Node::setLocalPos(int64 time, Vec3 const& position) {
+  if (isFinite(position)) writeAt(m_translation, time, raw(position));
+}
+
+void Node::setWSPos(int64 time, Vec3 const& position) {
+  setLocalPos(time, translationFor(parentWorld(time).seen(position)));
+}
+
+void Node::setLocalRot(int64 time, TalixRotation const& rotation) {
+  writeAt(m_rotation, time, raw(rotation));
+}
+
+void Node::setWSRot(int64 time, TalixRotation const& rotation) {
+  setLocalRot(time, (parentWorld(time).rotation * m_preRotation).inverse() * rotation);
+}
+
+void Node::setLocalScale(int64 time, Vec3 const& scale) {
+  if (isFinite(scale)) writeAt(m_scale, time, raw(scale));
+}
+
+void Node::setWSScale(int64 time, Vec3 const& scale) {
+  setLocalScale(time, quotients(scale, parentWorld(time).scale));
+}
+
+void Node::setConstLocalPos(Vec3 const& position) { m_translation->setConstValue(position, true, false); }
+
+void Node::setConstWSPos(Vec3 const& position) {
+  setConstLocalPos(translationFor(constParentWorld().seen(position)));
+}
+
+void Node::setConstLocalRot(TalixRotation const& rotation, bool withoutPre) {
+  m_rotation->setConstValue(withoutPre ? rotation : m_preRotation.inverse() * rotation, true);
+}
+
+void Node::setConstWSRot(TalixRotation const& rotation) {
+  setConstLocalRot(constParentWorld().rotation.inverse() * rotation, false);
+}
+
+void Node::setConstLocalScale(Vec3 const& scale) { m_scale->setConstValue(scale, true, false); }
+
+void Node::setConstWSScale(Vec3 const& scale) {
+  setConstLocalScale(quotients(scale, constParentWorld().scale));
+}
+
+void Node::storePreTransform(Vec3 const& translation, TalixRotation const& rotation) {
+  m_preTranslation = translation;
+  m_preRotation = rotation;
+  markMoved(this);
+}
+
+bool Node::setPreRotation(TalixRotation const& rotation, bool keepWorld) {
+  const TalixRotation former = getConstLocalRot(false);
+  storePreTransform(m_preTranslation, rotation);
+  if (keepWorld) setConstLocalRot(former, false);
+  return true;
+}
+
+bool Node::setPreTranslation(Vec3 const& translation) {
+  if (!isFinite(translation)) return false;
+  storePreTransform(translation, m_preRotation);
+  return true;
+}
+
+void Node::setPreRotationWS(TalixRotation const& rotation) {
+  setPreRotation(parentWorld(now()).rotation.inverse() * rotation, false);
+}
+
+void Node::setPreTranslationWS(Vec3 const& translation) {
+  setPreTranslation(parentWorld(now()).seen(translation));
+}
+
+// --- connecting lines
+// ------------------------------------------------------------------------------------------
+
+Vec3 MarkerConnection::getDefaultColor() { return {128, 128, 128}; }
+
+MarkerConnection const* Node::findLine(Node const* target) const {
+  for (MarkerConnection const& line : m_lines)
+    if (line.getTarget() == target) return &line;
+  return nullptr;
+}
+
+MarkerConnection* Node::getConnectionTo(Node const* target) {
+  return const_cast<MarkerConnection*>(findLine(target));
+}
+
+void Node::storeLines(std::vector<MarkerConnection> lines) {
+  for (MarkerConnection const& line : lines) refer(line.getTarget());
+  for (MarkerConnection const& line : m_lines) release(line.getTarget());
+  m_lines = std::move(lines);
+}
+
+void Node::addConnectingLine(MarkerConnection const& line) {
+  std::vector<MarkerConnection> lines = m_lines;
+  std::erase_if(lines, [&](MarkerConnection const& other) { return other.getTarget() == line.getTarget(); });
+  lines.push_back(line);
+  storeLines(std::move(lines));
+}
+
+void Node::removeConnectingLine(MarkerConnection const& line) { removeConnectingLine(line.getTarget()); }
+
+void Node::removeConnectingLine(Node* target) {
+  std::vector<MarkerConnection> lines = m_lines;
+  std::erase_if(lines, [&](MarkerConnection const& line) { return line.getTarget() == target; });
+  storeLines(std::move(lines));
+}
+
+void Node::resetAllLines() { storeLines({}); }
+
+void Node::forget(Module* module) { removeConnectingLine(static_cast<Node*>(module)); }

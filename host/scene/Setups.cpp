@@ -1,0 +1,41 @@
+#include "host/scene/Setups.h"
+
+H_DEFINE_ABSTRACT_CLASS(ParameterizedSetup);
+H_DEFINE_CLASS(LabelingSetup);
+H_DEFINE_CLASS(SolvingSetup);
+
+double Parameter::getValue() const {
+  double value = 0;
+  m_attribute->getModule()->getPropertyVal(getName(), value, true);
+  return value;
+}
+
+std::vector<Attribute*> ParameterizedSetup::parameters() const {
+  std::vector<Attribute*> found;
+  for (int i = 0; i < getNumAttributes(); ++i) {
+    Attribute* attribute = getAttribute(i);
+    const Attribute::Type type = attribute->getType();
+    const bool number = type == Attribute::Integer || type == Attribute::Float || type == Attribute::Boolean;
+    if (number && attribute->isCustom()) found.push_back(attribute);
+  }
+  return found;
+}
+
+int ParameterizedSetup::getNumParameters() const { return static_cast<int>(parameters().size()); }
+
+Parameter* ParameterizedSetup::getParameter(int i) {
+  const std::vector<Attribute*> all = parameters();
+  m_answered = i >= 0 && i < static_cast<int>(all.size())
+                   ? std::make_unique<Parameter>(all[static_cast<size_t>(i)])
+                   : nullptr;
+  return m_answered.get();
+}
+
+Parameter* ParameterizedSetup::getParameter(HString name) {
+  for (Attribute* attribute : parameters()) {
+    if (attribute->getName() != name) continue;
+    m_answered = std::make_unique<Parameter>(attribute);
+    return m_answered.get();
+  }
+  return nullptr;
+}

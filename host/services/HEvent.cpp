@@ -1,0 +1,56 @@
+#include "host/services/HEvent.h"
+
+#include <typeinfo>
+
+namespace {
+
+HEventManager s_manager;
+
+}  // namespace
+
+HEventManager* g_eventManager = &s_manager;
+
+HSmartEventStaticDataStore HSmartEvent::s_staticData;
+
+void HEventManager::safeSubmit(HEvent const& event) {
+  if (!event.mayJoinAnother()) {
+    HLock lock(HSmartEvent::s_staticData.section);
+    if (!HSmartEvent::s_staticData.pending.insert(typeid(event)).second) return;
+  }
+  HLock lock(g_eventManager->m_section);
+  g_eventManager->m_queue.push_back(event.clone());
+}
+
+bool HEventManager::submitImmediate(HEvent const& event) {
+  // A listener may add or remove listeners.
+  const auto listeners = m_listeners;
+  for (auto const& [number, listener] : listeners) listener(event);
+  return !listeners.empty();
+}
+
+void HEventManager::deliverQueued() {
+  while (true) {
+    std::unique_ptr<HEvent> event;
+    {
+      HLock lock(m_section);
+      if (m_queue.empty()) return;
+      event = std::move(m_queue.front());
+      m_queue.pop_front();
+    }
+    if (!event->mayJoinAnother()) {
+      HLock lock(HSmartEvent::s_staticData.section);
+      HEvent const& known = *event;
+      HSmartEvent::s_staticData.pending.erase(typeid(known));
+    }
+    submitImmediate(*event);
+  }
+}
+
+int HEventManager::addListener(Listener listener) {
+  m_listeners.emplace_back(++m_lastNumber, std::move(listener));
+  return m_lastNumber;
+}
+
+void HEventManager::removeListener(int number) {
+  std::erase_if(m_listeners, [&](auto const& entry) { return entry.first == number; });
+}
