@@ -290,13 +290,14 @@ void setUpAxis(Take& take) {
            (take.up == Axis::Y ? "y was assumed, as files in metres have it" : "z was assumed")});
 }
 
+// "Subject:Name"; a star stands before the numbers of points that nobody has named.
 TakePoint namedPoint(const std::string& name) {
   TakePoint point;
   const size_t colon = name.find(':');
   const bool hasSubject = colon != std::string::npos && colon > 0 && colon + 1 < name.size();
   if (hasSubject) point.subject = name.substr(0, colon);
   point.label = hasSubject ? name.substr(colon + 1) : name;
-  return point;
+  return point.label.starts_with('*') ? TakePoint() : point;
 }
 
 }  // namespace

@@ -171,6 +171,7 @@ TEST(TrcHeader, NamesMayBeMissingShiftedOrHaveASubject) {
   const Take subjects = withNames("Frame#\tTime\tAnn:L Hip\t\t\tB:\t\t\n", "1\t0\t1\t2\t3\t4\t5\t6");
   EXPECT_EQ(subjects.points[0].subject, "Ann");
   EXPECT_EQ(subjects.points[0].label, "L Hip");
+  EXPECT_EQ(withNames("Frame#\tTime\tAnn:*12\n", "1\t0\t1\t2\t3").points[0].label, "");
   EXPECT_EQ(subjects.points[1].subject, "");
   EXPECT_EQ(subjects.points[1].label, "B:");
 
