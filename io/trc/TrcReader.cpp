@@ -81,14 +81,14 @@ class RowReader {
     size_t column = 0;
     for (TrcCells cells(row); cells.next(cell) && cell.empty();) ++column;
     if (!startsIgnoringCase(cell, "x")) return false;
-    m_coordinateColumn = column;
+    m_coordinateColumn = std::max(column, kFirstColumn);
     return true;
   }
 
   // Positions begin after Frame# and Time, even under a header that has a column more; unless the rows have
   // it too: then it is empty, and the row too long without it.
   void alignWith(std::string_view row) {
-    if (m_coordinateColumn <= kFirstColumn) return;
+    if (m_coordinateColumn == kFirstColumn) return;
     size_t column = 0, firstFilled = 0, columns = 0;
     std::string_view cell;
     for (TrcCells cells(row); cells.next(cell); ++column) {
@@ -202,12 +202,13 @@ class RowReader {
   }
 
   void noteAlignment() {
-    if (m_coordinateColumn == kFirstColumn) return;
     const std::string extra = std::to_string(m_coordinateColumn - kFirstColumn);
-    if (m_firstColumn == kFirstColumn)
-      warn("the header has " + extra + " column more than the rows; the markers were named in order");
-    else
+    if (m_firstColumn != kFirstColumn)
       warn("header and rows have " + extra + " empty column before the first marker, which was left out");
+    else if (m_coordinateColumn != kFirstColumn)
+      warn("the header has " + extra + " column more than the rows; the markers were named in order");
+    else if (m_header.namesOutOfPlace)
+      warn("the marker names do not stand above every third column; the markers were named in order");
   }
 
   void noteCounts() {
