@@ -179,11 +179,12 @@ class MotionReader {
   }
 
   // How far a printed number may be from what was meant: half its last digit, or the whole of it where the
-  // digits are so many that one was more likely cut than rounded.
+  // digits are so many that one was more likely cut than rounded. Zeros at the end tell nothing.
   static double printedPrecision(std::string_view word) {
     const size_t exponent = std::min(word.find_first_of("eE"), word.size());
     const size_t point = std::min(word.find('.'), exponent);
-    const int digits = static_cast<int>(exponent - point) - (point < exponent ? 1 : 0);
+    const size_t last = word.substr(0, exponent).find_last_not_of('0');
+    const int digits = last == std::string_view::npos || last < point ? 0 : static_cast<int>(last - point);
     const double power = exponent < word.size() ? parseNumber(word.substr(exponent + 1)).value_or(0) : 0;
     return (digits >= 5 ? 1.0 : 0.5) * std::pow(10.0, power - digits);
   }

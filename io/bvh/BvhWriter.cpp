@@ -214,6 +214,7 @@ class BvhWriter {
   }
 
   void warnOfWhatIsLeftOut() {
+    constexpr double kCentimetre = 10;  // what readers assume
     warnOfCount(m_take.points.size(), "points");
     warnOfCount(m_take.outputs.size(), "computed outputs");
     warnOfCount(m_take.analog.size(), "analog channels");
@@ -221,7 +222,8 @@ class BvhWriter {
     warnOfCount(m_endSiteNames, "names of end sites");
     if (m_take.firstFrame != 0)
       warn("BVH frames count from 0; the first frame was " + std::to_string(m_take.firstFrame));
-    if (m_take.fileUnit != "cm") warn("BVH names no length unit; the lengths are in " + m_take.fileUnit);
+    if (m_take.unitInMillimetres != kCentimetre)
+      warn("BVH names no length unit; the lengths are in " + m_take.fileUnit);
     if (m_take.up != Axis::Y)
       warn(std::string("BVH names no up axis; up is ") + (m_take.up == Axis::Z ? "z" : "x"));
     size_t leftOut = 0, tracks = 0;

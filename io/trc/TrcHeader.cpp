@@ -95,10 +95,12 @@ void readNames(TextScanner& scanner, TrcHeader& header) {
       !startsIgnoringCase(cells[1], "time"))
     scanner.failAt(line,
                    "the line of marker names beginning with Frame# and Time expected, not " + shown(row));
-  for (size_t i = kFirst; i < cells.size(); ++i)
-    if (!cells[i].empty() && (i - kFirst) % 3 != 0) header.namesInOrder = true;
-  for (size_t i = kFirst; i < cells.size(); header.namesInOrder ? ++i : i += 3)
-    if (!header.namesInOrder || !cells[i].empty()) header.names.emplace_back(cells[i]);
+  const bool tabbed = row.find('\t') != std::string_view::npos;
+  for (size_t i = kFirst; tabbed && i < cells.size(); ++i)
+    if (!cells[i].empty() && (i - kFirst) % 3 != 0) header.namesOutOfPlace = true;
+  const bool inOrder = !tabbed || header.namesOutOfPlace;
+  for (size_t i = kFirst; i < cells.size(); i += inOrder ? 1 : 3)
+    if (!inOrder || !cells[i].empty()) header.names.emplace_back(cells[i]);
 }
 
 }  // namespace

@@ -15,7 +15,7 @@ struct TrcHeader {
   std::string unit;                               // empty: not given
   std::optional<double> frameCount, markerCount;  // as announced; the rows decide
   std::vector<std::string> names;  // of the markers, with subject; empty for one without a name
-  bool namesInOrder = false;  // the names stand at other columns than every third, so only their order counts
+  bool namesOutOfPlace = false;    // not at every third column, so that only their order counts
 };
 
 // Reads through the line of marker names. Throws FileError.

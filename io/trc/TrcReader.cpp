@@ -81,14 +81,14 @@ class RowReader {
     size_t column = 0;
     for (TrcCells cells(row); cells.next(cell) && cell.empty();) ++column;
     if (!startsIgnoringCase(cell, "x")) return false;
-    m_coordinateColumn = column;
+    m_coordinateColumn = std::max(column, kFirstColumn);
     return true;
   }
 
   // Positions begin after Frame# and Time, even under a header that has a column more; unless the rows have
   // it too: then it is empty, and the row too long without it.
   void alignWith(std::string_view row) {
-    if (m_coordinateColumn <= kFirstColumn) return;
+    if (m_coordinateColumn == kFirstColumn) return;
     size_t column = 0, firstFilled = 0, columns = 0;
     std::string_view cell;
     for (TrcCells cells(row); cells.next(cell); ++column) {
@@ -202,12 +202,13 @@ class RowReader {
   }
 
   void noteAlignment() {
-    if (m_coordinateColumn == kFirstColumn) return;
     const std::string extra = std::to_string(m_coordinateColumn - kFirstColumn);
-    if (m_firstColumn == kFirstColumn)
-      warn("the header has " + extra + " column more than the rows; the markers were named in order");
-    else
+    if (m_firstColumn != kFirstColumn)
       warn("header and rows have " + extra + " empty column before the first marker, which was left out");
+    else if (m_coordinateColumn != kFirstColumn)
+      warn("the header has " + extra + " column more than the rows; the markers were named in order");
+    else if (m_header.namesOutOfPlace)
+      warn("the marker names do not stand above every third column; the markers were named in order");
   }
 
   void noteCounts() {
@@ -290,13 +291,14 @@ void setUpAxis(Take& take) {
            (take.up == Axis::Y ? "y was assumed, as files in metres have it" : "z was assumed")});
 }
 
+// "Subject:Name"; a star stands before the numbers of points that nobody has named.
 TakePoint namedPoint(const std::string& name) {
   TakePoint point;
   const size_t colon = name.find(':');
   const bool hasSubject = colon != std::string::npos && colon > 0 && colon + 1 < name.size();
   if (hasSubject) point.subject = name.substr(0, colon);
   point.label = hasSubject ? name.substr(colon + 1) : name;
-  return point;
+  return point.label.starts_with('*') ? TakePoint() : point;
 }
 
 }  // namespace

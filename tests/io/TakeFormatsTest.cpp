@@ -17,6 +17,7 @@ TEST(TakeFormats, ContentGoesBeforeSuffix) {
   EXPECT_EQ(readTake(folder.file("b", "\xEF\xBB\xBF\n" + bvh)).format, "BVH");
   EXPECT_EQ(readTake(folder.file("c.bvh", trc)).format, "TRC");
   EXPECT_EQ(readTake(folder.file("d.e.TRC", trc)).name, "d.e");
+  EXPECT_EQ(readTake(folder.file("f.bvh", readText(dataFile("single_frame_01.c3d")))).format, "C3D");
 }
 
 TEST(TakeFormats, SuffixDecidesWhereContentHasNoMark) {
@@ -38,6 +39,8 @@ TEST(TakeFormats, WritesBySuffixOnly) {
   EXPECT_THAT(errorOf([&] { writeTake(take, folder.path("a.trc"), notes); }),
               HasSubstr("a.trc: takes are written as"));
   writeTake(take, folder.path("a.bvh"), notes);
+  writeTake(readTake(dataFile("nan_case_01.trc")), folder.path("b.C3D"), notes);
+  EXPECT_EQ(readTake(folder.path("b.C3D")).points.size(), 14u);
   EXPECT_EQ(readTake(folder.path("a.bvh")).joints.size(), take.joints.size());
 }
 

@@ -45,9 +45,9 @@ void PrintTo(Setup const& setup, std::ostream* out) {
        << " keys in a leaf, fanout " << setup.limits.fanout << ", seed " << setup.seed;
 }
 
-class RandomEdits : public testing::TestWithParam<Setup> {
+class KeyTrackEdits : public testing::TestWithParam<Setup> {
  protected:
-  RandomEdits()
+  KeyTrackEdits()
       : track(GetParam().shape, GetParam().limits), model(GetParam().shape), random(GetParam().seed) {}
 
   int64 upTo(int64 n) { return std::uniform_int_distribution<int64>(0, n)(random); }
@@ -187,7 +187,7 @@ class RandomEdits : public testing::TestWithParam<Setup> {
   std::mt19937 random;
 };
 
-TEST_P(RandomEdits, MatchThePlainModel) {
+TEST_P(KeyTrackEdits, MatchThePlainModel) {
   std::vector<std::pair<KeyTrack, KeyTrackModel>> snapshots;
   for (int i = 0; i < GetParam().steps; ++i) {
     step();
@@ -207,7 +207,7 @@ TEST_P(RandomEdits, MatchThePlainModel) {
   for (auto const& [snapshot, then] : snapshots) EXPECT_EQ(difference(snapshot, then), "");
 }
 
-INSTANTIATE_TEST_SUITE_P(Trees, RandomEdits,
+INSTANTIATE_TEST_SUITE_P(Random, KeyTrackEdits,
                          testing::Values(Setup{Shape::Scalar, {4, 4}, 6000, 700, 1},
                                          Setup{Shape::Vector, {4, 4}, 9000, 700, 2},
                                          Setup{Shape::Rotation, {4, 4}, 4000, 700, 3},

@@ -139,13 +139,14 @@ TEST(TrcCells, BlanksAndLineEndsDoNotMatter) {
   const std::string blanks =
       "\xEF\xBB\xBF\nPathFileType 4\n\nDataRate CameraRate NumFrames NumMarkers Units\n 100\t\t 200\t\t "
       "2\t\t\t2 \tmm\n"
-      "Frame# Time A B\n1 0.00  1 2 3   4 5 6\n\t\t\n\n2 \t 0.01\t1 \t2\t 3 4  5 6  \t";
+      "Frame# Time A B\nX1 Y1 Z1 X2 Y2 Z2\n1 0.00  1 2 3   4 5 6\n\t\t\n\n2 \t 0.01\t1 \t2\t 3 4  5 6  \t";
   for (const std::string& text : {plain, crlf, cr, blanks}) {
     const Take take = read(text);
     ASSERT_EQ(take.points.size(), 2u);
     EXPECT_EQ(take.points[1].label, "B");
     EXPECT_EQ(take.rate, 100);
     EXPECT_EQ(keys(take, 0), "1=1 2 3  2=1 2 3");
+    EXPECT_THAT(notesOf(take.notes), Not(HasSubstr("column")));
     EXPECT_EQ(keys(take, 1), "1=4 5 6  2=4 5 6");
   }
 }
@@ -171,6 +172,7 @@ TEST(TrcHeader, NamesMayBeMissingShiftedOrHaveASubject) {
   const Take subjects = withNames("Frame#\tTime\tAnn:L Hip\t\t\tB:\t\t\n", "1\t0\t1\t2\t3\t4\t5\t6");
   EXPECT_EQ(subjects.points[0].subject, "Ann");
   EXPECT_EQ(subjects.points[0].label, "L Hip");
+  EXPECT_EQ(withNames("Frame#\tTime\tAnn:*12\n", "1\t0\t1\t2\t3").points[0].label, "");
   EXPECT_EQ(subjects.points[1].subject, "");
   EXPECT_EQ(subjects.points[1].label, "B:");
 
@@ -192,6 +194,10 @@ TEST(TrcHeader, NamesMayBeMissingShiftedOrHaveASubject) {
   EXPECT_EQ(keys(rowsToo, 1), "1=4 5 6");
   EXPECT_THAT(notesOf(rowsToo.notes),
               HasSubstr("warning: header and rows have 1 empty column before the first"));
+  const Take noCoordinates = withNames("Frame#\tTime\tA\tB\n", "1\t0\t1\t2\t3\t4\t5\t6");
+  EXPECT_EQ(noCoordinates.points[1].label, "B");
+  EXPECT_THAT(notesOf(noCoordinates.notes),
+              HasSubstr("warning: the marker names do not stand above every third"));
   const Take gapFirst = withNames(shifted, "1\t0\t\t\t\t4\t5\t6");
   EXPECT_EQ(keys(gapFirst, 1), "1=4 5 6");
 }
