@@ -19,8 +19,6 @@ TestFolder::TestFolder() {
 
 TestFolder::~TestFolder() { std::filesystem::remove_all(m_path); }
 
-std::string dataFile(const std::string& name) { return std::string(TALIX_TEST_DATA) + "/" + name; }
-
 std::string readBytes(const std::string& path) {
   std::ifstream in(path, std::ios::binary);
   std::ostringstream bytes;

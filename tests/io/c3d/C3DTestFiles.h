@@ -8,6 +8,7 @@
 
 #include "io/Take.h"
 #include "io/c3d/C3DParameters.h"
+#include "tests/io/TakeTesting.h"
 
 namespace talix {
 
@@ -22,7 +23,6 @@ class TestFolder {
   std::filesystem::path m_path;
 };
 
-std::string dataFile(const std::string& name);  // among the tests' takes
 std::string readBytes(const std::string& path);
 void writeBytes(const std::string& path, const std::string& bytes);
 
