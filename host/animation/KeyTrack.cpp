@@ -205,19 +205,19 @@ int64 KeyTrack::lowerBound(int64 time) const {
 }
 
 int64 KeyTrack::nextHolding(int64 index, unsigned mask) const {
-  return m_root ? findNext(*m_root.get(), index + 1, {normal(mask), false}) : -1;
+  return m_root ? findNext(*m_root.get(), std::max<int64>(index + 1, 0), {normal(mask), false}) : -1;
 }
 
 int64 KeyTrack::previousHolding(int64 index, unsigned mask) const {
-  return m_root ? findPrevious(*m_root.get(), index - 1, {normal(mask), false}) : -1;
+  return m_root ? findPrevious(*m_root.get(), std::min(index, count()) - 1, {normal(mask), false}) : -1;
 }
 
 int64 KeyTrack::nextSelected(int64 index, unsigned mask) const {
-  return m_root ? findNext(*m_root.get(), index + 1, {normal(mask), true}) : -1;
+  return m_root ? findNext(*m_root.get(), std::max<int64>(index + 1, 0), {normal(mask), true}) : -1;
 }
 
 int64 KeyTrack::previousSelected(int64 index, unsigned mask) const {
-  return m_root ? findPrevious(*m_root.get(), index - 1, {normal(mask), true}) : -1;
+  return m_root ? findPrevious(*m_root.get(), std::min(index, count()) - 1, {normal(mask), true}) : -1;
 }
 
 KeyTrack::Key KeyTrack::Reader::next() {

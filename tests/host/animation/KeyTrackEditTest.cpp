@@ -40,9 +40,14 @@ struct Setup {
   unsigned seed;
 };
 
-class RandomEdits : public testing::TestWithParam<Setup> {
+void PrintTo(Setup const& setup, std::ostream* out) {
+  *out << "width " << static_cast<int>(setup.shape) << ", " << setup.limits.leafKeys
+       << " keys in a leaf, fanout " << setup.limits.fanout << ", seed " << setup.seed;
+}
+
+class KeyTrackEdits : public testing::TestWithParam<Setup> {
  protected:
-  RandomEdits()
+  KeyTrackEdits()
       : track(GetParam().shape, GetParam().limits), model(GetParam().shape), random(GetParam().seed) {}
 
   int64 upTo(int64 n) { return std::uniform_int_distribution<int64>(0, n)(random); }
@@ -150,7 +155,7 @@ class RandomEdits : public testing::TestWithParam<Setup> {
     for (unsigned m = 0; m < 8; ++m) {
       ASSERT_EQ(track.countHolding(m), model.countHolding(m)) << m;
       ASSERT_EQ(track.countSelected(m), model.countSelected(m)) << m;
-      const int64 i = upTo(model.size() + 1) - 1;
+      const int64 i = upTo(model.size() + 3) - 2;
       ASSERT_EQ(track.nextHolding(i, m), model.walk(i, 1, &Key::components, m)) << i << " " << m;
       ASSERT_EQ(track.nextSelected(i, m), model.walk(i, 1, &Key::selected, m)) << i << " " << m;
       ASSERT_EQ(track.previousHolding(i, m), model.walk(i, -1, &Key::components, m)) << i << " " << m;
@@ -170,6 +175,9 @@ class RandomEdits : public testing::TestWithParam<Setup> {
     }
     if (model.keys.empty()) return;
     const int64 i = upTo(model.size() - 1);
+    int64 k = i;
+    track.forEach(i, std::min(i + 20, model.size()),
+                  [&](Key const& key) { ASSERT_EQ(key.time, model.at(k++).time); });
     ASSERT_EQ(track.timeAt(i), model.at(i).time);
     ASSERT_EQ(track.at(i).values, model.at(i).values);
   }
@@ -179,7 +187,7 @@ class RandomEdits : public testing::TestWithParam<Setup> {
   std::mt19937 random;
 };
 
-TEST_P(RandomEdits, MatchThePlainModel) {
+TEST_P(KeyTrackEdits, MatchThePlainModel) {
   std::vector<std::pair<KeyTrack, KeyTrackModel>> snapshots;
   for (int i = 0; i < GetParam().steps; ++i) {
     step();
@@ -199,7 +207,7 @@ TEST_P(RandomEdits, MatchThePlainModel) {
   for (auto const& [snapshot, then] : snapshots) EXPECT_EQ(difference(snapshot, then), "");
 }
 
-INSTANTIATE_TEST_SUITE_P(Trees, RandomEdits,
+INSTANTIATE_TEST_SUITE_P(Random, KeyTrackEdits,
                          testing::Values(Setup{Shape::Scalar, {4, 4}, 6000, 700, 1},
                                          Setup{Shape::Vector, {4, 4}, 9000, 700, 2},
                                          Setup{Shape::Rotation, {4, 4}, 4000, 700, 3},

@@ -37,10 +37,10 @@ class KeyTrackModel {
     mask = normal(mask);
     return std::count_if(keys.begin(), keys.end(), [mask](Key const& k) { return (k.selected & mask) != 0; });
   }
-  // The first key from `index` on, in steps of `step`, whose flags meet the mask.
+  // The first key behind `index`, in steps of `step`, whose flags meet the mask.
   int64 walk(int64 index, int step, unsigned char Key::*flags, unsigned mask) const {
     mask = normal(mask);
-    for (index += step; index >= 0 && index < size(); index += step)
+    for (index = std::clamp<int64>(index, -1, size()) + step; index >= 0 && index < size(); index += step)
       if (at(index).*flags & mask) return index;
     return -1;
   }
