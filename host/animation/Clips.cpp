@@ -34,7 +34,11 @@ void Clip::setUp() {
   m_smpteOffset = addBuiltIn<TimeAttribute>("SmpteOffset");
 }
 
-Clip* Clip::createInstance() { return new Clip; }
+Clip* Clip::createInstance() {
+  auto* clip = new Clip;
+  clip->setUp();
+  return clip;
+}
 
 void Clip::setSmpteOffset(int64 ticks) { m_smpteOffset->setValue(ticks, true, true, true, true); }
 

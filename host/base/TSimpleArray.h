@@ -13,12 +13,13 @@ class TSimpleArray {
 
  public:
   TSimpleArray() = default;
-  // Starts with room for `initial` elements and grows by as many as `step`.
+  // Starts with room for `initial` elements and grows by `step` of them, by a quarter when it is large.
   TSimpleArray(int initial, int step) : growBy(step > 0 ? step : 1) {
-    if (initial > 0) enlarge(initial);
+    if (initial > 0) reserve(initial);
   }
   TSimpleArray(TSimpleArray const& o) : growBy(o.growBy) {
-    enlarge(o.count);
+    if (o.count == 0) return;
+    reserve(o.count);
     std::copy_n(o.data, o.count, data);
     count = o.count;
   }
@@ -46,15 +47,17 @@ class TSimpleArray {
   }
 
  private:
+  static constexpr int kLarge = 1024;  // steps alone would copy larger arrays too often
+
+  void addSpace() { reserve(capacity + std::max(growBy, capacity < kLarge ? 0 : capacity / 4)); }
   // Raises the text that the host's users know when memory runs out; the elements stay.
-  void addSpace() { enlarge(growBy); }
-  void enlarge(int by) {
-    capacity += by;
-    T* larger = new (std::nothrow) T[static_cast<size_t>(capacity)];
+  void reserve(int wanted) {
+    T* larger = new (std::nothrow) T[static_cast<size_t>(wanted)];
     if (!larger) throw "E1224: Out of memory in TSimpleArray::addSpace";
     std::copy_n(data, count, larger);
     delete[] data;
     data = larger;
+    capacity = wanted;
   }
 
   bool m_flag [[maybe_unused]] = false;  // kept: part of the host's layout, read by nobody

@@ -39,7 +39,8 @@ int truncated(double value) {
   return value >= 2147483647.0 ? 2147483647 : static_cast<int>(value);
 }
 
-std::string numberText(double value) {
+template <class Number>
+std::string numberText(Number value) {
   char text[32];
   return {text, std::to_chars(text, text + sizeof text, value).ptr};
 }
@@ -245,6 +246,7 @@ void Variable::convertToType(VarType type) {
     static constexpr char const* words[] = {"false", "true", "toggle"};
     const BoolType value = getBoolValue(-1);
     const bool word = own == Bool && value >= False && value <= Toggle;
-    setValue(word ? words[value] : numberText(getFloatValue(-1)).c_str(), -1);
+    const HString number = own == Float ? numberText(getFloatValue(-1)) : numberText(getIntValue(-1));
+    setValue(word ? words[value] : number.GetStr(), -1);
   }
 }

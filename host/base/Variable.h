@@ -13,7 +13,7 @@
 
 class Variable {
  public:
-  enum VarType {
+  enum VarType : int {
     None = 0,
     Int = 1,
     Float = 2,
@@ -27,7 +27,7 @@ class Variable {
     VectorArray = 21
   };
   static constexpr int kArray = 16;  // an array type is its scalar type plus this
-  enum BoolType { False = 0, True = 1, Toggle = 2 };
+  enum BoolType : int { False = 0, True = 1, Toggle = 2 };
 
   Variable() = default;
   // A value of a type: zero, empty; an array of `count` such elements.
@@ -63,8 +63,8 @@ class Variable {
   void setValue(char const* value, int i);
   void setValue(Vec3 const& value, int i);
 
-  // Converts in place where nothing is lost: integers and booleans to doubles, anything single to a string,
-  // an array by its elements. A value that cannot be converted stays as it is.
+  // Converts in place where nothing is lost: integers and booleans to doubles, numbers to strings, an array
+  // by its elements. A value that cannot be converted stays as it is.
   void convertToType(VarType type);
 
  private:

@@ -53,7 +53,9 @@ void TalixRotation::setAsEuler(RotOrder order, Vec3 const& angles) {
 
 void TalixRotation::getAsEuler(RotOrder order, Vec3& angles) const {
   // R = R_k(c) R_j(b) R_i(a) for the order i, j, k. With s the order's parity, the entries that name one or
-  // two angles are R[k][i] = -s sin b, R[k][j] / R[k][k] = s tan a, R[j][i] / R[i][i] = s tan c.
+  // two angles are R[k][i] = -s sin b, R[k][j] / R[k][k] = s tan a. Near gimbal lock these two shrink and a
+  // loses digits, so c is what remains once this very a is undone: R R_i(-a) takes axis j to where R_k(c)
+  // does, and the three angles together stay exact.
   const auto& [i, j, k] = kAxes[order];
   const double s = parity(kAxes[order]);
   Vec3 columns[3];
@@ -67,7 +69,8 @@ void TalixRotation::getAsEuler(RotOrder order, Vec3& angles) const {
   angles[j] = std::atan2(-s * entry(k, i), cosB);
   if (cosB > 1e-9) {
     angles[i] = std::atan2(s * entry(k, j), entry(k, k));
-    angles[k] = std::atan2(s * entry(j, i), entry(i, i));
+    const Vec3 turned = columns[j] * std::cos(angles[i]) + columns[k] * (-s * std::sin(angles[i]));
+    angles[k] = std::atan2(-s * turned[i], turned[j]);
   } else {
     angles[i] = std::atan2(-s * entry(j, k), entry(j, j));
     angles[k] = 0;

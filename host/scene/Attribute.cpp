@@ -87,6 +87,12 @@ std::unique_ptr<Attribute> Attribute::create(Type type, HString const& name, Lab
 
 Attribute::~Attribute() { releaseFrom(m_value); }
 
+void Attribute::takeAsDefault() {
+  // The default of a reference names nothing, so that no default outlives its module.
+  if (!std::holds_alternative<Module*>(m_value) && !std::holds_alternative<Modules>(m_value))
+    m_default = m_value;
+}
+
 void Attribute::referTo(Value const& value) {
   if (auto* module = std::get_if<Module*>(&value)) refer(*module);
   if (auto* modules = std::get_if<Modules>(&value))
@@ -215,8 +221,7 @@ double TimeAttribute::getValue() const { return HTimeManager::getInstance()->get
 
 HString TimeAttribute::getStringValue() const {
   HTimeManager const* time = HTimeManager::getInstance();
-  HFrameRate rate = time->getFrameRate();
-  if (m_relative && rate.getTimecodeStandard() == NTSC_DROP) rate.setTimecodeStandard(NTSC);
+  const HFrameRate rate = m_relative ? time->getFrameRate().withoutDrop() : time->getFrameRate();
   return rate.timecodeFromFrame(time->getFrame(getTime()));
 }
 
@@ -237,6 +242,9 @@ void ModAttribute::setValue(Module* value, bool, bool notify, bool react, bool m
 }
 
 void MatrixAttribute::setValue(Matrix const& value, bool, bool notify, bool react, bool markSet) {
+  for (uint64 row = 0; row < value.rows(); ++row)
+    if (!std::all_of(value[row], value[row] + value.cols(), [](double v) { return std::isfinite(v); }))
+      return;
   change(value, notify, react, markSet);
 }
 

@@ -65,8 +65,8 @@ class Attribute : public HObject, private ModuleReferrer {
   bool isSet() const { return m_set; }
   // Back to the default value, and "not set".
   virtual void unset(bool undoable, bool notify, bool react);
-  // Makes the present value the default one.
-  void takeAsDefault() { m_default = m_value; }
+  // Makes the present value the default one; the default of a reference always is none.
+  void takeAsDefault();
 
   // The raw value, for copies, files and undo.
   Value const& getRawValue() const { return m_value; }

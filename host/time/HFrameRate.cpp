@@ -1,5 +1,6 @@
 #include "host/time/HFrameRate.h"
 
+#include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <string_view>
@@ -50,6 +51,12 @@ void HFrameRate::setFrameRate(double rate) {
   m_ticks = ticksPerFrameAt(rate);
 }
 
+HFrameRate HFrameRate::withoutDrop() const {
+  HFrameRate rate = *this;
+  if (rate.m_standard == NTSC_DROP) rate.m_standard = NTSC;
+  return rate;
+}
+
 bool HFrameRate::getTimecodeStandardFromString(HString const& name, ETimecodeStandard& standard) {
   for (int i = NTSC; i <= CUSTOM; ++i)
     if (name == kStandards[i].name) return standard = static_cast<ETimecodeStandard>(i), true;
@@ -68,7 +75,7 @@ HString HFrameRate::timecodeFromFrame(int64 frame) const {
   const int64 counted = countedFrames();
   const bool drop = m_standard == NTSC_DROP;
   const char* sign = frame < 0 ? "-" : "";
-  int64 number = frame < 0 ? -frame : frame;
+  int64 number = frame < 0 ? -std::max(frame, -INT64_MAX) : frame;
   if (drop) number = DropCount(counted).numberOf(number);
   const int64 seconds = number / counted;
   HString text;

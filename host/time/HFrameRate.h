@@ -22,6 +22,9 @@ class HFrameRate {
   // Frames a second, above 0 and at most kMaximum; other rates are not taken.
   void setFrameRate(double rate);
 
+  // This rate with timecode that leaves no number out: what a length of time is counted in.
+  HFrameRate withoutDrop() const;
+
   // "ntsc", "ntscDrop", "pal", "film", "filmNtsc", "Custom", in exact case.
   static bool getTimecodeStandardFromString(HString const& name, ETimecodeStandard& standard);
   static char const* getTimecodeStandardName(ETimecodeStandard standard);

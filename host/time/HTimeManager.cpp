@@ -20,6 +20,12 @@ void HTimeManager::reset() {
 
 void HTimeManager::setTime(int64 time, bool) { m_time = std::clamp(time, -kForever, kForever); }
 
+int64 HTimeManager::getTime(int frame) const {
+  const int64 ticks = getTicksPerFrame();
+  if (std::abs(int64{frame}) > kForever / ticks) return frame < 0 ? -kForever : kForever;
+  return frame * ticks;
+}
+
 int HTimeManager::getFrame(int64 time) const {
   return static_cast<int>(std::clamp<int64>(time / getTicksPerFrame(), INT32_MIN, INT32_MAX));
 }
@@ -40,15 +46,14 @@ int64 HTimeManager::getTimeFromFrameDouble(double frame) const {
 
 int64 HTimeManager::frameTime(int64 time, ERoundDirection direction, int64 origin) const {
   const int64 ticks = getTicksPerFrame();
-  const int64 way = time - origin;
-  int64 down = way / ticks * ticks;
-  if (down > way) down -= ticks;
-  const bool up = way != down &&
-                  (direction == RoundUp || (direction == RoundNearest && way - down >= ticks - (way - down)));
-  return origin + down + (up ? ticks : 0);
+  int64 past = (time - origin) % ticks;  // the last boundary
+  if (past < 0) past += ticks;
+  const bool up = past > 0 && (direction == RoundUp || (direction == RoundNearest && past >= ticks - past));
+  return std::clamp(time + (up ? ticks - past : -past), -kForever, kForever);
 }
 
 void HTimeManager::frameRange(HTimeRange& range, bool outward, int64 origin) {
+  if (range.isEmpty()) return;
   range.setEnds(frameTime(range.getStart(), outward ? RoundDown : RoundUp, origin),
                 frameTime(range.getEnd(), outward ? RoundUp : RoundDown, origin));
 }
@@ -58,8 +63,7 @@ double HTimeManager::stringToFrameDouble(HString const& text, bool relative) con
   double frames = 0;
   const auto [end, error] = std::from_chars(s.data(), s.data() + s.size(), frames);
   if (error == std::errc() && end == s.data() + s.size() && std::isfinite(frames)) return frames;
-  HFrameRate rate = m_rate;
-  if (relative && rate.getTimecodeStandard() == NTSC_DROP) rate.setTimecodeStandard(NTSC);
+  const HFrameRate rate = relative ? m_rate.withoutDrop() : m_rate;
   int64 frame = 0;
   return rate.frameFromTimecode(text, frame) ? static_cast<double>(frame) : 0;
 }

@@ -22,8 +22,8 @@ class HTimeManager {
 
   // Current time.
   int64 getTime() const { return m_time; }
-  // The time of a frame.
-  int64 getTime(int frame) const { return frame * getTicksPerFrame(); }
+  // The time of a frame; beyond the time line it is the time line's end.
+  int64 getTime(int frame) const;
   // Moves the current time. `notify` tells listeners of the scene.
   void setTime(int64 time, bool notify);
 
@@ -32,9 +32,11 @@ class HTimeManager {
   double getFrameDouble(int64 time) const;
   // The nearest tick; beyond the time line it is the time line's end.
   int64 getTimeFromFrameDouble(double frame) const;
-  // The time of the frame boundary next to `time` in a direction, counted from `origin`.
+  // The time of the frame boundary next to `time` in a direction, counted from `origin`. Stays on the time
+  // line.
   int64 frameTime(int64 time, ERoundDirection direction, int64 origin) const;
-  // Rounds the ends to frame boundaries counted from `origin`: outward, or inward.
+  // Rounds the ends to frame boundaries counted from `origin`: outward, or inward. An empty range stays
+  // as it is.
   void frameRange(HTimeRange& range, bool outward, int64 origin);
 
   // Frames from a text: a number of frames or timecode; 0 for other texts. `relative` reads timecode as a

@@ -10,8 +10,9 @@ inline constexpr int64 kTicksPerSecond = 705'600'000;
 // The end of the time line, in ticks: times reach from -kForever to kForever.
 inline constexpr int64 kForever = (int64{1} << 62) - 1;
 
-// Ticks per frame at a rate in frames per second (above 0): the nearest whole number, at least 1.
+// Ticks per frame at a rate in frames per second (above 0): the nearest whole number, within the time line.
 inline int64 ticksPerFrameAt(double rate) {
-  const int64 ticks = std::llround(static_cast<double>(kTicksPerSecond) / rate);
-  return ticks < 1 ? 1 : ticks;
+  const double ticks = static_cast<double>(kTicksPerSecond) / rate;
+  if (ticks >= static_cast<double>(kForever)) return kForever;
+  return ticks < 1 ? 1 : std::llround(ticks);
 }

@@ -32,7 +32,7 @@ std::vector<TakeEvent> groupEvents(const C3DParameters& parameters, std::vector<
              descriptions = parameters.texts("EVENT", "DESCRIPTIONS");
   const double used = c3dUnsigned(parameters.number("EVENT", "USED", static_cast<double>(times.size() / 2)));
   if (used > static_cast<double>(times.size() / 2))
-    warn("EVENT:USED says " + std::to_string(std::llround(used)) + " events, EVENT:TIMES holds " +
+    warn("EVENT:USED says " + std::to_string(used) + " events, EVENT:TIMES holds " +
          std::to_string(times.size() / 2));
   std::vector<TakeEvent> events;
   for (size_t i = 0; i < times.size() / 2 && static_cast<double>(i) < used; ++i) {

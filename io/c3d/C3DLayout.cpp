@@ -6,13 +6,13 @@
 
 #include "host/time/Ticks.h"
 #include "io/FileError.h"
+#include "io/FrameRates.h"
 
 namespace talix {
 
 namespace {
 
 constexpr unsigned kMark = 0x50;
-constexpr double kSlowestRate = 0.01, kFastestRate = 1e6;  // frames a second that a take may have
 constexpr int64 kMostInWord = 65535;
 
 // What one place in the file says about the frames.
@@ -91,12 +91,10 @@ class LayoutFinder {
     m_layout.scale = std::abs(scale);
   }
 
-  static bool usableRate(double rate) { return rate >= kSlowestRate && rate <= kFastestRate; }
-
   void findRate() {
     const double fromParameters = m_parameters.number("POINT", "RATE", m_header.rate);
-    m_layout.rate = usableRate(fromParameters) ? fromParameters : m_header.rate;
-    if (!usableRate(m_layout.rate)) {
+    m_layout.rate = isFrameRate(fromParameters) ? fromParameters : m_header.rate;
+    if (!isFrameRate(m_layout.rate)) {
       m_layout.rate = Take().rate;
       warn("the file gives no usable frame rate; " + std::to_string(m_layout.rate) + " Hz is assumed");
     } else if (std::abs(m_layout.rate - m_header.rate) > 1e-6 * m_layout.rate) {
@@ -204,6 +202,26 @@ class LayoutFinder {
     m_layout.frameCount = fit->claim->count;
     m_layout.firstFrame = firstFrame(*fit->claim);
     tellDisagreements(*fit);
+    if (fit->claim->wordOnly && fit->claim->count == kMostInWord) takeAllFrames(excess(*fit));
+  }
+
+  // A count that stopped at what 16 bits hold says less than the size of the data, whose last block may be
+  // filled up with zeros.
+  void takeAllFrames(int64 left) {
+    if (m_layout.frameBytes() == 0) return;
+    const auto frame = static_cast<int64>(m_layout.frameBytes()), block = static_cast<int64>(kC3DBlock);
+    if (left < std::max(frame, block)) return;
+    size_t end = m_bytes.size() - static_cast<size_t>(left % frame);
+    for (; left >= frame && m_bytes.size() - end < kC3DBlock && isZero(end - m_layout.frameBytes());
+         left -= frame)
+      end -= m_layout.frameBytes();
+    m_layout.frameCount += left / frame;
+    warn("the frame count ends at 65535; the size of the data gives " + std::to_string(m_layout.frameCount));
+  }
+
+  bool isZero(size_t frameStart) const {
+    const std::string_view frame = m_bytes.text(frameStart, m_layout.frameBytes(), "the last frames");
+    return frame.find_first_not_of('\0') == std::string_view::npos;
   }
 
   [[noreturn]] void failTruncated() const {
@@ -235,7 +253,8 @@ class LayoutFinder {
       warn("the analog rate does not agree with the data, which hold " + std::to_string(fit.samplesPerFrame) +
            " samples per frame");
     const int64 left = excess(fit);
-    if (left >= static_cast<int64>(kC3DBlock) && m_layout.frameBytes() != 0)
+    if (left >= static_cast<int64>(kC3DBlock) && m_layout.frameBytes() != 0 &&
+        fit.claim->count != kMostInWord)
       warn(std::to_string(left) + " bytes behind the last frame are left out");
   }
 
@@ -261,10 +280,13 @@ class LayoutFinder {
 }  // namespace
 
 C3DHeader readC3DHeader(C3DBytes& bytes, std::vector<TakeNote>& notes) {
-  if (bytes.size() < kC3DBlock || bytes.byte(1, "the header") != kMark || bytes.byte(0, "the header") < 2)
-    throw FileError(bytes.path(),
-                    "is not a C3D file: it does not start with a header block of 512 bytes whose "
-                    "second byte is 0x50");
+  if (bytes.size() < kC3DBlock || bytes.byte(1, "the header") != kMark)
+    throw FileError(
+        bytes.path(),
+        "is not a C3D file: it does not start with a header of 512 bytes whose second byte is 0x50");
+  if (bytes.byte(0, "the header") < 2)
+    bytes.fail(0, "is not a C3D file: the parameters are said to be in block " +
+                      std::to_string(bytes.byte(0, "the header")) + ", expected 2 or a later one");
   C3DHeader header;
   header.parameterStart = (bytes.byte(0, "the header") - 1) * kC3DBlock;
   const unsigned blocks = bytes.byte(header.parameterStart + 2, "the parameter section's header");

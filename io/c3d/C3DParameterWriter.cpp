@@ -59,14 +59,15 @@ void appendParameter(std::string& bytes, int id, const C3DParameter& parameter) 
 }  // namespace
 
 void appendC3DWord(std::string& bytes, unsigned value) {
-  bytes += static_cast<char>(value & 0xff);
-  bytes += static_cast<char>(value >> 8 & 0xff);
+  const char word[] = {static_cast<char>(value & 0xff), static_cast<char>(value >> 8 & 0xff)};
+  bytes.append(word, sizeof word);
 }
 
 void appendC3DReal(std::string& bytes, double value) {
   const auto bits = std::bit_cast<std::uint32_t>(static_cast<float>(value));
-  appendC3DWord(bytes, bits & 0xffff);
-  appendC3DWord(bytes, bits >> 16);
+  const char real[] = {static_cast<char>(bits & 0xff), static_cast<char>(bits >> 8 & 0xff),
+                       static_cast<char>(bits >> 16 & 0xff), static_cast<char>(bits >> 24)};
+  bytes.append(real, sizeof real);
 }
 
 C3DGroupWriter::C3DGroupWriter(C3DParameters& parameters, const std::string& name,

@@ -13,7 +13,7 @@ class C3DDamage : public testing::Test {
  protected:
   // Reads the bytes as a file; what is read must be sound, an error must name the file. Answers the error.
   std::string outcome(const std::string& bytes) {
-    writeBytes(path, bytes);
+    folder.file("damaged.c3d", bytes);
     try {
       const Take take = readC3D(path);
       for (const TakePoint& point : take.points) {
@@ -28,12 +28,12 @@ class C3DDamage : public testing::Test {
     }
   }
 
-  const TestFolder folder;
+  const TempFolder folder;
   const std::string path = folder.path("damaged.c3d");
 };
 
 TEST_F(C3DDamage, SaysWhereTheDataEnds) {
-  const std::string bytes = readBytes(dataFile("walkset_a_le_real.c3d"));
+  const std::string bytes = readText(dataFile("walkset_a_le_real.c3d"));
   // Frames of 26 points and 16 * 4 samples from block 11 on.
   const size_t frame = (26 * 4 + 64) * 4, data = 10 * 512;
   EXPECT_EQ(
@@ -47,13 +47,16 @@ TEST_F(C3DDamage, SaysWhereTheDataEnds) {
 TEST_F(C3DDamage, SaysWhatIsNoC3DFile) {
   EXPECT_NE(outcome("hello").find("is not a C3D file"), std::string::npos);
   EXPECT_NE(outcome(std::string(2000, 'x')).find("is not a C3D file"), std::string::npos);
-  std::string bytes = readBytes(dataFile("single_frame_01.c3d"));
+  std::string bytes = readText(dataFile("single_frame_01.c3d"));
   bytes[512 + 3] = 7;
   EXPECT_NE(outcome(bytes).find("offset 515: is not a C3D file: the processor type is 7"), std::string::npos);
-  bytes = readBytes(dataFile("single_frame_01.c3d"));
+  bytes = readText(dataFile("single_frame_01.c3d"));
+  bytes[0] = 1;
+  EXPECT_NE(outcome(bytes).find("said to be in block 1"), std::string::npos);
   bytes[0] = 99;
   EXPECT_NE(outcome(bytes).find("the file ends inside the parameter section's header"), std::string::npos);
-  EXPECT_NE(readingError(folder.path("none.c3d")).find("there is no such file"), std::string::npos);
+  EXPECT_NE(errorOf([this] { readC3D(folder.path("none.c3d")); }).find("there is no such file"),
+            std::string::npos);
 }
 
 TEST_F(C3DDamage, SaysWhereParametersLeadAstray) {
@@ -74,7 +77,7 @@ TEST_F(C3DDamage, SaysWhereParametersLeadAstray) {
 }
 
 TEST_F(C3DDamage, SurvivesTruncationAtAnyLength) {
-  const std::string bytes = readBytes(dataFile("single_frame_01.c3d"));
+  const std::string bytes = readText(dataFile("single_frame_01.c3d"));
   for (size_t length = 1; length < bytes.size(); length += length < 1600 ? 7 : 1)
     EXPECT_NE(outcome(bytes.substr(0, length)), "") << length;
   EXPECT_EQ(outcome(bytes), "");
@@ -86,8 +89,8 @@ TEST_F(C3DDamage, SurvivesFlippedBytes) {
   small.set("ANALOG", integers("USED", {1}));
   small.set("EVENT", integers("USED", {1}));
   small.set("EVENT", C3DParameter{"TIMES", C3DParameter::Type::Real, {2, 1}, {}, {0, 1}});
-  const std::string files[] = {small.bytes(), readBytes(dataFile("single_frame_01.c3d")),
-                               readBytes(dataFile("gait_results_events_01.c3d")).substr(0, 6144 + 101 * 448)};
+  const std::string files[] = {small.bytes(), readText(dataFile("single_frame_01.c3d")),
+                               readText(dataFile("gait_results_events_01.c3d")).substr(0, 6144 + 101 * 448)};
   std::mt19937 random(20240);
   int read = 0, refused = 0;
   for (int round = 0; round < 6000; ++round) {

@@ -127,7 +127,7 @@ TEST(C3DReader, ScalesAnalogChannels) {
   EXPECT_EQ(channel.samples.timeAt(1) - channel.samples.timeAt(0), ticksPerFrameAt(200));
   EXPECT_EQ(channel.samples.timeAt(0), ticksPerFrameAt(50));
   // The second sample of channel 1 in frame 1: behind 26 points and 16 samples in block 11.
-  const std::string bytes = readBytes(file);
+  const std::string bytes = readText(file);
   const size_t at = 10 * 512 + 26 * 8 + 16 * 2;
   const int raw = static_cast<unsigned char>(bytes[at]) | static_cast<unsigned char>(bytes[at + 1]) << 8;
   EXPECT_NEAR(channel.samples.at(1).values[0], (raw - 2048) * -0.43, 1e-4);

@@ -1,43 +1,13 @@
 #include "tests/io/c3d/C3DTestFiles.h"
 
+#include <algorithm>
 #include <cmath>
-#include <fstream>
 #include <gtest/gtest.h>
-#include <sstream>
-#include <unistd.h>
 
-#include "io/FileError.h"
-#include "io/TakeFormats.h"
+#include "host/time/Ticks.h"
 #include "io/c3d/C3DParameterWriter.h"
 
 namespace talix {
-
-TestFolder::TestFolder() {
-  std::string pattern = (std::filesystem::temp_directory_path() / "c3dtestXXXXXX").string();
-  m_path = ::mkdtemp(pattern.data());
-}
-
-TestFolder::~TestFolder() { std::filesystem::remove_all(m_path); }
-
-std::string readBytes(const std::string& path) {
-  std::ifstream in(path, std::ios::binary);
-  std::ostringstream bytes;
-  bytes << in.rdbuf();
-  return bytes.str();
-}
-
-void writeBytes(const std::string& path, const std::string& bytes) {
-  std::ofstream(path, std::ios::binary) << bytes;
-}
-
-std::string readingError(const std::string& path) {
-  try {
-    readC3D(path);
-  } catch (const FileError& error) {
-    return error.what();
-  }
-  return {};
-}
 
 bool hasNote(const std::vector<TakeNote>& notes, TakeNote::Level level, const std::string& part) {
   for (const TakeNote& note : notes)

@@ -1,7 +1,6 @@
 // Files and takes that the C3D tests share.
 #pragma once
 
-#include <filesystem>
 #include <functional>
 #include <string>
 #include <vector>
@@ -11,23 +10,6 @@
 #include "tests/io/TakeTesting.h"
 
 namespace talix {
-
-// A folder of the test's own, gone at its end.
-class TestFolder {
- public:
-  TestFolder();
-  ~TestFolder();
-  std::string path(const std::string& name) const { return (m_path / name).string(); }
-
- private:
-  std::filesystem::path m_path;
-};
-
-std::string readBytes(const std::string& path);
-void writeBytes(const std::string& path, const std::string& bytes);
-
-// The text of the FileError that reading throws; empty when it throws none.
-std::string readingError(const std::string& path);
 
 bool hasNote(const std::vector<TakeNote>& notes, TakeNote::Level level, const std::string& part);
 

@@ -1,5 +1,4 @@
 // What is written is read back equal, and what cannot be written is told.
-#include <fstream>
 #include <gtest/gtest.h>
 #include <limits>
 
@@ -14,7 +13,7 @@ namespace {
 const auto kAlways = [](int, int64) { return true; };
 
 Take writtenAndRead(const Take& take, std::vector<TakeNote>& notes) {
-  const TestFolder folder;
+  const TempFolder folder;
   writeC3D(take, folder.path("written.c3d"), notes);
   return readC3D(folder.path("written.c3d"));
 }
@@ -135,9 +134,8 @@ TEST(C3DWriter, ReplacesMissingSamplesAndLowFrameNumbersWithANote) {
 }
 
 TEST(C3DWriter, LeavesTheOldFileWhenTheTakeIsImpossible) {
-  const TestFolder folder;
-  const std::string path = folder.path("kept.c3d");
-  writeBytes(path, "old");
+  const TempFolder folder;
+  const std::string path = folder.file("kept.c3d", "old");
   Take take = movingPoints(1, 2, kAlways);
   take.rate = 0;
   std::vector<TakeNote> notes;
@@ -145,7 +143,7 @@ TEST(C3DWriter, LeavesTheOldFileWhenTheTakeIsImpossible) {
   take.rate = 100;
   take.points.resize(65'536);
   EXPECT_THROW(writeC3D(take, path, notes), FileError);
-  EXPECT_EQ(readBytes(path), "old");
+  EXPECT_EQ(readText(path), "old");
 }
 
 }  // namespace
