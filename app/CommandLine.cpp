@@ -3,6 +3,7 @@
 #include <CLI/CLI.hpp>
 #include <csignal>
 
+#include "app/Info.h"
 #include "app/Run.h"
 
 namespace {
@@ -17,6 +18,7 @@ constexpr char const* kExamples = R"(Examples:
   talix run --open walk.c3d --save clean.c3d clean.talix
   talix run --json -c 'create Marker LFHD' -c getModules
   talix commands setKey
+  talix info walk.c3d
 )";
 
 constexpr char const* kScriptHelp =
@@ -106,6 +108,12 @@ int main(int argc, char** argv) {
   commandsApp->add_flag("--json", json, "Print them as a JSON array");
   addPluginOptions(*commandsApp, plugin);
 
+  std::vector<std::string> takes;
+  bool infoAsJson = false;
+  CLI::App* infoApp = app.add_subcommand("info", "Show what is in take files (C3D, BVH, TRC)");
+  infoApp->add_option("FILE", takes, "Take files")->type_name("")->required();
+  infoApp->add_flag("--json", infoAsJson, "Print a JSON array with one object for each file");
+
   try {
     app.parse(argc, argv);
   } catch (CLI::ParseError const& error) {
@@ -113,6 +121,7 @@ int main(int argc, char** argv) {
     return status == 0 ? 0 : kBadCommandLine;
   }
   if (commandsApp->parsed()) return talix::showCommands(plugin, name, json);
+  if (infoApp->parsed()) return talix::runInfo(takes, infoAsJson);
   run.putInOrder(*runApp);
   return talix::runScripts(run.request);
 }

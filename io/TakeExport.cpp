@@ -22,7 +22,8 @@ FrameGrid animationFrames() {
 }
 
 void recallFile(Take& take, const NLEClip& clip) {
-  take.name = clip.getName().GetString();
+  take.name = remembered::text(clip, remembered::kFileName);
+  if (take.name.empty()) take.name = clip.getName().GetString();
   take.format = remembered::text(clip, remembered::kFileFormat);
   const double unit = remembered::number(clip, remembered::kFileUnitInMillimetres, 0);
   if (unit > 0) {

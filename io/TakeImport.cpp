@@ -1,5 +1,7 @@
 #include <filesystem>
+#include <unordered_set>
 
+#include "host/scene/SceneIndex.h"
 #include "host/time/HTimeManager.h"
 #include "io/FileError.h"
 #include "io/TakeScene.h"
@@ -41,6 +43,25 @@ void checkTake(const Take& take, const std::string& path, const Database& scene)
       throw FileError(path, "the joint \"" + joint.name + "\" stands before its parent");
     if (joint.name.empty()) throw FileError(path, "joint " + std::to_string(i + 1) + " has no name");
   }
+}
+
+// The names that a take's own modules get at the root.
+std::unordered_set<std::string> rootNames(const Take& take) {
+  std::unordered_set<std::string> names{"Analog", "Outputs"};
+  for (const TakePoint& point : take.points)
+    if (!point.label.empty()) names.insert(moduleName(point.subject.empty() ? take.name : point.subject));
+  if (!take.joints.empty()) names.insert(moduleName(take.name));
+  return names;
+}
+
+// After the take; numbered where the scene, or the character that stands for the file, has that name.
+std::string clipName(const Take& take, const Database& scene) {
+  const auto taken = rootNames(take);
+  const std::string wanted = moduleName(take.name);
+  std::string name = wanted;
+  for (int number = 1; taken.contains(name) || scene.getIndex().findChild(nullptr, name); ++number)
+    name = wanted + "_" + std::to_string(number);
+  return name;
 }
 
 HFrameRate frameRate(double rate) {
@@ -91,6 +112,7 @@ void noteAxes(TakeImport& import, const Take& take, int formerAxis, int axis, bo
 }
 
 void rememberFile(Clip& clip, const Take& take) {
+  remembered::setText(clip, remembered::kFileName, take.name);
   remembered::setText(clip, remembered::kFileFormat, take.format);
   remembered::setText(clip, remembered::kFileUnit, take.fileUnit);
   remembered::setNumber(clip, remembered::kFileUnitInMillimetres, take.unitInMillimetres);
@@ -109,8 +131,8 @@ void importTake(Take take, const std::string& path, int up, Database& scene, std
   const bool firstTake = scene.getNumClips() == 0;
   const int formerAxis = scene.getUpAxis(), axis = sceneUpAxis(take, up, scene);
   const Undoing undoing(scene);
-  const std::string clipName = moduleName(take.name);
-  auto* clip = static_cast<Clip*>(scene.createModule(&Clip::staticClass(), clipName.c_str(), nullptr));
+  auto* clip =
+      static_cast<Clip*>(scene.createModule(&Clip::staticClass(), clipName(take, scene).c_str(), nullptr));
   if (!clip) throw FileError(path, "the scene takes no further clip");
   scene.setActiveClip(clip);
 

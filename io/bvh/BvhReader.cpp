@@ -222,6 +222,7 @@ Take readBVH(const std::string& path, const ReadOptions& options) {
   take.name = std::filesystem::path(path).stem().string();
   take.up = Axis::Y;
   take.upAssumed = true;
+  take.notes.push_back({TakeNote::Level::Info, "the file names no up axis; y was assumed"});
   setUnit(take, path, options);
 
   BvhHierarchy hierarchy = readBvhHierarchy(scanner);

@@ -77,7 +77,6 @@ class Reader {
     if (!asked.empty() && millimetresPerUnit(inFile) != size)
       info("lengths are read as " + asked + ", not as the file's " +
            (inFile.empty() ? "unnamed unit" : inFile));
-    if (size != 1) info("lengths were converted from " + unit + " to mm");
   }
 
   // The screen's upward axis is the world's.

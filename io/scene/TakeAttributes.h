@@ -13,6 +13,11 @@
 
 namespace talix::remembered {
 
+// Of a clip: the file's name without folder and suffix, a string. Of a character that stands for a file's
+// points without a subject: the name that it got from it; its markers' labels carry no subject as long as it
+// has that name.
+inline constexpr const char* kFileName = "FileName";
+
 // Of a clip.
 inline constexpr const char* kFileFormat = "FileFormat";                        // string: "C3D", "BVH", "TRC"
 inline constexpr const char* kFileUnit = "FileUnit";                            // string: the file's own word
@@ -25,9 +30,6 @@ inline constexpr const char* kAnalogChannels = "AnalogChannels";
 // Records: channel in the scene, name in the file, unit, kind.
 inline constexpr const char* kOutputs = "OutputChannels";
 
-// Of a character that stands for a file's points without a subject: the name that the file gave it, a string.
-// Its markers' labels carry no subject as long as it has that name.
-inline constexpr const char* kFileName = "FileName";
 // Of a marker: string.
 inline constexpr const char* kDescription = "Description";
 // Of a bone: the file's channel names in their order, separated by blanks, a string.
