@@ -44,7 +44,8 @@ std::string optionLines(std::vector<CommandOption const*> const& options) {
   for (auto const* option : options) {
     std::string excluded;
     for (auto const* other : options)
-      if (excludeEachOther(*option, *other)) excluded += (excluded.empty() ? "-" : ", -") + other->getName().GetString();
+      if (excludeEachOther(*option, *other))
+        excluded += (excluded.empty() ? "-" : ", -") + other->getName().GetString();
     lines += "\n  ";
     lines += excluded.empty() ? optionSyntax(*option)
                               : padded(optionSyntax(*option), width + 2) + "excludes " + excluded;
@@ -66,7 +67,8 @@ std::string commandList(CommandRegistry const& commands) {
   size_t width = 0;
   for (auto const& entry : commands.entries()) {
     const std::string category = categoryOf(*entry.command);
-    if (std::find(categories.begin(), categories.end(), category) == categories.end()) categories.push_back(category);
+    if (std::find(categories.begin(), categories.end(), category) == categories.end())
+      categories.push_back(category);
     width = std::max(width, entry.command->getName().GetString().size());
   }
   std::string text;

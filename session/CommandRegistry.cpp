@@ -8,8 +8,8 @@ void CommandRegistry::add(Command* command, std::string const& source) {
   std::string const& name = command->getName().GetString();
   const auto [place, added] = m_byName.emplace(name, m_entries.size());
   if (!added) {
-    throw std::runtime_error("Two commands are named " + name + ": one of " + m_entries[place->second].source +
-                             ", one of " + source);
+    throw std::runtime_error("Two commands are named " + name + ": one of " +
+                             m_entries[place->second].source + ", one of " + source);
   }
   m_entries.push_back({command, source});
 }

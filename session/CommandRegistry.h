@@ -1,5 +1,5 @@
-// The script commands of a program, in order: those of plug-ins first, then the host's own. Found by exact name.
-// Does not own them.
+// The script commands of a program, in order: those of plug-ins first, then the host's own. Found by exact
+// name. Does not own them.
 #pragma once
 
 #include <string>

@@ -9,7 +9,9 @@ namespace json = boost::json;
 
 namespace {
 
-json::value numberJson(double value) { return std::isfinite(value) ? json::value(value) : json::value(nullptr); }
+json::value numberJson(double value) {
+  return std::isfinite(value) ? json::value(value) : json::value(nullptr);
+}
 
 json::value textJson(std::string_view text) { return json::value(mendedUtf8(text)); }
 
@@ -40,7 +42,10 @@ size_t characterLength(std::string_view text) {
   const auto byte = [&](size_t i) { return static_cast<unsigned char>(text[i]); };
   const unsigned lead = byte(0);
   if (lead < 0x80) return 1;
-  const size_t length = lead >= 0xc2 && lead < 0xe0 ? 2 : lead >= 0xe0 && lead < 0xf0 ? 3 : lead >= 0xf0 && lead < 0xf5 ? 4 : 0;
+  const size_t length = lead >= 0xc2 && lead < 0xe0   ? 2
+                        : lead >= 0xe0 && lead < 0xf0 ? 3
+                        : lead >= 0xf0 && lead < 0xf5 ? 4
+                                                      : 0;
   if (length == 0 || text.size() < length) return 0;
   for (size_t i = 1; i < length; ++i)
     if ((byte(i) & 0xc0) != 0x80) return 0;

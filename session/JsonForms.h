@@ -1,5 +1,5 @@
-// Values, results and commands as JSON. Text that is no UTF-8 is mended, so that the JSON is valid whatever the scene
-// holds; numbers that are not finite are null.
+// Values, results and commands as JSON. Text that is no UTF-8 is mended, so that the JSON is valid whatever
+// the scene holds; numbers that are not finite are null.
 #pragma once
 
 #include <boost/json/fwd.hpp>

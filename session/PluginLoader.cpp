@@ -1,8 +1,7 @@
 #include "session/PluginLoader.h"
 
-#include <dlfcn.h>
-
 #include <cstring>
+#include <dlfcn.h>
 #include <filesystem>
 #include <new>
 
@@ -72,7 +71,8 @@ void PluginLibrary::load() {
     const bool initialised = plugin->initialise();
     collect(*plugin);
     if (!initialised) {
-      throw PluginError(m_path + ": the plug-in " + plugin->getName().GetString() + " could not be initialised");
+      throw PluginError(m_path + ": the plug-in " + plugin->getName().GetString() +
+                        " could not be initialised");
     }
   }
 }

@@ -17,8 +17,8 @@ class PluginError : public std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
-// A loaded library. Its commands and providers live as long as this object; it ends the plug-in objects first, then
-// releases what they made, then unloads the library.
+// A loaded library. Its commands and providers live as long as this object; it ends the plug-in objects
+// first, then releases what they made, then unloads the library.
 class PluginLibrary {
  public:
   // Loads and initialises. Throws PluginError, with nothing left loaded.
@@ -47,8 +47,8 @@ class PluginLibrary {
   std::vector<ControlSystem::ICommandProvider*> m_providers;
 };
 
-// The program's own plug-in: beside the program, or where it is installed (../lib/talix). Throws PluginError naming
-// both places when it is in neither.
+// The program's own plug-in: beside the program, or where it is installed (../lib/talix). Throws PluginError
+// naming both places when it is in neither.
 std::string findPlugin(std::string const& programFolder);
 
 }  // namespace talix

@@ -1,13 +1,13 @@
-// One line of a script, read against the commands that there are: a command's name, then options and values in any
-// order.
+// One line of a script, read against the commands that there are: a command's name, then options and values
+// in any order.
 //
 //   # comment, where a token could start        12  -3        integer of 32 bits
 //   "it's" 'say ""no""'  word  \Subject\Hips    1.5  1e3      float
 //   <1 2 3>  <1, 2, 3>                          true false on off toggle
 //   [a b c]  []    one type of element; an empty one holds strings
 //
-// In a string the backslash is ordinary and a doubled quote stands for one. An option is "-" and a letter and takes
-// as many of the values after it as it declares; these are converted where nothing is lost.
+// In a string the backslash is ordinary and a doubled quote stands for one. An option is "-" and a letter and
+// takes as many of the values after it as it declares; these are converted where nothing is lost.
 #pragma once
 
 #include <string>

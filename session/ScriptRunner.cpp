@@ -51,7 +51,8 @@ void ScriptRunner::report(LineResult const& result, std::string const& file, int
     for (auto& [key, value] : toJson(result)) object.emplace(key, std::move(value));
     m_text = boost::json::serialize(object);
   } else {
-    writeLogLines(result, m_style.nameLines ? file + ", line " + std::to_string(number) + ": " : std::string());
+    writeLogLines(result,
+                  m_style.nameLines ? file + ", line " + std::to_string(number) + ": " : std::string());
     if (result.value.getType() == Variable::None) return;
     appendText(result.value, m_text);
   }

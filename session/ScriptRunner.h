@@ -1,4 +1,5 @@
-// Runs scripts and writes what comes of them: results to one stream, log lines to another, or one JSON object a line.
+// Runs scripts and writes what comes of them: results to one stream, log lines to another, or one JSON object
+// a line.
 #pragma once
 
 #include <cstdio>
@@ -24,8 +25,8 @@ class ScriptRunner {
   ScriptRunner(Session& session, RunStyle const& style, std::FILE* out, std::FILE* err)
       : m_session(session), m_style(style), m_out(out), m_err(err) {}
 
-  // Runs the lines of a text (LF or CRLF ends them). `file` is the name for messages, `firstLine` the number of the
-  // first line. False when the run has to end.
+  // Runs the lines of a text (LF or CRLF ends them). `file` is the name for messages, `firstLine` the number
+  // of the first line. False when the run has to end.
   bool runText(std::string_view text, std::string const& file, int firstLine);
   // Runs one line. False when the run has to end.
   bool runLine(std::string_view line, std::string const& file, int number);

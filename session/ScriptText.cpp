@@ -68,7 +68,7 @@ void appendElement(Variable const& value, Variable::VarType type, int i, std::st
   }
   const std::string_view text = value.getStringValue(i);
   if (value.isArray() && needsQuotes(text)) {
-    out += quoted(text);
+    out += quotedText(text);
   } else {
     out += text;
   }
@@ -114,7 +114,8 @@ Word readWord(std::string_view text) {
   const std::string_view unsignedText = text.substr(sign ? 1 : 0);
   if (unsignedText.empty()) return {};
   const char first = unsignedText.front();
-  if ((first >= '0' && first <= '9') || first == '.') return readNumber(text.front() == '+' ? unsignedText : text);
+  if ((first >= '0' && first <= '9') || first == '.')
+    return readNumber(text.front() == '+' ? unsignedText : text);
   switch (first) {
     case 'n':
     case 'N':
@@ -161,7 +162,7 @@ std::string toText(Variable const& value) {
   return text;
 }
 
-std::string quoted(std::string_view text) {
+std::string quotedText(std::string_view text) {
   std::string out = "\"";
   for (const char c : text) {
     if (c == '"') out += '"';

@@ -1,8 +1,8 @@
 // Values as script text.
 //
-// Numbers, booleans, vectors, arrays and strings without line breaks can be typed back: numbers are the shortest text
-// that reads back the same, floats always with a point or an exponent. A string alone is bare; inside an array it is
-// quoted where it would not be read as that string. An empty value is empty text.
+// Numbers, booleans, vectors, arrays and strings without line breaks can be typed back: numbers are the
+// shortest text that reads back the same, floats always with a point or an exponent. A string alone is bare;
+// inside an array it is quoted where it would not be read as that string. An empty value is empty text.
 #pragma once
 
 #include <string>
@@ -16,7 +16,7 @@ void appendText(Variable const& value, std::string& out);
 std::string toText(Variable const& value);
 
 // The text between double quotes, with those inside doubled.
-std::string quoted(std::string_view text);
+std::string quotedText(std::string_view text);
 
 // "integer", "float array"; "nothing" for no type.
 std::string typeName(Variable::VarType type);

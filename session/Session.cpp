@@ -21,7 +21,9 @@ class LogCollector : public LogSink {
   ~LogCollector() override { setLogSink(m_former); }
   LogCollector(LogCollector const&) = delete;
   LogCollector& operator=(LogCollector const&) = delete;
-  void write(LogLevel level, std::string_view text) override { m_lines.push_back({level, std::string(text)}); }
+  void write(LogLevel level, std::string_view text) override {
+    m_lines.push_back({level, std::string(text)});
+  }
 
  private:
   std::vector<LogLine>& m_lines;

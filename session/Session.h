@@ -1,7 +1,8 @@
 // Runs script lines against the scene.
 //
-// A line runs through its command's own argument check; what the command logs meanwhile is collected. Nothing that a
-// command does or throws ends the program. The scene is the engine's (g_db): there is one, however many sessions.
+// A line runs through its command's own argument check; what the command logs meanwhile is collected. Nothing
+// that a command does or throws ends the program. The scene is the engine's (g_db): there is one, however
+// many sessions.
 #pragma once
 
 #include <memory>
@@ -23,7 +24,7 @@ struct LogLine {
 
 struct LineResult {
   enum class Outcome {
-    Blank,      // nothing was run
+    Blank,  // nothing was run
     Done,
     Failed,     // refused, or the command failed
     FileFailed  // a file could not be read or written

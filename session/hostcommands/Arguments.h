@@ -1,4 +1,5 @@
-// Arguments that several host commands take: modules, channels, frames. A reader that answers nothing has logged why.
+// Arguments that several host commands take: modules, channels, frames. A reader that answers nothing has
+// logged why.
 #pragma once
 
 #include <optional>

@@ -18,9 +18,9 @@ struct AttributeKind {
 AttributeKind const* findAttributeKind(HString const& name);  // null: none
 std::string attributeKindNames();
 
-// A new attribute for `module` with the values from args[first] on, which become its default; without values it has
-// the kind's own. Null, and a logged error, when they do not fit the kind.
-std::unique_ptr<Attribute> makeAttribute(AttributeKind const& kind, HString const& name, Args const& args, int first,
-                                         Module const& module);
+// A new attribute for `module` with the values from args[first] on, which become its default; without values
+// it has the kind's own. Null, and a logged error, when they do not fit the kind.
+std::unique_ptr<Attribute> makeAttribute(AttributeKind const& kind, HString const& name, Args const& args,
+                                         int first, Module const& module);
 
 }  // namespace talix

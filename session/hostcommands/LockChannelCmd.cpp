@@ -6,17 +6,18 @@ namespace {
 
 class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "lockChannel",
-                                       .displayName = "Lock Channel",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Manipulators",
-                                       .purpose = "Locks a channel of a module against editing, or unlocks it.",
-                                       .args = {"PATH CHANNEL BOOLEAN", 3, 3, {Variable::String, Variable::String}}};
+  static constexpr CommandInfo info = {
+      .name = "lockChannel",
+      .displayName = "Lock Channel",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose = "Locks a channel of a module against editing, or unlocks it.",
+      .args = {"PATH CHANNEL BOOLEAN", 3, 3, {Variable::String, Variable::String}}};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     if (!fits(info.args, args) || !args[2].isNumber()) return false;
     const double value = args[2].getFloatValue(-1);
-    return value == Variable::False || value == Variable::True || value == Variable::Toggle;
+    return value == 0 || value == 1 || value == 2;
   }
 
   bool execute(Given const&, Args const& args, Variable&) override {

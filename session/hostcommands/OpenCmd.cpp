@@ -17,13 +17,16 @@ class OpenCmd final : public ScriptCommand<OpenCmd> {
       .name = "open",
       .displayName = "Open Take",
       .category = "System",
-      .purpose = "Adds a take (C3D, BVH, TRC) to the scene as a new clip; -up (x, y, z) and -units (mm, cm, m, in, ft) "
-                 "set what the file leaves open.",
+      .purpose =
+          "Adds a take (C3D, BVH, TRC) to the scene as a new clip; -up (x, y, z) and -units (mm, cm, m, in, "
+          "ft) "
+          "set what the file leaves open.",
       .args = {"FILE", 1, 1, {Variable::String}},
       .options = {{"up", 1, Variable::String}, {"units", 1, Variable::String}}};
   static constexpr int kUp = info.option("up"), kUnits = info.option("units");
 
-  // Throws FileError: the runner makes it the error line, and a failure of the file rather than of the command.
+  // Throws FileError: the runner makes it the error line, and a failure of the file rather than of the
+  // command.
   bool execute(Given const& given, Args const& args, Variable&) override {
     const GivenOptions options(given);
     const HString up = options.textOr(kUp, ""), units = options.textOr(kUnits, "");

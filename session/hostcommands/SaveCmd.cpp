@@ -10,14 +10,16 @@ namespace {
 
 class SaveCmd final : public ScriptCommand<SaveCmd> {
  public:
-  static constexpr CommandInfo info = {
-      .name = "save",
-      .displayName = "Save Take",
-      .category = "System",
-      .purpose = "Writes the active clip over the animation range to a file; the suffix (.c3d, .bvh) names the format.",
-      .args = {"FILE", 1, 1, {Variable::String}}};
+  static constexpr CommandInfo info = {.name = "save",
+                                       .displayName = "Save Take",
+                                       .category = "System",
+                                       .purpose =
+                                           "Writes the active clip over the animation range to a file; the "
+                                           "suffix (.c3d, .bvh) names the format.",
+                                       .args = {"FILE", 1, 1, {Variable::String}}};
 
-  // Throws FileError: the runner makes it the error line, and a failure of the file rather than of the command.
+  // Throws FileError: the runner makes it the error line, and a failure of the file rather than of the
+  // command.
   bool execute(Given const&, Args const& args, Variable&) override {
     std::vector<TakeNote> notes;
     writeTake(exportTake(*g_db, notes), args[0].getStringValue(-1), notes);

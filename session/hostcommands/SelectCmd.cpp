@@ -32,8 +32,9 @@ class SelectCmd final : public ScriptCommand<SelectCmd> {
                   {"none", 0, Variable::None, 0b01000},
                   {"type", 1, Variable::String},
                   {"primary", 1, Variable::String}}};
-  static constexpr int kAdd = info.option("add"), kRemove = info.option("remove"), kToggle = info.option("toggle"),
-                       kAll = info.option("all"), kNone = info.option("none"), kType = info.option("type"),
+  static constexpr int kAdd = info.option("add"), kRemove = info.option("remove"),
+                       kToggle = info.option("toggle"), kAll = info.option("all"),
+                       kNone = info.option("none"), kType = info.option("type"),
                        kPrimary = info.option("primary");
 
   bool checkArgSyntax(Args const& args, Given const& options) const override {

@@ -7,13 +7,14 @@ namespace {
 
 class SetActiveClipCmd final : public ScriptCommand<SetActiveClipCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "setActiveClip",
-                                       .displayName = "Set Active Clip",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Manipulators",
-                                       .purpose = "Makes a clip the active one; -none goes back to the base clip.",
-                                       .args = {"[PATH]", 0, 1, {Variable::String}},
-                                       .options = {{"none"}}};
+  static constexpr CommandInfo info = {
+      .name = "setActiveClip",
+      .displayName = "Set Active Clip",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose = "Makes a clip the active one; -none goes back to the base clip.",
+      .args = {"[PATH]", 0, 1, {Variable::String}},
+      .options = {{"none"}}};
 
   // A path or -none, not both.
   bool checkArgSyntax(Args const& args, Given const& options) const override {

@@ -7,12 +7,13 @@ namespace {
 
 class SetActiveLayerCmd final : public ScriptCommand<SetActiveLayerCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "setActiveLayer",
-                                       .displayName = "Set Active Layer",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Manipulators",
-                                       .purpose = "Makes a layer of the active clip the one that is edited, from 0.",
-                                       .args = {"N", 1, 1, {Variable::Int}}};
+  static constexpr CommandInfo info = {
+      .name = "setActiveLayer",
+      .displayName = "Set Active Layer",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose = "Makes a layer of the active clip the one that is edited, from 0.",
+      .args = {"N", 1, 1, {Variable::Int}}};
 
   bool execute(Given const&, Args const& args, Variable&) override {
     if (!g_db->getActiveClip()) {

@@ -7,11 +7,12 @@ namespace {
 
 class SetPlayRangeCmd final : public ScriptCommand<SetPlayRangeCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "setPlayRange",
-                                       .displayName = "Set Play Range",
-                                       .category = "Interface",
-                                       .purpose = "Sets the range of frames that is played; the current time stays.",
-                                       .args = {"START END", 2, 2}};
+  static constexpr CommandInfo info = {
+      .name = "setPlayRange",
+      .displayName = "Set Play Range",
+      .category = "Interface",
+      .purpose = "Sets the range of frames that is played; the current time stays.",
+      .args = {"START END", 2, 2}};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     return args.getCount() == 2 && areFrameNumbers(args);

@@ -7,11 +7,12 @@ namespace {
 
 class SetTimeCmd final : public ScriptCommand<SetTimeCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "setTime",
-                                       .displayName = "Set Current Time",
-                                       .category = "Interface",
-                                       .purpose = "Moves the current time to a frame, which may be a fraction.",
-                                       .args = {"FRAME", 1, 1}};
+  static constexpr CommandInfo info = {
+      .name = "setTime",
+      .displayName = "Set Current Time",
+      .category = "Interface",
+      .purpose = "Moves the current time to a frame, which may be a fraction.",
+      .args = {"FRAME", 1, 1}};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     return args.getCount() == 1 && areFrameNumbers(args);
