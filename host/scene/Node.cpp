@@ -54,6 +54,8 @@ Placement Placement::seen(Placement const& other) const {
 void Node::forgetWorldCache() { ++s_cache.epoch; }
 
 void Node::markMoved(Module* module) {
+  auto const* top = objectAs<Node>(module);
+  if (top && top->m_worldEpoch != s_cache.epoch) return;
   std::vector<Module*> open{module};
   while (!open.empty()) {
     Module* next = open.back();

@@ -224,6 +224,14 @@ class LayoutFinder {
     return frame.find_first_not_of('\0') == std::string_view::npos;
   }
 
+  [[noreturn]] void failTruncated() const {
+    const size_t frames = (m_bytes.size() - m_layout.dataStart) / m_layout.frameBytes();
+    m_bytes.fail(m_bytes.size(), "the data section ends at frame " + std::to_string(frames) + " of " +
+                                     std::to_string(m_claims[0].count) + " (it starts at offset " +
+                                     std::to_string(m_layout.dataStart) + ", a frame takes " +
+                                     std::to_string(m_layout.frameBytes()) + " bytes)");
+  }
+
   // The number comes from the place that counts right, else from the header.
   int64 firstFrame(const FrameClaim& chosen) const {
     if (chosen.first) return *chosen.first;
