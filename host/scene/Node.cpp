@@ -175,9 +175,10 @@ Placement Node::constInParent() const {
 }
 
 Placement Node::constWorld() const {
-  Placement world = constInParent();
-  for (Node const* node = getNodeParent(); node; node = node->getNodeParent())
-    world = node->constInParent() * world;
+  std::vector<Node const*> chain;
+  for (Node const* node = this; node; node = node->getNodeParent()) chain.push_back(node);
+  Placement world;
+  for (auto node = chain.rbegin(); node != chain.rend(); ++node) world = world * (*node)->constInParent();
   return world;
 }
 

@@ -17,7 +17,8 @@ struct Placement {
   TalixRotation rotation;
   Vec3 scale{1, 1, 1};
 
-  // A frame given in this one, in the frame that this one is given in.
+  // A frame given in this one, in the frame that this one is given in. Frames do not shear, so with uneven
+  // scales it matters where a product begins: at the root.
   Placement operator*(Placement const& inner) const;
   // A frame given beside this one, as seen from this one. Along an axis of scale 0 everything is at 0.
   Placement seen(Placement const& other) const;
