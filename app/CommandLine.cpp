@@ -3,6 +3,7 @@
 #include <CLI/CLI.hpp>
 #include <csignal>
 
+#include "app/Info.h"
 #include "app/Run.h"
 
 namespace {
@@ -17,6 +18,7 @@ constexpr char const* kExamples = R"(Examples:
   talix run --open walk.c3d --save clean.c3d clean.talix
   talix run --json -c 'create Marker LFHD' -c getModules
   talix commands setKey
+  talix info walk.c3d
 )";
 
 constexpr char const* kScriptHelp =
@@ -106,12 +108,19 @@ int main(int argc, char** argv) {
   commandsApp->add_flag("--json", json, "Print them as a JSON array");
   addPluginOptions(*commandsApp, plugin);
 
+  std::vector<std::string> infoFiles;
+  bool infoJson = false;
+  CLI::App* infoApp = app.add_subcommand("info", "Tell what take files hold, without opening them in a scene");
+  infoApp->add_option("FILE", infoFiles, "Take files (C3D, BVH, TRC)")->required();
+  infoApp->add_flag("--json", infoJson, "Print it as JSON");
+
   try {
     app.parse(argc, argv);
   } catch (CLI::ParseError const& error) {
     const int status = app.exit(error);
     return status == 0 ? 0 : kBadCommandLine;
   }
+  if (infoApp->parsed()) return talix::runInfo(infoFiles, infoJson);
   if (commandsApp->parsed()) return talix::showCommands(plugin, name, json);
   run.putInOrder(*runApp);
   return talix::runScripts(run.request);
