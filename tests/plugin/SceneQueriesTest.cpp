@@ -1,4 +1,4 @@
-// Questions about the scene, its hierarchy and its selection.
+// Questions about scenes of several classes and of repeated names.
 #include "host/scene/Devices.h"
 #include "tests/plugin/SceneFixture.h"
 
@@ -78,25 +78,6 @@ TEST_F(TwoOfAName, ExistsByTypeAndPriority) {
   EXPECT_EQ(run("exists", {"m"}), "false");
 }
 
-TEST_F(SceneQueries, FollowTheSelectionInItsOwnOrder) {
-  EXPECT_EQ(run("getModule"), "error: No module is selected.\nfailed");
-  EXPECT_EQ(run("getModules", {}, {{"selected"}}), "[]");
-  EXPECT_EQ(run("getModules", {}, {{"primary"}}), "[]");
-
-  Node* a = make("a");
-  Node* b = make("b");
-  Marker* c = make<Marker>("c");
-  for (Module* module : {static_cast<Module*>(c), static_cast<Module*>(a)}) module->setSelected(true);
-  EXPECT_EQ(run("getModules", {}, {{"selected"}}), "[\"c\" \"a\"]");
-  EXPECT_EQ(run("getModules", {}, {{"selected"}, {"primary"}}), "[\"a\"]");
-  EXPECT_EQ(run("getModules", {}, {{"primary"}, {"type", {"Marker"}}}), "[]");
-  EXPECT_EQ(run("getNumModules", {}, {{"selected"}}), "2");
-  EXPECT_EQ(run("isSelected", {"a"}), "true");
-  EXPECT_EQ(run("isSelected", {"b"}), "false");
-  b->setSelected(true);
-  EXPECT_EQ(run("getModule"), "\"b\"");
-}
-
 TEST_F(SceneQueries, ListExactlyATypeButCountItsSubtypesToo) {
   make("node");
   make<Marker>("marker");
@@ -115,18 +96,6 @@ TEST_F(SceneQueries, ListExactlyATypeButCountItsSubtypesToo) {
     EXPECT_EQ(run("getNumModules", {}, {{"type", {type}}}), message);
   }
   EXPECT_EQ(run("getModuleType", {"device"}), "\"AnalogDevice\"");
-}
-
-TEST_F(SceneQueries, NameActiveChannelsWithTheirComponent) {
-  EXPECT_EQ(run("getChannels"), "[]");
-  make("n")->addChannel("Speed", DataSource::FloatProperty);
-  const unsigned translation = Controller::mapPropertyName("Translation");
-  const unsigned speed = Controller::mapPropertyName("Speed");
-  g_db->setActiveProperties(
-      {translation | 0x20000000, translation | 0x10000000, speed, translation | 0x40000000});
-  EXPECT_EQ(run("getChannels"), "[\"Translation.Y\" \"Translation.X\" \"Speed\" \"Translation.Z\"]");
-  g_db->setActiveProperties({translation | 0x70000000});
-  EXPECT_EQ(run("getChannels"), "[\"Translation\"]");
 }
 
 }  // namespace
