@@ -110,7 +110,8 @@ int main(int argc, char** argv) {
 
   std::vector<std::string> infoFiles;
   bool infoJson = false;
-  CLI::App* infoApp = app.add_subcommand("info", "Tell what take files hold, without opening them in a scene");
+  CLI::App* infoApp =
+      app.add_subcommand("info", "Tell what take files hold, without opening them in a scene");
   infoApp->add_option("FILE", infoFiles, "Take files (C3D, BVH, TRC)")->required();
   infoApp->add_flag("--json", infoJson, "Print it as JSON");
 

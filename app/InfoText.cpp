@@ -103,7 +103,7 @@ class TakeText {
     std::string frames = std::to_string(m_take.frameCount);
     if (m_take.frameCount > 0)
       frames += " (" + std::to_string(m_take.firstFrame) + " to " + std::to_string(last) + ")";
-    head("frames", frames + " at " + number(m_take.rate) + " a second, " +
+    head("frames", frames + " at " + number(m_take.rate, 4) + " a second, " +
                        number(static_cast<double>(m_take.frameCount) / m_take.rate) + " s");
     head("unit", printable(m_take.fileUnit) + (m_take.unitAssumed ? " (assumed)" : ""));
     head("up axis",

@@ -30,8 +30,9 @@ class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
       return false;
     }
     if (!Module::isValidPropertyName(name)) {
-      logError("%s cannot be the name of an attribute: it must not be empty nor hold a dot or a backslash.",
-               name.GetStr());
+      logError(
+          "\"%s\" cannot be the name of an attribute: it must not be empty nor hold a dot or a backslash.",
+          name.GetStr());
       return false;
     }
     if (module->getProperty(name) || module->getAttribute(name.GetStr())) {
