@@ -40,7 +40,11 @@ class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
       return false;
     }
     std::unique_ptr<Attribute> attribute = makeAttribute(*kind, name, args, 3, *module);
-    return attribute && module->addCustomAttribute(std::move(attribute));
+    if (!attribute) return false;
+    Attribute* added = module->addCustomAttribute(std::move(attribute));
+    // Every attribute joins its module as "not set"; one that was given a value is set.
+    if (args.getCount() > 3 && !kind->takesLabels()) added->store(added->getRawValue(), true, false);
+    return true;
   }
 };
 

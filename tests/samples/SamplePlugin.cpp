@@ -231,7 +231,7 @@ class AttributeCmd final : public ScriptCommand<AttributeCmd> {
   static void show(TalixRotation const& value, Variable& result) {
     Vec3 angles;
     value.getAsEuler(TalixRotation::XYZ, angles);
-    for (int i = 0; i < 3; ++i) angles[i] = std::round(angles[i] * 57.29577951308232);
+    for (int i = 0; i < 3; ++i) angles[i] = std::round(angles[i] * 57.29577951308232) + 0.0;  // no -0
     result.setValue(angles, -1);
   }
   static void show(Attribute::Bits const& value, Variable& result) {
