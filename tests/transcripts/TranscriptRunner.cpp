@@ -7,9 +7,9 @@
 //   error: Option -int of echo needs 1 integer
 //   failed
 //
-// Lines after "> " are run in order against a fresh scene; the lines below each are what must be printed: log lines,
-// the result, and "failed" when the command failed. A printed line that is empty or begins with "#", ">" or "|"
-// stands after "| ". The working folder is the folder of the tests.
+// Lines after "> " are run in order against a fresh scene; the lines below each are what must be printed: log
+// lines, the result, and "failed" when the command failed. A printed line that is empty or begins with "#",
+// ">" or "|" stands after "| ". The working folder is the folder of the tests.
 //
 //   transcripts [--update] --plugin LIBRARY FILE...      --update rewrites the files instead
 
@@ -49,7 +49,8 @@ void addPrinted(std::string_view text, Lines& lines) {
 }
 
 void addResult(talix::LineResult const& result, Lines& lines) {
-  for (talix::LogLine const& line : result.log) addPrinted(getLogLevelName(line.level) + (": " + line.text), lines);
+  for (talix::LogLine const& line : result.log)
+    addPrinted(getLogLevelName(line.level) + (": " + line.text), lines);
   if (result.value.getType() != Variable::None) addPrinted(talix::toText(result.value), lines);
   if (result.failed()) lines.emplace_back("failed");
 }
@@ -76,9 +77,11 @@ void tellDifference(std::string const& path, Lines const& expected, Lines const&
   while (i < expected.size() && i < found.size() && expected[i] == found[i]) ++i;
   size_t prompt = i;
   while (prompt > 0 && !expected[--prompt].starts_with(kPrompt)) continue;
-  const auto lineOr = [](Lines const& lines, size_t at) { return at < lines.size() ? lines[at] : "(the end)"; };
-  std::cout << path << ":" << i + 1 << ": after \"" << expected[prompt] << "\"\n  expected: " << lineOr(expected, i)
-            << "\n  printed:  " << lineOr(found, i) << "\n";
+  const auto lineOr = [](Lines const& lines, size_t at) {
+    return at < lines.size() ? lines[at] : "(the end)";
+  };
+  std::cout << path << ":" << i + 1 << ": after \"" << expected[prompt]
+            << "\"\n  expected: " << lineOr(expected, i) << "\n  printed:  " << lineOr(found, i) << "\n";
 }
 
 Lines readFile(std::string const& path) {
