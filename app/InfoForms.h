@@ -1,0 +1,21 @@
+// The forms in which "talix info" describes a take.
+#pragma once
+
+#include <boost/json/object.hpp>
+#include <string>
+#include <string_view>
+
+#include "io/Take.h"
+
+namespace talix {
+
+std::string takeAsText(const Take& take, const std::string& file);
+boost::json::object takeAsJson(const Take& take, const std::string& file);
+
+// Text of a file as UTF-8 without control characters: bytes that are no UTF-8 count as Latin-1.
+std::string printable(std::string_view text);
+
+// "Tx", "Rz": a joint's channel in short.
+std::string shortChannel(const std::string& channel);
+
+}  // namespace talix

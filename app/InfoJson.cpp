@@ -1,0 +1,92 @@
+#include <boost/json.hpp>
+#include <cmath>
+
+#include "app/InfoForms.h"
+#include "io/TakeGaps.h"
+
+namespace talix {
+
+namespace {
+
+namespace json = boost::json;
+
+// Whole numbers without an exponent.
+json::value number(double value) {
+  constexpr double kExact = 9007199254740992.0;
+  if (value == std::floor(value) && std::abs(value) < kExact) return static_cast<int64>(value);
+  return value;
+}
+
+template <class T, class Form>
+json::array listOf(const std::vector<T>& items, Form form) {
+  json::array list;
+  list.reserve(items.size());
+  for (const T& item : items) list.emplace_back(form(item));
+  return list;
+}
+
+json::object marker(const Take& take, const TakePoint& point) {
+  const TakeGaps gaps = gapsOf(take, point.positions);
+  return {{"subject", printable(point.subject)},
+          {"label", printable(point.label)},
+          {"description", printable(point.description)},
+          {"missingFrames", gaps.missing},
+          {"gaps", gaps.count},
+          {"longestGap", gaps.longest}};
+}
+
+json::object joint(const TakeJoint& joint) {
+  constexpr const char* kOrders[] = {"XYZ", "XZY", "YXZ", "YZX", "ZXY", "ZYX"};
+  return {{"name", printable(joint.name)},
+          {"parent", joint.parent},
+          {"endSite", joint.endSite},
+          {"offset", {number(joint.offset.x), number(joint.offset.y), number(joint.offset.z)}},
+          {"rotationOrder", kOrders[joint.rotationOrder]},
+          {"channels", listOf(joint.channels, shortChannel)}};
+}
+
+}  // namespace
+
+json::object takeAsJson(const Take& take, const std::string& file) {
+  json::object info;
+  info["file"] = printable(file);
+  info["format"] = take.format;
+  info["variant"] = printable(take.variant);
+  info["rate"] = number(take.rate);
+  info["frames"] = take.frameCount;
+  info["firstFrame"] = take.firstFrame;
+  info["seconds"] = number(static_cast<double>(take.frameCount) / take.rate);
+  info["unit"] = printable(take.fileUnit);
+  info["unitInMillimetres"] = number(take.unitInMillimetres);
+  info["unitAssumed"] = take.unitAssumed;
+  info["upAxis"] = std::string(1, "xyz"[static_cast<int>(take.up)]);
+  info["upAxisAssumed"] = take.upAssumed;
+  info["markers"] = listOf(take.points, [&](const TakePoint& point) { return marker(take, point); });
+  info["outputs"] = listOf(take.outputs, [](const TakeOutput& output) -> json::object {
+    return {
+        {"name", printable(output.name)}, {"kind", printable(output.kind)}, {"unit", printable(output.unit)}};
+  });
+  info["analogRate"] = number(take.analogRate);
+  info["analog"] = listOf(take.analog, [](const TakeAnalogChannel& channel) -> json::object {
+    return {{"name", printable(channel.name)},
+            {"unit", printable(channel.unit)},
+            {"description", printable(channel.description)},
+            {"scale", number(channel.scale)},
+            {"offset", number(channel.offset)}};
+  });
+  info["joints"] = listOf(take.joints, joint);
+  info["events"] = listOf(take.events, [](const TakeEvent& event) -> json::object {
+    return {{"seconds", number(event.seconds)},
+            {"label", printable(event.label)},
+            {"context", printable(event.context)},
+            {"subject", printable(event.subject)},
+            {"description", printable(event.description)}};
+  });
+  info["notes"] = listOf(take.notes, [](const TakeNote& note) -> json::object {
+    return {{"level", note.level == TakeNote::Level::Warning ? "warning" : "info"},
+            {"text", printable(note.text)}};
+  });
+  return info;
+}
+
+}  // namespace talix

@@ -1,0 +1,137 @@
+#include "app/Run.h"
+
+#include <algorithm>
+#include <boost/json.hpp>
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <filesystem>
+#include <iostream>
+#include <unistd.h>
+
+#include "host/scene/Database.h"
+#include "io/FileError.h"
+#include "session/CommandHelp.h"
+#include "session/JsonForms.h"
+#include "session/JsonText.h"
+#include "session/ScriptRunner.h"
+#include "session/ScriptText.h"
+
+namespace talix {
+
+namespace {
+
+constexpr char const* kStandardInput = "-";
+
+std::string programFolder() {
+  std::error_code error;
+  const auto program = std::filesystem::read_symlink("/proc/self/exe", error);
+  return error ? "." : program.parent_path().string();
+}
+
+int failed(Status status, std::string const& text) {
+  std::fprintf(stderr, "error: %s\n", text.c_str());
+  return static_cast<int>(status);
+}
+
+// A session, or null with `status` set when the plug-in cannot be used.
+std::unique_ptr<Session> makeSession(PluginChoice const& plugin, int& status) {
+  Database::setDevOnlyMode(plugin.developer);
+  try {
+    return std::make_unique<Session>(plugin.file.empty() ? findPlugin(programFolder()) : plugin.file);
+  } catch (std::exception const& error) {
+    status = failed(Status::FileFailed, error.what());
+    return nullptr;
+  }
+}
+
+// Answers `status` once all output is out. Somebody who stops reading is told nothing: he knows.
+int finished(int status, bool written) {
+  if (written) return status;
+  if (errno != EPIPE) std::fprintf(stderr, "error: standard output: %s\n", std::strerror(errno));
+  return static_cast<int>(Status::FileFailed);
+}
+
+bool runStandardInput(ScriptRunner& runner) {
+  std::string line;
+  for (int number = 1; std::getline(std::cin, line); ++number)
+    if (!runner.runLine(line, kStandardInput, number)) return false;
+  return true;
+}
+
+bool isStandardInput(RunRequest::Part const& part) { return !part.isLine && part.text == kStandardInput; }
+
+// What each part runs; nothing for standard input, which is read as it comes.
+std::vector<std::string> readParts(std::vector<RunRequest::Part> const& parts) {
+  std::vector<std::string> texts;
+  for (RunRequest::Part const& part : parts)
+    texts.push_back(part.isLine ? part.text : isStandardInput(part) ? "" : readScript(part.text));
+  return texts;
+}
+
+// The parts in order, until one fails. Lines of the command line are counted through.
+void runParts(ScriptRunner& runner, std::vector<RunRequest::Part> const& parts,
+              std::vector<std::string> const& texts) {
+  int lines = 0;
+  bool going = true;
+  for (size_t i = 0; going && i < parts.size(); ++i) {
+    if (isStandardInput(parts[i])) {
+      going = runStandardInput(runner);
+    } else if (parts[i].isLine) {
+      going = runner.runText(texts[i], "-c", lines + 1);
+      lines += 1 + static_cast<int>(std::count(texts[i].begin(), texts[i].end(), '\n'));
+    } else {
+      going = runner.runText(texts[i], parts[i].text, 1);
+    }
+  }
+}
+
+}  // namespace
+
+int runScripts(RunRequest const& request) {
+  int status = 0;
+  const std::unique_ptr<Session> session = makeSession(request.plugin, status);
+  if (!session) return status;
+  session->setAssumeYes(request.assumeYes);
+  RunStyle style{
+      .json = request.json, .keepGoing = request.keepGoing, .nameLines = isatty(STDERR_FILENO) != 0};
+  for (RunRequest::Part const& part : request.parts) style.flushLines |= isStandardInput(part);
+  ScriptRunner runner(*session, style, stdout, stderr);
+
+  try {
+    // A script that cannot be read is told before anything is run.
+    const std::vector<std::string> texts = readParts(request.parts);
+    for (std::string const& file : request.opens)
+      if (!runner.runSilently("open " + quotedText(file))) return static_cast<int>(Status::FileFailed);
+    runParts(runner, request.parts, texts);
+  } catch (FileError const& error) {
+    return finished(failed(Status::FileFailed, error.what()), runner.finish());
+  }
+  status = static_cast<int>(runner.status());
+  if (runner.mayGoOn()) {
+    for (std::string const& file : request.saves)
+      if (!runner.runSilently("save " + quotedText(file)) && status == 0)
+        status = static_cast<int>(Status::FileFailed);
+  }
+  return finished(status, runner.finish());
+}
+
+int showCommands(PluginChoice const& plugin, std::string const& name, bool json) {
+  int status = 0;
+  const std::unique_ptr<Session> session = makeSession(plugin, status);
+  if (!session) return status;
+  CommandRegistry const& commands = session->commands();
+  CommandRegistry::Entry const* entry = nullptr;
+  if (!name.empty() && !(entry = commands.find(name)))
+    return failed(Status::BadCommandLine, "Unknown command: " + name);
+  std::string text;
+  if (json) {
+    text = jsonText(entry ? boost::json::array{toJson(*entry)} : toJson(commands));
+  } else {
+    text = entry ? commandPage(*entry) : commandList(commands);
+  }
+  const bool written = std::puts(text.c_str()) >= 0 && std::fflush(stdout) == 0;
+  return finished(status, written);
+}
+
+}  // namespace talix

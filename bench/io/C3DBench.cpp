@@ -1,0 +1,81 @@
+// Reading and writing C3D files: a long take of many points, and a short trial in all number forms.
+#include <benchmark/benchmark.h>
+#include <cmath>
+#include <filesystem>
+#include <unistd.h>
+#include <vector>
+
+#include "host/time/Ticks.h"
+#include "io/TakeFormats.h"
+
+namespace talix {
+namespace {
+
+// 300 points by 20,000 frames with gaps, 3.3 minutes at 100 frames a second.
+Take longTake() {
+  constexpr int64 kPoints = 300, kFrames = 20'000;
+  Take take;
+  take.rate = 100;
+  take.firstFrame = 1;
+  take.frameCount = kFrames;
+  const int64 period = ticksPerFrameAt(take.rate);
+  std::vector<double> values(3 * kFrames);
+  for (int64 p = 0; p < kPoints; ++p) {
+    for (size_t i = 0; i < values.size(); ++i)
+      values[i] = 1000 * std::sin(0.001 * static_cast<double>(i) + static_cast<double>(p));
+    TakePoint point;
+    point.label = "M" + std::to_string(p);
+    const int64 seen = kFrames / 2 - 20;
+    point.positions.append(period, period, values.data(), seen);
+    point.positions.append((kFrames / 2 + 1) * period, period, values.data(), kFrames / 2);
+    take.points.push_back(std::move(point));
+  }
+  return take;
+}
+
+// The long take as a file, as long as the program runs.
+struct LongFile {
+  std::filesystem::path path;
+  LongFile() {
+    std::string pattern = (std::filesystem::temp_directory_path() / "c3dbenchXXXXXX").string();
+    path = std::filesystem::path(::mkdtemp(pattern.data())) / "long.c3d";
+    std::vector<TakeNote> notes;
+    writeC3D(longTake(), path.string(), notes);
+  }
+  ~LongFile() { std::filesystem::remove_all(path.parent_path()); }
+};
+
+void readFile(benchmark::State& state, const std::string& path) {
+  for (auto _ : state) benchmark::DoNotOptimize(readC3D(path));
+  state.SetBytesProcessed(state.iterations() * static_cast<int64>(std::filesystem::file_size(path)));
+}
+
+void ReadLongC3D(benchmark::State& state) {
+  static const LongFile file;
+  readFile(state, file.path.string());
+}
+BENCHMARK(ReadLongC3D)->Unit(benchmark::kMillisecond);
+
+void WriteLongC3D(benchmark::State& state) {
+  const LongFile file;
+  const Take take = longTake();
+  for (auto _ : state) {
+    std::vector<TakeNote> notes;
+    writeC3D(take, file.path.string(), notes);
+  }
+  state.SetBytesProcessed(state.iterations() * static_cast<int64>(std::filesystem::file_size(file.path)));
+}
+BENCHMARK(WriteLongC3D)->Unit(benchmark::kMillisecond);
+
+void ReadTrial(benchmark::State& state, const char* name) {
+  readFile(state, std::string(TALIX_TEST_DATA) + "/" + name);
+}
+BENCHMARK_CAPTURE(ReadTrial, IntelInteger, "walkset_a_le_int.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(ReadTrial, IntelReal, "walkset_a_le_real.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(ReadTrial, MIPSInteger, "walkset_a_be_int.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(ReadTrial, MIPSReal, "walkset_a_be_real.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(ReadTrial, DECInteger, "walkset_a_vax_int.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(ReadTrial, DECReal, "walkset_a_vax_real.c3d")->Unit(benchmark::kMicrosecond);
+
+}  // namespace
+}  // namespace talix

@@ -1,0 +1,40 @@
+#include "commands/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
+
+namespace {
+
+class ExistsCmd final : public ScriptCommand<ExistsCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "exists",
+      .displayName = "Exists",
+      .category = "Data Editing",
+      .purpose = "Tells whether a path names a module, of any type or of a given one.",
+      .args = {"modPath", 1, 1, {Variable::String}},
+      .options = {{"type", 1, Variable::String}, {"priorityOnly"}},
+      .returns = Variable::Bool,
+      .solo = Solo::no};
+  static constexpr int kType = info.option("type"), kPriorityOnly = info.option("priorityOnly");
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
+};
+
+bool ExistsCmd::execute(Given const& given, Args const& args, Variable& result) {
+  const GivenOptions options(given);
+  HRuntimeClass const* type = nullptr;
+  if (options.has(kType)) {
+    const HString name = options.textOr(kType, "");
+    type = HRuntimeClass::findClass(name.GetStr());  // kept: any class, though no module has most of them
+    if (!type) {
+      logError("%s is not a Module type", name.GetStr());
+      return false;
+    }
+  }
+  const HString path = args[0].getStringValue(-1);
+  return answer(result, g_db->getModuleWithPath(path, type, options.has(kPriorityOnly)) != nullptr);
+}
+
+}  // namespace
+
+Command* newExistsCmd() { return new (std::nothrow) ExistsCmd; }

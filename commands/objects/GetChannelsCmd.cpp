@@ -1,0 +1,47 @@
+#include "commands/Results.h"
+#include "host/animation/PropertyTable.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
+
+namespace {
+
+class GetChannelsCmd final : public ScriptCommand<GetChannelsCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getChannels",
+      .displayName = "Get Selected Channels",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Lists the active channels, with \".X\", \".Y\" or \".Z\" where one component is active.",
+      .returns = Variable::StringArray};
+
+  bool execute(Given const&, Args const&, Variable& result) override;
+};
+
+// Several components together have no suffix.
+char const* componentSuffix(unsigned id) {
+  switch (id & ~PropertyTable::kIdMask) {
+    case PropertyTable::kX:
+      return ".X";
+    case PropertyTable::kY:
+      return ".Y";
+    case PropertyTable::kZ:
+      return ".Z";
+    default:
+      return "";
+  }
+}
+
+bool GetChannelsCmd::execute(Given const&, Args const&, Variable& result) {
+  const int count = g_db->getNumActiveProperties();
+  Variable names(Variable::StringArray, count);
+  for (int i = 0; i < count; ++i) {
+    const unsigned id = g_db->getActiveProperty(i);
+    names.setValue((Controller::mapPropertyId(id) + componentSuffix(id)).GetStr(), i);
+  }
+  return answer(result, names);
+}
+
+}  // namespace
+
+Command* newGetChannelsCmd() { return new (std::nothrow) GetChannelsCmd; }

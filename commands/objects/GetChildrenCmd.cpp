@@ -1,0 +1,39 @@
+#include "commands/Results.h"
+#include "commands/Targets.h"
+#include "commands/objects/SceneQueries.h"
+
+namespace {
+
+class GetChildrenCmd final : public ScriptCommand<GetChildrenCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getChildren",
+      .displayName = "Get Children",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Lists the paths of the modules right below a module.",
+      .args = {"parentName", 1, 1, {Variable::String}},
+      .options = {{"nodesOnly"}, {"fullPath", 0, Variable::None, 4}, {"nameOnly", 0, Variable::None, 2}},
+      .returns = Variable::StringArray,
+      .solo = Solo::no};
+  static constexpr int kNodesOnly = info.option("nodesOnly");
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
+};
+
+bool GetChildrenCmd::execute(Given const& given, Args const& args, Variable& result) {
+  Module const* module =
+      moduleAt(args[0].getStringValue(-1),
+               "%s  is not a valid unique path to a Module in the scene.");  // two spaces: kept
+  if (!module) return false;
+  const bool nodesOnly = GivenOptions(given).has(kNodesOnly);
+  const int count = nodesOnly ? module->getNumNodeChildren() : module->getNumChildren();
+  std::vector<Module*> children;
+  for (int i = 0; i < count; ++i)
+    children.push_back(nodesOnly ? module->getNodeChild(i) : module->getChild(i));
+  return answer(result, pathsOf(children, pathType<GetChildrenCmd>(given)));
+}
+
+}  // namespace
+
+Command* newGetChildrenCmd() { return new (std::nothrow) GetChildrenCmd; }

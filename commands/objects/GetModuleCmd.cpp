@@ -1,0 +1,31 @@
+#include "commands/Results.h"
+#include "commands/objects/SceneQueries.h"
+
+namespace {
+
+class GetModuleCmd final : public ScriptCommand<GetModuleCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getModule",
+      .displayName = "Get Scene Module",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Answers the path of the primary selected module.",
+      .options = {{"fullPath", 0, Variable::None, 2}, {"nameOnly", 0, Variable::None, 1}},
+      .returns = Variable::String};
+
+  bool execute(Given const& given, Args const&, Variable& result) override;
+};
+
+bool GetModuleCmd::execute(Given const& given, Args const&, Variable& result) {
+  Module const* module = g_db->getPrimarySelectedModule();
+  if (!module) {
+    logError("No module is selected.");
+    return false;
+  }
+  return answer(result, module->getPath(pathType<GetModuleCmd>(given)));
+}
+
+}  // namespace
+
+Command* newGetModuleCmd() { return new (std::nothrow) GetModuleCmd; }

@@ -1,0 +1,48 @@
+#include "commands/Results.h"
+#include "commands/objects/SceneQueries.h"
+
+namespace {
+
+class GetModulesCmd final : public ScriptCommand<GetModulesCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getModules",
+      .displayName = "Get Scene Modules",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Lists the paths of modules: of all, of the selected ones, or of those of a type.",
+      .options = {{"type", 1, Variable::String},
+                  {"primary", 0, Variable::None, 4},
+                  {"selected", 0, Variable::None, 2},
+                  {"fullPath", 0, Variable::None, 16},
+                  {"nameOnly", 0, Variable::None, 8}},
+      .returns = Variable::StringArray};
+  static constexpr int kType = info.option("type"), kPrimary = info.option("primary"),
+                       kSelected = info.option("selected");
+
+  bool execute(Given const& given, Args const&, Variable& result) override;
+};
+
+bool GetModulesCmd::execute(Given const& given, Args const&, Variable& result) {
+  const GivenOptions options(given);
+  HRuntimeClass const* type = nullptr;
+  if (options.has(kType)) {
+    type = moduleTypeNamed(options.textOr(kType, ""));
+    if (!type) return false;
+  }
+  // Kept: only modules of exactly this class, whereas getNumModules counts those of its subclasses too.
+  std::vector<Module*> found;
+  const auto collect = [&](Module* module) {
+    if (!type || module->getRuntimeClass() == type) found.push_back(module);
+  };
+  if (options.has(kPrimary)) {
+    if (Module* primary = g_db->getPrimarySelectedModule()) collect(primary);
+  } else {
+    eachModule(options.has(kSelected), collect);
+  }
+  return answer(result, pathsOf(found, pathType<GetModulesCmd>(given)));
+}
+
+}  // namespace
+
+Command* newGetModulesCmd() { return new (std::nothrow) GetModulesCmd; }

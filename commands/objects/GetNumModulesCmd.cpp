@@ -1,0 +1,36 @@
+#include "commands/Results.h"
+#include "commands/objects/SceneQueries.h"
+
+namespace {
+
+class GetNumModulesCmd final : public ScriptCommand<GetNumModulesCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getNumModules",
+      .displayName = "Get Number of Modules",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose =
+          "Counts the modules of the scene, or the selected ones, of any type or of one and its subtypes.",
+      .options = {{"type", 1, Variable::String}, {"selected"}},
+      .returns = Variable::Int};
+  static constexpr int kType = info.option("type"), kSelected = info.option("selected");
+
+  bool execute(Given const& given, Args const&, Variable& result) override;
+};
+
+bool GetNumModulesCmd::execute(Given const& given, Args const&, Variable& result) {
+  const GivenOptions options(given);
+  HRuntimeClass const* type = &Module::s_classModule;
+  if (options.has(kType)) {
+    type = moduleTypeNamed(options.textOr(kType, ""));
+    if (!type) return false;
+  }
+  int count = 0;
+  eachModule(options.has(kSelected), [&](Module const* module) { count += module->isKindOf(type); });
+  return answer(result, count);
+}
+
+}  // namespace
+
+Command* newGetNumModulesCmd() { return new (std::nothrow) GetNumModulesCmd; }

@@ -1,0 +1,33 @@
+#include "commands/Results.h"
+#include "commands/Targets.h"
+#include "commands/objects/SceneQueries.h"
+
+namespace {
+
+class GetParentCmd final : public ScriptCommand<GetParentCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getParent",
+      .displayName = "Get Parent",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Answers the path of the parent of a module; nothing when it has none.",
+      .args = {"module", 1, 1, {Variable::String}},
+      .options = {{"fullPath", 0, Variable::None, 2}, {"nameOnly", 0, Variable::None, 1}},
+      .returns = Variable::String,
+      .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
+};
+
+bool GetParentCmd::execute(Given const& given, Args const& args, Variable& result) {
+  Module const* module =
+      moduleAt(args[0].getStringValue(-1), "%s is not a valid unique path to a Module in the scene.");
+  if (!module) return false;
+  Module const* parent = module->getParent();
+  return !parent || answer(result, parent->getPath(pathType<GetParentCmd>(given)));
+}
+
+}  // namespace
+
+Command* newGetParentCmd() { return new (std::nothrow) GetParentCmd; }

@@ -1,0 +1,29 @@
+#include "commands/Results.h"
+#include "commands/Targets.h"
+#include "host/command/ScriptCommand.h"
+
+namespace {
+
+class IsSelectedCmd final : public ScriptCommand<IsSelectedCmd> {
+ public:
+  static constexpr CommandInfo info = {.name = "isSelected",
+                                       .displayName = "Is Selected",
+                                       .category = "Data Editing",
+                                       .subCategory = "Data Retrieval",
+                                       .purpose = "Tells whether a module is selected.",
+                                       .args = {"module", 1, 1, {Variable::String}},
+                                       .returns = Variable::Bool,
+                                       .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable& result) override;
+};
+
+bool IsSelectedCmd::execute(Given const&, Args const& args, Variable& result) {
+  Module const* module =
+      moduleAt(args[0].getStringValue(-1), "%s is not a valid unique path to a Module in the scene.");
+  return module && answer(result, module->isSelected());
+}
+
+}  // namespace
+
+Command* newIsSelectedCmd() { return new (std::nothrow) IsSelectedCmd; }

@@ -1,0 +1,34 @@
+#include "commands/Results.h"
+#include "commands/properties/PropertyReading.h"
+
+namespace {
+
+class GetBooleanArrayPropertyCmd final : public ScriptCommand<GetBooleanArrayPropertyCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getBooleanArrayProperty",
+      .displayName = "Get Array of Boolean Properties",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Reads a bit field of a module: true or false for each of its labels.",
+      .args = {"moduleName propertyName", 2, 2, {Variable::String, Variable::String}},
+      .returns = Variable::BoolArray,
+      .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable& result) override;
+};
+
+bool GetBooleanArrayPropertyCmd::execute(Given const&, Args const& args, Variable& result) {
+  Attribute const* attribute = attributeAt(args, "%s is not a valid unique path to a Module in the scene.");
+  if (!attribute) return false;
+  BitFieldAttribute const* bits = objectAs<BitFieldAttribute>(attribute);
+  if (!bits) return redirect(Getter::BooleanArray, *attribute);
+  Variable fields(Variable::BoolArray, bits->getNumFields());
+  for (int i = 0; i < bits->getNumFields(); ++i)
+    fields.setValue(bits->getField(i) ? Variable::True : Variable::False, i);
+  return answer(result, fields);
+}
+
+}  // namespace
+
+Command* newGetBooleanArrayPropertyCmd() { return new (std::nothrow) GetBooleanArrayPropertyCmd; }

@@ -1,0 +1,76 @@
+#include "commands/Results.h"
+#include "commands/properties/PropertyReading.h"
+
+namespace {
+
+class GetBooleanPropertyCmd final : public ScriptCommand<GetBooleanPropertyCmd> {
+ public:
+  // More than a label is refused by the command itself, with its own message.
+  static constexpr CommandInfo info = {
+      .name = "getBooleanProperty",
+      .displayName = "Get Boolean Property",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Reads a property of a module as true or false; of a bit field, the one with a label.",
+      .args = {"moduleName propertyName", 2, ArgsInfo::kAny, {}, Variable::String},
+      .options = {{"c"}, {"d"}},
+      .returns = Variable::Bool,
+      .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
+};
+
+// Kept: a channel of another kind is an error, yet the command succeeds without a value.
+bool readChannel(Module const& module, HString const& name, DataSource::PropertyType kind, bool byDefault,
+                 Variable& result) {
+  switch (kind) {
+    case DataSource::BoolProperty: {
+      BoolController const* channel = channelNamed<BoolController>(module, name);
+      return channel && answer(result, valueOf(*channel, byDefault));
+    }
+    case DataSource::FloatProperty:
+      Command::logError("Use getFloatProperty for this type of property");
+      return true;
+    case DataSource::IntProperty:
+      Command::logError("Use getIntProperty for this type of property");
+      return true;
+    default:
+      Command::logError("Use getVectorProperty for this type of property");
+      return true;
+  }
+}
+
+// The third argument is the label.
+bool readField(BitFieldAttribute const& bits, Args const& args, Variable& result) {
+  if (args.getCount() != 3) {
+    Command::logError("Not enough arguments for getBooleanProperty command");  // kept: for too many as well
+    return false;
+  }
+  const HString label = args[2].getStringValue(-1);
+  if (bits.findLabel(label) < 0) {
+    Command::logError("\"%s\" is not a field in \"%s\"", label.GetStr(), bits.getName().GetStr());
+    return false;
+  }
+  return answer(result, bits.getField(label));
+}
+
+bool GetBooleanPropertyCmd::execute(Given const& given, Args const& args, Variable& result) {
+  Module const* module =
+      moduleAt(args[0].getStringValue(-1), "%s is not a valid unique path to a Module in the scene.");
+  if (!module) return false;
+  const HString name = args[1].getStringValue(-1);
+  const DataSource::PropertyType kind = Controller::mapToPropertyType(name);
+  if (kind != DataSource::NoProperty)
+    return readChannel(*module, name, kind, isByDefault<GetBooleanPropertyCmd>(given), result);
+  Attribute const* attribute = attributeNamed(*module, name);
+  if (!attribute) return false;
+  if (BoolAttribute const* boolean = objectAs<BoolAttribute>(attribute))
+    return answer(result, boolean->getValue());
+  if (BitFieldAttribute const* bits = objectAs<BitFieldAttribute>(attribute))
+    return readField(*bits, args, result);
+  return redirect(Getter::Boolean, *attribute);
+}
+
+}  // namespace
+
+Command* newGetBooleanPropertyCmd() { return new (std::nothrow) GetBooleanPropertyCmd; }

@@ -1,0 +1,16 @@
+#include "commands/PendingCommand.h"
+
+namespace {
+
+class GetEditToolCmd final : public PendingCommand<GetEditToolCmd> {
+ public:
+  static constexpr CommandInfo info = {.name = "getEditTool",
+                                       .displayName = "Get Current Edit Tool",
+                                       .category = "Interface",
+                                       .purpose = "Answers the number of the current editing tool.",
+                                       .returns = Variable::Int};
+};
+
+}  // namespace
+
+Command* newGetEditToolCmd() { return new (std::nothrow) GetEditToolCmd; }

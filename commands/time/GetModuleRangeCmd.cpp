@@ -1,0 +1,26 @@
+#include "commands/PendingCommand.h"
+
+namespace {
+
+class GetModuleRangeCmd final : public PendingCommand<GetModuleRangeCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getModuleRange",
+      .displayName = "Get Module(s) Data Range",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Answers the first and last frame of the keys of one or several modules.",
+      .args = {"module or moduleArray"},
+      .options = {{"i"}},
+      .returns = Variable::IntArray,
+      .solo = Solo::no};
+
+  bool checkArgSyntax(Args const& args, Given const&) const override {
+    return args.getCount() == 1 &&
+           (args[0].getType() == Variable::String || args[0].getType() == Variable::StringArray);
+  }
+};
+
+}  // namespace
+
+Command* newGetModuleRangeCmd() { return new (std::nothrow) GetModuleRangeCmd; }

@@ -1,0 +1,25 @@
+#include "commands/PendingCommand.h"
+
+namespace {
+
+class GetRotationAngleAxisCmd final : public PendingCommand<GetRotationAngleAxisCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "getRotationAngleAxis",
+      .displayName = "Get Node Rotation",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose =
+          "Answers the rotation of a node as a vector along its axis, as long as the angle in radians.",
+      .args = {"\"moduleName\"", 1, 1, {Variable::String}},
+      .options = {{"ws", 0, Variable::None, 2},
+                  {"inSpaceOf", 1, Variable::String, 1},
+                  {"preRot", 0, Variable::None, 8},
+                  {"def", 0, Variable::None, 4}},
+      .returns = Variable::Vector,
+      .solo = Solo::no};
+};
+
+}  // namespace
+
+Command* newGetRotationAngleAxisCmd() { return new (std::nothrow) GetRotationAngleAxisCmd; }

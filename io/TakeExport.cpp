@@ -1,0 +1,58 @@
+#include "host/time/HTimeManager.h"
+#include "io/TakeScene.h"
+#include "io/scene/TakeAttributes.h"
+#include "io/scene/TakeExportParts.h"
+
+namespace talix {
+
+namespace {
+
+// The whole frames of the animation range.
+FrameGrid animationFrames() {
+  const HTimeManager* time = HTimeManager::getInstance();
+  const HTimeRange range = time->getAnimRange();
+  FrameGrid grid;
+  grid.period = time->getTicksPerFrame();
+  const auto floorFrame = [&](int64 ticks) {
+    return ticks >= 0 ? ticks / grid.period : -((-ticks + grid.period - 1) / grid.period);
+  };
+  grid.firstFrame = floorFrame(range.getStart() + grid.period - 1);
+  grid.count = range.isEmpty() ? 0 : std::max<int64>(0, floorFrame(range.getEnd()) - grid.firstFrame + 1);
+  return grid;
+}
+
+void recallFile(Take& take, const NLEClip& clip) {
+  take.name = clip.getName().GetString();
+  take.format = remembered::text(clip, remembered::kFileFormat);
+  const double unit = remembered::number(clip, remembered::kFileUnitInMillimetres, 0);
+  if (unit > 0) {
+    take.unitInMillimetres = unit;
+    take.fileUnit = remembered::text(clip, remembered::kFileUnit);
+  }
+  for (const remembered::Record& record : remembered::records(clip, remembered::kEvents, 5))
+    take.events.push_back({record[1], record[2], record[3], record[4], remembered::textNumber(record[0])});
+}
+
+}  // namespace
+
+Take exportTake(Database& scene, std::vector<TakeNote>& notes) {
+  const FrameGrid grid = animationFrames();
+  Take take;
+  take.rate = HTimeManager::getInstance()->getFrameRate().getFrameRate();
+  take.firstFrame = grid.firstFrame;
+  take.frameCount = grid.count;
+  if (scene.getUpAxis() >= 0) take.up = static_cast<Axis>(scene.getUpAxis());
+  if (const NLEClip* clip = scene.getActiveClip()) recallFile(take, *clip);
+
+  TakeExport out{scene, FrameSampler(scene, grid), take, notes};
+  exportPoints(out);
+  exportDevices(out);
+  exportJoints(out);
+  if (out.keysLeftOut)
+    out.warn("takes hold the whole frames of the animation range only; " + std::to_string(out.keysLeftOut) +
+             (out.keysLeftOut == 1 ? " key" : " keys") + " between or outside them " +
+             (out.keysLeftOut == 1 ? "was" : "were") + " left out");
+  return take;
+}
+
+}  // namespace talix

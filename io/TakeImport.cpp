@@ -1,0 +1,142 @@
+#include <filesystem>
+
+#include "host/time/HTimeManager.h"
+#include "io/FileError.h"
+#include "io/TakeScene.h"
+#include "io/scene/TakeAttributes.h"
+#include "io/scene/TakeImportParts.h"
+
+namespace talix {
+
+namespace {
+
+constexpr const char* kAxisNames[] = {"x", "y", "z"};
+
+// Taken before anything changes: what a failed import goes back to.
+class Undoing {
+ public:
+  explicit Undoing(Database& scene)
+      : m_scene(scene), m_clip(scene.getActiveClip()), m_layer(scene.getActiveLayer()) {}
+
+  void takeBack(Clip* clip, const std::vector<Module*>& created) const {
+    for (size_t i = created.size(); i-- > 0;) m_scene.removeFromScene(created[i], true, true, true, true);
+    m_scene.removeFromScene(clip, true, true, true, true);
+    m_scene.setActiveClip(m_clip);
+    if (m_clip) m_scene.setActiveLayer(m_layer);
+  }
+
+ private:
+  Database& m_scene;
+  NLEClip* m_clip;
+  int m_layer;
+};
+
+void checkTake(const Take& take, const std::string& path, const Database& scene) {
+  if (scene.getNumClips() >= NLEClip::kMaximum)
+    throw FileError(
+        path, "the scene has " + std::to_string(NLEClip::kMaximum) + " clips already and takes no more");
+  for (size_t i = 0; i < take.joints.size(); ++i) {
+    const TakeJoint& joint = take.joints[i];
+    if (joint.parent >= static_cast<int>(i) || joint.parent < -1)
+      throw FileError(path, "the joint \"" + joint.name + "\" stands before its parent");
+    if (joint.name.empty()) throw FileError(path, "joint " + std::to_string(i + 1) + " has no name");
+  }
+}
+
+HFrameRate frameRate(double rate) {
+  HFrameRate result;
+  for (const ETimecodeStandard standard : {NTSC, PAL, FILM, FILM_NTSC}) {
+    HFrameRate known;
+    known.setTimecodeStandard(standard);
+    if (known.getFrameRate() == rate) return known;
+  }
+  result.setFrameRate(rate);
+  return result;
+}
+
+void setSceneTime(TakeImport& import, const Take& take) {
+  HTimeManager* time = HTimeManager::getInstance();
+  if (take.rate > HFrameRate::kMaximum)
+    import.warn("the scene counts at most " + remembered::numberText(HFrameRate::kMaximum) +
+                " frames a second and keeps its rate; keys lie at their times");
+  else
+    time->setFrameRate(frameRate(take.rate));
+  const int64 period = ticksPerFrameAt(take.rate);
+  const int64 last = take.firstFrame + std::max<int64>(take.frameCount, 1) - 1;
+  const HTimeRange range(take.firstFrame * period, last * period);
+  time->setAnimRange(range);
+  time->setPlayRange(range, false);
+}
+
+void noteSceneTime(TakeImport& import, const Take& take) {
+  const HFrameRate& rate = HTimeManager::getInstance()->getFrameRate();
+  if (rate.getTicksPerFrame() != ticksPerFrameAt(take.rate))
+    import.info("the take has " + remembered::numberText(take.rate) + " frames a second, the scene " +
+                remembered::numberText(rate.getFrameRate()) + "; keys keep their times");
+}
+
+// The scene's up axis, from the user, else as it was, else from the take.
+int sceneUpAxis(const Take& take, int up, const Database& scene) {
+  if (up >= 0) return up;
+  return scene.getUpAxis() >= 0 ? scene.getUpAxis() : static_cast<int>(take.up);
+}
+
+void noteAxes(TakeImport& import, const Take& take, int formerAxis, int axis, bool firstTake) {
+  if (formerAxis >= 0 && formerAxis != axis && !firstTake)
+    import.warn(std::string("the scene's up axis was ") + kAxisNames[formerAxis] + " and is " +
+                kAxisNames[axis] + " now; what the scene held before was not turned");
+  if (!import.turn().isIdentity())
+    import.info(std::string("turned from ") + kAxisNames[static_cast<int>(take.up)] + " up to the scene's " +
+                kAxisNames[axis] + " up");
+}
+
+void rememberFile(Clip& clip, const Take& take) {
+  remembered::setText(clip, remembered::kFileFormat, take.format);
+  remembered::setText(clip, remembered::kFileUnit, take.fileUnit);
+  remembered::setNumber(clip, remembered::kFileUnitInMillimetres, take.unitInMillimetres);
+  if (take.events.empty()) return;
+  std::vector<remembered::Record> events;
+  for (const TakeEvent& event : take.events)
+    events.push_back({remembered::numberText(event.seconds), event.label, event.context, event.subject,
+                      event.description});
+  remembered::setRecords(clip, remembered::kEvents, events);
+}
+
+}  // namespace
+
+void importTake(Take take, const std::string& path, int up, Database& scene, std::vector<TakeNote>& notes) {
+  checkTake(take, path, scene);
+  const bool firstTake = scene.getNumClips() == 0;
+  const int formerAxis = scene.getUpAxis(), axis = sceneUpAxis(take, up, scene);
+  const Undoing undoing(scene);
+  const std::string clipName = moduleName(take.name);
+  auto* clip = static_cast<Clip*>(scene.createModule(&Clip::staticClass(), clipName.c_str(), nullptr));
+  if (!clip) throw FileError(path, "the scene takes no further clip");
+  scene.setActiveClip(clip);
+
+  std::vector<TakeNote> said;
+  TakeImport import(scene, *clip, AxisTurn(static_cast<int>(take.up), axis),
+                    std::filesystem::path(path).filename().string(), said);
+  for (const TakeNote& note : take.notes)
+    note.level == TakeNote::Level::Warning ? import.warn(note.text) : import.info(note.text);
+  try {
+    importDevices(import, take, path);
+  } catch (...) {
+    undoing.takeBack(clip, import.created());
+    throw;
+  }
+  if (take.unitInMillimetres != 1) import.info("lengths converted from " + take.fileUnit + " to mm");
+  noteAxes(import, take, formerAxis, axis, firstTake);
+  scene.setUpAxis(axis);
+  rememberFile(*clip, take);
+  importPoints(import, take);
+  importJoints(import, take);
+  import.noteRepeatedNames();
+  if (firstTake)
+    setSceneTime(import, take);
+  else
+    noteSceneTime(import, take);
+  notes.insert(notes.end(), said.begin(), said.end());
+}
+
+}  // namespace talix

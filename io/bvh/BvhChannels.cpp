@@ -1,0 +1,56 @@
+#include "io/bvh/BvhChannels.h"
+
+#include <algorithm>
+#include <iterator>
+
+#include "io/TextScanner.h"
+
+namespace talix {
+
+std::optional<BvhChannel> bvhChannel(std::string_view name) {
+  if (name.empty()) return std::nullopt;
+  const std::string_view kind = name.substr(1);
+  const bool isRotation = equalsIgnoringCase(kind, "rotation");
+  if (!isRotation && !equalsIgnoringCase(kind, "position")) return std::nullopt;
+  switch (name[0]) {
+    case 'X':
+    case 'x':
+      return BvhChannel{isRotation, 0};
+    case 'Y':
+    case 'y':
+      return BvhChannel{isRotation, 1};
+    case 'Z':
+    case 'z':
+      return BvhChannel{isRotation, 2};
+    default:
+      return std::nullopt;
+  }
+}
+
+std::string bvhChannelName(BvhChannel channel) {
+  return std::string(1, "XYZ"[channel.axis]) + (channel.isRotation ? "rotation" : "position");
+}
+
+std::vector<int> rotationAxes(const std::vector<BvhChannel>& channels) {
+  std::vector<int> axes;
+  for (const BvhChannel& channel : channels)
+    if (channel.isRotation) axes.push_back(channel.axis);
+  return axes;
+}
+
+int rotationOrderOf(const std::vector<int>& channelAxes) {
+  std::vector<int> axes;
+  const auto add = [&](int axis) {
+    if (std::find(axes.begin(), axes.end(), axis) == axes.end()) axes.push_back(axis);
+  };
+  std::for_each(channelAxes.rbegin(), channelAxes.rend(), add);
+  const bool twoGiven = axes.size() == 2;
+  for (int axis = 0; axis < 3; ++axis) add(axis);
+  if (twoGiven) std::swap(axes[1], axes[2]);
+  const auto order = std::find_if(std::begin(kOrderAxes), std::end(kOrderAxes), [&](const int(&of)[3]) {
+    return std::equal(axes.begin(), axes.end(), of);
+  });
+  return static_cast<int>(order - std::begin(kOrderAxes));
+}
+
+}  // namespace talix

@@ -1,0 +1,21 @@
+// Events of a C3D file: those of its EVENT group and those of its header block.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "io/Take.h"
+#include "io/c3d/C3DBytes.h"
+#include "io/c3d/C3DParameters.h"
+
+namespace talix {
+
+// An event of the header that the group has too (same label, same time) comes once.
+std::vector<TakeEvent> readC3DEvents(const C3DBytes& bytes, const C3DParameters& parameters,
+                                     std::vector<TakeNote>& notes);
+
+// Adds the EVENT group; none without events.
+void addC3DEvents(const std::vector<TakeEvent>& events, C3DParameters& parameters,
+                  std::vector<TakeNote>& notes);
+
+}  // namespace talix

@@ -1,0 +1,44 @@
+// Fills and writes the parameter section of a C3D file (Intel numbers).
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "io/Take.h"
+#include "io/c3d/C3DParameters.h"
+
+namespace talix {
+
+// Adds parameters to a new group. Lists that are longer than a parameter can be go on in NAME2, NAME3, ...
+// A text that is too long is cut, with a warning.
+class C3DGroupWriter {
+ public:
+  C3DGroupWriter(C3DParameters& parameters, const std::string& name, const std::string& description,
+                 std::vector<TakeNote>& notes);
+
+  void text(const std::string& name, const std::string& value);
+  void texts(const std::string& name, const std::vector<std::string>& values);
+  // A list of pairs of texts, as one parameter.
+  void pairs(const std::string& name, const std::vector<std::string>& values);
+  void number(const std::string& name, C3DParameter::Type type, double value);
+  // `width` numbers belong together, as a first dimension of their own when there are several.
+  void numbers(const std::string& name, C3DParameter::Type type, const std::vector<double>& values,
+               size_t width = 1);
+
+ private:
+  C3DGroup& group() { return m_parameters.groups[m_group]; }
+  size_t longest(const std::string& name, const std::vector<std::string>& values);
+
+  C3DParameters& m_parameters;
+  size_t m_group;
+  std::vector<TakeNote>& m_notes;
+};
+
+// The section's bytes: whole blocks, its header first.
+std::string c3dParameterSection(const C3DParameters& parameters);
+
+// Numbers as Intel processors store them.
+void appendC3DWord(std::string& bytes, unsigned value);
+void appendC3DReal(std::string& bytes, double value);
+
+}  // namespace talix

@@ -1,0 +1,132 @@
+#include <unordered_map>
+
+#include "host/scene/Devices.h"
+#include "host/time/HTimeManager.h"
+#include "io/scene/TakeAttributes.h"
+#include "io/scene/TakeExportParts.h"
+
+namespace talix {
+
+namespace {
+
+// What the clip remembers of its channels, by their name in the scene.
+using Remembered = std::unordered_map<std::string, remembered::Record>;
+
+Remembered rememberedOf(const NLEClip* clip, const char* attribute, size_t fields) {
+  Remembered byChannel;
+  if (!clip) return byChannel;
+  for (remembered::Record& record : remembered::records(*clip, attribute, fields)) {
+    std::string channel = record[0];
+    byChannel.emplace(std::move(channel), std::move(record));
+  }
+  return byChannel;
+}
+
+class DeviceExport {
+ public:
+  explicit DeviceExport(TakeExport& out)
+      : m_out(out),
+        m_sampler(out.sampler),
+        m_analog(rememberedOf(m_sampler.clip(), remembered::kAnalogChannels, 6)),
+        m_outputs(rememberedOf(m_sampler.clip(), remembered::kOutputs, 4)) {}
+
+  void add(const AnalogDevice& device) {
+    for (int i = 0; i < device.getNumChannels(); ++i) {
+      const Controller& channel = *device.getChannel(i);
+      if (!m_sampler.belongsToClip(channel)) continue;
+      if (channel.getPropertyType() == DataSource::Vec3Property)
+        addOutput(channel);
+      else if (channel.getPropertyType() == DataSource::FloatProperty)
+        addAnalog(channel);
+      else
+        m_out.warn("takes hold vector and float channels of devices only; \"" +
+                   channel.getName().GetString() + "\" of " + device.getName().GetString() + " was left out");
+    }
+  }
+
+  void finish() {
+    if (m_out.take.analog.empty()) return;
+    m_out.take.analogRate =
+        m_sampler.clip() ? remembered::number(*m_sampler.clip(), remembered::kAnalogRate, m_out.take.rate)
+                         : m_out.take.rate;
+  }
+
+ private:
+  void addOutput(const Controller& channel) {
+    TakeOutput output;
+    output.name = channel.getName().GetString();
+    output.kind = "SCALARS";
+    if (const auto known = m_outputs.find(output.name); known != m_outputs.end()) {
+      output.unit = known->second[2];
+      output.kind = known->second[3];
+      output.name = known->second[1];
+    }
+    m_out.keysLeftOut += m_sampler.keysOffGrid(channel);
+    const KeyTrack* track = m_sampler.asItIs(channel);
+    output.values =
+        track ? *track : m_sampler.sampleWhere(m_sampler.framesWithData(channel, nullptr), channel);
+    m_out.take.outputs.push_back(std::move(output));
+  }
+
+  void addAnalog(const Controller& channel) {
+    TakeAnalogChannel analog;
+    analog.name = channel.getName().GetString();
+    if (const auto known = m_analog.find(analog.name); known != m_analog.end()) {
+      const remembered::Record& record = known->second;
+      analog.unit = record[2];
+      analog.description = record[3];
+      analog.scale = remembered::textNumber(record[4]);
+      analog.offset = remembered::textNumber(record[5]);
+      analog.name = record[1];
+    }
+    analog.samples = samples(channel);
+    m_out.take.analog.push_back(std::move(analog));
+  }
+
+  // The keys inside the range, wherever they lie: devices sample faster than cameras.
+  KeyTrack samples(const Controller& channel) {
+    const KeyTrack* lowest = m_sampler.lowestKeys(channel);
+    if (!lowest) return m_sampler.clip() ? KeyTrack(KeyTrack::Shape::Scalar) : m_sampler.everyFrame(channel);
+    KeyTrack track = *lowest;
+    const FrameGrid& grid = m_sampler.grid();
+    m_out.keysLeftOut += track.eraseRange(-kForever, grid.start() - 1);
+    m_out.keysLeftOut += track.eraseRange(grid.end() + grid.period, kForever);
+    if (isLayered(channel)) addLayers(track, channel);
+    track.deselect(-kForever, kForever);
+    return track;
+  }
+
+  bool isLayered(const Controller& channel) const {
+    const NLEClip* clip = m_sampler.clip();
+    int layers = 0;
+    for (int layer = 0; layer < clip->getNumLayers(); ++layer) {
+      const KeyTrack* track = channel.findTrack(clip, layer);
+      layers += track && !track->empty() ? 1 : 0;
+    }
+    return layers > 1 || !channel.findTrack(clip, 0) || channel.findTrack(clip, 0)->empty();
+  }
+
+  void addLayers(KeyTrack& track, const Controller& channel) const {
+    Controller::Values values{};
+    for (int64 i = 0; i < track.count(); ++i) {
+      const int64 time = track.timeAt(i);
+      channel.evaluate(time, values);
+      track.set(time, values);
+    }
+  }
+
+  TakeExport& m_out;
+  const FrameSampler& m_sampler;
+  Remembered m_analog, m_outputs;
+};
+
+}  // namespace
+
+void exportDevices(TakeExport& out) {
+  DeviceExport devices(out);
+  for (int i = 0; i < out.scene.getNumModules(); ++i)
+    if (const auto* device = objectAs<AnalogDevice>(out.scene.getModule(i))) devices.add(*device);
+  devices.finish();
+}
+
+}  // namespace talix

@@ -1,0 +1,130 @@
+#include <cctype>
+#include <string_view>
+
+#include "host/scene/Character.h"
+#include "host/scene/Marker.h"
+#include "io/scene/AxisTurn.h"
+#include "io/scene/TakeAttributes.h"
+#include "io/scene/TakeExportParts.h"
+
+namespace talix {
+
+namespace {
+
+bool isStill(const FrameSampler& sampler, const Node& node) {
+  return !sampler.mayChange(*node.getTranslationChannel()) &&
+         !sampler.mayChange(*node.getRotationChannel()) && !sampler.mayChange(*node.getScaleChannel());
+}
+
+bool hasPreTransform(const Node& node) {
+  return !(node.getPreTranslation() == Vec3()) || !isNoRotation(node.getPreRotation());
+}
+
+// The name that a marker without a label gets when it is imported: "unlabeled", "unlabeled_1" ...
+bool standsForNoName(std::string_view name) {
+  constexpr std::string_view kUnlabeled = "unlabeled";
+  if (!name.starts_with(kUnlabeled)) return false;
+  name.remove_prefix(kUnlabeled.size());
+  if (name.empty()) return true;
+  if (name.size() < 2 || name[0] != '_') return false;
+  for (const char c : name.substr(1))
+    if (!std::isdigit(static_cast<unsigned char>(c))) return false;
+  return true;
+}
+
+std::string subjectOf(const Marker& marker) {
+  const Character* character = marker.getCharacterParent();
+  if (!character) return {};
+  const std::string name = character->getName().GetString();
+  return remembered::text(*character, remembered::kFileName) == name ? std::string() : name;
+}
+
+class PointExport {
+ public:
+  explicit PointExport(TakeExport& out) : m_out(out), m_sampler(out.sampler) {}
+
+  void add(const Marker& marker) {
+    const Controller& translation = *marker.getTranslationChannel();
+    if (!m_sampler.belongsToClip(translation)) return;
+    TakePoint point;
+    point.label = marker.getName().GetString();
+    if (marker.isUnlabeled() && standsForNoName(point.label)) point.label.clear();
+    point.subject = subjectOf(marker);
+    point.description = remembered::text(marker, remembered::kDescription);
+    m_out.keysLeftOut += m_sampler.keysOffGrid(translation);
+
+    const std::vector<bool> frames = m_sampler.framesWithData(translation, &marker);
+    point.positions = positions(marker, frames);
+    if (m_sampler.hasKeys(*marker.getResidualChannel())) point.residuals = residuals(marker, frames);
+    point.cameras = cameras(marker);
+    m_out.take.points.push_back(std::move(point));
+  }
+
+ private:
+  KeyTrack positions(const Marker& marker, const std::vector<bool>& frames) const {
+    const Controller& translation = *marker.getTranslationChannel();
+    if (!hasPreTransform(marker) && isWorldSpace(m_sampler, marker.getNodeParent())) {
+      const KeyTrack* track = m_sampler.asItIs(translation);
+      const auto seen = std::count(frames.begin(), frames.end(), true);
+      return track && track->count() == seen ? *track : m_sampler.sampleWhere(frames, translation);
+    }
+    const FrameGrid& grid = m_sampler.grid();
+    FrameRun run(KeyTrack::Shape::Vector, grid);
+    for (int64 i = 0; i < grid.count; ++i) {
+      if (!frames[static_cast<size_t>(i)]) continue;
+      const Vec3 position = marker.getWSPos(grid.start() + i * grid.period);
+      run.add(i, &position.x);
+    }
+    return run.take();
+  }
+
+  // Where there is a position, and a residual was recorded.
+  KeyTrack residuals(const Marker& marker, const std::vector<bool>& positioned) const {
+    const Controller& residual = *marker.getResidualChannel();
+    std::vector<bool> frames = m_sampler.framesWithData(residual, nullptr);
+    bool allPositioned = true;
+    for (size_t i = 0; i < frames.size(); ++i) {
+      allPositioned = allPositioned && (positioned[i] || !frames[i]);
+      frames[i] = frames[i] && positioned[i];
+    }
+    const KeyTrack* track = allPositioned ? m_sampler.asItIs(residual) : nullptr;
+    return track ? *track : m_sampler.sampleWhere(frames, residual);
+  }
+
+  std::vector<unsigned char> cameras(const Marker& marker) const {
+    const Controller* channel = marker.getChannel("Cameras");
+    const KeyTrack* track = channel ? m_sampler.lowestKeys(*channel) : nullptr;
+    if (!track || channel->getPropertyType() != DataSource::IntProperty) return {};
+    const FrameGrid& grid = m_sampler.grid();
+    std::vector<unsigned char> masks(static_cast<size_t>(grid.count));
+    track->forEach(0, track->count(), [&](const KeyTrack::Key& key) {
+      if (grid.contains(key.time))
+        masks[static_cast<size_t>((key.time - grid.start()) / grid.period)] =
+            static_cast<unsigned char>(key.values[0]);
+    });
+    return masks;
+  }
+
+  TakeExport& m_out;
+  const FrameSampler& m_sampler;
+};
+
+}  // namespace
+
+bool isWorldSpace(const FrameSampler& sampler, const Node* node) {
+  for (; node; node = node->getNodeParent()) {
+    const bool still = isStill(sampler, *node) && !hasPreTransform(*node) &&
+                       node->getConstLocalPos() == Vec3() && isNoRotation(node->getConstLocalRot(true)) &&
+                       node->getConstLocalScale() == Vec3(1, 1, 1);
+    if (!still) return false;
+  }
+  return true;
+}
+
+void exportPoints(TakeExport& out) {
+  PointExport points(out);
+  for (int i = 0; i < out.scene.getNumNodes(); ++i)
+    if (const auto* marker = objectAs<Marker>(out.scene.getNode(i))) points.add(*marker);
+}
+
+}  // namespace talix

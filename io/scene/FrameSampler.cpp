@@ -1,0 +1,109 @@
+#include "io/scene/FrameSampler.h"
+
+namespace talix {
+
+void FrameRun::add(int64 frame, const double* values) {
+  if (m_count > 0 && frame != m_first + m_count) flush();
+  if (m_count == 0) m_first = frame;
+  m_values.insert(m_values.end(), values, values + m_track.width());
+  ++m_count;
+}
+
+KeyTrack FrameRun::take() {
+  flush();
+  return std::move(m_track);
+}
+
+void FrameRun::flush() {
+  if (m_count > 0)
+    m_track.append(m_grid.start() + m_first * m_grid.period, m_grid.period, m_values.data(), m_count);
+  m_values.clear();
+  m_count = 0;
+}
+
+FrameSampler::FrameSampler(const Database& scene, const FrameGrid& grid) : m_scene(scene), m_grid(grid) {
+  const NLEClip* active = scene.getActiveClip();
+  m_blends = active && !active->holdsKeys();
+  if (!m_blends) m_clip = active;
+}
+
+bool FrameSampler::belongsToClip(const Controller& channel) const {
+  if (!m_clip) return true;
+  for (int layer = 0; layer < m_clip->getNumLayers(); ++layer)
+    if (channel.findTrack(m_clip, layer)) return true;
+  for (const NLEClip* clip = m_scene.getHeadClip(); clip; clip = clip->getNext())
+    if (channel.hasKeysInClip(clip)) return false;
+  return true;
+}
+
+bool FrameSampler::mayChange(const Controller& channel) const {
+  if (!m_blends) return hasKeys(channel);
+  for (const NLEClip* clip = m_scene.getHeadClip(); clip; clip = clip->getNext())
+    if (channel.hasKeysInClip(clip)) return true;
+  return false;
+}
+
+const KeyTrack* FrameSampler::lowestKeys(const Controller& channel) const {
+  if (!m_clip) return nullptr;
+  for (int layer = 0; layer < m_clip->getNumLayers(); ++layer)
+    if (const KeyTrack* track = channel.findTrack(m_clip, layer); track && !track->empty()) return track;
+  return nullptr;
+}
+
+const KeyTrack* FrameSampler::asItIs(const Controller& channel) const {
+  const KeyTrack* lowest = lowestKeys(channel);
+  if (!lowest || lowest != channel.findTrack(m_clip, 0)) return nullptr;
+  for (int layer = 1; layer < m_clip->getNumLayers(); ++layer)
+    if (const KeyTrack* track = channel.findTrack(m_clip, layer); track && !track->empty()) return nullptr;
+  if (lowest->countHolding(1) != lowest->count() || lowest->countHolding(2) != lowest->count() ||
+      lowest->countHolding(4) != lowest->count() || lowest->countSelected() > 0)
+    return nullptr;
+  return keysOffGrid(channel) == 0 ? lowest : nullptr;
+}
+
+KeyTrack FrameSampler::sampleWhere(const std::vector<bool>& frames, const Controller& channel) const {
+  FrameRun run(Controller::shapeOf(channel.getPropertyType()), m_grid);
+  Controller::Values values{};
+  for (int64 i = 0; i < m_grid.count; ++i) {
+    if (!frames[static_cast<size_t>(i)]) continue;
+    channel.evaluate(m_grid.start() + i * m_grid.period, values);
+    run.add(i, values.data());
+  }
+  return run.take();
+}
+
+KeyTrack FrameSampler::everyFrame(const Controller& channel) const {
+  if (const KeyTrack* track = asItIs(channel); track && track->count() == m_grid.count) return *track;
+  return sampleWhere(std::vector<bool>(static_cast<size_t>(m_grid.count), true), channel);
+}
+
+std::vector<bool> FrameSampler::framesWithData(const Controller& channel, const Marker* reduced) const {
+  std::vector<bool> frames(static_cast<size_t>(m_grid.count), m_clip == nullptr);
+  const KeyTrack* track = lowestKeys(channel);
+  if (!track) return frames;
+  if (reduced && !reduced->getChannel("FillType")) reduced = nullptr;
+  const auto firstAtOrAfter = [&](int64 time) {
+    return time <= m_grid.start() ? 0 : (time - m_grid.start() + m_grid.period - 1) / m_grid.period;
+  };
+  bool bridged = false;
+  int64 next = 0;  // the first frame after the last key
+  track->forEach(0, track->count(), [&](const KeyTrack::Key& key) {
+    const int64 frame = firstAtOrAfter(key.time);
+    if (bridged)
+      for (int64 i = next; i < std::min(frame, m_grid.count); ++i) frames[static_cast<size_t>(i)] = true;
+    if (m_grid.contains(key.time)) frames[static_cast<size_t>(frame)] = true;
+    next = firstAtOrAfter(key.time + 1);
+    bridged = reduced && reduced->getFillType(key.time) == Marker::Reduced;
+  });
+  return frames;
+}
+
+int64 FrameSampler::keysOffGrid(const Controller& channel) const {
+  const KeyTrack* track = lowestKeys(channel);
+  if (!track) return 0;
+  int64 off = 0;
+  track->forEach(0, track->count(), [&](const KeyTrack::Key& key) { off += !m_grid.contains(key.time); });
+  return off;
+}
+
+}  // namespace talix

@@ -1,0 +1,80 @@
+// Channels of the scene as tracks with one key at each frame of a range: what take formats hold.
+#pragma once
+
+#include <functional>
+#include <string>
+
+#include "host/scene/Database.h"
+#include "io/Take.h"
+
+namespace talix {
+
+// Whole frames: frame i lies at start() + i * period.
+struct FrameGrid {
+  int64 firstFrame = 0;
+  int64 count = 0;
+  int64 period = 1;  // ticks
+
+  int64 start() const { return firstFrame * period; }
+  int64 end() const { return start() + (count - 1) * period; }
+  bool contains(int64 time) const { return time >= start() && time <= end() && time % period == 0; }
+};
+
+// Appends values frame by frame; runs go to the track whole.
+class FrameRun {
+ public:
+  FrameRun(KeyTrack::Shape shape, const FrameGrid& grid) : m_track(shape), m_grid(grid) {}
+
+  void add(int64 frame, const double* values);
+  KeyTrack take();
+
+ private:
+  void flush();
+
+  KeyTrack m_track;
+  const FrameGrid& m_grid;
+  int64 m_first = 0, m_count = 0;
+  std::vector<double> m_values;
+};
+
+class FrameSampler {
+ public:
+  // The scene's active clip; without one (or with a blend, which holds no keys) every frame has a value.
+  FrameSampler(const Database& scene, const FrameGrid& grid);
+
+  const FrameGrid& grid() const { return m_grid; }
+  const NLEClip* clip() const { return m_clip; }
+
+  // Whether a channel has to do with the clip: it has a track there, or in no clip at all.
+  bool belongsToClip(const Controller&) const;
+  // In any layer of the clip.
+  bool hasKeys(const Controller& channel) const { return m_clip ? channel.hasKeysInClip(m_clip) : false; }
+  // Whether the channel may change over time: keys in the clip, or an active blend.
+  bool mayChange(const Controller&) const;
+
+  // The keys of the lowest layer of the clip that has any; null: none.
+  const KeyTrack* lowestKeys(const Controller&) const;
+  // That track, when it alone makes the channel's values and all its keys are whole ones at frames; else
+  // null.
+  const KeyTrack* asItIs(const Controller&) const;
+
+  // A value at the frames that have data.
+  KeyTrack sampleWhere(const std::vector<bool>& frames, const Controller&) const;
+  // A value at every frame: the channel's own track where that is what it holds.
+  KeyTrack everyFrame(const Controller&) const;
+
+  // The frames at which a channel has a key. A marker's frames between two keys have data as well when the
+  // keys between them were taken out by reduction, which the marker's fill type says at the key before.
+  std::vector<bool> framesWithData(const Controller&, const Marker* reduced) const;
+
+  // How many keys lie at no frame of the grid; sampled channels lose them.
+  int64 keysOffGrid(const Controller&) const;
+
+ private:
+  const Database& m_scene;
+  FrameGrid m_grid;
+  const NLEClip* m_clip = nullptr;  // null: every frame counts
+  bool m_blends = false;
+};
+
+}  // namespace talix

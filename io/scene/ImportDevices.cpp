@@ -1,0 +1,91 @@
+#include <algorithm>
+#include <unordered_set>
+
+#include "host/animation/PropertyTable.h"
+#include "host/scene/Devices.h"
+#include "io/FileError.h"
+#include "io/scene/TakeAttributes.h"
+#include "io/scene/TakeImportParts.h"
+
+namespace talix {
+
+namespace {
+
+bool isDevice(const Module& module) { return module.isKindOf(&AnalogDevice::staticClass()); }
+
+std::string channelName(const std::string& name, const char* byDefault) {
+  std::string mended = name.empty() ? byDefault : name;
+  for (char& c : mended)
+    if (c == '.' || c == '\\') c = '_';
+  return mended;
+}
+
+// The channels of one device: each name of the take gets one, under that name or, where it cannot have it,
+// under a mended one.
+class DeviceImport {
+ public:
+  DeviceImport(TakeImport& import, AnalogDevice& device, DataSource::PropertyType type,
+               const std::string& path)
+      : m_import(import), m_device(device), m_type(type), m_path(path) {}
+
+  // Answers the channel's name.
+  std::string add(const std::string& name, const char* byDefault, KeyTrack track) {
+    const std::string mended = channelName(name, byDefault);
+    std::string free = mended;
+    for (int& number = m_lastNumber[mended]; !isFree(free);) free = mended + "_" + std::to_string(++number);
+    Controller* channel = m_device.addChannel(free, m_type);
+    if (!channel) throw FileError(m_path, "the scene has no channel name left for \"" + name + "\"");
+    m_used.insert(free);
+    channel->setTrack(&m_import.clip(), 0, std::move(track));
+    if (free != name)
+      m_import.info("the channel " + (name.empty() ? std::string("without a name") : "\"" + name + "\"") +
+                    " of " + m_device.getName().GetString() + " became \"" + free + "\"");
+    return free;
+  }
+
+ private:
+  bool isFree(const std::string& name) const {
+    const PropertyTable& table = PropertyTable::getInstance();
+    const unsigned known = table.findId(name);
+    return !m_used.contains(name) && !m_device.getAttribute(name.c_str()) &&
+           (!known || table.getType(known) == m_type);
+  }
+
+  TakeImport& m_import;
+  AnalogDevice& m_device;
+  DataSource::PropertyType m_type;
+  const std::string& m_path;
+  std::unordered_set<std::string> m_used;
+  std::unordered_map<std::string, int> m_lastNumber;  // that a name was given
+};
+
+void importOutputs(TakeImport& import, Take& take, const std::string& path) {
+  auto* device = import.place<AnalogDevice>(isDevice, "Outputs", nullptr);
+  DeviceImport channels(import, *device, DataSource::Vec3Property, path);
+  std::vector<remembered::Record> records;
+  for (TakeOutput& output : take.outputs)
+    records.push_back({channels.add(output.name, "output", std::move(output.values)), output.name,
+                       output.unit, output.kind});
+  remembered::setRecords(import.clip(), remembered::kOutputs, records);
+}
+
+void importAnalog(TakeImport& import, Take& take, const std::string& path) {
+  auto* device = import.place<AnalogDevice>(isDevice, "Analog", nullptr);
+  DeviceImport channels(import, *device, DataSource::FloatProperty, path);
+  std::vector<remembered::Record> records;
+  for (TakeAnalogChannel& analog : take.analog)
+    records.push_back({channels.add(analog.name, "channel", std::move(analog.samples)), analog.name,
+                       analog.unit, analog.description, remembered::numberText(analog.scale),
+                       remembered::numberText(analog.offset)});
+  remembered::setRecords(import.clip(), remembered::kAnalogChannels, records);
+  remembered::setNumber(import.clip(), remembered::kAnalogRate, take.analogRate);
+}
+
+}  // namespace
+
+void importDevices(TakeImport& import, Take& take, const std::string& path) {
+  if (!take.outputs.empty()) importOutputs(import, take, path);
+  if (!take.analog.empty()) importAnalog(import, take, path);
+}
+
+}  // namespace talix

@@ -1,0 +1,78 @@
+// The parts of taking a take into the scene. They run after all checks: none of them fails half way, except
+// that importDevices may run out of channel names; it comes first, and the clip and its devices are then
+// taken back.
+#pragma once
+
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "host/scene/Database.h"
+#include "io/Take.h"
+#include "io/scene/AxisTurn.h"
+
+namespace talix {
+
+// What the parts share: the clip that the motion goes to, and the modules that stand where the take wants
+// some.
+class TakeImport {
+ public:
+  TakeImport(Database& scene, Clip& clip, const AxisTurn& turn, std::string fileName,
+             std::vector<TakeNote>& notes);
+
+  Clip& clip() const { return m_clip; }
+  const AxisTurn& turn() const { return m_turn; }
+  void info(const std::string& text) { note(TakeNote::Level::Info, text); }
+  void warn(const std::string& text) { note(TakeNote::Level::Warning, text); }
+
+  // The module of that name below `parent` (null: root) that was there before the import and that `fits`,
+  // each handed out once; else a new one of `type`, of exactly that name. isNew (may be null): whether it was
+  // made.
+  template <class T>
+  T* place(bool (*fits)(const Module&), const std::string& name, Module* parent, bool* isNew = nullptr) {
+    return static_cast<T*>(placeModule(&T::staticClass(), fits, name, parent, isNew));
+  }
+  // A new marker at the root under a free name.
+  Marker* placeUnlabeled();
+  // The character at the root with that name; each name stands for one.
+  Character* character(const std::string& name, bool* isNew = nullptr);
+  // The character for what the file names no subject of.
+  Character* fileCharacter(const std::string& takeName);
+
+  const std::vector<Module*>& created() const { return m_created; }
+  // Says which names clash now.
+  void noteRepeatedNames();
+
+ private:
+  using Waiting = std::unordered_map<std::string, std::vector<Module*>>;  // in order, null once handed out
+
+  Module* placeModule(HRuntimeClass* type, bool (*fits)(const Module&), const std::string& name,
+                      Module* parent, bool* isNew);
+  Waiting& waitingBelow(Module* parent);
+  void note(TakeNote::Level level, const std::string& text) {
+    m_notes.push_back({level, m_fileName + ": " + text});
+  }
+
+  Database& m_scene;
+  Clip& m_clip;
+  AxisTurn m_turn;
+  std::string m_fileName;
+  std::vector<TakeNote>& m_notes;
+  std::unordered_map<Module*, Waiting> m_waiting;
+  std::unordered_map<std::string, Character*> m_characters;
+  std::vector<Module*> m_created;
+  std::vector<std::string> m_repeated;  // paths
+};
+
+// A name as modules can have it: "\" becomes "_".
+std::string moduleName(const std::string& name);
+
+// "1 point", "3 points"
+std::string counted(int64 count, const std::string& noun);
+
+// Throws FileError when there is no channel name left.
+void importDevices(TakeImport&, Take&, const std::string& path);
+void importPoints(TakeImport&, Take&);
+void importJoints(TakeImport&, Take&);
+
+}  // namespace talix

@@ -1,0 +1,101 @@
+#include "session/CommandHelp.h"
+
+#include <algorithm>
+
+#include "session/ScriptText.h"
+
+namespace talix {
+
+namespace {
+
+std::string categoryOf(Command const& command) {
+  std::string category = command.getCategory().GetString();
+  if (!command.getSubCategory().IsEmpty()) category += " / " + command.getSubCategory().GetString();
+  return category;
+}
+
+std::string const& purposeOf(Command const& command) {
+  return (command.getPurpose().IsEmpty() ? command.getDisplayName() : command.getPurpose()).GetString();
+}
+
+std::string padded(std::string text, size_t width) {
+  if (text.size() < width) text.resize(width, ' ');
+  return text;
+}
+
+// "-color integer integer integer"
+std::string optionSyntax(CommandOption const& option) {
+  std::string text = "-" + option.getName().GetString();
+  for (int i = 0; i < option.getArgCount(); ++i) text += " " + typeName(option.getType());
+  return text;
+}
+
+std::vector<CommandOption const*> shownOptions(Command const& command) {
+  std::vector<CommandOption const*> shown;
+  for (int i = 0; i < command.getNumOptions(); ++i)
+    if (!command.getOption(i).isHidden()) shown.push_back(&command.getOption(i));
+  return shown;
+}
+
+std::string optionLines(std::vector<CommandOption const*> const& options) {
+  size_t width = 0;
+  for (auto const* option : options) width = std::max(width, optionSyntax(*option).size());
+  std::string lines;
+  for (auto const* option : options) {
+    std::string excluded;
+    for (auto const* other : options)
+      if (excludeEachOther(*option, *other))
+        excluded += (excluded.empty() ? "-" : ", -") + other->getName().GetString();
+    lines += "\n  ";
+    lines += excluded.empty() ? optionSyntax(*option)
+                              : padded(optionSyntax(*option), width + 2) + "excludes " + excluded;
+  }
+  return lines;
+}
+
+}  // namespace
+
+bool excludeEachOther(CommandOption const& a, CommandOption const& b) {
+  const auto excludes = [](CommandOption const& option, CommandOption const& other) {
+    return (option.getMask() >> other.getIndex() & 1) != 0;
+  };
+  return a.getIndex() != b.getIndex() && excludes(a, b) && excludes(b, a);
+}
+
+std::string commandList(CommandRegistry const& commands) {
+  std::vector<std::string> categories;  // in the order of their first commands
+  size_t width = 0;
+  for (auto const& entry : commands.entries()) {
+    const std::string category = categoryOf(*entry.command);
+    if (std::find(categories.begin(), categories.end(), category) == categories.end())
+      categories.push_back(category);
+    width = std::max(width, entry.command->getName().GetString().size());
+  }
+  std::string text;
+  for (std::string const& category : categories) {
+    text += (text.empty() ? "" : "\n\n") + category;
+    for (auto const& entry : commands.entries()) {
+      if (categoryOf(*entry.command) != category) continue;
+      text += "\n  " + padded(entry.command->getName().GetString(), width + 2) + purposeOf(*entry.command);
+    }
+  }
+  return text;
+}
+
+std::string commandPage(CommandRegistry::Entry const& entry) {
+  Command& command = *entry.command;
+  const auto options = shownOptions(command);
+  std::string usage = command.getName().GetString();
+  if (const std::string syntax = argSyntax(command); !syntax.empty()) usage += " " + syntax;
+  for (auto const* option : options) usage += " [" + optionSyntax(*option) + "]";
+
+  std::string text = command.getName().GetString() + ": " + command.getDisplayName().GetString();
+  if (!command.getPurpose().IsEmpty()) text += "\n" + command.getPurpose().GetString();
+  text += "\n\nUsage: " + usage;
+  if (!options.empty()) text += "\n\nOptions:" + optionLines(options);
+  text += "\n\nReturns: " + typeName(command.getReturnType());
+  text += "\nCategory: " + categoryOf(command);
+  return text += "\nSource: " + entry.source;
+}
+
+}  // namespace talix

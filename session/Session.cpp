@@ -1,0 +1,119 @@
+#include "session/Session.h"
+
+#include <new>
+
+#include "host/scene/Database.h"
+#include "host/services/HEvent.h"
+#include "host/services/HInterface.h"
+#include "host/services/OperationStack.h"
+#include "io/FileError.h"
+#include "session/CommandHelp.h"
+#include "session/hostcommands/HostCommands.h"
+
+namespace talix {
+
+namespace {
+
+// Collects what is logged while it lives.
+class LogCollector : public LogSink {
+ public:
+  explicit LogCollector(std::vector<LogLine>& lines) : m_lines(lines), m_former(setLogSink(this)) {}
+  ~LogCollector() override { setLogSink(m_former); }
+  LogCollector(LogCollector const&) = delete;
+  LogCollector& operator=(LogCollector const&) = delete;
+  void write(LogLevel level, std::string_view text) override {
+    m_lines.push_back({level, std::string(text)});
+  }
+
+ private:
+  std::vector<LogLine>& m_lines;
+  LogSink* m_former;
+};
+
+}  // namespace
+
+Session::Session(std::string const& plugin) {
+  if (!plugin.empty()) {
+    m_plugin = std::make_unique<PluginLibrary>(plugin);
+    for (PluginLibrary::Item const& item : m_plugin->commands()) m_registry.add(item.command, item.source);
+  }
+  for (Command* command : makeHostCommands(m_registry)) m_hostCommands.emplace_back(command);
+  for (auto const& command : m_hostCommands) m_registry.add(command.get(), "host");
+}
+
+Session::~Session() { setAssumeYes(false); }
+
+void Session::setAssumeYes(bool yes) {
+  g_interface->setAsker([yes](HString const&) { return yes; });
+}
+
+LineResult const& Session::run(std::string_view line) {
+  m_result.log.clear();
+  m_result.value = Variable();
+  const LogCollector collector(m_result.log);
+  m_result.outcome = guarded(line);
+  m_result.command = m_line.name();
+  if (m_result.failed()) m_result.value = Variable();
+  g_db->releaseRemoved();
+  g_theOperationStack.reset();
+  g_eventManager->deliverQueued();
+  return m_result;
+}
+
+LineResult::Outcome Session::guarded(std::string_view line) {
+  using Outcome = LineResult::Outcome;
+  try {
+    switch (m_line.read(line, m_registry)) {
+      case ScriptLine::Outcome::Blank:
+        return Outcome::Blank;
+      case ScriptLine::Outcome::Refused:
+        writeLog(LogLevel::Error, m_line.problem());
+        return Outcome::Failed;
+      case ScriptLine::Outcome::Command:
+        return execute();
+    }
+  } catch (FileError const& error) {
+    writeLog(LogLevel::Error, error.what());
+    return Outcome::FileFailed;
+  } catch (char const* text) {
+    // How the host's own arrays report that memory ran out.
+    writeLog(LogLevel::Error, text);
+  } catch (std::bad_alloc const&) {
+    writeLog(LogLevel::Error, "Out of memory");
+  } catch (std::exception const& error) {
+    writeLog(LogLevel::Error, error.what());
+  }
+  return Outcome::Failed;
+}
+
+LineResult::Outcome Session::execute() {
+  Command& command = *m_line.command();
+  if (!command.checkArgSyntax(m_line.args(), m_line.options())) {
+    const std::string syntax = argSyntax(command);
+    writeLog(LogLevel::Error, "Usage: " + m_line.name() + (syntax.empty() ? "" : " " + syntax));
+    return LineResult::Outcome::Failed;
+  }
+  warnOfExclusions();
+  const bool done = command.execute(m_line.options(), m_line.args(), m_result.value);
+  return done ? LineResult::Outcome::Done : LineResult::Outcome::Failed;
+}
+
+// Two options exclude each other only when both say so.
+void Session::warnOfExclusions() const {
+  std::vector<CommandOption const*> given;  // each once, in the order given
+  uint64 seen = 0;
+  for (CommandOption const& option : m_line.options()) {
+    const uint64 bit = uint64{1} << option.getIndex();
+    if (option.getMask() != 0 && (seen & bit) == 0) given.push_back(&option);
+    seen |= bit;
+  }
+  for (auto first = given.begin(); first != given.end(); ++first) {
+    for (auto second = first + 1; second != given.end(); ++second) {
+      if (!excludeEachOther(**first, **second)) continue;
+      writeLog(LogLevel::Warning, "Options -" + (*first)->getName().GetString() + " and -" +
+                                      (*second)->getName().GetString() + " exclude each other");
+    }
+  }
+}
+
+}  // namespace talix

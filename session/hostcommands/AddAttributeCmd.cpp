@@ -1,0 +1,50 @@
+#include "session/hostcommands/Arguments.h"
+#include "session/hostcommands/AttributeValues.h"
+
+namespace talix {
+
+namespace {
+
+class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
+ public:
+  static constexpr CommandInfo info = {.name = "addAttribute",
+                                       .displayName = "Add Attribute",
+                                       .category = "Data Editing",
+                                       .subCategory = "Data Manipulators",
+                                       .purpose =
+                                           "Adds an attribute of any kind to a module. The values are its "
+                                           "first and default ones; those of enum "
+                                           "and bitField are the labels.",
+                                       .args = {"PATH NAME KIND [VALUE...]",
+                                                3,
+                                                ArgsInfo::kAny,
+                                                {Variable::String, Variable::String, Variable::String}}};
+
+  bool execute(Given const&, Args const& args, Variable&) override {
+    Module* module = moduleAt(args[0].getStringValue(-1));
+    if (!module) return false;
+    const HString name = args[1].getStringValue(-1), kindText = args[2].getStringValue(-1);
+    AttributeKind const* kind = findAttributeKind(kindText);
+    if (!kind) {
+      logError("%s is not a kind of attribute: %s.", kindText.GetStr(), attributeKindNames().c_str());
+      return false;
+    }
+    if (!Module::isValidPropertyName(name)) {
+      logError("%s cannot be the name of an attribute: it must not be empty nor hold a dot or a backslash.",
+               name.GetStr());
+      return false;
+    }
+    if (module->getProperty(name) || module->getAttribute(name.GetStr())) {
+      logError("Module %s already has a property named %s.", module->getName().GetStr(), name.GetStr());
+      return false;
+    }
+    std::unique_ptr<Attribute> attribute = makeAttribute(*kind, name, args, 3, *module);
+    return attribute && module->addCustomAttribute(std::move(attribute));
+  }
+};
+
+}  // namespace
+
+Command* newAddAttributeCmd() { return new AddAttributeCmd; }
+
+}  // namespace talix

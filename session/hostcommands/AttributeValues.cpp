@@ -1,0 +1,233 @@
+#include "session/hostcommands/AttributeValues.h"
+
+#include <algorithm>
+#include <cmath>
+#include <iterator>
+
+#include "host/scene/Node.h"
+#include "host/time/HTimeManager.h"
+#include "session/hostcommands/Arguments.h"
+
+namespace talix {
+
+namespace {
+
+// Single values: arrays are taken apart.
+using Values = std::vector<Variable>;
+
+constexpr AttributeKind kKinds[] = {
+    {"int", Attribute::Integer, "an integer"},
+    {"enum", Attribute::Enumeration, "strings, its labels"},
+    {"float", Attribute::Float, "a number"},
+    {"string", Attribute::String, "a string"},
+    {"multiString", Attribute::MultiString, "strings, one for each line"},
+    {"bool", Attribute::Boolean, "true or false"},
+    {"vector", Attribute::Vector, "a vector or three numbers"},
+    {"bitField", Attribute::BitField, "strings, its labels"},
+    {"rotation", Attribute::Rotation, "a vector or three numbers, angles in degrees"},
+    {"time", Attribute::Time, "a number of frames or a timecode"},
+    {"color", Attribute::Color, "a vector or three numbers, from 0 to 255"},
+    {"event", Attribute::Event, "no values"},
+    {"module", Attribute::ModuleReference, "the path of a module"},
+    {"none", Attribute::NoKind, "no values"},
+    {"matrix", Attribute::MatrixKind, "the numbers of a square matrix, row by row"},
+    {"multiModule", Attribute::MultiModule, "paths of modules"},
+    {"temperature", Attribute::Temperature, "an integer"},
+};
+
+enum class Reading { Taken, Misfit, Logged };
+
+bool isNumber(Variable const& value) { return isFrameNumber(value); }
+bool isString(Variable const& value) { return value.getType() == Variable::String; }
+
+Values flattened(Args const& args, int first) {
+  Values values;
+  for (int i = first; i < args.getCount(); ++i)
+    for (int k = 0; k < args[i].getNumItems(); ++k) values.push_back(args[i].getArrayValue(k));
+  return values;
+}
+
+Attribute::Labels labelsFrom(Values const& values) {
+  std::vector<HString> labels;
+  for (Variable const& value : values) labels.emplace_back(value.getStringValue(-1));
+  return std::make_shared<std::vector<HString> const>(std::move(labels));
+}
+
+std::optional<Vec3> vectorFrom(Values const& values) {
+  if (values.size() == 1 && values[0].getType() == Variable::Vector) return values[0].getVecValue(-1);
+  if (values.size() != 3 || !std::all_of(values.begin(), values.end(), isNumber)) return {};
+  return Vec3(values[0].getFloatValue(-1), values[1].getFloatValue(-1), values[2].getFloatValue(-1));
+}
+
+TalixRotation rotationFrom(Vec3 const& degrees, Module const& module) {
+  constexpr double kRadians = 0.017453292519943295;
+  auto const* node = objectAs<Node>(&module);
+  TalixRotation rotation;
+  rotation.setAsEuler(node ? node->getRotationOrder() : TalixRotation::XYZ, degrees * kRadians);
+  return rotation;
+}
+
+HString linesFrom(Values const& values) {
+  std::string text;
+  for (Variable const& value : values) {
+    if (&value != &values.front()) text += '\n';
+    text += value.getStringValue(-1);
+  }
+  return HString(std::move(text));
+}
+
+Reading takeVector(Attribute& attribute, Values const& values, Module const& module) {
+  const std::optional<Vec3> vector = vectorFrom(values);
+  if (!vector) return Reading::Misfit;
+  if (attribute.getType() == Attribute::Vector) {
+    static_cast<VectorAttribute&>(attribute).setValue(*vector, true, true, true, true);
+  } else if (attribute.getType() == Attribute::Rotation) {
+    static_cast<RotationAttribute&>(attribute).setValue(rotationFrom(*vector, module), true, true, true,
+                                                        true);
+  } else {
+    for (int i = 0; i < 3; ++i)
+      if ((*vector)[i] < 0 || (*vector)[i] > 255) return Reading::Misfit;
+    static_cast<ColorAttribute&>(attribute).setValue(*vector, true, true, true, true);
+  }
+  return Reading::Taken;
+}
+
+Reading takeTime(TimeAttribute& attribute, Values const& values) {
+  if (values.size() != 1) return Reading::Misfit;
+  if (isNumber(values[0])) {
+    const std::optional<int64> time = timeOfFrame(values[0].getFloatValue(-1));
+    if (!time) return Reading::Logged;
+    attribute.setValue(*time, true, true, true, true);
+    return Reading::Taken;
+  }
+  HTimeManager const& times = *HTimeManager::getInstance();
+  int64 frame = 0;
+  if (!times.getFrameRate().frameFromTimecode(values[0].getStringValue(-1), frame)) return Reading::Misfit;
+  attribute.setValue(times.getTimeFromFrameDouble(static_cast<double>(frame)), true, true, true, true);
+  return Reading::Taken;
+}
+
+Reading takeMatrix(MatrixAttribute& attribute, Values const& values) {
+  const auto n = static_cast<uint64>(std::llround(std::sqrt(static_cast<double>(values.size()))));
+  if (n * n != values.size() || !std::all_of(values.begin(), values.end(), isNumber)) return Reading::Misfit;
+  Matrix matrix(n);
+  for (uint64 i = 0; i < values.size(); ++i) matrix[i / n][i % n] = values[i].getFloatValue(-1);
+  attribute.setValue(matrix, true, true, true, true);
+  return Reading::Taken;
+}
+
+Reading takeModules(Attribute& attribute, Values const& values) {
+  if (!std::all_of(values.begin(), values.end(), isString)) return Reading::Misfit;
+  TSimpleArray<Module*> modules;
+  for (Variable const& value : values) {
+    Module* module = moduleAt(value.getStringValue(-1));
+    if (!module) return Reading::Logged;
+    modules.add(module);
+  }
+  if (attribute.getType() == Attribute::MultiModule) {
+    static_cast<MultiModAttribute&>(attribute).setValue(modules, true, true, true, true);
+    return Reading::Taken;
+  }
+  if (modules.getCount() != 1) return Reading::Misfit;
+  static_cast<ModAttribute&>(attribute).setValue(modules[0], true, true, true, true);
+  return Reading::Taken;
+}
+
+Reading takeScalar(Attribute& attribute, Values const& values) {
+  if (values.size() != 1) return Reading::Misfit;
+  Variable const& value = values[0];
+  switch (attribute.getType()) {
+    case Attribute::Integer:
+      if (value.getType() != Variable::Int) return Reading::Misfit;
+      static_cast<IntAttribute&>(attribute).setValue(value.getIntValue(-1), true, true, true, true);
+      return Reading::Taken;
+    case Attribute::Temperature:
+      if (value.getType() != Variable::Int) return Reading::Misfit;
+      static_cast<TemperatureAttribute&>(attribute).setValue(value.getIntValue(-1), true, true, true, true);
+      return Reading::Taken;
+    case Attribute::Float:
+      if (!isNumber(value)) return Reading::Misfit;
+      static_cast<FloatAttribute&>(attribute).setValue(value.getFloatValue(-1), true, true, true, true);
+      return Reading::Taken;
+    case Attribute::String:
+      if (!isString(value)) return Reading::Misfit;
+      static_cast<StringAttribute&>(attribute).setValue(value.getStringValue(-1), true, true, 0, true, true);
+      return Reading::Taken;
+    case Attribute::Boolean: {
+      const double number = value.getFloatValue(-1);
+      if (!value.isNumber() || (number != 0 && number != 1)) return Reading::Misfit;
+      static_cast<BoolAttribute&>(attribute).setValue(number != 0, true, true, true, true);
+      return Reading::Taken;
+    }
+    default:
+      return Reading::Misfit;
+  }
+}
+
+Reading takeValues(Attribute& attribute, Values const& values, Module const& module) {
+  switch (attribute.getType()) {
+    case Attribute::Enumeration:
+    case Attribute::BitField:
+      return Reading::Taken;  // the labels are there already
+    case Attribute::MultiString:
+      if (!std::all_of(values.begin(), values.end(), isString)) return Reading::Misfit;
+      static_cast<MultiStringAttribute&>(attribute).setValue(linesFrom(values), true, true, true, true);
+      return Reading::Taken;
+    case Attribute::Vector:
+    case Attribute::Rotation:
+    case Attribute::Color:
+      return takeVector(attribute, values, module);
+    case Attribute::Time:
+      return takeTime(static_cast<TimeAttribute&>(attribute), values);
+    case Attribute::MatrixKind:
+      return takeMatrix(static_cast<MatrixAttribute&>(attribute), values);
+    case Attribute::ModuleReference:
+    case Attribute::MultiModule:
+      return takeModules(attribute, values);
+    default:
+      return takeScalar(attribute, values);
+  }
+}
+
+bool isReference(Attribute const& attribute) {
+  return attribute.getType() == Attribute::ModuleReference || attribute.getType() == Attribute::MultiModule;
+}
+
+}  // namespace
+
+AttributeKind const* findAttributeKind(HString const& name) {
+  const auto* kind = std::find_if(std::begin(kKinds), std::end(kKinds),
+                                  [&](AttributeKind const& known) { return name == known.name; });
+  return kind == std::end(kKinds) ? nullptr : kind;
+}
+
+std::string attributeKindNames() {
+  std::string names;
+  for (AttributeKind const& kind : kKinds) {
+    if (!names.empty()) names += &kind == std::end(kKinds) - 1 ? " or " : ", ";
+    names += kind.name;
+  }
+  return names;
+}
+
+std::unique_ptr<Attribute> makeAttribute(AttributeKind const& kind, HString const& name, Args const& args,
+                                         int first, Module const& module) {
+  const Values values = flattened(args, first);
+  const bool labelled = kind.type == Attribute::Enumeration || kind.type == Attribute::BitField;
+  Reading reading = Reading::Taken;
+  std::unique_ptr<Attribute> attribute;
+  if (labelled && !std::all_of(values.begin(), values.end(), isString)) {
+    reading = Reading::Misfit;
+  } else {
+    attribute = Attribute::create(kind.type, name, labelled ? labelsFrom(values) : nullptr);
+    if (!values.empty()) reading = takeValues(*attribute, values, module);
+  }
+  if (reading == Reading::Misfit)
+    Command::logError("An attribute of kind %s takes %s.", kind.name, kind.values);
+  if (reading != Reading::Taken) return nullptr;
+  // A default outlives the module that it names, so references have none.
+  if (!isReference(*attribute)) attribute->takeAsDefault();
+  return attribute;
+}
+
+}  // namespace talix

@@ -1,0 +1,27 @@
+#include "host/command/ScriptCommand.h"
+#include "host/time/HTimeManager.h"
+
+namespace talix {
+
+namespace {
+
+class GetTimeCmd final : public ScriptCommand<GetTimeCmd> {
+ public:
+  static constexpr CommandInfo info = {.name = "getTime",
+                                       .displayName = "Get Current Time",
+                                       .category = "Interface",
+                                       .purpose = "Answers the current time in frames.",
+                                       .returns = Variable::Float};
+
+  bool execute(Given const&, Args const&, Variable& result) override {
+    HTimeManager const& times = *HTimeManager::getInstance();
+    result.setValue(times.getFrameDouble(times.getTime()), -1);
+    return true;
+  }
+};
+
+}  // namespace
+
+Command* newGetTimeCmd() { return new GetTimeCmd; }
+
+}  // namespace talix

@@ -1,0 +1,42 @@
+#include "host/command/ScriptCommand.h"
+#include "session/CommandHelp.h"
+
+namespace talix {
+
+namespace {
+
+class HelpCmd final : public ScriptCommand<HelpCmd> {
+ public:
+  static constexpr CommandInfo info = {.name = "help",
+                                       .displayName = "Help",
+                                       .category = "System",
+                                       .purpose = "Lists all commands, or tells all about one.",
+                                       .args = {"[NAME]", 0, 1, {Variable::String}},
+                                       .returns = Variable::String};
+
+  explicit HelpCmd(CommandRegistry const& registry) : m_registry(registry) {}
+
+  bool execute(Given const&, Args const& args, Variable& result) override {
+    if (args.getCount() == 0) {
+      result.setValue(commandList(m_registry).c_str(), -1);
+      return true;
+    }
+    char const* name = args[0].getStringValue(-1);
+    CommandRegistry::Entry const* entry = m_registry.find(name);
+    if (!entry) {
+      logError("Unknown command: %s", name);
+      return false;
+    }
+    result.setValue(commandPage(*entry).c_str(), -1);
+    return true;
+  }
+
+ private:
+  CommandRegistry const& m_registry;
+};
+
+}  // namespace
+
+Command* newHelpCmd(CommandRegistry const& registry) { return new HelpCmd(registry); }
+
+}  // namespace talix

@@ -1,0 +1,48 @@
+#include "session/hostcommands/Arguments.h"
+
+namespace talix {
+
+namespace {
+
+class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "lockChannel",
+      .displayName = "Lock Channel",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose = "Locks a channel of a module against editing, or unlocks it.",
+      .args = {"PATH CHANNEL BOOLEAN", 3, 3, {Variable::String, Variable::String}}};
+
+  bool checkArgSyntax(Args const& args, Given const&) const override {
+    if (!fits(info.args, args) || !args[2].isNumber()) return false;
+    const double value = args[2].getFloatValue(-1);
+    return value == 0 || value == 1 || value == 2;
+  }
+
+  bool execute(Given const&, Args const& args, Variable&) override {
+    Module* module = moduleAt(args[0].getStringValue(-1));
+    if (!module) return false;
+    char const* name = args[1].getStringValue(-1);
+    const auto choice = channelNamed(name);
+    if (!choice) return false;
+    if (choice->mask != 7) {
+      logError("%s is a component; channels are locked as a whole.", name);
+      return false;
+    }
+    Controller* channel = module->getProperty(choice->id);
+    if (!channel) {
+      logError("Cannot find property named %s on module %s", name, module->getName().GetStr());
+      return false;
+    }
+    const Variable::BoolType lock = args[2].getBoolValue(-1);
+    channel->setLocked(lock == Variable::Toggle ? !channel->isLocked() : lock == Variable::True);
+    return true;
+  }
+};
+
+}  // namespace
+
+Command* newLockChannelCmd() { return new LockChannelCmd; }
+
+}  // namespace talix

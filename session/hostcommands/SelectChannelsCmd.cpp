@@ -1,0 +1,39 @@
+#include "host/scene/Database.h"
+#include "session/hostcommands/Arguments.h"
+
+namespace talix {
+
+namespace {
+
+class SelectChannelsCmd final : public ScriptCommand<SelectChannelsCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "selectChannels",
+      .displayName = "Select Channels",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose = "Sets the channels and components that key commands work on, in order.",
+      .args = {"[NAME[.x|.y|.z]...]", 0, ArgsInfo::kAny, {}, Variable::String},
+      .options = {{"none"}}};
+
+  bool checkArgSyntax(Args const& args, Given const& options) const override {
+    return (args.getCount() > 0 || options.getCount() > 0) && fits(info.args, args);
+  }
+
+  bool execute(Given const&, Args const& args, Variable&) override {
+    std::vector<unsigned> ids;
+    for (Variable const& arg : args) {
+      const auto channel = channelNamed(arg.getStringValue(-1));
+      if (!channel) return false;
+      ids.push_back(channel->id | channel->mask << 28);
+    }
+    g_db->setActiveProperties(std::move(ids));
+    return true;
+  }
+};
+
+}  // namespace
+
+Command* newSelectChannelsCmd() { return new SelectChannelsCmd; }
+
+}  // namespace talix

@@ -1,0 +1,101 @@
+#include <algorithm>
+
+#include "host/scene/Database.h"
+#include "session/hostcommands/Arguments.h"
+
+namespace talix {
+
+namespace {
+
+bool isText(Variable const& value) {
+  return value.getType() == Variable::String || value.getType() == Variable::StringArray;
+}
+
+void addAll(HRuntimeClass const* type, std::vector<Module*>& modules) {
+  for (int i = 0; i < g_db->getNumModules(); ++i)
+    if (Module* module = g_db->getModule(i); !type || module->isKindOf(type)) modules.push_back(module);
+}
+
+class SelectCmd final : public ScriptCommand<SelectCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "select",
+      .displayName = "Select Modules",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose = "Selects modules by path, by class or all; -primary names the primary one.",
+      .args = {"[PATH...]", 0, ArgsInfo::kAny},
+      .options = {{"add", 0, Variable::None, 0b110},
+                  {"remove", 0, Variable::None, 0b101},
+                  {"toggle", 0, Variable::None, 0b011},
+                  {"all", 0, Variable::None, 0b10000},
+                  {"none", 0, Variable::None, 0b01000},
+                  {"type", 1, Variable::String},
+                  {"primary", 1, Variable::String}}};
+  static constexpr int kAdd = info.option("add"), kRemove = info.option("remove"),
+                       kToggle = info.option("toggle"), kAll = info.option("all"),
+                       kNone = info.option("none"), kType = info.option("type"),
+                       kPrimary = info.option("primary");
+
+  bool checkArgSyntax(Args const& args, Given const& options) const override {
+    return (args.getCount() > 0 || options.getCount() > 0) && std::all_of(args.begin(), args.end(), isText);
+  }
+
+  // Everything is looked up before anything changes.
+  bool execute(Given const& given, Args const& args, Variable&) override {
+    const GivenOptions options(given);
+    HRuntimeClass const* type = nullptr;
+    if (options.has(kType) && !(type = typeNamed(options.textOr(kType, "")))) return false;
+    const int extent = lastOf(given, kAll, kNone);
+    const bool byClass = extent == kAll || (type && args.getCount() == 0 && extent != kNone);
+    std::vector<Module*> chosen;
+    if (byClass) addAll(type, chosen);
+    if (!addNamed(args, type, chosen)) return false;
+    const bool setPrimary = options.has(kPrimary);
+    const HString primaryPath = options.textOr(kPrimary, "");
+    Module* primary = nullptr;
+    if (!primaryPath.IsEmpty() && !(primary = moduleAt(primaryPath))) return false;
+
+    const int mode = lastOf(given, kAdd, kRemove, kToggle);
+    const bool replaces = mode < 0 && (byClass || args.getCount() > 0);
+    if (extent == kNone || replaces) g_db->selectAllModules(false);
+    for (Module* module : chosen)
+      module->setSelected(mode == kToggle ? !module->isSelected() : mode != kRemove);
+    if (setPrimary) g_db->setPrimarySelectedModule(primary);
+    return true;
+  }
+
+ private:
+  // Which of some options was given last; -1: none.
+  template <class... Indices>
+  static int lastOf(Given const& given, Indices... indices) {
+    int last = -1;
+    for (CommandOption const& option : given)
+      if (((option.getIndex() == indices) || ...)) last = option.getIndex();
+    return last;
+  }
+
+  static HRuntimeClass const* typeNamed(HString const& name) {
+    HRuntimeClass const* type = HRuntimeClass::findClass(name.GetStr());
+    if (type && type->isDerivedFrom(&Module::s_classModule)) return type;
+    logError("Unknown module type name: %s", name.GetStr());
+    return nullptr;
+  }
+
+  static bool addNamed(Args const& args, HRuntimeClass const* type, std::vector<Module*>& modules) {
+    for (Variable const& arg : args) {
+      for (int i = 0; i < arg.getNumItems(); ++i) {
+        Module* module = moduleAt(arg.getStringValue(i), type);
+        if (!module) return false;
+        modules.push_back(module);
+      }
+    }
+    return true;
+  }
+};
+
+}  // namespace
+
+Command* newSelectCmd() { return new SelectCmd; }
+
+}  // namespace talix

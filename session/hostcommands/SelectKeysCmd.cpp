@@ -1,0 +1,108 @@
+#include "host/animation/PropertyTable.h"
+#include "host/scene/Database.h"
+#include "session/hostcommands/Arguments.h"
+
+namespace talix {
+
+namespace {
+
+// Which keys of a module: those in a range, of a channel, of the active properties, or of all channels.
+class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "selectKeys",
+      .displayName = "Select Keys",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose =
+          "Selects keys of a channel, else of the selected channels, else of all; -frames limits them to a "
+          "range, -none deselects them.",
+      .args = {"[CHANNEL[.x]]", 0, 1, {Variable::String}},
+      .options = {{"frames", 2, Variable::Float, 0b0010},
+                  {"all", 0, Variable::None, 0b0101},
+                  {"none", 0, Variable::None, 0b1010},
+                  {"add", 0, Variable::None, 0b0100},
+                  {"onMod", 1, Variable::String}}};
+  static constexpr int kFrames = info.option("frames"), kAll = info.option("all"),
+                       kNone = info.option("none"), kAdd = info.option("add"), kOnMod = info.option("onMod");
+
+  bool execute(Given const& given, Args const& args, Variable&) override {
+    const GivenOptions options(given);
+    std::vector<ChannelChoice> channels;
+    if (!chooseChannels(args, options.has(kAll), channels)) return false;
+    HTimeRange range = HTimeRange::forever();
+    if (CommandOption const* frames = options.find(kFrames)) {
+      const auto chosen =
+          rangeOfFrames(frames->getArg(0).getFloatValue(-1), frames->getArg(1).getFloatValue(-1));
+      if (!chosen) return false;
+      range = *chosen;
+    }
+    std::vector<Module*> modules;
+    if (!chooseModules(options, modules)) return false;
+    if (args.getCount() > 0 && !checkChannel(modules, channels.front(), args[0].getStringValue(-1)))
+      return false;
+    if (!g_db->getActiveClip()) {
+      logWarning("No keys on Base Clip");
+      return true;
+    }
+    for (Module* module : modules) selectIn(*module, channels, range, options.has(kNone), options.has(kAdd));
+    return true;
+  }
+
+ private:
+  // No channels mean all.
+  static bool chooseChannels(Args const& args, bool all, std::vector<ChannelChoice>& channels) {
+    if (args.getCount() > 0) {
+      const auto channel = channelNamed(args[0].getStringValue(-1));
+      if (channel) channels.push_back(*channel);
+      return channel.has_value();
+    }
+    for (int i = 0; !all && i < g_db->getNumActiveProperties(); ++i) {
+      const unsigned id = g_db->getActiveProperty(i);
+      channels.push_back({id & PropertyTable::kIdMask, id >> 28 & 7});
+    }
+    return true;
+  }
+
+  static bool chooseModules(GivenOptions const& options, std::vector<Module*>& modules) {
+    if (options.has(kOnMod)) {
+      modules.push_back(moduleAt(options.textOr(kOnMod, "")));
+      return modules.front() != nullptr;
+    }
+    for (int i = 0; i < g_db->getNumSelectedModules(); ++i) modules.push_back(g_db->getSelectedModule(i));
+    if (modules.empty())
+      logError(
+          "Please select at least one Module or specify the module to be modified with the -onMod option.");
+    return !modules.empty();
+  }
+
+  // Somebody must have the channel that was named.
+  static bool checkChannel(std::vector<Module*> const& modules, ChannelChoice const& channel,
+                           char const* name) {
+    for (Module* module : modules)
+      if (module->getProperty(channel.id)) return true;
+    logError("Cannot find property named %s on module %s", name, modules.front()->getName().GetStr());
+    return false;
+  }
+
+  static void selectIn(Module& module, std::vector<ChannelChoice> const& channels, HTimeRange const& range,
+                       bool none, bool add) {
+    for (int i = 0; i < module.getNumChannels(); ++i) {
+      Controller& channel = *module.getChannel(i);
+      if (!none && !add) channel.deselectKeys(HTimeRange::forever(), 7);
+      if (channels.empty()) change(channel, range, 7, none);
+      for (ChannelChoice const& choice : channels)
+        if (choice.id == channel.getPropertyId()) change(channel, range, choice.mask, none);
+    }
+  }
+
+  static void change(Controller& channel, HTimeRange const& range, unsigned mask, bool none) {
+    none ? channel.deselectKeys(range, mask) : channel.selectKeys(range, mask);
+  }
+};
+
+}  // namespace
+
+Command* newSelectKeysCmd() { return new SelectKeysCmd; }
+
+}  // namespace talix

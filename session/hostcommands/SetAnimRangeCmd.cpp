@@ -1,0 +1,31 @@
+#include "host/time/HTimeManager.h"
+#include "session/hostcommands/Arguments.h"
+
+namespace talix {
+
+namespace {
+
+class SetAnimRangeCmd final : public ScriptCommand<SetAnimRangeCmd> {
+ public:
+  static constexpr CommandInfo info = {.name = "setAnimRange",
+                                       .displayName = "Set Animation Range",
+                                       .category = "Interface",
+                                       .purpose = "Sets the range of frames that the scene has.",
+                                       .args = {"START END", 2, 2}};
+
+  bool checkArgSyntax(Args const& args, Given const&) const override {
+    return args.getCount() == 2 && areFrameNumbers(args);
+  }
+
+  bool execute(Given const&, Args const& args, Variable&) override {
+    const auto range = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
+    if (range) HTimeManager::getInstance()->setAnimRange(*range);
+    return range.has_value();
+  }
+};
+
+}  // namespace
+
+Command* newSetAnimRangeCmd() { return new SetAnimRangeCmd; }
+
+}  // namespace talix

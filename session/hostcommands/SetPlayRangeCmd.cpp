@@ -1,0 +1,32 @@
+#include "host/time/HTimeManager.h"
+#include "session/hostcommands/Arguments.h"
+
+namespace talix {
+
+namespace {
+
+class SetPlayRangeCmd final : public ScriptCommand<SetPlayRangeCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "setPlayRange",
+      .displayName = "Set Play Range",
+      .category = "Interface",
+      .purpose = "Sets the range of frames that is played; the current time stays.",
+      .args = {"START END", 2, 2}};
+
+  bool checkArgSyntax(Args const& args, Given const&) const override {
+    return args.getCount() == 2 && areFrameNumbers(args);
+  }
+
+  bool execute(Given const&, Args const& args, Variable&) override {
+    const auto range = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
+    if (range) HTimeManager::getInstance()->setPlayRange(*range, true);
+    return range.has_value();
+  }
+};
+
+}  // namespace
+
+Command* newSetPlayRangeCmd() { return new SetPlayRangeCmd; }
+
+}  // namespace talix

@@ -1,0 +1,32 @@
+#include "host/time/HTimeManager.h"
+#include "session/hostcommands/Arguments.h"
+
+namespace talix {
+
+namespace {
+
+class SetTimeCmd final : public ScriptCommand<SetTimeCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "setTime",
+      .displayName = "Set Current Time",
+      .category = "Interface",
+      .purpose = "Moves the current time to a frame, which may be a fraction.",
+      .args = {"FRAME", 1, 1}};
+
+  bool checkArgSyntax(Args const& args, Given const&) const override {
+    return args.getCount() == 1 && areFrameNumbers(args);
+  }
+
+  bool execute(Given const&, Args const& args, Variable&) override {
+    const auto time = timeOfFrame(args[0].getFloatValue(-1));
+    if (time) HTimeManager::getInstance()->setTime(*time, true);
+    return time.has_value();
+  }
+};
+
+}  // namespace
+
+Command* newSetTimeCmd() { return new SetTimeCmd; }
+
+}  // namespace talix

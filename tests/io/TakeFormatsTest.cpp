@@ -1,0 +1,48 @@
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "io/TakeFormats.h"
+#include "tests/io/TakeTesting.h"
+
+namespace talix {
+namespace {
+
+using testing::HasSubstr;
+
+TEST(TakeFormats, ContentGoesBeforeSuffix) {
+  const TempFolder folder;
+  const std::string bvh = readText(dataFile("frametime_precise_01.bvh"));
+  const std::string trc = readText(dataFile("nan_case_01.trc"));
+  EXPECT_EQ(readTake(folder.file("a.trc", bvh)).format, "BVH");
+  EXPECT_EQ(readTake(folder.file("b", "\xEF\xBB\xBF\n" + bvh)).format, "BVH");
+  EXPECT_EQ(readTake(folder.file("c.bvh", trc)).format, "TRC");
+  EXPECT_EQ(readTake(folder.file("d.e.TRC", trc)).name, "d.e");
+  EXPECT_EQ(readTake(folder.file("f.bvh", readText(dataFile("single_frame_01.c3d")))).format, "C3D");
+}
+
+TEST(TakeFormats, SuffixDecidesWhereContentHasNoMark) {
+  const TempFolder folder;
+  EXPECT_THAT(errorOf([&] { readTake(folder.file("a.Bvh", "nothing")); }),
+              HasSubstr("line 1: HIERARCHY expected"));
+  EXPECT_THAT(errorOf([&] { readTake(folder.file("a.trc", "nothing")); }),
+              HasSubstr("line 1: PathFileType expected"));
+  EXPECT_THAT(errorOf([&] { readTake(folder.file("a.txt", "nothing")); }),
+              HasSubstr("a.txt: is no take that can be read (C3D, BVH or TRC)"));
+  EXPECT_THAT(errorOf([&] { readTake(folder.file("a.bvh", "")); }), HasSubstr("the file is empty"));
+  EXPECT_THAT(errorOf([&] { readTake(folder.path("none.bvh")); }), HasSubstr("there is no such file"));
+}
+
+TEST(TakeFormats, WritesBySuffixOnly) {
+  const TempFolder folder;
+  std::vector<TakeNote> notes;
+  const Take take = readTake(dataFile("frametime_precise_01.bvh"));
+  EXPECT_THAT(errorOf([&] { writeTake(take, folder.path("a.trc"), notes); }),
+              HasSubstr("a.trc: takes are written as"));
+  writeTake(take, folder.path("a.bvh"), notes);
+  writeTake(readTake(dataFile("nan_case_01.trc")), folder.path("b.C3D"), notes);
+  EXPECT_EQ(readTake(folder.path("b.C3D")).points.size(), 14u);
+  EXPECT_EQ(readTake(folder.path("a.bvh")).joints.size(), take.joints.size());
+}
+
+}  // namespace
+}  // namespace talix

@@ -1,0 +1,40 @@
+// What the tests of take files share.
+#pragma once
+
+#include <filesystem>
+#include <functional>
+#include <random>
+#include <string>
+
+#include "io/Take.h"
+
+namespace talix {
+
+std::string dataFile(const std::string& name);
+std::string readText(const std::string& path);
+
+// A folder of its own that goes at the end of the test.
+class TempFolder {
+ public:
+  TempFolder();
+  ~TempFolder();
+  std::string path(const std::string& name) const { return (m_path / name).string(); }
+  // Writes a file and answers its path.
+  std::string file(const std::string& name, const std::string& content) const;
+
+ private:
+  std::filesystem::path m_path;
+};
+
+// The text of the FileError that `work` throws; empty when it throws none.
+std::string errorOf(const std::function<void()>& work);
+
+// All notes, a line each.
+std::string notesOf(const std::vector<TakeNote>& notes);
+
+// Reads every shortened and many damaged forms of a file's content: each must give a take or a FileError that
+// names the file. `damages` random changes of one to four bytes come from a fixed seed.
+void expectSurvivesDamage(const std::string& content, const std::string& suffix, size_t step, int damages,
+                          const std::function<Take(const std::string& path)>& read);
+
+}  // namespace talix

@@ -1,0 +1,48 @@
+// Real takes into the scene and out of it.
+#include <filesystem>
+
+#include "tests/io/TakeTesting.h"
+#include "tests/io/scene/SceneTesting.h"
+
+namespace talix {
+
+namespace {
+
+class TakeRoundTrip : public SceneTest {};
+
+std::vector<std::string> takeFiles() {
+  std::vector<std::string> names;
+  for (const auto& entry : std::filesystem::directory_iterator(dataFile(""))) {
+    const std::string name = entry.path().filename().string(), suffix = entry.path().extension().string();
+    if (suffix == ".c3d" || suffix == ".bvh" || suffix == ".trc") names.push_back(name);
+  }
+  return names;
+}
+
+TEST_F(TakeRoundTrip, EveryRealTakeComesBackAsItWasRead) {
+  int read = 0;
+  for (const std::string& name : takeFiles()) {
+    Take take;
+    if (!errorOf([&] { take = readTake(dataFile(name)); }).empty()) continue;
+    g_db->newScene();
+    HTimeManager::getInstance()->reset();
+    open(take);
+    EXPECT_EQ(differenceOf(take, save()), "") << name;
+    EXPECT_FALSE(warned("left out")) << name << ": " << notes();
+    ++read;
+  }
+  EXPECT_GE(read, 30);
+}
+
+TEST_F(TakeRoundTrip, KeysAreSharedNotCopied) {
+  openFile("walkset_a_le_real.c3d");
+  const Take made = save();
+  ASSERT_EQ(made.points.size(), 26u);
+  const auto* marker = at<Marker>("\\walkset_a_le_real\\" + made.points[0].label);
+  EXPECT_TRUE(made.points[0].positions.sharesAll(
+      *marker->getTranslationChannel()->findTrack(g_db->getActiveClip(), 0)));
+}
+
+}  // namespace
+
+}  // namespace talix
