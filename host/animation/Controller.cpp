@@ -404,17 +404,19 @@ HTimeRange Controller::getKeyRangeInClip(NLEClip const* clip) const {
 }
 
 void Controller::forgetClip(NLEClip const* clip) {
-  if (std::erase_if(m_tracks, [&](ClipTrack const& track) { return track.clip == clip; })) changed();
+  std::vector<ClipTrack> others;
+  std::copy_if(m_tracks.begin(), m_tracks.end(), std::back_inserter(others),
+               [&](ClipTrack const& track) { return track.clip != clip; });
+  if (others.size() < m_tracks.size()) storeTracks(std::move(others));
 }
 
-void Controller::dropTracks() {
-  m_tracks.clear();
+void Controller::storeTracks(std::vector<ClipTrack> tracks) {
+  m_tracks = std::move(tracks);
   changed();
 }
 
 void Controller::restore(State const& state) {
-  m_tracks = state.tracks;
-  m_default = state.byDefault;
-  m_interpolation = state.interpolation;
-  changed();
+  storeTracks(state.tracks);
+  setDefaultValues(state.byDefault);
+  setInterpType(static_cast<int>(state.interpolation));
 }

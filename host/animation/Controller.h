@@ -150,7 +150,7 @@ class Controller : public DataSource {
     mutable KeyTrack::Cursor cursor;
   };
   ClipTrack const* find(NLEClip const* clip, int layer) const;
-  // The mutator of keys: the track of the active layer, made when there is none. Null on the base clip.
+  // The mutator of a track: that of the active layer, made when there is none. Null on the base clip.
   KeyTrack* editTrack();
   KeyTrack* editTrack(NLEClip* clip, int layer);
   void evaluateInClip(NLEClip const* clip, int64 time, Values& values) const;
@@ -164,8 +164,8 @@ class Controller : public DataSource {
     Interpolation interpolation;
   };
   State getState() const { return {m_tracks, m_default, m_interpolation}; }
-  void restore(State const& state);  // mutator
-  void dropTracks();                 // mutator
+  void restore(State const& state);
+  void storeTracks(std::vector<ClipTrack> tracks);  // the mutator of all keys at once
 
   Module* m_module = nullptr;
   ControlID m_id{ControlID::CreateUnique};

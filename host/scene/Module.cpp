@@ -44,6 +44,10 @@ void ModuleReferrer::release(Module* module) {
   if (--found->second == 0) module->m_referrers->erase(found);
 }
 
+bool ModuleReferrer::refersTo(Module const* module) const {
+  return module && module->m_referrers && module->m_referrers->contains(const_cast<ModuleReferrer*>(this));
+}
+
 void Module::forgetByAll() {
   while (m_referrers && !m_referrers->empty()) m_referrers->begin()->first->forget(this);
 }
@@ -296,7 +300,7 @@ void Module::discardDataEdit() {
   if (!m_dataEdit) return;
   for (DataEdit::Before const& before : m_dataEdit->before) before.channel->restore(before.state);
   // Channels that were added meanwhile held no keys.
-  for (size_t i = m_dataEdit->before.size(); i < m_channels.size(); ++i) m_channels[i]->dropTracks();
+  for (size_t i = m_dataEdit->before.size(); i < m_channels.size(); ++i) m_channels[i]->storeTracks({});
   endDataEdit();
 }
 

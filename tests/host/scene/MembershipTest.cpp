@@ -298,6 +298,47 @@ TEST_F(MembershipTest, ANewSceneIsEmptyAndAsNew) {
       << "a channel name's kind is that scene's";
 }
 
+TEST_F(MembershipTest, ConnectingLines) {
+  auto *hub = create<Marker>("hub"), *a = create<Marker>("a"), *b = create<Marker>("b");
+  MarkerConnection red(a);
+  red.setConnectingColor({255, 0, 0});
+  hub->addConnectingLine(MarkerConnection(a));
+  hub->addConnectingLine(MarkerConnection(b));
+  hub->addConnectingLine(red);
+  hub->addConnectingLine(MarkerConnection());
+  ASSERT_EQ(hub->getNumConnectingLines(), 2);
+  EXPECT_EQ(hub->getConnectingLine(0).getConnectingColor(), Vec3(255, 0, 0))
+      << "it took the former one's place";
+  EXPECT_TRUE(hub->isConnectedTo(a) && !a->isConnectedTo(hub) && !hub->isConnectedTo(nullptr));
+  EXPECT_EQ(hub->getConnectionTo(b)->getConnectingColor(), MarkerConnection::getDefaultColor());
+  EXPECT_EQ(hub->getConnectionTo(hub), nullptr);
+  hub->removeConnectingLine(red);
+  hub->removeConnectingLine(a);
+  EXPECT_EQ(hub->getNumConnectingLines(), 1);
+  hub->resetAllLines();
+  EXPECT_FALSE(hub->isConnectedTo(b));
+  remove(a);
+}
+
+TEST_F(MembershipTest, LongListsOfReferencesAreLetGoOf) {
+  constexpr int kMany = 10'000;
+  auto* hub = create<Marker>("hub");
+  auto* cluster = create<LabelingCluster>("cluster");
+  TSimpleArray<Module*> markers;
+  for (int i = 0; i < kMany; ++i) {
+    markers.add(create<Marker>("m"));
+    hub->addConnectingLine(MarkerConnection(static_cast<Marker*>(markers[i])));
+  }
+  auto* list = static_cast<MultiModAttribute*>(cluster->getAttribute("Markers"));
+  list->setValue(markers, true, true, true, true);
+  std::shuffle(markers.begin(), markers.end(), m_random);
+  for (int i = 0; i < kMany; ++i) {
+    EXPECT_EQ(list->getNumModules(), kMany - i);
+    remove(markers[i]);
+  }
+  EXPECT_EQ(list->getNumModules() + hub->getNumConnectingLines(), 0);
+}
+
 // With a cost that grew with the scene these would take minutes.
 TEST_F(MembershipTest, CrowdsComeAndGoQuickly) {
   constexpr int kMany = 30'000;
