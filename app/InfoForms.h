@@ -12,7 +12,7 @@ namespace talix {
 std::string takeAsText(const Take& take, const std::string& file);
 boost::json::object takeAsJson(const Take& take, const std::string& file);
 
-// Text of a file as UTF-8 without control characters: bytes that are no UTF-8 count as Latin-1.
+// Text of a file as UTF-8 without control characters.
 std::string printable(std::string_view text);
 
 // "Tx", "Rz": a joint's channel in short.

@@ -1,3 +1,5 @@
+#include <filesystem>
+
 #include "host/time/HTimeManager.h"
 #include "io/TakeScene.h"
 #include "io/scene/TakeAttributes.h"
@@ -22,7 +24,7 @@ FrameGrid animationFrames() {
 }
 
 void recallFile(Take& take, const NLEClip& clip) {
-  take.name = clip.getName().GetString();
+  take.name = std::filesystem::path(clip.getName().GetString()).stem().string();
   take.format = remembered::text(clip, remembered::kFileFormat);
   const double unit = remembered::number(clip, remembered::kFileUnitInMillimetres, 0);
   if (unit > 0) {

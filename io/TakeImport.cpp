@@ -109,14 +109,15 @@ void importTake(Take take, const std::string& path, int up, Database& scene, std
   const bool firstTake = scene.getNumClips() == 0;
   const int formerAxis = scene.getUpAxis(), axis = sceneUpAxis(take, up, scene);
   const Undoing undoing(scene);
-  const std::string clipName = moduleName(take.name);
+  // With its suffix, so that the clip and the character that stands for the file do not share a path.
+  const std::string fileName = std::filesystem::path(path).filename().string();
+  const std::string clipName = moduleName(fileName);
   auto* clip = static_cast<Clip*>(scene.createModule(&Clip::staticClass(), clipName.c_str(), nullptr));
   if (!clip) throw FileError(path, "the scene takes no further clip");
   scene.setActiveClip(clip);
 
   std::vector<TakeNote> said;
-  TakeImport import(scene, *clip, AxisTurn(static_cast<int>(take.up), axis),
-                    std::filesystem::path(path).filename().string(), said);
+  TakeImport import(scene, *clip, AxisTurn(static_cast<int>(take.up), axis), fileName, said);
   for (const TakeNote& note : take.notes)
     note.level == TakeNote::Level::Warning ? import.warn(note.text) : import.info(note.text);
   try {
