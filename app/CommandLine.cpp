@@ -14,7 +14,7 @@ using talix::RunRequest;
 constexpr int kBadCommandLine = 2;
 
 constexpr char const* kExamples = R"(Examples:
-  talix run --open walk.c3d -c 'getModules -type Marker'
+  talix run --open walk.c3d -c 'select -type Marker'
   talix run --open walk.c3d --save clean.c3d clean.talix
   talix run --json -c 'create Marker LFHD' -c getModules
   talix commands setKey
@@ -25,8 +25,8 @@ constexpr char const* kScriptHelp =
     R"(A script is a text file with one command a line: its name, then values and options in any order.
   # comment
   select LFHD RFHD
-  setKey Translation <1 2.5 3> -t 10
-  getKeys tx                       # the short form of Translation.x
+  setKey Translation 1 2.5 3 -t 10
+  getKeys tx        # the short form of Translation.x
 Values: 12  1.5  true  <1 2 3>  [a b c]  "a string"  word. In a string "\" is an ordinary character.
 "talix commands" lists all commands, "talix commands NAME" tells all about one.
 
@@ -108,11 +108,12 @@ int main(int argc, char** argv) {
   commandsApp->add_flag("--json", json, "Print them as a JSON array");
   addPluginOptions(*commandsApp, plugin);
 
-  std::vector<std::string> takes;
-  bool infoAsJson = false;
-  CLI::App* infoApp = app.add_subcommand("info", "Show what is in take files (C3D, BVH, TRC)");
-  infoApp->add_option("FILE", takes, "Take files")->type_name("")->required();
-  infoApp->add_flag("--json", infoAsJson, "Print a JSON array with one object for each file");
+  std::vector<std::string> infoFiles;
+  bool infoJson = false;
+  CLI::App* infoApp =
+      app.add_subcommand("info", "Tell what take files hold, without opening them in a scene");
+  infoApp->add_option("FILE", infoFiles, "Take files (C3D, BVH, TRC)")->required();
+  infoApp->add_flag("--json", infoJson, "Print it as JSON");
 
   try {
     app.parse(argc, argv);
@@ -120,8 +121,8 @@ int main(int argc, char** argv) {
     const int status = app.exit(error);
     return status == 0 ? 0 : kBadCommandLine;
   }
+  if (infoApp->parsed()) return talix::runInfo(infoFiles, infoJson);
   if (commandsApp->parsed()) return talix::showCommands(plugin, name, json);
-  if (infoApp->parsed()) return talix::runInfo(takes, infoAsJson);
   run.putInOrder(*runApp);
   return talix::runScripts(run.request);
 }

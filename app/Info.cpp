@@ -7,6 +7,7 @@
 #include "io/FileError.h"
 #include "io/TakeFormats.h"
 #include "session/JsonForms.h"
+#include "session/JsonText.h"
 
 namespace talix {
 
@@ -43,7 +44,7 @@ int runInfo(std::vector<std::string> const& files, bool json) {
       status = kUnreadable;
     }
   }
-  if (json) std::cout << boost::json::serialize(all) << std::endl;
+  if (json) std::cout << jsonText(all) << std::endl;
   return std::cout.flush() ? status : kUnreadable;
 }
 

@@ -13,6 +13,7 @@
 #include "io/FileError.h"
 #include "session/CommandHelp.h"
 #include "session/JsonForms.h"
+#include "session/JsonText.h"
 #include "session/ScriptRunner.h"
 #include "session/ScriptText.h"
 
@@ -125,7 +126,7 @@ int showCommands(PluginChoice const& plugin, std::string const& name, bool json)
     return failed(Status::BadCommandLine, "Unknown command: " + name);
   std::string text;
   if (json) {
-    text = boost::json::serialize(entry ? boost::json::array{toJson(*entry)} : toJson(commands));
+    text = jsonText(entry ? boost::json::array{toJson(*entry)} : toJson(commands));
   } else {
     text = entry ? commandPage(*entry) : commandList(commands);
   }

@@ -1,7 +1,5 @@
 #include <filesystem>
-#include <unordered_set>
 
-#include "host/scene/SceneIndex.h"
 #include "host/time/HTimeManager.h"
 #include "io/FileError.h"
 #include "io/TakeScene.h"
@@ -43,25 +41,6 @@ void checkTake(const Take& take, const std::string& path, const Database& scene)
       throw FileError(path, "the joint \"" + joint.name + "\" stands before its parent");
     if (joint.name.empty()) throw FileError(path, "joint " + std::to_string(i + 1) + " has no name");
   }
-}
-
-// The names that a take's own modules get at the root.
-std::unordered_set<std::string> rootNames(const Take& take) {
-  std::unordered_set<std::string> names{"Analog", "Outputs"};
-  for (const TakePoint& point : take.points)
-    if (!point.label.empty()) names.insert(moduleName(point.subject.empty() ? take.name : point.subject));
-  if (!take.joints.empty()) names.insert(moduleName(take.name));
-  return names;
-}
-
-// After the take; numbered where the scene, or the character that stands for the file, has that name.
-std::string clipName(const Take& take, const Database& scene) {
-  const auto taken = rootNames(take);
-  const std::string wanted = moduleName(take.name);
-  std::string name = wanted;
-  for (int number = 1; taken.contains(name) || scene.getIndex().findChild(nullptr, name); ++number)
-    name = wanted + "_" + std::to_string(number);
-  return name;
 }
 
 HFrameRate frameRate(double rate) {
@@ -131,14 +110,15 @@ void importTake(Take take, const std::string& path, int up, Database& scene, std
   const bool firstTake = scene.getNumClips() == 0;
   const int formerAxis = scene.getUpAxis(), axis = sceneUpAxis(take, up, scene);
   const Undoing undoing(scene);
-  auto* clip =
-      static_cast<Clip*>(scene.createModule(&Clip::staticClass(), clipName(take, scene).c_str(), nullptr));
+  // With its suffix, so that the clip and the character that stands for the file do not share a path.
+  const std::string fileName = std::filesystem::path(path).filename().string();
+  const std::string clipName = moduleName(fileName);
+  auto* clip = static_cast<Clip*>(scene.createModule(&Clip::staticClass(), clipName.c_str(), nullptr));
   if (!clip) throw FileError(path, "the scene takes no further clip");
   scene.setActiveClip(clip);
 
   std::vector<TakeNote> said;
-  TakeImport import(scene, *clip, AxisTurn(static_cast<int>(take.up), axis),
-                    std::filesystem::path(path).filename().string(), said);
+  TakeImport import(scene, *clip, AxisTurn(static_cast<int>(take.up), axis), fileName, said);
   for (const TakeNote& note : take.notes)
     note.level == TakeNote::Level::Warning ? import.warn(note.text) : import.info(note.text);
   try {

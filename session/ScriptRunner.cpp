@@ -8,6 +8,7 @@
 
 #include "io/FileError.h"
 #include "session/JsonForms.h"
+#include "session/JsonText.h"
 #include "session/ScriptText.h"
 
 namespace talix {
@@ -49,7 +50,7 @@ void ScriptRunner::report(LineResult const& result, std::string const& file, int
   if (m_style.json) {
     boost::json::object object{{"file", mendedUtf8(file)}, {"line", number}};
     for (auto& [key, value] : toJson(result)) object.emplace(key, std::move(value));
-    m_text = boost::json::serialize(object);
+    m_text = jsonText(object);
   } else {
     writeLogLines(result,
                   m_style.nameLines ? file + ", line " + std::to_string(number) + ": " : std::string());

@@ -8,6 +8,9 @@ namespace talix {
 
 namespace {
 
+// Beyond it the digits of a whole number say more than is known of it.
+constexpr double kLargestWhole = 9007199254740992;
+
 void appendInt(int value, std::string& out) {
   char text[16];
   out.append(text, std::to_chars(text, text + sizeof text, value).ptr);
@@ -20,6 +23,11 @@ void appendNumber(double value, std::string& out) {
 }
 
 void appendFloat(double value, std::string& out) {
+  if (std::isfinite(value) && std::abs(value) > kLargestWhole) {
+    char text[32];
+    out.append(text, std::to_chars(text, text + sizeof text, value, std::chars_format::scientific).ptr);
+    return;
+  }
   const size_t start = out.size();
   appendNumber(value, out);
   const bool whole = std::string_view(out).substr(start).find_first_of(".e") == std::string_view::npos;

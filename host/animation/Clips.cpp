@@ -16,8 +16,15 @@ bool NLEClip::isActive() const { return g_db->getActiveClip() == this; }
 
 NLEClip* NLEClip::getNext() const { return g_db->getClipAfter(this); }
 
+// A blend's values hang on the weights of its sources.
+void NLEClip::dataChanged(Controller const*) { Node::forgetWorldCache(); }
+
+void NLEClip::storeLayerLocks(std::vector<bool> locks) { m_layerLocks = std::move(locks); }
+
 int NLEClip::addLayer() {
-  m_layerLocks.push_back(false);
+  std::vector<bool> locks = m_layerLocks;
+  locks.push_back(false);
+  storeLayerLocks(std::move(locks));
   return getNumLayers() - 1;
 }
 
@@ -26,7 +33,10 @@ bool NLEClip::isLayerLocked(int layer) const {
 }
 
 void NLEClip::setLayerLocked(int layer, bool locked) {
-  if (layer >= 0 && layer < getNumLayers()) m_layerLocks[static_cast<size_t>(layer)] = locked;
+  if (layer < 0 || layer >= getNumLayers()) return;
+  std::vector<bool> locks = m_layerLocks;
+  locks[static_cast<size_t>(layer)] = locked;
+  storeLayerLocks(std::move(locks));
 }
 
 void Clip::setUp() {
@@ -45,4 +55,5 @@ void Clip::setSmpteOffset(int64 ticks) { m_smpteOffset->setValue(ticks, true, tr
 void BlendClip::setUp() {
   NLEClip::setUp();
   m_sources = addBuiltIn<MultiModAttribute>("Sources");
+  setReaction(m_sources, [](Module&, Attribute&) { Node::forgetWorldCache(); });
 }

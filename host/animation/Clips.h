@@ -25,9 +25,12 @@ class NLEClip : public Module {
 
  protected:
   void setUp() override;
+  void dataChanged(Controller const*) override;
 
  private:
   friend class Database;
+
+  void storeLayerLocks(std::vector<bool> locks);  // mutator
 
   FloatController* m_weight = nullptr;
   std::vector<bool> m_layerLocks{false};

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cassert>
 #include <climits>
+#include <cmath>
 #include <string_view>
 
 #include "host/animation/Clips.h"
@@ -122,12 +123,21 @@ KeyTrack* Controller::editTrack() {
   return clip && clip->holdsKeys() ? editTrack(clip, g_db->getActiveLayer()) : nullptr;
 }
 
+bool Controller::areFinite(Values const& values, unsigned mask) const {
+  const bool split = getPropertyType() == Vec3Property;
+  for (int i = 0; i < static_cast<int>(shapeOf(getPropertyType())); ++i)
+    if ((!split || mask >> i & 1) && !std::isfinite(values[static_cast<size_t>(i)])) return false;
+  return true;
+}
+
 void Controller::setDefaultValues(Values const& values) {
+  if (!areFinite(values, KeyTrack::kAll)) return;
   m_default = values;
   changed();
 }
 
 void Controller::writeKeyAt(int64 time, Values const& values, unsigned mask) {
+  if (!areFinite(values, mask)) return;
   KeyTrack* track = editTrack();
   if (!track) return;
   // A new key of a one-valued or rotation channel is whole whatever the mask.
@@ -161,9 +171,9 @@ int Controller::deleteKey(int64 time, unsigned mask) {
 int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers) {
   int64 deleted = 0;
   NLEClip* clip = g_db->getActiveClip();
-  for (ClipTrack& track : m_tracks)
+  for (ClipTrack const& track : m_tracks)
     if (track.clip == clip && (allLayers || track.layer == g_db->getActiveLayer()))
-      deleted += track.track.eraseRange(range.getStart(), range.getEnd(), mask);
+      deleted += editTrack(clip, track.layer)->eraseRange(range.getStart(), range.getEnd(), mask);
   if (deleted) changed();
   return static_cast<int>(deleted);
 }
@@ -178,8 +188,8 @@ int Controller::deleteSelectedKeys(unsigned mask) {
 bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo) {
   if (source->getPropertyType() != getPropertyType() || !isEditable()) return false;
   if (source == this) return true;
-  m_default = source->m_default;
-  m_interpolation = source->m_interpolation;
+  setDefaultValues(source->m_default);
+  setInterpType(static_cast<int>(source->m_interpolation));
   NLEClip* clip = g_db->getActiveClip();
   for (int layer = 0; keys && layer < clip->getNumLayers(); ++layer) {
     KeyTrack const* theirs = source->findTrack(clip, layer);
@@ -188,7 +198,6 @@ bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo
     if (!selectionToo) copy.deselect(-kForever, kForever);
     setTrack(clip, layer, std::move(copy));
   }
-  changed();
   return true;
 }
 
@@ -366,6 +375,7 @@ char const* Controller::getInterpTypeName(int i) const {
 }
 
 void Controller::setInterpType(int i) {
+  if (i < 0 || i >= m_numInterpTypes) return;
   m_interpolation = static_cast<Interpolation>(i);
   changed();
 }
@@ -394,5 +404,19 @@ HTimeRange Controller::getKeyRangeInClip(NLEClip const* clip) const {
 }
 
 void Controller::forgetClip(NLEClip const* clip) {
-  std::erase_if(m_tracks, [&](ClipTrack const& track) { return track.clip == clip; });
+  std::vector<ClipTrack> others;
+  std::copy_if(m_tracks.begin(), m_tracks.end(), std::back_inserter(others),
+               [&](ClipTrack const& track) { return track.clip != clip; });
+  if (others.size() < m_tracks.size()) storeTracks(std::move(others));
+}
+
+void Controller::storeTracks(std::vector<ClipTrack> tracks) {
+  m_tracks = std::move(tracks);
+  changed();
+}
+
+void Controller::restore(State const& state) {
+  storeTracks(state.tracks);
+  setDefaultValues(state.byDefault);
+  setInterpType(static_cast<int>(state.interpolation));
 }

@@ -88,6 +88,7 @@ class Controller : public DataSource {
 
   // Raw values: 1, 3 or 4 doubles (a rotation's quaternion), as KeyTrack holds them.
   void readKey(int key, Values& values) const;
+  // Values that are not finite are not written.
   void writeKey(int key, Values const& values, unsigned mask);
   void writeKeyAt(int64 time, Values const& values, unsigned mask);
   void evaluate(int64 time, Values& values) const;
@@ -96,13 +97,13 @@ class Controller : public DataSource {
   // The value that the active layer must have at a time for all layers together to give `wanted`.
   virtual Values solveLayer(int64 time, Values const& wanted) const;
   Values const& getDefaultValues() const { return m_default; }
-  void setDefaultValues(Values const& values);
+  void setDefaultValues(Values const& values);  // not taken when not finite
 
   // --- interpolation
   // -------------------------------------------------------------------------------------------
   virtual int getNumInterpTypes() const;
   virtual char const* getInterpTypeName(int i) const;
-  virtual void setInterpType(int i);
+  virtual void setInterpType(int i);  // a number that is none of the channel's is not taken
   Interpolation getInterpolation() const { return m_interpolation; }
 
   // --- clips and layers
@@ -149,11 +150,22 @@ class Controller : public DataSource {
     mutable KeyTrack::Cursor cursor;
   };
   ClipTrack const* find(NLEClip const* clip, int layer) const;
-  // The mutator of keys: the track of the active layer, made when there is none. Null on the base clip.
+  // The mutator of a track: that of the active layer, made when there is none. Null on the base clip.
   KeyTrack* editTrack();
   KeyTrack* editTrack(NLEClip* clip, int layer);
   void evaluateInClip(NLEClip const* clip, int64 time, Values& values) const;
+  bool areFinite(Values const& values, unsigned mask) const;
   void changed();
+
+  // Everything that edits of data change: keys (snapshots), default value, interpolation.
+  struct State {
+    std::vector<ClipTrack> tracks;
+    Values byDefault;
+    Interpolation interpolation;
+  };
+  State getState() const { return {m_tracks, m_default, m_interpolation}; }
+  void restore(State const& state);
+  void storeTracks(std::vector<ClipTrack> tracks);  // the mutator of all keys at once
 
   Module* m_module = nullptr;
   ControlID m_id{ControlID::CreateUnique};
@@ -189,7 +201,7 @@ class IntController : public Controller {
   int getKeyValue(int key) const;
   void setKeyValue(int key, int value, unsigned mask);
   void setKey(int64 time, int value, unsigned mask);
-  int getConstValue() const { return static_cast<int>(m_default[0]); }
+  int getConstValue() const;
   void setConstValue(int value, bool notify);
 };
 

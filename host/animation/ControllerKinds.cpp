@@ -69,6 +69,7 @@ int IntController::getValue(int64 time) const { return rounded(first(*this, time
 int IntController::getKeyValue(int key) const { return rounded(firstOfKey(*this, key)); }
 void IntController::setKeyValue(int key, int value, unsigned mask) { writeKey(key, scalar(value), mask); }
 void IntController::setKey(int64 time, int value, unsigned mask) { writeKeyAt(time, scalar(value), mask); }
+int IntController::getConstValue() const { return rounded(m_default[0]); }
 void IntController::setConstValue(int value, bool) { setDefaultValues(scalar(value)); }
 
 bool BoolController::getValue(int64 time) const { return first(*this, time) != 0; }

@@ -75,6 +75,7 @@ void TalixRotation::getAsEuler(RotOrder order, Vec3& angles) const {
     angles[i] = std::atan2(-s * entry(j, k), entry(j, j));
     angles[k] = 0;
   }
+  for (int axis = 0; axis < 3; ++axis) angles[axis] += 0.0;  // no angle is -0
 }
 
 void TalixRotation::setAsVector(Vec3 rotationVector) {

@@ -21,6 +21,8 @@ class TalixRotation {
     product *= other;
     return product;
   }
+  // The same quaternion, digit by digit.
+  bool operator==(TalixRotation const&) const = default;
   TalixRotation inverse() const;
   Vec3 rotate(Vec3 const& v) const;
 

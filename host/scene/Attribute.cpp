@@ -108,6 +108,10 @@ void Attribute::releaseFrom(Value const& value) {
 void Attribute::store(Value value, bool set, bool react) {
   referTo(value);
   releaseFrom(m_value);
+  put(std::move(value), set, react);
+}
+
+void Attribute::put(Value value, bool set, bool react) {
   m_value = std::move(value);
   m_set = set;
   if (react && m_reaction && m_module) m_reaction(*m_module, *this);
@@ -120,14 +124,14 @@ void Attribute::change(Value value, bool, bool react, bool markSet) {
 void Attribute::unset(bool, bool, bool react) { store(m_default, false, react); }
 
 void Attribute::forget(Module* module) {
-  if (auto* modules = std::get_if<Modules>(&m_value)) {
-    Modules others;
-    std::copy_if(modules->begin(), modules->end(), std::back_inserter(others),
-                 [&](Module* other) { return other != module; });
-    store(std::move(others), m_set, true);
-  } else {
-    store(static_cast<Module*>(nullptr), m_set, true);
-  }
+  auto const* modules = std::get_if<Modules>(&m_value);
+  if (!modules) return store(static_cast<Module*>(nullptr), m_set, true);
+  // The others are referred to as before: releasing and taking them all would cost too much in a long list.
+  Modules others;
+  others.reserve(modules->size());
+  std::remove_copy(modules->begin(), modules->end(), std::back_inserter(others), module);
+  for (size_t gone = modules->size() - others.size(); gone > 0; --gone) release(module);
+  put(std::move(others), m_set, true);
 }
 
 bool IntAttribute::setValue(int value, bool, bool notify, bool react, bool markSet) {

@@ -71,7 +71,7 @@ class Attribute : public HObject, private ModuleReferrer {
   // The raw value, for copies, files and undo.
   Value const& getRawValue() const { return m_value; }
   Value const& getRawDefault() const { return m_default; }
-  // The mutator: every change of any attribute passes here.
+  // Puts a value in place, with the references that it holds.
   virtual void store(Value value, bool set, bool react);
 
  protected:
@@ -86,6 +86,8 @@ class Attribute : public HObject, private ModuleReferrer {
  private:
   friend class Module;
 
+  // The mutator: every change of any attribute passes here.
+  void put(Value value, bool set, bool react);
   void forget(Module* module) override;
   void referTo(Value const& value);
   void releaseFrom(Value const& value);

@@ -3,18 +3,12 @@
 
 #include "host/scene/Node.h"
 
-class Marker;
 class SolvingSetup;
 
 class Character : public Node {
   H_DECLARE_CLASS(Character, Node)
 
  public:
-  // The i-th marker among the direct children, in child order; null beyond them.
-  Marker* getMarkerChild(int i) const;
-  int getNumMarkerChildren() const;
-  // Index of the marker child of that name, -1: none.
-  int findMarkerChild(HString const& name) const;
   // The first solving setup among the children. create: one is made when there is none.
   SolvingSetup* getSolvingSetup(bool create);
 

@@ -111,6 +111,7 @@ void Database::leave(Module* module) {
       for (int i = 0; i < other->getNumChannels(); ++i) other->getChannel(i)->forgetClip(clip);
   }
   m_index->remove(module);
+  m_index->forgetParent(module);
   --m_countByClass[module->getRuntimeClass()];
   m_byId.erase(module->getID());
   m_modules.remove(module);
@@ -129,10 +130,7 @@ bool Database::removeFromScene(Module* module, bool, bool, bool, bool) {
   return true;
 }
 
-void Database::releaseRemoved() {
-  // Children stand before their parents.
-  while (!m_removed.empty()) m_removed.pop_back();
-}
+void Database::releaseRemoved() { m_removed.clear(); }
 
 Module* Database::getModule(ControlID& id) const {
   const auto found = m_byId.find(id);
@@ -196,15 +194,20 @@ NLEClip* Database::getClipAfter(NLEClip const* clip) const {
   return next < getNumClips() ? m_clips.at(next) : nullptr;
 }
 
-void Database::setActiveClip(NLEClip* clip) {
+void Database::storeActive(NLEClip* clip, int layer) {
+  const bool switched = clip != m_activeClip;
   m_activeClip = clip;
-  m_activeLayer = 0;
-  Node::forgetWorldCache();
+  m_activeLayer = layer;
+  if (switched) Node::forgetWorldCache();
+}
+
+void Database::setActiveClip(NLEClip* clip) {
+  if (!clip || clip->isInScene()) storeActive(clip, 0);
 }
 
 bool Database::setActiveLayer(int layer) {
   if (!m_activeClip || layer < 0 || layer >= m_activeClip->getNumLayers()) return false;
-  m_activeLayer = layer;
+  storeActive(m_activeClip, layer);
   return true;
 }
 

@@ -74,7 +74,10 @@ class Database {
   // --- priority
   // ------------------------------------------------------------------------------------------------
   Module* getPriorityModule() const { return m_priority; }
-  void setPrioritySearchModule(Module* module) { m_priority = module; }
+  // Null: none. A module that is not in the scene is not taken.
+  void setPrioritySearchModule(Module* module) {
+    if (!module || module->isInScene()) m_priority = module;
+  }
 
   // --- clips and layers
   // ----------------------------------------------------------------------------------------
@@ -82,7 +85,8 @@ class Database {
   NLEClip* getHeadClip() const { return m_clips.getCount() ? m_clips.at(0) : nullptr; }
   NLEClip* getClipAfter(NLEClip const* clip) const;
   NLEClip* getActiveClip() const { return m_activeClip; }  // null: the base clip
-  void setActiveClip(NLEClip* clip);                       // its lowest layer becomes active
+  // Its lowest layer becomes active. A clip that is not in the scene is not taken.
+  void setActiveClip(NLEClip* clip);
   int getActiveLayer() const { return m_activeClip ? m_activeLayer : -1; }
   bool setActiveLayer(int layer);  // false: the active clip has no such layer
 
@@ -126,6 +130,7 @@ class Database {
   // Mutators of membership: put a set-up module with its name and parent into every index, and take it out.
   void enter(Module* module);
   void leave(Module* module);
+  void storeActive(NLEClip* clip, int layer);  // mutator
   void removeAll();
 
   OrderedList<Module, &Module::m_sceneSlot> m_modules;

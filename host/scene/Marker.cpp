@@ -1,5 +1,7 @@
 #include "host/scene/Marker.h"
 
+#include <cmath>
+
 #include "host/scene/Character.h"
 #include "host/scene/Database.h"
 
@@ -26,8 +28,15 @@ void Marker::setFillType(int64 const& time, EFillType const& type, bool) {
   channel->endDataEdit();
 }
 
-// Each key speaks for its own time only: without one the data was recorded.
+// Each key speaks for its own time only: without one the data was recorded. Fill types of layers do not add
+// up, the highest layer's says.
 Marker::EFillType Marker::getFillType(int64 time) const {
-  auto const* channel = static_cast<IntController const*>(getChannel("FillType"));
-  return channel && channel->hasKeyAt(time) ? static_cast<EFillType>(channel->getValue(time)) : Recorded;
+  NLEClip const* clip = g_db->getActiveClip();
+  Controller const* channel = getChannel("FillType");
+  for (int layer = clip && channel ? clip->getNumLayers() : 0; layer-- > 0;) {
+    KeyTrack const* track = channel->findTrack(clip, layer);
+    const int64 key = track ? track->find(time) : -1;
+    if (key >= 0) return static_cast<EFillType>(std::lround(track->at(key).values[0]));
+  }
+  return Recorded;
 }

@@ -8,7 +8,7 @@ class Marker : public Node {
 
  public:
   // How the data at a time came about, as the integer channel "FillType" keys it.
-  enum EFillType { Recorded = 0, Filled = 1, EditedByHand = 2, Resampled = 3, Reduced = 4 };
+  enum EFillType : int { Recorded = 0, Filled = 1, EditedByHand = 2, Resampled = 3, Reduced = 4 };
 
   // A marker that is not in the scene yet: Database::addToScene puts it there, or the caller deletes it.
   static Marker* createInstance();

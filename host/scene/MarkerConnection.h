@@ -11,7 +11,6 @@ class MarkerConnection {
   explicit MarkerConnection(Node* target) : m_target(target), m_color(getDefaultColor()) {}
 
   Node* getTarget() const { return m_target; }
-  void setTarget(Node* target) { m_target = target; }
   // Red, green and blue, 0 to 255.
   Vec3 getConnectingColor() const { return m_color; }
   void setConnectingColor(Vec3 color) { m_color = color; }

@@ -8,19 +8,25 @@
 
 H_DEFINE_ABSTRACT_CLASS(Module);
 
-// Children in order; the nodes among them have a list of their own once there is a child that is none.
+// Children in order; the nodes and the markers among them once more, so that these are found as fast.
 struct Module::Children {
   OrderedList<Module, &Module::m_childSlot> all;
   OrderedList<Module, &Module::m_nodeChildSlot> nodes;
+  OrderedList<Module, &Module::m_markerChildSlot> markers;
+
+  template <class Edit>
+  void editFor(Module* child, Edit edit) {
+    edit(all);
+    if (child->isKindOf(&Node::s_classNode)) edit(nodes);
+    if (child->isKindOf(&Marker::s_classMarker)) edit(markers);
+  }
 };
 
 struct Module::DataEdit {
   int depth = 0;
   struct Before {
     Controller* channel;
-    decltype(Controller::m_tracks) tracks;  // snapshots
-    Controller::Values byDefault;
-    Interpolation interpolation;
+    Controller::State state;
   };
   std::vector<Before> before;
 };
@@ -36,6 +42,10 @@ void ModuleReferrer::release(Module* module) {
   if (!module) return;
   const auto found = module->m_referrers->find(this);
   if (--found->second == 0) module->m_referrers->erase(found);
+}
+
+bool ModuleReferrer::refersTo(Module const* module) const {
+  return module && module->m_referrers && module->m_referrers->contains(const_cast<ModuleReferrer*>(this));
 }
 
 void Module::forgetByAll() {
@@ -123,6 +133,24 @@ int Module::getNumNodeChildren() const { return m_children ? m_children->nodes.g
 
 Node* Module::getNodeChild(int i) const { return static_cast<Node*>(m_children->nodes.at(i)); }
 
+int Module::getNumMarkerChildren() const { return m_children ? m_children->markers.getCount() : 0; }
+
+Marker* Module::getMarkerChild(int i) const {
+  return i >= 0 && i < getNumMarkerChildren() ? static_cast<Marker*>(m_children->markers.at(i)) : nullptr;
+}
+
+int Module::findMarkerChild(HString const& name) const {
+  int found = -1;
+  const auto visit = [&](Module* child) {
+    if (!child->isKindOf(&Marker::s_classMarker)) return true;
+    const int index = m_children->markers.indexOf(child);
+    if (found < 0 || index < found) found = index;
+    return true;
+  };
+  if (m_children) g_db->getIndex().forEachChild(this, name.GetString(), visit);
+  return found;
+}
+
 Node* Module::getNodeParent() const {
   Module* ancestor = m_parent;
   while (ancestor && !ancestor->isKindOf(&Node::s_classNode)) ancestor = ancestor->m_parent;
@@ -142,8 +170,13 @@ bool Module::isDescendedFrom(Module const* ancestor) const {
 }
 
 void Module::getModAndDecedents(TSimpleArray<Module*>& out) {
-  out.add(this);
-  for (int i = 0; i < getNumChildren(); ++i) getChild(i)->getModAndDecedents(out);
+  std::vector<Module*> open{this};
+  while (!open.empty()) {
+    Module* next = open.back();
+    open.pop_back();
+    out.add(next);
+    for (int i = next->getNumChildren(); i-- > 0;) open.push_back(next->getChild(i));
+  }
 }
 
 bool Module::addChild(Module* child) {
@@ -163,16 +196,9 @@ bool Module::removeChild(Module* child, bool) {
 void Module::storeParent(Module* parent) {
   const bool indexed = isInScene();
   if (indexed) g_db->getIndex().remove(this);
-  const bool node = isKindOf(&Node::s_classNode);
-  if (m_parent) {
-    m_parent->m_children->all.remove(this);
-    if (node) m_parent->m_children->nodes.remove(this);
-  }
+  if (m_parent) m_parent->children().editFor(this, [this](auto& list) { list.remove(this); });
   m_parent = parent;
-  if (m_parent) {
-    m_parent->children().all.append(this);
-    if (node) m_parent->children().nodes.append(this);
-  }
+  if (m_parent) m_parent->children().editFor(this, [this](auto& list) { list.append(this); });
   if (indexed) g_db->getIndex().add(this);
   Node::markMoved(this);
 }
@@ -257,9 +283,7 @@ HTimeRange Module::getDataRange() const {
 void Module::beginDataEdit(HTimeRange const& range) {
   if (!m_dataEdit) {
     m_dataEdit = std::make_unique<DataEdit>();
-    for (auto const& channel : m_channels)
-      m_dataEdit->before.push_back(
-          {channel.get(), channel->m_tracks, channel->m_default, channel->m_interpolation});
+    for (auto const& channel : m_channels) m_dataEdit->before.push_back({channel.get(), channel->getState()});
   }
   ++m_dataEdit->depth;
   for (DataEdit::Before const& before : m_dataEdit->before) before.channel->beginDataEdit(range);
@@ -274,11 +298,9 @@ void Module::endDataEdit() {
 
 void Module::discardDataEdit() {
   if (!m_dataEdit) return;
-  for (DataEdit::Before& before : m_dataEdit->before) {
-    before.channel->m_tracks = before.tracks;
-    before.channel->m_default = before.byDefault;
-    before.channel->m_interpolation = before.interpolation;
-  }
+  for (DataEdit::Before const& before : m_dataEdit->before) before.channel->restore(before.state);
+  // Channels that were added meanwhile held no keys.
+  for (size_t i = m_dataEdit->before.size(); i < m_channels.size(); ++i) m_channels[i]->storeTracks({});
   endDataEdit();
 }
 

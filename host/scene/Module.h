@@ -17,6 +17,7 @@
 #include "host/scene/OrderedList.h"
 
 class Character;
+class Marker;
 class NLEClip;
 class Node;
 
@@ -60,6 +61,11 @@ class Module : public HObject {
   Node* getNodeParent() const;
   int getNumNodeChildren() const;
   Node* getNodeChild(int i) const;
+  // The i-th marker among the direct children, in child order; null beyond them.
+  Marker* getMarkerChild(int i) const;
+  int getNumMarkerChildren() const;
+  // Index of the first marker child of that name, -1: none.
+  int findMarkerChild(HString const& name) const;
   Character* getCharacterParent() const;  // the nearest ancestor that is a character
   bool isDescendedFrom(Module const* ancestor) const;
   // This module and all below it, parents first.
@@ -155,6 +161,7 @@ class Module : public HObject {
   std::unique_ptr<Children> m_children;  // null: none yet
   uint32 m_childSlot = kNoSlot;
   uint32 m_nodeChildSlot = kNoSlot;
+  uint32 m_markerChildSlot = kNoSlot;
   uint32 m_sceneSlot = kNoSlot;
   uint32 m_selectionSlot = kNoSlot;
   uint64 m_order = 0;  // of creation

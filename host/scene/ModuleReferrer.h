@@ -13,4 +13,5 @@ class ModuleReferrer {
   // Each pointer held counts as one reference; null modules are passed over.
   void refer(Module* module);
   void release(Module* module);
+  bool refersTo(Module const* module) const;  // constant time
 };

@@ -1,5 +1,6 @@
 #include "host/scene/Node.h"
 
+#include <algorithm>
 #include <cmath>
 
 #include "host/scene/Database.h"
@@ -54,6 +55,8 @@ Placement Placement::seen(Placement const& other) const {
 void Node::forgetWorldCache() { ++s_cache.epoch; }
 
 void Node::markMoved(Module* module) {
+  auto const* top = objectAs<Node>(module);
+  if (top && top->m_worldEpoch != s_cache.epoch) return;
   std::vector<Module*> open{module};
   while (!open.empty()) {
     Module* next = open.back();
@@ -72,18 +75,22 @@ Placement Node::getWorldPlacement(int64 time) const {
     ++s_cache.epoch;
   }
   if (m_worldEpoch == s_cache.epoch) return m_world;
-  std::vector<Node const*> chain;
-  Node const* known = this;
-  while (known && known->m_worldEpoch != s_cache.epoch) {
-    chain.push_back(known);
-    known = known->getNodeParent();
-  }
+  Node const* parent = getNodeParent();
+  if (!parent || parent->m_worldEpoch == s_cache.epoch) return placeBelow(parent, time);
+  std::vector<Node const*> chain{this};
+  for (; parent && parent->m_worldEpoch != s_cache.epoch; parent = parent->getNodeParent())
+    chain.push_back(parent);
   for (auto node = chain.rbegin(); node != chain.rend(); ++node) {
-    const Placement own = (*node)->inParent(time);
-    (*node)->m_world = known ? known->m_world * own : own;
-    (*node)->m_worldEpoch = s_cache.epoch;
-    known = *node;
+    (*node)->placeBelow(parent, time);
+    parent = *node;
   }
+  return m_world;
+}
+
+Placement const& Node::placeBelow(Node const* parent, int64 time) const {
+  const Placement own = inParent(time);
+  m_world = parent ? parent->m_world * own : own;
+  m_worldEpoch = s_cache.epoch;
   return m_world;
 }
 
@@ -173,9 +180,10 @@ Placement Node::constInParent() const {
 }
 
 Placement Node::constWorld() const {
-  Placement world = constInParent();
-  for (Node const* node = getNodeParent(); node; node = node->getNodeParent())
-    world = node->constInParent() * world;
+  std::vector<Node const*> chain;
+  for (Node const* node = this; node; node = node->getNodeParent()) chain.push_back(node);
+  Placement world;
+  for (auto node = chain.rbegin(); node != chain.rend(); ++node) world = world * (*node)->constInParent();
   return world;
 }
 
@@ -307,37 +315,42 @@ void Node::setPreTranslationWS(Vec3 const& translation) {
 
 Vec3 MarkerConnection::getDefaultColor() { return {128, 128, 128}; }
 
-MarkerConnection const* Node::findLine(Node const* target) const {
-  for (MarkerConnection const& line : m_lines)
-    if (line.getTarget() == target) return &line;
-  return nullptr;
+namespace {
+
+template <class Lines>
+auto findLine(Lines& lines, Node const* target) {
+  return std::find_if(lines.begin(), lines.end(), [&](auto& line) { return line.getTarget() == target; });
 }
+
+}  // namespace
 
 MarkerConnection* Node::getConnectionTo(Node const* target) {
-  return const_cast<MarkerConnection*>(findLine(target));
+  return isConnectedTo(target) ? &*findLine(m_lines, target) : nullptr;
 }
 
-void Node::storeLines(std::vector<MarkerConnection> lines) {
-  for (MarkerConnection const& line : lines) refer(line.getTarget());
-  for (MarkerConnection const& line : m_lines) release(line.getTarget());
-  m_lines = std::move(lines);
+void Node::storeLine(Node* target, MarkerConnection const* line) {
+  const bool known = isConnectedTo(target);
+  if (line && known) {
+    *findLine(m_lines, target) = *line;
+  } else if (line) {
+    m_lines.push_back(*line);
+    refer(target);
+  } else if (known) {
+    m_lines.erase(findLine(m_lines, target));
+    release(target);
+  }
 }
 
 void Node::addConnectingLine(MarkerConnection const& line) {
-  std::vector<MarkerConnection> lines = m_lines;
-  std::erase_if(lines, [&](MarkerConnection const& other) { return other.getTarget() == line.getTarget(); });
-  lines.push_back(line);
-  storeLines(std::move(lines));
+  if (line.getTarget()) storeLine(line.getTarget(), &line);
 }
 
 void Node::removeConnectingLine(MarkerConnection const& line) { removeConnectingLine(line.getTarget()); }
 
-void Node::removeConnectingLine(Node* target) {
-  std::vector<MarkerConnection> lines = m_lines;
-  std::erase_if(lines, [&](MarkerConnection const& line) { return line.getTarget() == target; });
-  storeLines(std::move(lines));
-}
+void Node::removeConnectingLine(Node* target) { storeLine(target, nullptr); }
 
-void Node::resetAllLines() { storeLines({}); }
+void Node::resetAllLines() {
+  while (!m_lines.empty()) storeLine(m_lines.front().getTarget(), nullptr);
+}
 
 void Node::forget(Module* module) { removeConnectingLine(static_cast<Node*>(module)); }

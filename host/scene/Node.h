@@ -17,7 +17,8 @@ struct Placement {
   TalixRotation rotation;
   Vec3 scale{1, 1, 1};
 
-  // A frame given in this one, in the frame that this one is given in.
+  // A frame given in this one, in the frame that this one is given in. Frames do not shear, so with uneven
+  // scales it matters where a product begins: at the root.
   Placement operator*(Placement const& inner) const;
   // A frame given beside this one, as seen from this one. Along an axis of scale 0 everything is at 0.
   Placement seen(Placement const& other) const;
@@ -104,7 +105,10 @@ class Node : public Module, private ModuleReferrer {
 
   // --- connecting lines
   // ----------------------------------------------------------------------------------------
-  bool isConnectedTo(Node const* target) const { return findLine(target) != nullptr; }
+  bool isConnectedTo(Node const* target) const { return refersTo(target); }
+  int getNumConnectingLines() const { return static_cast<int>(m_lines.size()); }
+  MarkerConnection const& getConnectingLine(int i) const { return m_lines[static_cast<size_t>(i)]; }
+  // For reading: a line with another colour is added in place of the former one.
   MarkerConnection* getConnectionTo(Node const* target);
   // Replaces a line to the same target.
   void addConnectingLine(MarkerConnection const& line);
@@ -122,9 +126,11 @@ class Node : public Module, private ModuleReferrer {
   friend class Selection;
 
   void forget(Module* module) override;
-  MarkerConnection const* findLine(Node const* target) const;
   void storePreTransform(Vec3 const& translation, TalixRotation const& rotation);  // mutator
-  void storeLines(std::vector<MarkerConnection> lines);                            // mutator
+  // Mutator: the line to a target, null for none.
+  void storeLine(Node* target, MarkerConnection const* line);
+  // Caches this node's world frame; the parent's (null: none) holds already.
+  Placement const& placeBelow(Node const* parent, int64 time) const;
   // The frame of this node in its parent node's frame.
   Placement inParent(int64 time) const;
   Placement constInParent() const;

@@ -35,6 +35,30 @@ int trailingNumber(std::string_view name, std::string_view& base) {
 
 }  // namespace
 
+void SceneIndex::ByAge::insert(Module* module) {
+  if (empty()) {
+    m_only = module;
+    return;
+  }
+  if (!m_several) {
+    m_several = std::make_unique<std::set<Module*, Earlier>>();
+    m_several->insert(m_only);
+    m_only = nullptr;
+  }
+  m_several->insert(m_several->end(), module);  // most often the last
+}
+
+void SceneIndex::ByAge::erase(Module* module) {
+  if (!m_several) {
+    m_only = nullptr;
+    return;
+  }
+  m_several->erase(module);
+  if (m_several->size() > 1) return;
+  m_only = *m_several->begin();
+  m_several.reset();
+}
+
 void SceneIndex::add(Module* module) {
   const auto insert = [&](auto& map, auto makeKey) {
     auto found = map.find(makeKey(std::string_view(module->m_name.GetString())));
@@ -43,9 +67,7 @@ void SceneIndex::add(Module* module) {
       const std::string_view text = *name;
       found = map.emplace(makeKey(text), Bucket{std::move(name), {}}).first;
     }
-    auto& modules = found->second.modules;
-    const auto later = [](Module const* a, Module const* b) { return a->m_order < b->m_order; };
-    modules.insert(std::upper_bound(modules.begin(), modules.end(), module, later), module);
+    found->second.modules.insert(module);
   };
   insert(m_byName, [](std::string_view name) { return name; });
   insert(m_byParent, [&](std::string_view name) { return ChildKey{module->m_parent, name}; });
@@ -54,51 +76,63 @@ void SceneIndex::add(Module* module) {
 void SceneIndex::remove(Module* module) {
   const auto erase = [&](auto& map, auto const& key) {
     const auto found = map.find(key);
-    auto& modules = found->second.modules;
-    const auto earlier = [](Module const* a, Module const* b) { return a->m_order < b->m_order; };
-    modules.erase(std::lower_bound(modules.begin(), modules.end(), module, earlier));
-    if (modules.empty()) map.erase(found);
+    found->second.modules.erase(module);
+    if (found->second.modules.empty()) map.erase(found);
   };
   const std::string_view name = module->m_name.GetString();
   erase(m_byName, name);
   erase(m_byParent, ChildKey{module->m_parent, name});
   freeNumber(module->m_parent, name);
-  m_nextNumber.erase(module);
 }
 
-SceneIndex::Bucket const* SceneIndex::bucket(std::string_view name) const {
+SceneIndex::ByAge const* SceneIndex::modulesNamed(std::string_view name) const {
   const auto found = m_byName.find(name);
-  return found == m_byName.end() ? nullptr : &found->second;
+  return found == m_byName.end() ? nullptr : &found->second.modules;
+}
+
+SceneIndex::ByAge const* SceneIndex::childrenNamed(Module const* parent, std::string_view name) const {
+  const auto found = m_byParent.find(ChildKey{parent, name});
+  return found == m_byParent.end() ? nullptr : &found->second.modules;
 }
 
 Module* SceneIndex::findChild(Module const* parent, std::string_view name) const {
-  const auto found = m_byParent.find(ChildKey{parent, name});
-  return found == m_byParent.end() ? nullptr : found->second.modules.front();
+  ByAge const* children = childrenNamed(parent, name);
+  return children ? children->first() : nullptr;
+}
+
+// Calls visit(module) for the modules to which these names lead from a module (null: the root) down, until it
+// answers false; answers whether it never did.
+template <class Visit>
+bool SceneIndex::forEachBelow(Module* top, std::span<std::string_view const> names, Visit visit) const {
+  std::vector<std::pair<Module*, size_t>> open{{top, 0}};
+  while (!open.empty()) {
+    const auto [module, depth] = open.back();
+    open.pop_back();
+    if (depth == names.size()) {
+      if (!visit(module)) return false;
+      continue;
+    }
+    forEachChild(module, names[depth], [&, next = depth + 1](Module* child) {
+      open.emplace_back(child, next);
+      return true;
+    });
+  }
+  return true;
 }
 
 Module* SceneIndex::findFull(std::string_view path, HRuntimeClass const* filter, Module const* below) const {
   if (path.empty() || path.front() != '\\') return nullptr;
   const std::vector<std::string_view> names = splitPath(path.substr(1));
-  // Siblings may share a name, so each level may have several modules.
-  std::vector<Module const*> parents{nullptr};
+  // Siblings may share a name, so several modules may have the path.
   Module* first = nullptr;
-  for (size_t level = 0; level < names.size(); ++level) {
-    std::vector<Module const*> next;
-    for (Module const* parent : parents) {
-      const auto found = m_byParent.find(ChildKey{parent, names[level]});
-      if (found == m_byParent.end()) continue;
-      if (level + 1 < names.size()) {
-        next.insert(next.end(), found->second.modules.begin(), found->second.modules.end());
-        continue;
-      }
-      for (Module* module : found->second.modules) {
-        if (!passes(module, filter) || !isBelow(module, below)) continue;
-        if (!first || module->m_order < first->m_order) first = module;
-        break;  // the others were created later
-      }
-    }
-    parents = std::move(next);
-  }
+  forEachBelow(nullptr, std::span(names).first(names.size() - 1), [&](Module* parent) {
+    forEachChild(parent, names.back(), [&](Module* module) {
+      if (!passes(module, filter) || !isBelow(module, below)) return true;
+      if (!first || module->m_order < first->m_order) first = module;
+      return false;  // its siblings of that name were created later
+    });
+    return true;
+  });
   return first;
 }
 
@@ -106,31 +140,21 @@ Module* SceneIndex::findFull(std::string_view path, HRuntimeClass const* filter,
 // rarer of the first and the last name.
 template <class Visit>
 void SceneIndex::forEachWithSuffix(std::vector<std::string_view> const& names, Visit visit) const {
-  Bucket const* tops = bucket(names.front());
-  Bucket const* ends = bucket(names.back());
+  ByAge const* tops = modulesNamed(names.front());
+  ByAge const* ends = modulesNamed(names.back());
   if (!tops || !ends) return;
-  if (names.size() == 1 || ends->modules.size() <= tops->modules.size()) {
-    for (Module* module : ends->modules) {
-      Module const* ancestor = module;
-      size_t left = names.size();
-      while (left > 0 && ancestor && ancestor->m_name.GetString() == names[left - 1])
-        ancestor = ancestor->m_parent, --left;
-      if (left == 0 && !visit(module)) return;
-    }
+  if (ends->size() > tops->size()) {
+    const std::span<std::string_view const> rest = std::span(names).subspan(1);
+    tops->forEach([&](Module* top) { return forEachBelow(top, rest, visit); });
     return;
   }
-  std::vector<Module*> level = tops->modules, next;
-  for (size_t i = 1; i < names.size(); ++i) {
-    next.clear();
-    for (Module const* parent : level) {
-      const auto found = m_byParent.find(ChildKey{parent, names[i]});
-      if (found != m_byParent.end())
-        next.insert(next.end(), found->second.modules.begin(), found->second.modules.end());
-    }
-    level.swap(next);
-  }
-  for (Module* module : level)
-    if (!visit(module)) return;
+  ends->forEach([&](Module* module) {
+    Module const* ancestor = module;
+    size_t left = names.size();
+    while (left > 0 && ancestor && ancestor->m_name.GetString() == names[left - 1])
+      ancestor = ancestor->m_parent, --left;
+    return left > 0 || visit(module);
+  });
 }
 
 Module* SceneIndex::findSuffix(std::string_view path, HRuntimeClass const* filter,
@@ -160,21 +184,27 @@ int SceneIndex::levelsToTell(Module const* module, Module const* below) const {
 
 HString SceneIndex::freeName(Module const* parent, HString const& wanted) {
   if (!findChild(parent, wanted.GetString())) return wanted;
-  int& next = m_nextNumber[parent].try_emplace(wanted.GetString(), 1).first->second;
-  while (true) {
-    HString name(wanted.GetString() + "_" + std::to_string(next));
-    if (!findChild(parent, name.GetString())) return name;
-    ++next;
+  Numbers& numbers = m_numbers[parent][wanted.GetString()];
+  const auto isFree = [&](int number, HString& name) {
+    name = HString(wanted.GetString() + "_" + std::to_string(number));
+    return !findChild(parent, name.GetString());
+  };
+  HString name;
+  while (!numbers.freed.empty()) {
+    if (isFree(*numbers.freed.begin(), name)) return name;
+    numbers.freed.erase(numbers.freed.begin());  // taken since
   }
+  while (!isFree(numbers.next, name)) ++numbers.next;
+  return name;
 }
 
-// A name has become free below a parent: numbers are counted from it again.
+// A name has become free below a parent.
 void SceneIndex::freeNumber(Module const* parent, std::string_view name) {
-  const auto numbers = m_nextNumber.find(parent);
-  if (numbers == m_nextNumber.end()) return;
+  const auto numbers = m_numbers.find(parent);
+  if (numbers == m_numbers.end()) return;
   std::string_view base;
   const int number = trailingNumber(name, base);
   if (number == 0) return;
-  const auto next = numbers->second.find(std::string(base));
-  if (next != numbers->second.end()) next->second = std::min(next->second, number);
+  const auto known = numbers->second.find(std::string(base));
+  if (known != numbers->second.end() && number < known->second.next) known->second.freed.insert(number);
 }

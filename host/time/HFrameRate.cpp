@@ -75,7 +75,7 @@ HString HFrameRate::timecodeFromFrame(int64 frame) const {
   const int64 counted = countedFrames();
   const bool drop = m_standard == NTSC_DROP;
   const char* sign = frame < 0 ? "-" : "";
-  int64 number = frame < 0 ? -std::max(frame, -INT64_MAX) : frame;
+  int64 number = std::abs(std::clamp(frame, -kForever, kForever));
   if (drop) number = DropCount(counted).numberOf(number);
   const int64 seconds = number / counted;
   HString text;

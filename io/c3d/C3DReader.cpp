@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <cctype>
 #include <cmath>
 #include <filesystem>
@@ -46,6 +47,7 @@ class Reader {
     findUpAxis();
     makePoints();
     makeAnalogChannels();
+    tellOtherGroups();
     const C3DDataCounts counts = readC3DData(m_file, m_bytes.processor(), m_layout, pointTargets(),
                                              analogTargets(), m_take.analogRate);
     tellCounts(counts);
@@ -109,6 +111,19 @@ class Reader {
       m_take.points.push_back(std::move(point));
     }
     if (unnamed) info(std::to_string(unnamed) + " points have no label");
+  }
+
+  // A take has no place for other groups, so a file written from it lacks them.
+  void tellOtherGroups() {
+    static constexpr std::string_view kRead[] = {"POINT", "ANALOG", "EVENT", "TRIAL", "SUBJECTS"};
+    std::string names;
+    for (const C3DGroup& group : parameters().groups) {
+      if (group.parameters.empty() ||
+          std::find(std::begin(kRead), std::end(kRead), group.name) != std::end(kRead))
+        continue;
+      names += (names.empty() ? "" : ", ") + group.name;
+    }
+    if (!names.empty()) info("these parameter groups are not kept: " + names);
   }
 
   size_t pointCount() const { return static_cast<size_t>(m_layout.pointCount); }

@@ -2,6 +2,17 @@
 
 namespace talix {
 
+namespace {
+
+// With or without keys: a marker that was never seen has an empty one.
+bool hasTrack(const Controller& channel, const NLEClip& clip) {
+  for (int layer = 0; layer < clip.getNumLayers(); ++layer)
+    if (channel.findTrack(&clip, layer)) return true;
+  return false;
+}
+
+}  // namespace
+
 void FrameRun::add(int64 frame, const double* values) {
   if (m_count > 0 && frame != m_first + m_count) flush();
   if (m_count == 0) m_first = frame;
@@ -28,11 +39,9 @@ FrameSampler::FrameSampler(const Database& scene, const FrameGrid& grid) : m_sce
 }
 
 bool FrameSampler::belongsToClip(const Controller& channel) const {
-  if (!m_clip) return true;
-  for (int layer = 0; layer < m_clip->getNumLayers(); ++layer)
-    if (channel.findTrack(m_clip, layer)) return true;
+  if (!m_clip || hasTrack(channel, *m_clip)) return true;
   for (const NLEClip* clip = m_scene.getHeadClip(); clip; clip = clip->getNext())
-    if (channel.hasKeysInClip(clip)) return false;
+    if (hasTrack(channel, *clip)) return false;
   return true;
 }
 

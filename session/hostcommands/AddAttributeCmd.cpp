@@ -30,8 +30,9 @@ class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
       return false;
     }
     if (!Module::isValidPropertyName(name)) {
-      logError("%s cannot be the name of an attribute: it must not be empty nor hold a dot or a backslash.",
-               name.GetStr());
+      logError(
+          "\"%s\" cannot be the name of an attribute: it must not be empty nor hold a dot or a backslash.",
+          name.GetStr());
       return false;
     }
     if (module->getProperty(name) || module->getAttribute(name.GetStr())) {
@@ -39,7 +40,11 @@ class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
       return false;
     }
     std::unique_ptr<Attribute> attribute = makeAttribute(*kind, name, args, 3, *module);
-    return attribute && module->addCustomAttribute(std::move(attribute));
+    if (!attribute) return false;
+    Attribute* added = module->addCustomAttribute(std::move(attribute));
+    // Every attribute joins its module as "not set"; one that was given a value is set.
+    if (args.getCount() > 3 && !kind->takesLabels()) added->store(added->getRawValue(), true, false);
+    return true;
   }
 };
 

@@ -53,7 +53,7 @@ class AddChannelCmd final : public ScriptCommand<AddChannelCmd> {
  private:
   static bool mayAdd(Module const& module, HString const& name, Kind const& kind) {
     if (!Module::isValidPropertyName(name)) {
-      logError("%s cannot be the name of a channel: it must not be empty nor hold a dot or a backslash.",
+      logError("\"%s\" cannot be the name of a channel: it must not be empty nor hold a dot or a backslash.",
                name.GetStr());
       return false;
     }

@@ -213,7 +213,7 @@ std::string attributeKindNames() {
 std::unique_ptr<Attribute> makeAttribute(AttributeKind const& kind, HString const& name, Args const& args,
                                          int first, Module const& module) {
   const Values values = flattened(args, first);
-  const bool labelled = kind.type == Attribute::Enumeration || kind.type == Attribute::BitField;
+  const bool labelled = kind.takesLabels();
   Reading reading = Reading::Taken;
   std::unique_ptr<Attribute> attribute;
   if (labelled && !std::all_of(values.begin(), values.end(), isString)) {

@@ -13,6 +13,9 @@ struct AttributeKind {
   char const* name;
   Attribute::Type type;
   char const* values;  // what it takes, for messages
+
+  // Its values are its labels.
+  bool takesLabels() const { return type == Attribute::Enumeration || type == Attribute::BitField; }
 };
 
 AttributeKind const* findAttributeKind(HString const& name);  // null: none

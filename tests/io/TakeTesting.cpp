@@ -27,6 +27,8 @@ TempFolder::TempFolder() {
 TempFolder::~TempFolder() { std::filesystem::remove_all(m_path); }
 
 std::string TempFolder::file(const std::string& name, const std::string& content) const {
+  // Removed first: some file systems flush a file that is cut and written again, which takes milliseconds.
+  std::filesystem::remove(path(name));
   std::ofstream(path(name), std::ios::binary) << content;
   return path(name);
 }

@@ -1,0 +1,244 @@
+// Attributes of every kind, and numbers by name.
+#include <limits>
+
+#include "host/scene/Constraints.h"
+#include "host/scene/Devices.h"
+#include "host/scene/Setups.h"
+#include "tests/host/scene/SceneFixture.h"
+
+namespace {
+
+constexpr double kNan = std::numeric_limits<double>::quiet_NaN();
+
+Attribute::Labels labels(std::vector<HString> texts) {
+  return std::make_shared<std::vector<HString> const>(std::move(texts));
+}
+
+class AttributeTest : public SceneTest {
+ protected:
+  Node* m_node = create<Node>("node");
+
+  template <class T>
+  T* add(char const* name, Attribute::Type type, Attribute::Labels texts = nullptr) {
+    return objectAs<T>(
+        static_cast<HObject*>(m_node->addCustomAttribute(Attribute::create(type, name, std::move(texts)))));
+  }
+  template <class T>
+  static T* attributeOf(Module* module, char const* name) {
+    return objectAs<T>(static_cast<HObject*>(module->getAttribute(name)));
+  }
+};
+
+TEST_F(AttributeTest, EveryKindCanBeAddedSetAndUnset) {
+  for (int type = Attribute::Integer; type <= Attribute::Temperature; ++type) {
+    const HString name("custom" + std::to_string(type));
+    Attribute* attribute = m_node->addCustomAttribute(
+        Attribute::create(static_cast<Attribute::Type>(type), name, labels({"one", "two"})));
+    ASSERT_NE(attribute, nullptr);
+    EXPECT_EQ(attribute->getType(), type);
+    EXPECT_EQ(m_node->getAttribute(name.GetStr()), attribute);
+    EXPECT_EQ(m_node->getAttribute(attribute->getID()), attribute);
+    EXPECT_EQ(attribute->getModule(), m_node);
+    EXPECT_TRUE(attribute->isCustom() && attribute->canBeUnset() && !attribute->isSet());
+    const Attribute::Value before = attribute->getRawValue();
+    attribute->store(before, true, true);
+    EXPECT_TRUE(attribute->isSet());
+    attribute->unset(true, true, true);
+    EXPECT_TRUE(!attribute->isSet() && attribute->getRawValue() == before);
+  }
+}
+
+TEST_F(AttributeTest, ValuesReadBackAndBadOnesAreRefused) {
+  auto* number = add<IntAttribute>("i", Attribute::Integer);
+  EXPECT_TRUE(number->setValue(-7, true, true, true, false));
+  EXPECT_EQ(number->getValue(), -7);
+  EXPECT_FALSE(number->isSet()) << "asked not to be marked";
+  number->takeAsDefault();
+  number->setValue(9, true, true, true, true);
+  number->unset(true, true, true);
+  EXPECT_EQ(number->getValue(), -7);
+
+  auto* choice = add<EnumAttribute>("e", Attribute::Enumeration, labels({"low", "high"}));
+  EXPECT_TRUE(choice->setValue("high", true, true, true, true));
+  EXPECT_FALSE(choice->setValue("High", true, true, true, true));
+  EXPECT_FALSE(choice->setIndex(2, true, true, true, true));
+  EXPECT_FALSE(choice->setIndex(-1, true, true, true, true));
+  EXPECT_TRUE(choice->getIndex() == 1 && choice->getEnumValue() == "high");
+  EXPECT_TRUE(add<EnumAttribute>("none", Attribute::Enumeration)->getEnumValue().IsEmpty());
+
+  auto* bits = add<BitFieldAttribute>("b", Attribute::BitField, labels({"x", "y", "z"}));
+  EXPECT_TRUE(bits->setValue("y", true, true, true, true, true));
+  EXPECT_FALSE(bits->setValue("w", true, true, true, true, true));
+  EXPECT_TRUE(!bits->getField(0) && bits->getField(1) && bits->getField("y") && !bits->getField("w"));
+  EXPECT_TRUE(!bits->getField(-1) && !bits->getField(3) && bits->getLabel(2) == "z");
+
+  auto* real = add<FloatAttribute>("f", Attribute::Float);
+  EXPECT_TRUE(real->setValue(1e300, true, true, true, true));
+  EXPECT_FALSE(real->setValue(kNan, true, true, true, true));
+  EXPECT_EQ(real->getValue(), 1e300);
+  auto* vector = add<VectorAttribute>("v", Attribute::Vector);
+  vector->setValue({1, 2, 3}, true, true, true, true);
+  vector->setValue({1, kNan, 3}, true, true, true, true);
+  EXPECT_EQ(vector->getValue(), Vec3(1, 2, 3));
+  auto* matrix = add<MatrixAttribute>("m", Attribute::MatrixKind);
+  Matrix values(2);
+  values[1][0] = 5;
+  matrix->setValue(values, true, true, true, true);
+  values[0][1] = kNan;
+  matrix->setValue(values, true, true, true, true);
+  EXPECT_TRUE(matrix->getValue().rows() == 2 && matrix->getValue()[1][0] == 5 &&
+              matrix->getValue()[0][1] == 0);
+  auto* text = add<MultiStringAttribute>("t", Attribute::MultiString);
+  text->setValue("a\nb", true, true, true, true);
+  EXPECT_EQ(text->getValue(), "a\nb");
+}
+
+TEST_F(AttributeTest, TimesAreFramesAndTimecode) {
+  HFrameRate rate;
+  rate.setTimecodeStandard(NTSC_DROP);
+  HTimeManager::getInstance()->setFrameRate(rate);
+  auto* moment = add<TimeAttribute>("t", Attribute::Time);
+  moment->setValue(HTimeManager::getInstance()->getTime(1800), true, true, true, true);
+  EXPECT_EQ(moment->getValue(), 1800);
+  EXPECT_EQ(moment->getStringValue(), "00:01:00;02");
+  auto* length = objectAs<TimeAttribute>(static_cast<HObject*>(
+      m_node->addCustomAttribute(std::make_unique<TimeAttribute>(moment->getTime(), true))));
+  EXPECT_EQ(length, nullptr) << "an attribute without a name";
+  TimeAttribute relative(moment->getTime(), true);
+  EXPECT_EQ(relative.getStringValue(), "00:01:00:00");
+  moment->setValue(std::numeric_limits<int64>::min(), true, true, true, true);
+  EXPECT_EQ(moment->getTime(), -kForever);
+}
+
+TEST_F(AttributeTest, NamesRename) {
+  auto* name = attributeOf<StringAttribute>(m_node, "Name");
+  EXPECT_EQ(name->getValue(), "node");
+  EXPECT_TRUE(name->setValue("other", true, true, 0, true, true));
+  EXPECT_EQ(named("\\other"), m_node);
+  EXPECT_FALSE(name->setValue("a\\b", true, true, 0, true, true));
+  EXPECT_FALSE(name->setValue("", true, true, 0, true, true));
+  EXPECT_EQ(name->getValue(), "other");
+}
+
+TEST_F(AttributeTest, NamesOfAttributesAndChannelsDiffer) {
+  EXPECT_EQ(add<IntAttribute>("Translation", Attribute::Integer), nullptr);
+  EXPECT_EQ(add<IntAttribute>("Visible", Attribute::Integer), nullptr);
+  EXPECT_EQ(add<IntAttribute>("a.b", Attribute::Integer), nullptr);
+  EXPECT_EQ(add<IntAttribute>("a\\b", Attribute::Integer), nullptr);
+  EXPECT_EQ(add<IntAttribute>("", Attribute::Integer), nullptr);
+  ASSERT_NE(add<IntAttribute>("visible", Attribute::Integer), nullptr) << "case counts";
+  EXPECT_EQ(m_node->addChannel("visible", DataSource::IntProperty), nullptr);
+  EXPECT_EQ(m_node->addChannel("a.b", DataSource::IntProperty), nullptr);
+}
+
+TEST_F(AttributeTest, BuiltInOnes) {
+  auto* bone = create<SolvingBone>("bone");
+  EXPECT_EQ(bone->getNumDofs(), 3);
+  auto* dofs = bone->getDofs();
+  char const* const names[] = {"Tx", "Ty", "Tz", "Rx", "Ry", "Rz"};
+  for (int i = 0; i < 6; ++i) {
+    EXPECT_EQ(dofs->getLabel(i), names[i]);
+    EXPECT_EQ(dofs->getField(i), i >= 3);
+  }
+  EXPECT_EQ(bone->getMajorAxisIndex(), 0);
+  attributeOf<EnumAttribute>(bone, "MajorAxis")->setValue("Z", true, true, true, true);
+  EXPECT_EQ(bone->getMajorAxisIndex(), 2);
+  EXPECT_EQ(m_node->getNumDofs(), 0);
+
+  EXPECT_TRUE(m_node->setRotationOrder(TalixRotation::ZYX));
+  EXPECT_EQ(attributeOf<EnumAttribute>(m_node, "RotationOrder")->getEnumValue(), "ZYX");
+  EXPECT_FALSE(m_node->getAttribute("RotationOrder")->canBeUnset());
+  EXPECT_TRUE(m_node->isVisible());
+  m_node->setVisible(false, true);
+  EXPECT_FALSE(attributeOf<BoolAttribute>(m_node, "Visible")->getValue());
+
+  auto* color = attributeOf<ColorAttribute>(m_node, "Color");
+  EXPECT_TRUE(color->isDefaultMode() && color->getValue() == Database::getDefaultModColor());
+  color->setValue({1, 2, 3}, true, true, true, true);
+  EXPECT_FALSE(color->isDefaultMode());
+  color->setDefaultMode(true, true);
+  EXPECT_EQ(color->getValue(), Database::getDefaultModColor());
+
+  auto* camera = create<OpticalCamera>("camera");
+  auto* focal = static_cast<FloatController*>(camera->getChannel("FocalLength"));
+  focal->setConstValue(35, true);
+  attributeOf<EventAttribute>(camera, "Reset")->doCallBack();
+  EXPECT_EQ(focal->getConstValue(), 0);
+}
+
+TEST_F(AttributeTest, ConstraintsAndClusters) {
+  auto* target = create<SolvingBone>("bone");
+  auto* constraint = create<LabelingConstraint>("k");
+  ASSERT_TRUE(constraint->setConstraintOffset({1, 0, 0}));
+  EXPECT_FALSE(constraint->setConstraintOffset({kNan, 0, 0}));
+  EXPECT_EQ(constraint->getConstraintOffsetWS(0), Vec3(1, 0, 0));
+  target->setConstLocalPos({10, 0, 0});
+  target->setConstLocalScale({2, 2, 2});
+  target->setConstLocalRot(TalixRotation({0, 0, 1.5707963267948966}), true);
+  constraint->setTarget(target);
+  EXPECT_LT((constraint->getConstraintOffsetWS(0) - Vec3(10, 2, 0)).length(), 1e-12);
+
+  auto* cluster = create<LabelingCluster>("cluster");
+  cluster->setConstLocalPos({0, 5, 0});
+  auto* marker = create<Marker>("m");
+  marker->setConstLocalPos({1, 2, 3});
+  TSimpleArray<Module*> list;
+  for (Module* module : {static_cast<Module*>(marker), static_cast<Module*>(nullptr)}) list.add(module);
+  attributeOf<MultiModAttribute>(cluster, "Markers")->setValue(list, true, true, true, true);
+  const TSimpleArray<Vec3> offsets = cluster->getMarkerOffsets();
+  ASSERT_EQ(offsets.getCount(), 2);
+  EXPECT_EQ(offsets[0], Vec3(1, -3, 3));
+  EXPECT_EQ(offsets[1], Vec3());
+}
+
+TEST_F(AttributeTest, ParametersAreTheNumbersOfASetup) {
+  auto* setup = create<SolvingSetup>("setup");
+  EXPECT_EQ(setup->getNumParameters(), 0);
+  setup->addCustomAttribute(Attribute::create(Attribute::String, "text"));
+  setup->addCustomAttribute(Attribute::create(Attribute::Float, "gain"));
+  setup->addCustomAttribute(Attribute::create(Attribute::Boolean, "on"));
+  attributeOf<FloatAttribute>(setup, "gain")->setValue(0.5, true, true, true, true);
+  ASSERT_EQ(setup->getNumParameters(), 2);
+  EXPECT_EQ(setup->getParameter(0)->getValue(), 0.5);
+  EXPECT_EQ(setup->getParameter("on")->getName(), "on");
+  EXPECT_EQ(setup->getParameter("text"), nullptr);
+  EXPECT_EQ(setup->getParameter(2), nullptr);
+  EXPECT_EQ(setup->getParameter(-1), nullptr);
+}
+
+TEST_F(AttributeTest, NumbersByName) {
+  auto* camera = create<OpticalCamera>("cam");
+  camera->setConstLocalPos({1, 2, 3});
+  camera->setRotationOrder(TalixRotation::ZXY);
+  TalixRotation rotation;
+  rotation.setAsEuler(TalixRotation::ZXY, {0.1, 0.2, 0.3});
+  camera->setConstLocalRot(rotation, true);
+  camera->setDeviceID(4);
+  const auto number = [&](char const* name) {
+    double value = kNan;
+    EXPECT_EQ(camera->getPropertyVal(name, value, false), "") << name;
+    return value;
+  };
+  EXPECT_EQ(number("Translation.y"), 2);
+  EXPECT_EQ(number("Translation.Z"), 3);
+  EXPECT_NEAR(number("Rotation.x"), 0.1 * 180 / 3.141592653589793, 1e-12);
+  EXPECT_EQ(number("Threshold"), 0);
+  EXPECT_EQ(number("DeviceID"), 4);
+  EXPECT_EQ(number("RotationOrder"), 4);
+  EXPECT_EQ(number("Visible"), 1);
+  EXPECT_EQ(number("Temperature"), 0);
+  double value = 5;
+  EXPECT_EQ(camera->getPropertyVal("Rotation", value, false),
+            "Use getVectorProperty for this type of property");
+  EXPECT_EQ(camera->getPropertyVal("Nothing", value, false), "Unknown property type: Nothing");
+  EXPECT_EQ(camera->getPropertyVal("Length", value, false),
+            "Cannot find property named Length on module cam");
+  EXPECT_EQ(value, 5);
+  create<Clip>("clip");
+  camera->setLocalPos(0, {9, 9, 9});
+  EXPECT_EQ(number("Translation.x"), 9);
+  EXPECT_EQ(camera->getPropertyVal("Translation.x", value, true), "");
+  EXPECT_EQ(value, 1) << "the default value";
+}
+
+}  // namespace

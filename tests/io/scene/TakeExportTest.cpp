@@ -1,0 +1,143 @@
+#include <gmock/gmock.h>
+
+#include "host/scene/Bones.h"
+#include "host/scene/Character.h"
+#include "tests/io/scene/SceneTesting.h"
+
+namespace talix {
+
+namespace {
+
+class TakeExportTest : public SceneTest {
+ protected:
+  int64 at100(int64 frame) const { return frame * ticksPerFrameAt(100); }
+  // A blank for each of the frames 1 to 5 without a position.
+  std::string seen(const KeyTrack& track) const {
+    std::string text;
+    for (int64 frame = 1; frame <= 5; ++frame) text += track.find(at100(frame)) >= 0 ? 'x' : ' ';
+    return text;
+  }
+  KeyTrack onlyPoint() {
+    const Take take = save();
+    EXPECT_EQ(take.points.size(), 1u);
+    return take.points.at(0).positions;
+  }
+};
+
+TEST_F(TakeExportTest, ReducedRunsAreDataOtherGapsAreNot) {
+  Take take = smallTake("walk");
+  addPoint(take, "Bob", "M", {0, 0, 0}, "x x x");
+  open(take);
+  auto* marker = at<Marker>("\\Bob\\M");
+  EXPECT_EQ(seen(onlyPoint()), "x x x");
+  marker->setFillType(at100(1), Marker::Reduced, false);
+  EXPECT_EQ(seen(onlyPoint()), "xxx x");
+  EXPECT_EQ(onlyPoint().at(1).values[0], 1);
+  // Behind the last key there is nothing to reduce.
+  marker->setFillType(at100(5), Marker::Reduced, false);
+  marker->getTranslationChannel()->deleteKey(at100(5), KeyTrack::kAll);
+  EXPECT_EQ(seen(onlyPoint()), "xxx  ");
+}
+
+TEST_F(TakeExportTest, LayersAndPartialKeysAreEvaluated) {
+  Take take = smallTake("walk");
+  addPoint(take, "Bob", "M", {0, 0, 0}, "xx xx");
+  open(take);
+  Vec3Controller* channel = at<Marker>("\\Bob\\M")->getTranslationChannel();
+  g_db->getActiveClip()->addLayer();
+  KeyTrack raised(KeyTrack::Shape::Vector);
+  raised.set(at100(3), {0, 0, 7});
+  channel->setTrack(g_db->getActiveClip(), 1, raised);
+  const KeyTrack made = onlyPoint();
+  EXPECT_EQ(seen(made), "xx xx");
+  EXPECT_EQ(Vec3(made.at(3).values.data()), Vec3(4, 0, 7));
+
+  channel->setTrack(g_db->getActiveClip(), 1, KeyTrack(KeyTrack::Shape::Vector));
+  channel->deleteKey(at100(2), 1);  // x comes from its neighbours
+  EXPECT_EQ(onlyPoint().at(1).components, KeyTrack::kAll);
+}
+
+TEST_F(TakeExportTest, KeysOffTheFramesAreLeftOutWithOneWarning) {
+  Take take = smallTake("walk");
+  addPoint(take, "Bob", "M", {0, 0, 0});
+  open(take);
+  KeyTrack track = *at<Marker>("\\Bob\\M")->getTranslationChannel()->findTrack(g_db->getActiveClip(), 0);
+  track.set(at100(2) + 5, {});
+  track.set(at100(9), {});
+  at<Marker>("\\Bob\\M")->getTranslationChannel()->setTrack(g_db->getActiveClip(), 0, track);
+  EXPECT_EQ(onlyPoint().count(), 5);
+  EXPECT_TRUE(warned("2 keys between or outside them were left out"));
+}
+
+TEST_F(TakeExportTest, OnlyWhatBelongsToTheActiveClipGoesOut) {
+  Take first = smallTake("one"), second = smallTake("two");
+  addPoint(first, "Ann", "M", {});
+  addPoint(second, "Bob", "M", {});
+  addPoint(second, "Bob", "never seen", {}, "     ");
+  open(first);
+  open(second);
+  const Take made = save();
+  EXPECT_EQ(differenceOf(second, made), "");
+  g_db->setActiveClip(g_db->getHeadClip());
+  EXPECT_EQ(differenceOf(first, save()), "");
+}
+
+TEST_F(TakeExportTest, WithoutAClipDefaultValuesLastThroughTheRange) {
+  auto* bob = g_db->createModule(&Character::staticClass(), "Bob", nullptr);
+  static_cast<Node*>(g_db->createModule(&Marker::staticClass(), "M", bob))->setConstLocalPos({1, 2, 3});
+  HTimeManager::getInstance()->setAnimRange(HTimeRange(0, 4 * ticksPerFrameAt(120)));
+  const Take take = save();
+  EXPECT_EQ(take.frameCount, 5);
+  ASSERT_EQ(take.points.size(), 1u);
+  EXPECT_EQ(take.points[0].subject, "Bob");
+  EXPECT_EQ(take.points[0].positions.count(), 5);
+  EXPECT_EQ(take.points[0].positions.at(4).values[2], 3);
+}
+
+TEST_F(TakeExportTest, SubjectsAndLabelsFollowTheNamesInTheScene) {
+  Take take = smallTake("walk");
+  addPoint(take, "", "A", {});
+  addPoint(take, "", "", {});
+  open(take);
+  at<Marker>("\\unlabeled")->setName("Wand");
+  EXPECT_EQ(save().points[0].subject, "");
+  EXPECT_EQ(save().points[1].label, "Wand");
+  at<Character>("\\walk")->setName("Bob");
+  EXPECT_EQ(save().points[0].subject, "Bob");
+}
+
+TEST_F(TakeExportTest, MarkersBelowMovingBonesAreInTheWorld) {
+  openFile("two_frames_01.bvh");
+  auto* head = at<SolvingBone>("\\two_frames_01\\Hips\\Chest\\Neck\\Head");
+  auto* marker = static_cast<Marker*>(g_db->createModule(&Marker::staticClass(), "Top", head));
+  marker->setLocalPos(0, {0, 100, 0});
+  const Take made = save();
+  ASSERT_EQ(made.points.size(), 1u);
+  const Vec3 world = marker->getWSPos(0);
+  EXPECT_LT((Vec3(made.points[0].positions.at(0).values.data()) - world).length(), 1e-9);
+  EXPECT_GT((world - Vec3(0, 100, 0)).length(), 1);
+}
+
+TEST_F(TakeExportTest, ChangedBonesGetTheChannelsThatTheyNeed) {
+  openFile("two_frames_01.bvh");
+  auto* chest = at<SolvingBone>("\\two_frames_01\\Hips\\Chest");
+  const size_t index = 1;
+  EXPECT_EQ(save().joints[index].channels.size(), 3u);
+  const Vec3 offset = chest->getPreTranslation();
+  chest->setLocalPos(0, {1, 0, 0});
+  const Take moved = save();
+  EXPECT_TRUE(moved.joints[index].channels.empty());
+  EXPECT_EQ(moved.joints[index].translations.count(), moved.frameCount);
+  EXPECT_EQ(Vec3(moved.joints[index].translations.at(1).values.data()), offset + Vec3(1, 0, 0));
+
+  // A turn before the bone's own shows in its orientation.
+  chest->setPreRotation(TalixRotation(Vec3(0.5, 0, 0)), false);
+  EXPECT_FALSE(moved.joints[index].rotations == save().joints[index].rotations);
+  chest->setConstLocalScale({2, 2, 2});
+  save();
+  EXPECT_TRUE(warned("takes hold no scale of joints; that of 1 joint was left out"));
+}
+
+}  // namespace
+
+}  // namespace talix

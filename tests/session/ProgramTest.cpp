@@ -1,0 +1,171 @@
+// The built program, as its users run it: output, exit statuses, what a failed line stops.
+
+#include <boost/json.hpp>
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sstream>
+#include <sys/wait.h>
+
+namespace {
+
+namespace fs = std::filesystem;
+using testing::HasSubstr;
+
+class ProgramTest : public testing::Test {
+ protected:
+  ProgramTest() {
+    const auto* test = testing::UnitTest::GetInstance()->current_test_info();
+    m_folder = fs::path(testing::TempDir()) / (std::string("talix_") + test->name());
+    fs::remove_all(m_folder);
+    fs::create_directories(m_folder);
+  }
+  ~ProgramTest() override { fs::remove_all(m_folder); }
+
+  // Runs a shell line in the test's folder; "talix" is the program, "$sample" the option for the sample
+  // plug-in.
+  int run(std::string const& line) {
+    const std::string bin = TALIX_BIN;
+    const std::string command = "cd '" + m_folder.string() + "' && talix() { '" + bin +
+                                "/talix' \"$@\"; } && sample='--plugin " + bin + "/sample/Sample.so' && { " +
+                                line + "\n} >out 2>err";
+    const int status = std::system(command.c_str());
+    m_out = text("out");
+    m_err = text("err");
+    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+  }
+  std::string text(std::string const& file) const {
+    std::ostringstream all;
+    all << std::ifstream(m_folder / file).rdbuf();
+    return all.str();
+  }
+  void write(std::string const& file, std::string const& content) const {
+    std::ofstream(m_folder / file) << content;
+  }
+
+  fs::path m_folder;
+  std::string m_out, m_err;
+};
+
+TEST_F(ProgramTest, RunsLinesAndScriptsInTheOrderGiven) {
+  write("two.talix", "\xef\xbb\xbf# two\r\necho 2\r\n\r\necho 3");
+  EXPECT_EQ(run("echo 'echo 5' | talix run $sample -c 'echo 1' two.talix -c 'echo 4' - -c 'echo 6'"), 0);
+  EXPECT_EQ(m_out, "1\n2\n3\n4\n5\n6\n");
+  EXPECT_EQ(m_err, "");
+  EXPECT_EQ(run("talix run $sample"), 0);
+  EXPECT_EQ(m_out + m_err, "");
+}
+
+TEST_F(ProgramTest, AFailedLineStopsTheRunUnlessToldOtherwise) {
+  write("fails.talix", "echo 1\nfail\necho 2\n");
+  EXPECT_EQ(run("talix run $sample fails.talix -c 'echo 3'"), 1);
+  EXPECT_EQ(m_out, "1\n");
+  EXPECT_EQ(m_err, "info: about to fail\nwarning: 100% sure\nerror: failed\n");
+  EXPECT_EQ(run("talix run $sample --keep-going fails.talix -c nothing -c 'echo 3'"), 1);
+  EXPECT_EQ(m_out, "1\n2\n3\n");
+  EXPECT_THAT(m_err, HasSubstr("error: Unknown command: nothing\n"));
+}
+
+TEST_F(ProgramTest, NothingIsSavedAfterAFailedLine) {
+  const std::string scene = "--open '" TALIX_TEST_DATA "/pose_t_01.bvh' --save out.bvh ";
+  EXPECT_EQ(run("talix run $sample " + scene + "-c nothing"), 1);
+  EXPECT_FALSE(fs::exists(m_folder / "out.bvh"));
+  EXPECT_EQ(run("talix run $sample " + scene + "--keep-going -c nothing"), 1);
+  EXPECT_TRUE(fs::exists(m_folder / "out.bvh"));
+  fs::remove(m_folder / "out.bvh");
+  EXPECT_EQ(run("talix run $sample --json " + scene + "-c getTime"), 0) << m_err;
+  EXPECT_TRUE(fs::exists(m_folder / "out.bvh"));
+  EXPECT_EQ(std::count(m_out.begin(), m_out.end(), '\n'), 1) << m_out;
+}
+
+TEST_F(ProgramTest, FilesThatCannotBeUsedAreStatusThree) {
+  EXPECT_EQ(run("talix run $sample --open missing.c3d -c 'echo 1'"), 3);
+  EXPECT_EQ(m_out, "");
+  EXPECT_THAT(m_err, HasSubstr("error: missing.c3d"));
+  EXPECT_EQ(run("talix run $sample -c 'echo 1' missing.talix"), 3);
+  EXPECT_EQ(m_out, "");
+  EXPECT_THAT(m_err, HasSubstr("error: missing.talix"));
+  EXPECT_EQ(run("talix run $sample ."), 3);
+  EXPECT_EQ(run("talix run $sample -c 'echo 1' --save nowhere/out.bvh"), 3);
+  EXPECT_EQ(m_out, "1\n");
+  EXPECT_EQ(run("talix run $sample -c 'open missing.c3d'"), 3);
+  EXPECT_EQ(run("talix run $sample --keep-going -c fail -c 'open missing.c3d'"), 1);
+  EXPECT_EQ(run("talix run --plugin missing.so -c 'echo 1'"), 3);
+  EXPECT_EQ(m_err, "error: missing.so: no such plug-in library\n");
+}
+
+TEST_F(ProgramTest, WrongCommandLinesAreStatusTwo) {
+  for (char const* line :
+       {"talix", "talix walk", "talix run --nothing", "talix run -c", "talix commands $sample nothing"})
+    EXPECT_EQ(run(line), 2) << line;
+  EXPECT_EQ(run("talix --help"), 0);
+  EXPECT_THAT(m_out, HasSubstr("Examples:"));
+  EXPECT_EQ(run("talix run --help"), 0);
+  EXPECT_THAT(m_out, HasSubstr("Exit status:"));
+  EXPECT_EQ(run("talix --version"), 0);
+  EXPECT_THAT(m_out, testing::StartsWith("talix "));
+}
+
+TEST_F(ProgramTest, JsonHasOneObjectForEachLineThatIsRun) {
+  write("some.talix", "# first\necho <1 2.5 3>\n\nfail\nnothing <\n");
+  EXPECT_EQ(run("talix run $sample --json --keep-going some.talix -c 'echo \"a\xff\"' -c 'types 1 a' -c "
+                "'selection'"),
+            1);
+  EXPECT_EQ(m_err, "");
+  const auto line = [](std::string const& file, int number, std::string const& rest) {
+    return boost::json::parse("{\"file\": \"" + file + "\", \"line\": " + std::to_string(number) + ", " +
+                              rest + "}");
+  };
+  const std::vector<boost::json::value> expected = {
+      line("some.talix", 2, R"("command": "echo", "ok": true, "result": [1.0, 2.5, 3.0], "log": [])"),
+      line("some.talix", 4, R"("command": "fail", "ok": false, "result": null, "log": [
+           {"level": "info", "text": "about to fail"}, {"level": "warning", "text": "100% sure"},
+           {"level": "error", "text": "failed"}])"),
+      line("some.talix", 5, R"("command": "nothing", "ok": false, "result": null, "log": [
+           {"level": "error", "text": "Unknown command: nothing"}])"),
+      line("-c", 1, "\"command\": \"echo\", \"ok\": true, \"result\": \"a\xef\xbf\xbd\", \"log\": []"),
+      line("-c", 2, R"("command": "types", "ok": true, "result": [1, 3], "log": [])"),
+      line("-c", 3, R"("command": "selection", "ok": true, "result": [], "log": [])")};
+  std::istringstream out(m_out);
+  std::vector<boost::json::value> found;
+  for (std::string text; std::getline(out, text);) found.push_back(boost::json::parse(text));
+  EXPECT_EQ(found, expected);
+}
+
+TEST_F(ProgramTest, CommandsAreDescribed) {
+  ASSERT_EQ(run("talix commands $sample --json"), 0);
+  const boost::json::value all = boost::json::parse(m_out);
+  EXPECT_EQ(all.as_array().front().at("name"), "echo");
+  EXPECT_EQ(all.as_array().back().at("name"), "help");
+  ASSERT_EQ(run("talix commands $sample --json fail"), 0);
+  EXPECT_EQ(boost::json::parse(m_out), boost::json::parse(R"([{
+      "name": "fail", "displayName": "Fail", "category": "Testing", "subCategory": "", "purpose": "",
+      "syntax": null, "options": [{"name": "text", "args": 0, "type": 0, "mask": 0, "hidden": false},
+                                  {"name": "memory", "args": 0, "type": 0, "mask": 0, "hidden": false}],
+      "returns": 0, "solo": true, "source": "Sample Commands"}])"));
+  ASSERT_EQ(run("talix commands $sample echo"), 0);
+  const std::string page = m_out;
+  ASSERT_EQ(run("talix run $sample -c 'help echo'"), 0);
+  EXPECT_EQ(m_out, page);
+  ASSERT_EQ(run("talix commands $sample"), 0);
+  EXPECT_THAT(m_out, HasSubstr("\nSystem\n"));
+  EXPECT_THAT(m_out, HasSubstr("Moves the current time to a frame"));
+}
+
+TEST_F(ProgramTest, LostOutputIsAFailureWithoutACrash) {
+  write("many.talix", [] {
+    std::string lines;
+    for (int i = 0; i < 100000; ++i) lines += "echo " + std::to_string(i) + "\n";
+    return lines;
+  }());
+  EXPECT_EQ(run("{ talix run $sample many.talix; echo $? >status; } | head -1"), 0);
+  EXPECT_EQ(text("status"), "3\n");
+  EXPECT_EQ(m_out, "0\n");
+  EXPECT_EQ(m_err, "");
+  EXPECT_EQ(run("talix commands $sample >/dev/full"), 3);
+  EXPECT_THAT(m_err, HasSubstr("error: standard output: "));
+}
+
+}  // namespace

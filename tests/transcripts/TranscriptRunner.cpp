@@ -1,0 +1,138 @@
+// Checks transcripts: files that read as a session with the program.
+//
+//   # a comment; it and blank lines are kept
+//   > echo [a b]
+//   [a b]
+//   > echo -int x
+//   error: Option -int of echo needs 1 integer
+//   failed
+//
+// Lines after "> " are run in order against a fresh scene; the lines below each are what must be printed: log
+// lines, the result, and "failed" when the command failed. A printed line that is empty or begins with "#",
+// ">" or "|" stands after "| ". The working folder is the folder of the tests.
+//
+//   transcripts [--update] --plugin LIBRARY FILE...      --update rewrites the files instead
+
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+#include <iostream>
+#include <string>
+#include <vector>
+
+#include "session/ScriptText.h"
+#include "session/Session.h"
+
+namespace {
+
+using Lines = std::vector<std::string>;
+
+constexpr std::string_view kPrompt = "> ";
+
+Lines splitLines(std::string_view text) {
+  Lines lines;
+  while (!text.empty()) {
+    const size_t end = text.find('\n');
+    lines.emplace_back(text.substr(0, end));
+    text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
+  }
+  return lines;
+}
+
+void addPrinted(std::string_view text, Lines& lines) {
+  Lines printed = splitLines(text);
+  if (printed.empty()) printed.emplace_back();
+  for (std::string const& line : printed) {
+    const bool plain = !line.empty() && std::string_view("#>|").find(line.front()) == std::string_view::npos;
+    lines.push_back(plain ? line : line.empty() ? "|" : "| " + line);
+  }
+}
+
+void addResult(talix::LineResult const& result, Lines& lines) {
+  for (talix::LogLine const& line : result.log)
+    addPrinted(getLogLevelName(line.level) + (": " + line.text), lines);
+  if (result.value.getType() != Variable::None) addPrinted(talix::toText(result.value), lines);
+  if (result.failed()) lines.emplace_back("failed");
+}
+
+// The file as it ought to be.
+Lines replayed(Lines const& file, std::string const& plugin) {
+  talix::Session session(plugin);
+  session.run("newScene");
+  Lines lines;
+  for (std::string const& line : file) {
+    if (line.starts_with(kPrompt)) {
+      lines.push_back(line);
+      addResult(session.run(std::string_view(line).substr(kPrompt.size())), lines);
+    } else if (line.empty() || line.front() == '#') {
+      lines.push_back(line);
+    }
+  }
+  return lines;
+}
+
+// The prompt lines are the same in both, so the first line that differs lies below one of them.
+void tellDifference(std::string const& path, Lines const& expected, Lines const& found) {
+  size_t i = 0;
+  while (i < expected.size() && i < found.size() && expected[i] == found[i]) ++i;
+  size_t prompt = i;
+  while (prompt > 0 && !expected[--prompt].starts_with(kPrompt)) continue;
+  const auto lineOr = [](Lines const& lines, size_t at) {
+    return at < lines.size() ? lines[at] : "(the end)";
+  };
+  std::cout << path << ":" << i + 1 << ": after \"" << expected[prompt]
+            << "\"\n  expected: " << lineOr(expected, i) << "\n  printed:  " << lineOr(found, i) << "\n";
+}
+
+Lines readFile(std::string const& path) {
+  std::ifstream file(path, std::ios::binary);
+  if (!file) throw std::runtime_error(path + ": cannot be opened");
+  const std::string text(std::istreambuf_iterator<char>(file), {});
+  return splitLines(text);
+}
+
+void writeFile(std::string const& path, Lines const& lines) {
+  std::ofstream file(path, std::ios::binary);
+  for (std::string const& line : lines) file << line << "\n";
+  if (!file.flush()) throw std::runtime_error(path + ": cannot be written");
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  bool update = false, same = true;
+  std::string plugin;
+  std::vector<std::string> paths;
+  for (int i = 1; i < argc; ++i) {
+    const std::string arg = argv[i];
+    if (arg == "--update") {
+      update = true;
+    } else if (arg == "--plugin" && i + 1 < argc) {
+      plugin = std::filesystem::absolute(argv[++i]);
+    } else {
+      paths.push_back(std::filesystem::absolute(arg));
+    }
+  }
+  if (paths.empty()) {
+    std::cout << "usage: transcripts [--update] --plugin LIBRARY FILE...\n";
+    return 2;
+  }
+  try {
+    std::filesystem::current_path(TALIX_TESTS_FOLDER);
+    for (std::string const& path : paths) {
+      const Lines expected = readFile(path);
+      const Lines found = replayed(expected, plugin);
+      if (found == expected) continue;
+      if (update) {
+        writeFile(path, found);
+      } else {
+        tellDifference(path, expected, found);
+        same = false;
+      }
+    }
+  } catch (std::exception const& error) {
+    std::cout << error.what() << "\n";
+    return 2;
+  }
+  return same ? 0 : 1;
+}
