@@ -11,6 +11,7 @@
 
 #include "host/scene/Database.h"
 #include "io/FileError.h"
+#include "io/TakeFormats.h"
 #include "session/CommandHelp.h"
 #include "session/JsonForms.h"
 #include "session/JsonText.h"
@@ -99,7 +100,8 @@ int runScripts(RunRequest const& request) {
   ScriptRunner runner(*session, style, stdout, stderr);
 
   try {
-    // A script that cannot be read is told before anything is run.
+    // A script that cannot be read and a place that cannot be written are told before anything is run.
+    for (std::string const& file : request.saves) checkTakeTarget(file);
     const std::vector<std::string> texts = readParts(request.parts);
     for (std::string const& file : request.opens)
       if (!runner.runSilently("open " + quotedText(file))) return static_cast<int>(Status::FileFailed);

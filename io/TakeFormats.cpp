@@ -47,17 +47,28 @@ Take readTake(const std::string& path, const ReadOptions& options) {
   throw FileError(path, "is no take that can be read (C3D, BVH or TRC)");
 }
 
-void writeTake(const Take& take, const std::string& path, std::vector<TakeNote>& notes) {
-  switch (formatBySuffix(path)) {
-    case Format::C3D:
-      return writeC3D(take, path, notes);
-    case Format::BVH:
-      return writeBVH(take, path, notes);
-    case Format::TRC:
-    case Format::None:
-      break;
-  }
+namespace {
+
+using Writer = void (*)(const Take&, const std::string&, std::vector<TakeNote>&);
+
+Writer writerFor(const std::string& path) {
+  const Format format = formatBySuffix(path);
+  if (format == Format::C3D) return writeC3D;
+  if (format == Format::BVH) return writeBVH;
   throw FileError(path, "takes are written as C3D or BVH: a name ending in .c3d or .bvh expected");
+}
+
+}  // namespace
+
+void checkTakeTarget(const std::string& path) {
+  writerFor(path);
+  const std::filesystem::path folder = std::filesystem::absolute(path).parent_path();
+  if (!std::filesystem::is_directory(folder))
+    throw FileError(path, "cannot be written: there is no such folder");
+}
+
+void writeTake(const Take& take, const std::string& path, std::vector<TakeNote>& notes) {
+  writerFor(path)(take, path, notes);
 }
 
 }  // namespace talix

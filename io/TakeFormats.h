@@ -27,6 +27,9 @@ void writeBVH(const Take&, const std::string& path, std::vector<TakeNote>& notes
 
 // By content and suffix. Throws FileError naming the formats when the file is of none.
 Take readTake(const std::string& path, const ReadOptions& = {});
+// Throws FileError when a take could not be written there whatever it holds: no such folder, or a name whose
+// suffix is of no format that is written. For asking before long work.
+void checkTakeTarget(const std::string& path);
 // By suffix (.c3d, .bvh).
 void writeTake(const Take&, const std::string& path, std::vector<TakeNote>& notes);
 

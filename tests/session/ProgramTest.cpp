@@ -88,8 +88,12 @@ TEST_F(ProgramTest, FilesThatCannotBeUsedAreStatusThree) {
   EXPECT_EQ(m_out, "");
   EXPECT_THAT(m_err, HasSubstr("error: missing.talix"));
   EXPECT_EQ(run("talix run $sample ."), 3);
-  EXPECT_EQ(run("talix run $sample -c 'echo 1' --save nowhere/out.bvh"), 3);
-  EXPECT_EQ(m_out, "1\n");
+  // Where nothing could be saved is told before anything runs.
+  for (char const* target : {"nowhere/out.bvh", "out.xyz"}) {
+    EXPECT_EQ(run(std::string("talix run $sample -c 'echo 1' --save ") + target), 3);
+    EXPECT_EQ(m_out, "");
+    EXPECT_THAT(m_err, testing::StartsWith(std::string("error: ") + target));
+  }
   EXPECT_EQ(run("talix run $sample -c 'open missing.c3d'"), 3);
   EXPECT_EQ(run("talix run $sample --keep-going -c fail -c 'open missing.c3d'"), 1);
   EXPECT_EQ(run("talix run --plugin missing.so -c 'echo 1'"), 3);
