@@ -66,21 +66,21 @@ void worldPositions(benchmark::State& state, bool forward) {
       for (Node const* bone : bones) benchmark::DoNotOptimize(bone->getWSPos(time));
   state.SetItemsProcessed(state.iterations() * kFrames * static_cast<int64>(bones.size()));
 }
-void BM_WorldPositionsForward(benchmark::State& state) { worldPositions(state, true); }
-void BM_WorldPositionsJumping(benchmark::State& state) { worldPositions(state, false); }
-BENCHMARK(BM_WorldPositionsForward)->Unit(benchmark::kMillisecond);
-BENCHMARK(BM_WorldPositionsJumping)->Unit(benchmark::kMillisecond);
+void worldPositionsForward(benchmark::State& state) { worldPositions(state, true); }
+void worldPositionsJumping(benchmark::State& state) { worldPositions(state, false); }
+BENCHMARK(worldPositionsForward)->Unit(benchmark::kMillisecond);
+BENCHMARK(worldPositionsJumping)->Unit(benchmark::kMillisecond);
 
 // Reading again at one time, and after one bone high up has moved.
-void BM_WorldPositionsCached(benchmark::State& state) {
+void worldPositionsCached(benchmark::State& state) {
   const std::vector<Node*> bones = skeletons(300);
   for (auto _ : state)
     for (Node const* bone : bones) benchmark::DoNotOptimize(bone->getWSPos(0));
   state.SetItemsProcessed(state.iterations() * static_cast<int64>(bones.size()));
 }
-BENCHMARK(BM_WorldPositionsCached);
+BENCHMARK(worldPositionsCached);
 
-void BM_WorldPositionsAfterAnEdit(benchmark::State& state) {
+void worldPositionsAfterAnEdit(benchmark::State& state) {
   const std::vector<Node*> bones = skeletons(300);
   double x = 0;
   for (auto _ : state) {
@@ -89,9 +89,9 @@ void BM_WorldPositionsAfterAnEdit(benchmark::State& state) {
   }
   state.SetItemsProcessed(state.iterations() * static_cast<int64>(bones.size()));
 }
-BENCHMARK(BM_WorldPositionsAfterAnEdit);
+BENCHMARK(worldPositionsAfterAnEdit);
 
-void BM_DeepChain(benchmark::State& state) {
+void deepChain(benchmark::State& state) {
   g_db->newScene();
   create<Clip>("take");
   Node* last = nullptr;
@@ -100,7 +100,7 @@ void BM_DeepChain(benchmark::State& state) {
   for (auto _ : state) benchmark::DoNotOptimize(last->getWSPos(++frame % 300 * kFrame));
   state.SetItemsProcessed(state.iterations() * 60);
 }
-BENCHMARK(BM_DeepChain);
+BENCHMARK(deepChain);
 
 // Characters of 100 modules each, in all of which the same names come again.
 std::vector<Module*> manyModules(int count) {
@@ -134,27 +134,27 @@ void lookUp(benchmark::State& state, Lookup lookup) {
   state.SetItemsProcessed(state.iterations());
 }
 
-void BM_FindFullPath(benchmark::State& state) {
+void findFullPath(benchmark::State& state) {
   lookUp(state, [](Module*, HString const& full, HString const&) {
     benchmark::DoNotOptimize(g_db->getModuleWithPath(full, nullptr, false));
   });
 }
-void BM_FindSuffix(benchmark::State& state) {
+void findSuffix(benchmark::State& state) {
   lookUp(state, [](Module*, HString const&, HString const& suffix) {
     benchmark::DoNotOptimize(g_db->getModuleWithPath(suffix, nullptr, false));
   });
 }
-void BM_MinimumPath(benchmark::State& state) {
+void minimumPath(benchmark::State& state) {
   lookUp(state, [](Module* module, HString const&, HString const&) {
     benchmark::DoNotOptimize(module->getMinimumPathString(false));
   });
 }
-BENCHMARK(BM_FindFullPath)->Arg(1'000)->Arg(100'000);
-BENCHMARK(BM_FindSuffix)->Arg(1'000)->Arg(100'000);
-BENCHMARK(BM_MinimumPath)->Arg(1'000)->Arg(100'000);
+BENCHMARK(findFullPath)->Arg(1'000)->Arg(100'000);
+BENCHMARK(findSuffix)->Arg(1'000)->Arg(100'000);
+BENCHMARK(minimumPath)->Arg(1'000)->Arg(100'000);
 
 // Markers of one name below one parent, so that each is given a number.
-void BM_CreateAndRemove(benchmark::State& state) {
+void createAndRemove(benchmark::State& state) {
   for (auto _ : state) {
     g_db->newScene();
     auto* parent = create<Character>("Subject");
@@ -164,10 +164,10 @@ void BM_CreateAndRemove(benchmark::State& state) {
   }
   state.SetItemsProcessed(state.iterations() * state.range(0));
 }
-BENCHMARK(BM_CreateAndRemove)->Arg(1'000)->Arg(10'000)->Arg(100'000)->Unit(benchmark::kMillisecond);
+BENCHMARK(createAndRemove)->Arg(1'000)->Arg(10'000)->Arg(100'000)->Unit(benchmark::kMillisecond);
 
 // All of one name below different parents, removed in any order.
-void BM_RemoveTwins(benchmark::State& state) {
+void removeTwins(benchmark::State& state) {
   for (auto _ : state) {
     state.PauseTiming();
     g_db->newScene();
@@ -181,9 +181,9 @@ void BM_RemoveTwins(benchmark::State& state) {
   }
   state.SetItemsProcessed(state.iterations() * state.range(0));
 }
-BENCHMARK(BM_RemoveTwins)->Arg(1'000)->Arg(100'000)->Unit(benchmark::kMillisecond);
+BENCHMARK(removeTwins)->Arg(1'000)->Arg(100'000)->Unit(benchmark::kMillisecond);
 
-void BM_SelectAndDeselect(benchmark::State& state) {
+void selectAndDeselect(benchmark::State& state) {
   std::vector<Module*> modules = manyModules(static_cast<int>(state.range(0)));
   std::shuffle(modules.begin(), modules.end(), std::mt19937(1));
   for (auto _ : state) {
@@ -193,6 +193,6 @@ void BM_SelectAndDeselect(benchmark::State& state) {
   }
   state.SetItemsProcessed(state.iterations() * state.range(0) * 2);
 }
-BENCHMARK(BM_SelectAndDeselect)->Arg(1'000)->Arg(100'000)->Unit(benchmark::kMillisecond);
+BENCHMARK(selectAndDeselect)->Arg(1'000)->Arg(100'000)->Unit(benchmark::kMillisecond);
 
 }  // namespace

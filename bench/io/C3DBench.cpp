@@ -50,13 +50,13 @@ void readFile(benchmark::State& state, const std::string& path) {
   state.SetBytesProcessed(state.iterations() * static_cast<int64>(std::filesystem::file_size(path)));
 }
 
-void ReadLongC3D(benchmark::State& state) {
+void readLongC3D(benchmark::State& state) {
   static const LongFile file;
   readFile(state, file.path.string());
 }
-BENCHMARK(ReadLongC3D)->Unit(benchmark::kMillisecond);
+BENCHMARK(readLongC3D)->Unit(benchmark::kMillisecond);
 
-void WriteLongC3D(benchmark::State& state) {
+void writeLongC3D(benchmark::State& state) {
   const LongFile file;
   const Take take = longTake();
   for (auto _ : state) {
@@ -65,17 +65,17 @@ void WriteLongC3D(benchmark::State& state) {
   }
   state.SetBytesProcessed(state.iterations() * static_cast<int64>(std::filesystem::file_size(file.path)));
 }
-BENCHMARK(WriteLongC3D)->Unit(benchmark::kMillisecond);
+BENCHMARK(writeLongC3D)->Unit(benchmark::kMillisecond);
 
-void ReadTrial(benchmark::State& state, const char* name) {
+void readTrial(benchmark::State& state, const char* name) {
   readFile(state, std::string(TALIX_TEST_DATA) + "/" + name);
 }
-BENCHMARK_CAPTURE(ReadTrial, IntelInteger, "walkset_a_le_int.c3d")->Unit(benchmark::kMicrosecond);
-BENCHMARK_CAPTURE(ReadTrial, IntelReal, "walkset_a_le_real.c3d")->Unit(benchmark::kMicrosecond);
-BENCHMARK_CAPTURE(ReadTrial, MIPSInteger, "walkset_a_be_int.c3d")->Unit(benchmark::kMicrosecond);
-BENCHMARK_CAPTURE(ReadTrial, MIPSReal, "walkset_a_be_real.c3d")->Unit(benchmark::kMicrosecond);
-BENCHMARK_CAPTURE(ReadTrial, DECInteger, "walkset_a_vax_int.c3d")->Unit(benchmark::kMicrosecond);
-BENCHMARK_CAPTURE(ReadTrial, DECReal, "walkset_a_vax_real.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(readTrial, IntelInteger, "walkset_a_le_int.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(readTrial, IntelReal, "walkset_a_le_real.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(readTrial, MIPSInteger, "walkset_a_be_int.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(readTrial, MIPSReal, "walkset_a_be_real.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(readTrial, DECInteger, "walkset_a_vax_int.c3d")->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(readTrial, DECReal, "walkset_a_vax_real.c3d")->Unit(benchmark::kMicrosecond);
 
 }  // namespace
 }  // namespace talix
