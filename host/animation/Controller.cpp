@@ -13,8 +13,7 @@
 H_DEFINE_ABSTRACT_CLASS(DataSource);
 H_DEFINE_ABSTRACT_CLASS(Controller);
 
-// --- names
-// -----------------------------------------------------------------------------------------------------
+// --- names ---
 
 DataSource::PropertyType Controller::mapToPropertyType(HString const& name) {
   return mapToPropertyType(mapPropertyName(name));
@@ -87,8 +86,7 @@ KeyTrack::Shape Controller::shapeOf(PropertyType type) {
                                : KeyTrack::Shape::Scalar;
 }
 
-// --- editing
-// ---------------------------------------------------------------------------------------------------
+// --- editing ---
 
 bool Controller::isEditable() const {
   NLEClip const* clip = g_db->getActiveClip();
@@ -201,8 +199,7 @@ bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo
   return true;
 }
 
-// --- keys of the active layer
-// ----------------------------------------------------------------------------------
+// --- keys of the active layer ---
 
 namespace {
 
@@ -289,8 +286,7 @@ HTimeRange Controller::getKeyRange() const {
                                   : HTimeRange();
 }
 
-// --- evaluation
-// ------------------------------------------------------------------------------------------------
+// --- evaluation ---
 
 void Controller::evaluate(int64 time, Values& values) const {
   NLEClip const* clip = g_db->getActiveClip();
@@ -364,8 +360,7 @@ void Controller::blend(Values const* values, double const* weights, int count, V
     for (size_t k = 0; k < out.size(); ++k) out[k] += weights[i] * values[i][k];
 }
 
-// --- interpolation
-// ---------------------------------------------------------------------------------------------
+// --- interpolation ---
 
 int Controller::getNumInterpTypes() const { return m_numInterpTypes; }
 
@@ -380,8 +375,7 @@ void Controller::setInterpType(int i) {
   changed();
 }
 
-// --- clips and layers
-// ------------------------------------------------------------------------------------------
+// --- clips and layers ---
 
 void Controller::setTrack(NLEClip* clip, int layer, KeyTrack track) {
   assert(track.shape() == shapeOf(getPropertyType()));

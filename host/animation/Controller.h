@@ -32,8 +32,7 @@ class Controller : public DataSource {
  public:
   using Values = KeyTrack::Values;
 
-  // --- names
-  // ---------------------------------------------------------------------------------------------------
+  // --- names ---
   static PropertyType mapToPropertyType(HString const& name);
   static PropertyType mapToPropertyType(unsigned id);
   static HString mapPropertyId(unsigned id);
@@ -63,8 +62,7 @@ class Controller : public DataSource {
   virtual void beginDataEdit(HTimeRange const& range);
   virtual void endDataEdit();
 
-  // --- keys of the active layer
-  // --------------------------------------------------------------------------------
+  // --- keys of the active layer ---
   virtual int getNumKeys() const;
   virtual int getNumKeys(unsigned mask) const;
   virtual int getNumSelectedKeys() const;
@@ -99,8 +97,7 @@ class Controller : public DataSource {
   Values const& getDefaultValues() const { return m_default; }
   void setDefaultValues(Values const& values);  // not taken when not finite
 
-  // --- interpolation
-  // -------------------------------------------------------------------------------------------
+  // --- interpolation ---
   virtual int getNumInterpTypes() const;
   virtual char const* getInterpTypeName(int i) const;
   virtual void setInterpType(int i);  // a number that is none of the channel's is not taken

@@ -47,8 +47,7 @@ void Database::newScene() {
   HTimeManager::getInstance()->reset();
 }
 
-// --- modules
-// ---------------------------------------------------------------------------------------------------
+// --- modules ---
 
 bool Database::mayJoin(Module const* module) const {
   HRuntimeClass const* type = module->getRuntimeClass();
@@ -167,8 +166,7 @@ bool Database::moduleOfTypeExists(HRuntimeClass const* type) const {
   return false;
 }
 
-// --- selection
-// -------------------------------------------------------------------------------------------------
+// --- selection ---
 
 bool Database::setPrimarySelectedModule(Module* module) {
   if (module && !module->isInScene()) return false;
@@ -185,8 +183,7 @@ void Database::selectAllModules(bool select) {
   for (int i = 0; i < getNumModules(); ++i) m_selection.add(getModule(i));
 }
 
-// --- clips and layers
-// ------------------------------------------------------------------------------------------
+// --- clips and layers ---
 
 NLEClip* Database::getClipAfter(NLEClip const* clip) const {
   if (!m_clips.contains(clip)) return nullptr;
@@ -211,8 +208,7 @@ bool Database::setActiveLayer(int layer) {
   return true;
 }
 
-// --- active properties
-// -----------------------------------------------------------------------------------------
+// --- active properties ---
 
 void Database::setActiveProperties(std::vector<unsigned> ids) { m_activeProperties = std::move(ids); }
 
@@ -227,8 +223,7 @@ void Database::syncActiveProperties(bool) {
   setActiveProperties(std::move(kept));
 }
 
-// --- settings
-// --------------------------------------------------------------------------------------------------
+// --- settings ---
 
 bool Database::isDevOnlyMode() { return s_devOnlyMode; }
 

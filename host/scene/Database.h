@@ -56,8 +56,7 @@ class Database {
   bool moduleOfTypeExists(HRuntimeClass const* type) const;
   SceneIndex& getIndex() const { return *m_index; }
 
-  // --- selection
-  // -----------------------------------------------------------------------------------------------
+  // --- selection ---
   Module* getPrimarySelectedModule() const { return m_selection.getPrimary(); }
   bool setPrimarySelectedModule(
       Module* module);  // selects it when need be; null: none. False: not in the scene
@@ -71,16 +70,14 @@ class Database {
   void selectAllModules(bool select);
   Selection& getSelection() { return m_selection; }
 
-  // --- priority
-  // ------------------------------------------------------------------------------------------------
+  // --- priority ---
   Module* getPriorityModule() const { return m_priority; }
   // Null: none. A module that is not in the scene is not taken.
   void setPrioritySearchModule(Module* module) {
     if (!module || module->isInScene()) m_priority = module;
   }
 
-  // --- clips and layers
-  // ----------------------------------------------------------------------------------------
+  // --- clips and layers ---
   int getNumClips() const { return m_clips.getCount(); }
   NLEClip* getHeadClip() const { return m_clips.getCount() ? m_clips.at(0) : nullptr; }
   NLEClip* getClipAfter(NLEClip const* clip) const;
@@ -90,8 +87,7 @@ class Database {
   int getActiveLayer() const { return m_activeClip ? m_activeLayer : -1; }
   bool setActiveLayer(int layer);  // false: the active clip has no such layer
 
-  // --- active properties: channels, or components of channels, that key commands work on
-  // ------------------------
+  // --- active properties: channels, or components of channels, that key commands work on ---
   int getNumActiveProperties() const { return static_cast<int>(m_activeProperties.size()); }
   // A property id with its component bits (PropertyTable).
   unsigned int getActiveProperty(int i) const { return m_activeProperties[static_cast<size_t>(i)]; }
@@ -102,8 +98,7 @@ class Database {
   // Drops active properties that no module has any more. notify: views are told.
   void syncActiveProperties(bool notify);
 
-  // --- settings
-  // ------------------------------------------------------------------------------------------------
+  // --- settings ---
   static bool isDevOnlyMode();
   static void setDevOnlyMode(bool on);
   bool getUpdateSolversBeforeClips() const { return m_solversBeforeClips; }

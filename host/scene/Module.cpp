@@ -63,8 +63,7 @@ void Module::setUp() {
   addBuiltIn<ColorAttribute>("Color", Database::getDefaultModColor());
 }
 
-// --- names
-// -----------------------------------------------------------------------------------------------------
+// --- names ---
 
 bool Module::isValidName(HString const& name) {
   return !name.IsEmpty() && name.GetString().find('\\') == std::string::npos;
@@ -117,8 +116,7 @@ HString Module::getMinimumPathString(bool withinPriority) const {
   return levels == 0 ? getFullPathString() : HString(suffixText(levels));
 }
 
-// --- hierarchy
-// -------------------------------------------------------------------------------------------------
+// --- hierarchy ---
 
 Module::Children& Module::children() {
   if (!m_children) m_children = std::make_unique<Children>();
@@ -203,8 +201,7 @@ void Module::storeParent(Module* parent) {
   Node::markMoved(this);
 }
 
-// --- attributes
-// ------------------------------------------------------------------------------------------------
+// --- attributes ---
 
 Attribute* Module::getAttribute(char const* name) const {
   for (auto const& attribute : m_attributes)
@@ -241,8 +238,7 @@ bool Module::isValidPropertyName(HString const& name) {
   return !name.IsEmpty() && name.GetString().find_first_of(".\\") == std::string::npos;
 }
 
-// --- channels
-// --------------------------------------------------------------------------------------------------
+// --- channels ---
 
 Controller* Module::getChannel(char const* name) const {
   return getProperty(Controller::mapPropertyName(HString(name)));
@@ -262,8 +258,7 @@ Controller* Module::getProperty(unsigned id) const {
   return nullptr;
 }
 
-// --- data
-// ------------------------------------------------------------------------------------------------------
+// --- data ---
 
 bool Module::hasKeysInClip(NLEClip const* clip, bool) const {
   return std::any_of(m_channels.begin(), m_channels.end(),
@@ -304,8 +299,7 @@ void Module::discardDataEdit() {
   endDataEdit();
 }
 
-// --- state
-// -----------------------------------------------------------------------------------------------------
+// --- state ---
 
 namespace {
 

@@ -29,8 +29,7 @@ class Module : public HObject {
 
   ~Module() override;
 
-  // --- names and paths
-  // -----------------------------------------------------------------------------------------
+  // --- names and paths ---
   virtual HString getName() const { return m_name; }
   ControlID getID() const { return m_id; }
   // Whether a name can stand: not empty, no backslash.
@@ -44,16 +43,14 @@ class Module : public HObject {
   // priority module, when this module lies below it.
   HString getMinimumPathString(bool withinPriority) const;
 
-  // --- namespaces: the prefixes of a name, joined by ":", outermost first
-  // ----------------------------------------
+  // --- namespaces: the prefixes of a name, joined by ":", outermost first ---
   virtual void getNamespace(HString& out) const;
   virtual void getNamespaces(TArray<HString>& out) const;
   virtual bool addNamespace(HString const& name);
   virtual bool removeNamespace(HString const& name);
   virtual bool replaceNamespace(HString const& former, HString const& name);
 
-  // --- hierarchy
-  // -----------------------------------------------------------------------------------------------
+  // --- hierarchy ---
   Module* getParent() const { return m_parent; }
   int getNumChildren() const;
   Module* getChild(int i) const;
@@ -76,8 +73,7 @@ class Module : public HObject {
   // The child becomes a root. keepPlace: the scene's order stays as it is.
   virtual bool removeChild(Module* child, bool keepPlace);
 
-  // --- attributes
-  // ----------------------------------------------------------------------------------------------
+  // --- attributes ---
   int getNumAttributes() const { return static_cast<int>(m_attributes.size()); }
   Attribute* getAttribute(int i) const { return m_attributes[static_cast<size_t>(i)].get(); }
   Attribute* getAttribute(char const* name) const;  // exact case; null: none
@@ -85,8 +81,7 @@ class Module : public HObject {
   // Adds a custom attribute. Null when the name is taken by an attribute or channel or cannot stand.
   Attribute* addCustomAttribute(std::unique_ptr<Attribute> attribute);
 
-  // --- channels
-  // ------------------------------------------------------------------------------------------------
+  // --- channels ---
   int getNumChannels() const { return static_cast<int>(m_channels.size()); }
   Controller* getChannel(int i) const { return m_channels[static_cast<size_t>(i)].get(); }
   Controller* getChannel(char const* name) const;
@@ -103,8 +98,7 @@ class Module : public HObject {
   // Names of channels and attributes hold no dot and no backslash and are not empty.
   static bool isValidPropertyName(HString const& name);
 
-  // --- data
-  // ----------------------------------------------------------------------------------------------------
+  // --- data ---
   virtual bool hasKeysInClip(NLEClip const* clip, bool allLayers) const;
   virtual void addToClip(NLEClip* clip);
   // From the first to the last key of all channels in the active clip.
@@ -113,8 +107,7 @@ class Module : public HObject {
   virtual void endDataEdit();
   virtual void discardDataEdit();  // restores what was there when the edit began
 
-  // --- state
-  // ---------------------------------------------------------------------------------------------------
+  // --- state ---
   bool isVisible() const;
   void setVisible(bool visible, bool notify);
   bool isLocked() const;

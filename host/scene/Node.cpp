@@ -8,8 +8,7 @@
 
 H_DEFINE_CLASS(Node);
 
-// --- placements and their cache
-// --------------------------------------------------------------------------------
+// --- placements and their cache ---
 
 namespace {
 
@@ -94,8 +93,7 @@ Placement const& Node::placeBelow(Node const* parent, int64 time) const {
   return m_world;
 }
 
-// --- life
-// ------------------------------------------------------------------------------------------------------
+// --- life ---
 
 Node::~Node() {
   for (MarkerConnection const& line : m_lines) release(line.getTarget());
@@ -124,8 +122,7 @@ bool Node::setRotationOrder(TalixRotation::RotOrder order) {
   return m_rotationOrder->setIndex(order, true, true, true, true);
 }
 
-// --- reading
-// ---------------------------------------------------------------------------------------------------
+// --- reading ---
 
 Vec3 Node::getLocalPos(int64 time) const { return m_translation->getValue(time); }
 TalixRotation Node::getLocalRot(int64 time) const { return m_rotation->getValue(time); }
@@ -220,8 +217,7 @@ TalixRotation Node::getPreRotationInSpaceOfNode(Node* space) const {
   return seenFrom(space, now(), parentWorld(now()) * Placement{{}, m_preRotation, {1, 1, 1}}).rotation;
 }
 
-// --- writing
-// ---------------------------------------------------------------------------------------------------
+// --- writing ---
 
 Vec3 Node::translationFor(Vec3 const& inParent) const {
   return m_preRotation.inverse().rotate(inParent - m_preTranslation);
@@ -310,8 +306,7 @@ void Node::setPreTranslationWS(Vec3 const& translation) {
   setPreTranslation(parentWorld(now()).seen(translation));
 }
 
-// --- connecting lines
-// ------------------------------------------------------------------------------------------
+// --- connecting lines ---
 
 Vec3 MarkerConnection::getDefaultColor() { return {128, 128, 128}; }
 

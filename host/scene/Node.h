@@ -46,8 +46,7 @@ class Node : public Module, private ModuleReferrer {
   bool setRotationOrder(TalixRotation::RotOrder order);
   virtual int getNumDofs() const { return 0; }
 
-  // --- reading
-  // -------------------------------------------------------------------------------------------------
+  // --- reading ---
   Vec3 getLocalPos(int64 time) const;
   TalixRotation getLocalRot(int64 time) const;
   Vec3 getLocalScale(int64 time) const;
@@ -103,8 +102,7 @@ class Node : public Module, private ModuleReferrer {
   void setPreRotationWS(TalixRotation const& rotation);
   void setPreTranslationWS(Vec3 const& translation);
 
-  // --- connecting lines
-  // ----------------------------------------------------------------------------------------
+  // --- connecting lines ---
   bool isConnectedTo(Node const* target) const { return refersTo(target); }
   int getNumConnectingLines() const { return static_cast<int>(m_lines.size()); }
   MarkerConnection const& getConnectingLine(int i) const { return m_lines[static_cast<size_t>(i)]; }
