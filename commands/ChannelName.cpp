@@ -1,0 +1,22 @@
+#include "commands/ChannelName.h"
+
+#include "host/animation/Controller.h"
+
+namespace {
+
+// The component that a suffix's first letter names, -1 for other letters.
+int componentOf(char letter) {
+  const int component = (letter | 0x20) - 'x';
+  return component >= 0 && component <= 2 ? component : -1;
+}
+
+}  // namespace
+
+ChannelName channelNameFrom(HString text, Suffix suffix) {
+  Controller::fixChannelStr(text);
+  const int dot = text.ReverseFind('.'), last = text.GetLength() - 1;
+  if (dot < 0 || dot == last) return {text, -1};
+  const int component = componentOf(text[dot + 1]);
+  if (suffix == Suffix::componentCut && (component < 0 || dot + 1 != last)) return {text, -1};
+  return {text.Left(static_cast<uint64>(dot)), component};
+}
