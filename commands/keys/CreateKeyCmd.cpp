@@ -1,8 +1,11 @@
-#include "commands/PendingCommand.h"
+#include "host/animation/PropertyTable.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class CreateKeyCmd final : public PendingCommand<CreateKeyCmd> {
+class CreateKeyCmd final : public ScriptCommand<CreateKeyCmd> {
  public:
   static constexpr CommandInfo info = {.name = "createKey",
                                        .displayName = "Create Key",
@@ -10,7 +13,38 @@ class CreateKeyCmd final : public PendingCommand<CreateKeyCmd> {
                                        .purpose =
                                            "Keys every active channel of the selected modules at the current "
                                            "time, with the values they have there."};
+
+  bool execute(Given const&, Args const&, Variable&) override;
 };
+
+// The components that an active property selects: all when it names all, else the first that it names.
+unsigned selectedMask(unsigned id) {
+  const unsigned bits = id >> 28 & 7;
+  return bits == 7 ? bits : bits & ~(bits - 1);
+}
+
+// The key is whole; it is left selected on the mask.
+void keyAt(Controller& channel, int64 time, unsigned mask) {
+  const HTimeRange range(time - 1, time + 1);
+  channel.beginDataEdit(range);
+  Controller::Values value;
+  channel.evaluateLayer(time, value);  // so that all layers together stay as they are
+  channel.writeKeyAt(time, value, 7);
+  channel.selectKeys(range, mask);
+  channel.endDataEdit();
+}
+
+bool CreateKeyCmd::execute(Given const&, Args const&, Variable&) {
+  const int64 now = HTimeManager::getInstance()->getTime();
+  for (int i = 0; i < g_db->getNumSelectedModules(); ++i) {
+    for (int k = 0; k < g_db->getNumActiveProperties(); ++k) {
+      const unsigned id = g_db->getActiveProperty(k), mask = selectedMask(id);
+      Controller* channel = g_db->getSelectedModule(i)->getProperty(id);
+      if (mask && channel && channel->isEditable() && !channel->hasKeyAt(now)) keyAt(*channel, now, mask);
+    }
+  }
+  return true;
+}
 
 }  // namespace
 

@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/Targets.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
 
 namespace {
 
-class SetInterpTypeCmd final : public PendingCommand<SetInterpTypeCmd> {
+class SetInterpTypeCmd final : public ScriptCommand<SetInterpTypeCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setInterpType",
@@ -14,7 +16,51 @@ class SetInterpTypeCmd final : public PendingCommand<SetInterpTypeCmd> {
       .args = {"propertyName interpType", 2, 2, {Variable::String, Variable::String}},
       .options = {{"onMod", 1, Variable::String}},
       .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable&) override;
 };
+
+bool choose(Module const& module, HString const& name, HString const& type) {
+  Controller* channel = module.getProperty(name);
+  if (!channel) {
+    Command::logError("%s is not a property on %s", name.GetStr(), module.getName().GetStr());
+    return false;
+  }
+  for (int i = 0; i < channel->getNumInterpTypes(); ++i) {
+    if (type != channel->getInterpTypeName(i)) continue;
+    channel->setInterpType(i);
+    return true;
+  }
+  Command::logError("Interpolation type %s not found on property %s", type.GetStr(), name.GetStr());
+  return false;
+}
+
+bool SetInterpTypeCmd::execute(Given const& given, Args const& args, Variable&) {
+  if (g_db->getActiveLayer() == -1) {
+    logError("Can't set interp type on the base clip");
+    return false;
+  }
+  Module const* onMod = nullptr;
+  for (CommandOption const& option : given) {
+    if (option.getName() != "onMod") continue;
+    onMod = moduleAt(option.getArg(0).getStringValue(-1),
+                     "%s is not a valid unique path to a Module in the scene.");
+    if (!onMod) return false;
+  }
+  const HString name = args[0].getStringValue(-1), type = args[1].getStringValue(-1);
+  if (name.IsEmpty()) {
+    logError("Cannot pass empty string as property name");
+    return false;
+  }
+  if (type.IsEmpty()) {
+    logError("Cannot pass empty string as interp type");
+    return false;
+  }
+  if (onMod) return choose(*onMod, name, type);
+  for (int i = 0; i < g_db->getNumSelectedModules(); ++i)
+    if (!choose(*g_db->getSelectedModule(i), name, type)) return false;
+  return true;
+}
 
 }  // namespace
 

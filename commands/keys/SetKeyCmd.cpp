@@ -1,8 +1,13 @@
-#include "commands/PendingCommand.h"
+#include "commands/Angles.h"
+#include "commands/Candidates.h"
+#include "commands/ChannelName.h"
+#include "commands/ChannelValues.h"
+#include "commands/Events.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class SetKeyCmd final : public PendingCommand<SetKeyCmd> {
+class SetKeyCmd final : public ScriptCommand<SetKeyCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setKey",
@@ -17,7 +22,169 @@ class SetKeyCmd final : public PendingCommand<SetKeyCmd> {
                   {"onMod", 1, Variable::String, 16},
                   {"type", 1, Variable::String, 8}},
       .solo = Solo::no};
+  static constexpr int kFrame = info.option("t"), kRelative = info.option("r");
+  static constexpr Candidates::Options kCandidates = {info.option("all"), info.option("onMod"),
+                                                      info.option("type")};
+
+  bool execute(Given const& given, Args const& args, Variable&) override;
 };
+
+// The key that a line writes, on one channel or on many.
+struct NewKey {
+  DataSource::PropertyType kind = DataSource::NoProperty;
+  int64 time = 0;
+  Change change;
+  Vec3 vector;                                              // angles in radians
+  TalixRotation::RotOrder givenOrder = TalixRotation::XYZ;  // of three angles
+  double number = 0;
+  int integer = 0;
+  Variable::BoolType state = Variable::False;
+
+  bool read(Args const& args);
+  void writeOn(Controller& channel) const;
+
+ private:
+  void writeVector(Vec3Controller& channel) const;
+  void writeRotation(RotController& channel) const;
+};
+
+// A relative key adds to the value of the layer that it goes to.
+Controller::Values layerValue(Controller const& channel, int64 time) {
+  Controller::Values values;
+  channel.evaluateLayer(time, values);
+  return values;
+}
+
+bool NewKey::read(Args const& args) {
+  switch (kind) {
+    case DataSource::Vec3Property:
+    case DataSource::RotProperty: {
+      const bool fits = kind == DataSource::RotProperty ? readAngles(args, change.component, vector)
+                                                        : readVector(args, change.component, vector);
+      if (!fits) Command::logError("Invalid number or type of arguments for %s", SetKeyCmd::info.name);
+      return fits;
+    }
+    case DataSource::FloatProperty:
+    case DataSource::IntProperty:
+      if (!isOneNumber(args)) break;
+      number = args[1].getFloatValue(-1);
+      integer = args[1].getIntValue(-1);
+      return true;
+    case DataSource::BoolProperty:
+      if (args.getCount() != 2 || args[1].getType() != Variable::Bool) break;
+      state = args[1].getBoolValue(-1);
+      if (change.relative) Command::logError("Cannot use -r option on Boolean types");
+      return !change.relative;
+    case DataSource::NoProperty:
+      break;
+  }
+  Command::logError("Invalid number or type of arguments");  // kept: these do not name the command
+  return false;
+}
+
+void NewKey::writeVector(Vec3Controller& channel) const {
+  const Vec3 value =
+      change.relative ? changed(Vec3(layerValue(channel, time).data()), vector, change) : vector;
+  if (change.component >= 0)
+    channel.setComponentKey(time, value[change.component], 1u << change.component);
+  else
+    channel.setKey(time, value, 7);
+}
+
+void NewKey::writeRotation(RotController& channel) const {
+  TalixRotation current;
+  if (change.relative || change.component >= 0) current.setQuaternion(layerValue(channel, time).data());
+  // Kept: without "-onMod" three angles count in XYZ, while a component counts in the module's own order.
+  const TalixRotation::RotOrder order =
+      change.component < 0 ? givenOrder : rotationOrderOf(*channel.getModule());
+  channel.setKey(time, changed(current, vector, change, order), 7);
+}
+
+void NewKey::writeOn(Controller& channel) const {
+  channel.beginDataEdit(HTimeRange(time - 1, time + 1));
+  if (Vec3Controller* vectors = objectAs<Vec3Controller>(&channel)) {
+    writeVector(*vectors);
+  } else if (RotController* rotations = objectAs<RotController>(&channel)) {
+    writeRotation(*rotations);
+  } else if (FloatController* floats = objectAs<FloatController>(&channel)) {
+    const double current = change.relative ? layerValue(channel, time)[0] : 0;
+    floats->setKey(time, changed(current, number, change.relative), 1);
+  } else if (IntController* ints = objectAs<IntController>(&channel)) {
+    const int current = change.relative ? nearestInt(layerValue(channel, time)[0]) : 0;
+    ints->setKey(time, changed(current, integer, change.relative), 1);
+  } else if (BoolController* bools = objectAs<BoolController>(&channel)) {
+    bools->setKey(time, changed(layerValue(channel, time)[0] != 0, state), 1);
+  }
+  channel.endDataEdit();
+}
+
+// The time of the last "-t", else now.
+bool readTime(GivenOptions const& options, int64& time) {
+  HTimeManager const& times = *HTimeManager::getInstance();
+  time = times.getTime();
+  CommandOption const* option = options.find(SetKeyCmd::kFrame);
+  if (!option) return true;
+  const int frame = option->getArg(0).getIntValue(-1);
+  const int64 ticks = times.getTicksPerFrame();
+  if (std::abs(int64{frame}) > kForever / ticks) {
+    Command::logError("Frame %d lies beyond the time line.", frame);
+    return false;
+  }
+  time = frame * ticks;
+  return true;
+}
+
+bool writeOnMod(NewKey const& key, Module const& module, unsigned id, char const* typed) {
+  Controller* channel = module.getProperty(id);
+  if (!channel) {
+    Command::logError("%s is not a property on module: %s", typed, module.getName().GetStr());
+    return false;
+  }
+  if (!channel->isEditable()) {
+    Command::logError("%s is not an editable property on module: %s. This may be due to the active clip.",
+                      typed, module.getName().GetStr());
+    return false;
+  }
+  key.writeOn(*channel);
+  return true;
+}
+
+bool writeOnCandidates(NewKey const& key, Candidates const& candidates, unsigned id) {
+  if (!candidates.exist("No modules to set property on", "No selected modules to set property on."))
+    return false;
+  return candidates.each([&](Module& module) {
+    Controller* channel = module.getProperty(id);
+    if (channel && channel->isEditable()) key.writeOn(*channel);
+    return true;
+  });
+}
+
+bool SetKeyCmd::execute(Given const& given, Args const& args, Variable&) {
+  const GivenOptions options(given);
+  NewKey key;
+  Candidates candidates;
+  if (!readTime(options, key.time) || !candidates.read(given, kCandidates)) return false;
+  key.change.relative = options.has(kRelative);
+
+  char const* typed = args[0].getStringValue(-1);
+  const ChannelName channel = channelNameFrom(typed, Suffix::anyCut);
+  key.change.component = channel.component;
+  const unsigned id = Controller::mapPropertyName(channel.name);
+  key.kind = Controller::mapToPropertyType(id);
+  if (key.kind == DataSource::NoProperty) {
+    logError("Unknown property type: %s", channel.name.GetStr());
+    return false;
+  }
+  if (!key.read(args)) return false;
+
+  Module* module = candidates.getOnMod();
+  if (module) key.givenOrder = rotationOrderOf(*module);
+  if (!(module ? writeOnMod(key, *module, id, typed) : writeOnCandidates(key, candidates, id))) return false;
+
+  if (g_db->getAutoUpdateProperties()) g_db->syncActiveProperties(true);
+  HEventManager::safeSubmit(HControllerSelectionChangedEvent());
+  return true;
+}
 
 }  // namespace
 

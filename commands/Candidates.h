@@ -1,0 +1,40 @@
+// The modules that a writer of properties works on: that of "-onMod", else all ("-all") or the selected ones,
+// of which "-type" leaves those of exactly one class. The database owns them.
+#pragma once
+
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
+
+class Candidates {
+ public:
+  // The options' indices in a command's declaration.
+  struct Options {
+    int all, onMod, type;
+  };
+  // In the order given; of an option given several times each value must hold and the last counts. False,
+  // with a message, for a path that names no module and for a name of no class.
+  [[nodiscard]] bool read(Given const& given, Options const& options);
+
+  // Null: the command works on every candidate.
+  Module* getOnMod() const { return m_onMod; }
+  // Whether there is any, whatever its class. Without one logs the message for "-all" or for the selection.
+  [[nodiscard]] bool exist(char const* noModules, char const* noSelection) const;
+  // Calls work(module) for each candidate of the class until it answers false; answers whether it never did.
+  template <class Work>
+  bool each(Work work) const {
+    // Counted anew each time: the work may change the selection.
+    for (int i = 0; i < getCount(); ++i) {
+      Module* module = m_all ? g_db->getModule(i) : g_db->getSelectedModule(i);
+      if (m_class && module->getRuntimeClass() != m_class) continue;
+      if (!work(*module)) return false;
+    }
+    return true;
+  }
+
+ private:
+  int getCount() const { return m_all ? g_db->getNumModules() : g_db->getNumSelectedModules(); }
+
+  Module* m_onMod = nullptr;
+  HRuntimeClass const* m_class = nullptr;  // null: any
+  bool m_all = false;
+};

@@ -1,0 +1,61 @@
+#include "commands/ChannelValues.h"
+
+#include <algorithm>
+#include <climits>
+#include <cmath>
+
+bool readVector(Args const& args, int component, Vec3& value) {
+  const int count = args.getCount();
+  if (component >= 0) {
+    if (!isOneNumber(args)) return false;
+    value[component] = args[1].getFloatValue(-1);
+    return true;
+  }
+  if (count == 2 && args[1].getType() == Variable::Vector) {
+    value = args[1].getVecValue(-1);
+    return true;
+  }
+  if (count != 4) return false;
+  for (int i = 0; i < 3; ++i) {
+    if (!args[i + 1].isNumber()) return false;
+    value[i] = args[i + 1].getFloatValue(-1);
+  }
+  return true;
+}
+
+bool readAngles(Args const& args, int component, Vec3& value) {
+  if (!readVector(args, component, value)) return false;
+  value *= kRadiansPerDegree;
+  return true;
+}
+
+int nearestInt(double value) {
+  return static_cast<int>(std::clamp<double>(std::round(value), INT_MIN, INT_MAX));
+}
+
+double changed(double current, double given, bool relative) { return relative ? current + given : given; }
+
+int changed(int current, int given, bool relative) {
+  if (!relative) return given;
+  return static_cast<int>(std::clamp<int64>(int64{current} + given, INT_MIN, INT_MAX));
+}
+
+Vec3 changed(Vec3 const& current, Vec3 const& given, Change const& change) {
+  if (change.component < 0) return change.relative ? current + given : given;
+  Vec3 value = current;
+  value[change.component] = changed(current[change.component], given[change.component], change.relative);
+  return value;
+}
+
+TalixRotation changed(TalixRotation const& current, Vec3 const& angles, Change const& change,
+                      TalixRotation::RotOrder order) {
+  TalixRotation rotation;
+  if (change.component < 0) {
+    rotation.setAsEuler(order, angles);
+    return change.relative ? current * rotation : rotation;
+  }
+  Vec3 present;
+  current.getAsEuler(order, present);
+  rotation.setAsEuler(order, changed(present, angles, change));
+  return rotation;
+}
