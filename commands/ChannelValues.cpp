@@ -29,6 +29,17 @@ bool readAngles(Args const& args, int component, Vec3& value) {
   return true;
 }
 
+bool readValue(Args const& args, DataSource::PropertyType kind, int component, ChannelValue& value) {
+  if (kind == DataSource::Vec3Property) return readVector(args, component, value.vector);
+  if (kind == DataSource::RotProperty) return readAngles(args, component, value.vector);
+  if (!isOneNumber(args)) return false;
+  value.number = args[1].getFloatValue(-1);
+  value.integer = args[1].getIntValue(-1);
+  value.state = args[1].getBoolValue(-1);
+  return kind != DataSource::BoolProperty ||
+         (value.integer >= Variable::False && value.integer <= Variable::Toggle);
+}
+
 int nearestInt(double value) {
   return static_cast<int>(std::clamp<double>(std::round(value), INT_MIN, INT_MAX));
 }

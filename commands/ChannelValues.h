@@ -1,6 +1,7 @@
 // Values that scripts give after a property's name: their shapes, and how they meet the value that is there.
 #pragma once
 
+#include "host/animation/Controller.h"
 #include "host/command/ScriptCommand.h"
 #include "host/math/TalixRotation.h"
 
@@ -18,6 +19,46 @@ struct Change {
 [[nodiscard]] bool readAngles(Args const& args, int component, Vec3& value);
 // Nothing but a number, whole or not.
 inline bool isOneNumber(Args const& args) { return args.getCount() == 2 && args[1].isNumber(); }
+
+// A value for a channel, whose kind says which member counts.
+struct ChannelValue {
+  Vec3 vector;  // angles in radians
+  double number = 0;
+  int integer = 0;
+  Variable::BoolType state = Variable::False;
+};
+// False for another shape than a channel of that kind takes.
+[[nodiscard]] bool readValue(Args const& args, DataSource::PropertyType kind, int component,
+                             ChannelValue& value);
+inline bool hasComponents(DataSource::PropertyType kind) {
+  return kind == DataSource::Vec3Property || kind == DataSource::RotProperty;
+}
+
+// Calls work(channel) with the channel as its own kind.
+template <class Work>
+void withKind(Controller& channel, Work work) {
+  switch (channel.getPropertyType()) {
+    case DataSource::Vec3Property:
+      return work(static_cast<Vec3Controller&>(channel));
+    case DataSource::RotProperty:
+      return work(static_cast<RotController&>(channel));
+    case DataSource::FloatProperty:
+      return work(static_cast<FloatController&>(channel));
+    case DataSource::IntProperty:
+      return work(static_cast<IntController&>(channel));
+    case DataSource::BoolProperty:
+      return work(static_cast<BoolController&>(channel));
+    case DataSource::NoProperty:
+      break;
+  }
+}
+
+// The value of the layer that edits go to, which a relative one adds to.
+inline Controller::Values layerValue(Controller const& channel, int64 time) {
+  Controller::Values values;
+  channel.evaluateLayer(time, values);
+  return values;
+}
 
 // The nearest integer, as integer channels show values between their keys.
 int nearestInt(double value);

@@ -31,91 +31,75 @@ class SetKeyCmd final : public ScriptCommand<SetKeyCmd> {
 
 // The key that a line writes, on one channel or on many.
 struct NewKey {
-  DataSource::PropertyType kind = DataSource::NoProperty;
   int64 time = 0;
   Change change;
-  Vec3 vector;                                              // angles in radians
+  ChannelValue value;
   TalixRotation::RotOrder givenOrder = TalixRotation::XYZ;  // of three angles
-  double number = 0;
-  int integer = 0;
-  Variable::BoolType state = Variable::False;
 
-  bool read(Args const& args);
   void writeOn(Controller& channel) const;
 
  private:
-  void writeVector(Vec3Controller& channel) const;
-  void writeRotation(RotController& channel) const;
+  void write(Vec3Controller& channel) const;
+  void write(RotController& channel) const;
+  void write(FloatController& channel) const;
+  void write(IntController& channel) const;
+  void write(BoolController& channel) const;
 };
 
-// A relative key adds to the value of the layer that it goes to.
-Controller::Values layerValue(Controller const& channel, int64 time) {
-  Controller::Values values;
-  channel.evaluateLayer(time, values);
-  return values;
-}
-
-bool NewKey::read(Args const& args) {
-  switch (kind) {
-    case DataSource::Vec3Property:
-    case DataSource::RotProperty: {
-      const bool fits = kind == DataSource::RotProperty ? readAngles(args, change.component, vector)
-                                                        : readVector(args, change.component, vector);
-      if (!fits) Command::logError("Invalid number or type of arguments for %s", SetKeyCmd::info.name);
-      return fits;
-    }
-    case DataSource::FloatProperty:
-    case DataSource::IntProperty:
-      if (!isOneNumber(args)) break;
-      number = args[1].getFloatValue(-1);
-      integer = args[1].getIntValue(-1);
-      return true;
-    case DataSource::BoolProperty:
-      if (args.getCount() != 2 || args[1].getType() != Variable::Bool) break;
-      state = args[1].getBoolValue(-1);
-      if (change.relative) Command::logError("Cannot use -r option on Boolean types");
-      return !change.relative;
-    case DataSource::NoProperty:
-      break;
-  }
-  Command::logError("Invalid number or type of arguments");  // kept: these do not name the command
-  return false;
-}
-
-void NewKey::writeVector(Vec3Controller& channel) const {
-  const Vec3 value =
-      change.relative ? changed(Vec3(layerValue(channel, time).data()), vector, change) : vector;
+void NewKey::write(Vec3Controller& channel) const {
+  Vec3 wanted = value.vector;
+  if (change.relative) wanted = changed(Vec3(layerValue(channel, time).data()), wanted, change);
   if (change.component >= 0)
-    channel.setComponentKey(time, value[change.component], 1u << change.component);
+    channel.setComponentKey(time, wanted[change.component], 1u << change.component);
   else
-    channel.setKey(time, value, 7);
+    channel.setKey(time, wanted, 7);
 }
 
-void NewKey::writeRotation(RotController& channel) const {
+void NewKey::write(RotController& channel) const {
   TalixRotation current;
   if (change.relative || change.component >= 0) current.setQuaternion(layerValue(channel, time).data());
   // Kept: without "-onMod" three angles count in XYZ, while a component counts in the module's own order.
   const TalixRotation::RotOrder order =
       change.component < 0 ? givenOrder : rotationOrderOf(*channel.getModule());
-  channel.setKey(time, changed(current, vector, change, order), 7);
+  channel.setKey(time, changed(current, value.vector, change, order), 7);
+}
+
+void NewKey::write(FloatController& channel) const {
+  const double current = change.relative ? layerValue(channel, time)[0] : 0;
+  channel.setKey(time, changed(current, value.number, change.relative), 1);
+}
+
+void NewKey::write(IntController& channel) const {
+  const int current = change.relative ? nearestInt(layerValue(channel, time)[0]) : 0;
+  channel.setKey(time, changed(current, value.integer, change.relative), 1);
+}
+
+void NewKey::write(BoolController& channel) const {
+  channel.setKey(time, changed(layerValue(channel, time)[0] != 0, value.state), 1);
 }
 
 void NewKey::writeOn(Controller& channel) const {
   channel.beginDataEdit(HTimeRange(time - 1, time + 1));
-  if (Vec3Controller* vectors = objectAs<Vec3Controller>(&channel)) {
-    writeVector(*vectors);
-  } else if (RotController* rotations = objectAs<RotController>(&channel)) {
-    writeRotation(*rotations);
-  } else if (FloatController* floats = objectAs<FloatController>(&channel)) {
-    const double current = change.relative ? layerValue(channel, time)[0] : 0;
-    floats->setKey(time, changed(current, number, change.relative), 1);
-  } else if (IntController* ints = objectAs<IntController>(&channel)) {
-    const int current = change.relative ? nearestInt(layerValue(channel, time)[0]) : 0;
-    ints->setKey(time, changed(current, integer, change.relative), 1);
-  } else if (BoolController* bools = objectAs<BoolController>(&channel)) {
-    bools->setKey(time, changed(layerValue(channel, time)[0] != 0, state), 1);
-  }
+  withKind(channel, [&](auto& typed) { write(typed); });
   channel.endDataEdit();
+}
+
+// Reads the value for a channel of that kind; false, with a message, when it cannot be keyed.
+bool readKeyValue(Args const& args, DataSource::PropertyType kind, NewKey& key) {
+  const bool boolean = kind == DataSource::BoolProperty;
+  if (!readValue(args, kind, key.change.component, key.value) ||
+      (boolean && args[1].getType() != Variable::Bool)) {
+    if (hasComponents(kind))
+      Command::logError("Invalid number or type of arguments for %s", SetKeyCmd::info.name);
+    else
+      Command::logError("Invalid number or type of arguments");  // kept: without the command's name
+    return false;
+  }
+  if (boolean && key.change.relative) {
+    Command::logError("Cannot use -r option on Boolean types");
+    return false;
+  }
+  return true;
 }
 
 // The time of the last "-t", else now.
@@ -170,12 +154,12 @@ bool SetKeyCmd::execute(Given const& given, Args const& args, Variable&) {
   const ChannelName channel = channelNameFrom(typed, Suffix::anyCut);
   key.change.component = channel.component;
   const unsigned id = Controller::mapPropertyName(channel.name);
-  key.kind = Controller::mapToPropertyType(id);
-  if (key.kind == DataSource::NoProperty) {
+  const DataSource::PropertyType kind = Controller::mapToPropertyType(id);
+  if (kind == DataSource::NoProperty) {
     logError("Unknown property type: %s", channel.name.GetStr());
     return false;
   }
-  if (!key.read(args)) return false;
+  if (!readKeyValue(args, kind, key)) return false;
 
   Module* module = candidates.getOnMod();
   if (module) key.givenOrder = rotationOrderOf(*module);

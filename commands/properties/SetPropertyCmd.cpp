@@ -1,8 +1,12 @@
-#include "commands/PendingCommand.h"
+#include "commands/ChannelName.h"
+#include "commands/Events.h"
+#include "commands/properties/AttributeWriting.h"
+#include "commands/properties/ChannelWriting.h"
+#include "commands/properties/EachAttribute.h"
 
 namespace {
 
-class SetPropertyCmd final : public PendingCommand<SetPropertyCmd> {
+class SetPropertyCmd final : public ScriptCommand<SetPropertyCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setProperty",
@@ -19,7 +23,71 @@ class SetPropertyCmd final : public PendingCommand<SetPropertyCmd> {
                   {"type", 1, Variable::String, 8},
                   {"d"}},
       .solo = Solo::no};
+  static constexpr int kConst = info.option("c"), kRelative = info.option("r"), kDefault = info.option("d");
+  static constexpr Candidates::Options kCandidates = {info.option("all"), info.option("onMod"),
+                                                      info.option("type")};
+
+  bool execute(Given const& given, Args const& args, Variable&) override;
 };
+
+constexpr char const kNoModules[] = "No modules to set property on";
+constexpr char const kNoSelection[] = "No selected modules to set property on.";
+
+bool setAttributes(Candidates const& candidates, HString const& name, Args const& args,
+                   Change const& change) {
+  const AttributeTexts texts = {kNoModules, kNoSelection, "Failed to set attribute %s on module %s"};
+  if (eachAttribute(candidates, name, texts, [&](Attribute& attribute) {
+        return setAttribute(attribute, args, change, SetPropertyCmd::info.name);
+      }))
+    return true;
+  HEventManager::safeSubmit(HReloadAttributesEvent());  // views drop what the user typed
+  return false;
+}
+
+bool readChannelValue(Args const& args, DataSource::PropertyType kind, ChannelWrite& write) {
+  if (!readValue(args, kind, write.change.component, write.value)) {
+    Command::logError("Invalid number or type of arguments for %s", SetPropertyCmd::info.name);
+    return false;
+  }
+  if (kind == DataSource::BoolProperty && write.change.relative) {
+    Command::logError("Can't use -r option for %s", SetPropertyCmd::info.name);
+    return false;
+  }
+  return true;
+}
+
+bool writeChannels(Candidates const& candidates, unsigned id, DataSource::PropertyType kind,
+                   ChannelWrite const& write) {
+  if (Module const* module = candidates.getOnMod()) {
+    // Kept: written even where it is locked; a module without the channel is no error.
+    if (Controller* channel = module->getProperty(id)) write.applyTo(*channel);
+    return true;
+  }
+  // Kept: without any module channels of one value succeed silently.
+  if (hasComponents(kind) && !candidates.exist(kNoModules, kNoSelection)) return false;
+  return candidates.each([&](Module& module) {
+    Controller* channel = module.getProperty(id);
+    // Kept: vector channels are written even where they are locked.
+    const bool writable =
+        channel && (channel->isKindOf(&Vec3Controller::s_classVec3Controller) || channel->isEditable());
+    if (writable) write.applyTo(*channel);
+    return true;
+  });
+}
+
+bool SetPropertyCmd::execute(Given const& given, Args const& args, Variable&) {
+  const GivenOptions options(given);
+  Candidates candidates;
+  if (!candidates.read(given, kCandidates)) return false;
+  const ChannelName property = channelNameFrom(args[0].getStringValue(-1), Suffix::anyCut);
+  const unsigned id = Controller::mapPropertyName(property.name);
+  const DataSource::PropertyType kind = Controller::mapToPropertyType(id);
+  const Change change = {property.component, options.has(kRelative)};
+  if (kind == DataSource::NoProperty) return setAttributes(candidates, property.name, args, change);
+
+  ChannelWrite write = {options.has(kConst) || options.has(kDefault), change, {}};
+  return readChannelValue(args, kind, write) && writeChannels(candidates, id, kind, write);
+}
 
 }  // namespace
 

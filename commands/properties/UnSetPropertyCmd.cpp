@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "commands/properties/EachAttribute.h"
 
 namespace {
 
-class UnSetPropertyCmd final : public PendingCommand<UnSetPropertyCmd> {
+class UnSetPropertyCmd final : public ScriptCommand<UnSetPropertyCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "unsetProperty",
@@ -13,7 +13,36 @@ class UnSetPropertyCmd final : public PendingCommand<UnSetPropertyCmd> {
       .args = {"propertyName", 1, 1, {Variable::String}},
       .options = {{"all"}, {"onMod", 1, Variable::String, 4}, {"type", 1, Variable::String, 2}},
       .solo = Solo::no};
+  static constexpr Candidates::Options kCandidates = {info.option("all"), info.option("onMod"),
+                                                      info.option("type")};
+
+  bool execute(Given const& given, Args const& args, Variable&) override;
 };
+
+bool unset(Attribute& attribute) {
+  if (attribute.canBeUnset()) {
+    attribute.unset(true, false, true);
+    return true;
+  }
+  g_db->logError("Attribute %s doesn't support the concept of being set or not set.",
+                 attribute.getName().GetStr());
+  return false;
+}
+
+bool UnSetPropertyCmd::execute(Given const& given, Args const& args, Variable&) {
+  Candidates candidates;
+  if (!candidates.read(given, kCandidates)) return false;
+  const HString name = args[0].getStringValue(-1);
+  if (Controller::mapToPropertyType(name) != DataSource::NoProperty) {
+    g_db->logError("Only attributes can be unset.");
+    return false;
+  }
+  return eachAttribute(candidates, name,
+                       {.noModules = "No modules to unset property on",
+                        .noSelection = "No selected modules to unset property on.",
+                        .failed = "Failed to unset attribute %s on module %s"},
+                       unset);
+}
 
 }  // namespace
 
