@@ -1,0 +1,184 @@
+// What scripts cannot see of the property and key writers: events, selection flags, values without a reader.
+#include <gmock/gmock.h>
+#include <array>
+#include <climits>
+#include <typeinfo>
+#include <utility>
+
+#include "host/animation/PropertyTable.h"
+#include "host/services/HEvent.h"
+#include "host/time/HTimeManager.h"
+#include "tests/plugin/SceneFixture.h"
+
+namespace {
+
+using testing::ElementsAre;
+using testing::IsEmpty;
+
+class PropertyWriters : public SceneFixture {
+ protected:
+  PropertyWriters() {
+    make<Clip>("take");
+    events();
+    m_listener = g_eventManager->addListener([this](HEvent const& event) {
+      // The class' name behind the length that the compiler puts before it.
+      m_events.push_back(typeid(event).name() + 2);
+    });
+  }
+  ~PropertyWriters() override {
+    g_eventManager->deliverQueued();
+    g_eventManager->removeListener(m_listener);
+  }
+
+  // The events that waited.
+  std::vector<std::string> events() {
+    g_eventManager->deliverQueued();
+    return std::exchange(m_events, {});
+  }
+  template <class T>
+  T* add(Module* module, Attribute::Type type, char const* name) {
+    auto labels = std::make_shared<std::vector<HString> const>(std::vector<HString>{"Left", "Right"});
+    return static_cast<T*>(module->addCustomAttribute(Attribute::create(type, name, labels)));
+  }
+
+ private:
+  std::vector<std::string> m_events;
+  int m_listener = 0;
+};
+
+TEST_F(PropertyWriters, TellViewsOnceOfKeysThatWereSet) {
+  make("n");
+  run("setKey", {"Translation", Vec3(1, 2, 3)}, {{"onMod", {"n"}}});
+  run("setKey", {"tx", 5}, {{"onMod", {"n"}}});
+  EXPECT_THAT(events(), ElementsAre("HControllerSelectionChangedEvent"));
+  run("setKey", {"tx", 5}, {{"all"}, {"type", {"Clip"}}});  // succeeds, though nothing is keyed
+  EXPECT_THAT(events(), ElementsAre("HControllerSelectionChangedEvent"));
+
+  run("setKey", {"tx", "5"}, {{"onMod", {"n"}}});
+  run("setKey", {"tx", 5});
+  run("setKey", {"Occluded", true}, {{"onMod", {"n"}}});
+  EXPECT_THAT(events(), IsEmpty());
+}
+
+TEST_F(PropertyWriters, TellAttributeViewsOfFailuresOnly) {
+  Node* node = make("n");
+  add<IntAttribute>(node, Attribute::Integer, "Count");
+  run("setProperty", {"Count", 5}, {{"onMod", {"n"}}});
+  run("setProperty", {"Translation", 5}, {{"onMod", {"n"}}});
+  run("setProperty", {"Count", 5}, {{"onMod", {"nobody"}}});
+  run("unsetProperty", {"Nothing"}, {{"onMod", {"n"}}});
+  run("unsetProperty", {"Count"});
+  EXPECT_THAT(events(), IsEmpty());
+
+  for (char const* value : {"five", "six"}) run("setProperty", {"Count", value}, {{"onMod", {"n"}}});
+  EXPECT_THAT(events(), ElementsAre("HReloadAttributesEvent"));
+  run("setProperty", {"Nothing", 5}, {{"onMod", {"n"}}});
+  EXPECT_THAT(events(), ElementsAre("HReloadAttributesEvent"));
+  run("setProperty", {"Count", 5});
+  EXPECT_THAT(events(), ElementsAre("HReloadAttributesEvent"));
+  run("setProperty", {"Nothing", 5}, {{"all"}});
+  EXPECT_THAT(events(), ElementsAre("HReloadAttributesEvent"));
+}
+
+TEST_F(PropertyWriters, KeyNothingBeyondTheTimeLine) {
+  Node* node = make("n");
+  const auto keyAt = [&](int frame) {
+    return run("setKey", {"Translation", Vec3(1, 2, 3)}, {{"t", {frame}}, {"onMod", {"n"}}});
+  };
+  EXPECT_EQ(keyAt(INT_MIN), "nothing");
+  HFrameRate rate;
+  rate.setFrameRate(0.1);
+  HTimeManager::getInstance()->setFrameRate(rate);
+  EXPECT_EQ(keyAt(INT_MAX), "error: Frame 2147483647 lies beyond the time line.\nfailed");
+  EXPECT_EQ(keyAt(INT_MIN), "error: Frame -2147483648 lies beyond the time line.\nfailed");
+  EXPECT_EQ(node->getTranslationChannel()->getNumKeys(), 1);
+}
+
+TEST_F(PropertyWriters, DropActivePropertiesThatNobodyHasWhenTheyFollow) {
+  make("n");
+  PropertyTable& table = PropertyTable::getInstance();
+  g_db->setActiveProperties({table.findId("Threshold") | PropertyTable::kWhole});
+  run("setKey", {"tx", 5}, {{"onMod", {"n"}}});
+  EXPECT_EQ(g_db->getNumActiveProperties(), 1);
+  g_db->setAutoUpdateProperties(true);
+  run("setKey", {"tx", "5"}, {{"onMod", {"n"}}});
+  EXPECT_EQ(g_db->getNumActiveProperties(), 1);
+  run("setKey", {"tx", 5}, {{"onMod", {"n"}}});
+  EXPECT_EQ(g_db->getNumActiveProperties(), 0);
+  g_db->setAutoUpdateProperties(false);
+}
+
+TEST_F(PropertyWriters, LeaveCreatedKeysSelectedOnTheActiveComponents) {
+  PropertyTable& table = PropertyTable::getInstance();
+  const unsigned translation = table.findId("Translation");
+  const auto selectedBy = [&](unsigned bits) {
+    Node* node = make("n");
+    g_db->selectAllModules(false);
+    node->setSelected(true);
+    g_db->setActiveProperties({translation | bits});
+    run("createKey");
+    Controller const* channel = node->getTranslationChannel();
+    EXPECT_EQ(channel->getNumKeys(7), bits ? 1 : 0);
+    return channel->getNumKeys() ? channel->getSelectedKeyFlags(0) : 8u;
+  };
+  EXPECT_EQ(selectedBy(PropertyTable::kWhole), 7u);
+  EXPECT_EQ(selectedBy(PropertyTable::kX | PropertyTable::kZ), 1u);  // the first of two
+  EXPECT_EQ(selectedBy(PropertyTable::kY | PropertyTable::kZ), 2u);
+  EXPECT_EQ(selectedBy(PropertyTable::kZ), 4u);
+  EXPECT_EQ(selectedBy(0), 8u);
+}
+
+TEST_F(PropertyWriters, FillSquareMatrices) {
+  auto* grid = add<MatrixAttribute>(make("n"), Attribute::MatrixKind, "Grid");
+  const auto fill = [&](int count) {
+    ArgList args = {"Grid"};
+    for (int i = 1; i <= count; ++i) args.push_back(i);
+    return run("setProperty", args, {{"onMod", {"n"}}});
+  };
+  const auto last = [&] {
+    return grid->getValue()[grid->getValue().rows() - 1][grid->getValue().rows() - 1];
+  };
+  for (const auto& [count, rows, corner] :
+       {std::array{1, 1, 1}, {3, 1, 1}, {4, 2, 4}, {10, 3, 9}, {11, 3, 9}, {36, 6, 36}}) {
+    EXPECT_EQ(fill(count), "nothing");
+    EXPECT_EQ(static_cast<int>(grid->getValue().rows()), rows) << count;
+    EXPECT_EQ(last(), corner);
+  }
+  fill(10);
+  EXPECT_EQ(grid->getValue()[1][0], 4);
+  EXPECT_EQ(fill(37),
+            "error: Invalid number of arguments for setProperty\n"
+            "error: Failed to set attribute Grid on module n\nfailed");
+  EXPECT_EQ(grid->getValue().rows(), 3u);
+}
+
+TEST_F(PropertyWriters, MarkAttributesSetAndUnset) {
+  Node* node = make("n");
+  auto* paint = add<ColorAttribute>(node, Attribute::Color, "Paint");
+  auto* button = add<EventAttribute>(node, Attribute::Event, "Go");
+  run("setProperty", {"Paint", Vec3(1, 2, 3)}, {{"onMod", {"n"}}});
+  EXPECT_FALSE(paint->isDefaultMode());
+  run("setProperty", {"Paint", "default"}, {{"onMod", {"n"}}});
+  EXPECT_TRUE(paint->isDefaultMode());
+  run("setProperty", {"Go", "now", 5}, {{"onMod", {"n"}}});
+  EXPECT_TRUE(button->isSet());
+  run("unsetProperty", {"Go"}, {{"onMod", {"n"}}});
+  EXPECT_FALSE(button->isSet());
+}
+
+// The last "-onMod" decides, and each must name a module; it goes before every other choice.
+TEST_F(PropertyWriters, FindTheirModules) {
+  Node *a = make("a"), *b = make("b");
+  auto* count = add<IntAttribute>(a, Attribute::Integer, "Count");
+  auto* other = add<IntAttribute>(b, Attribute::Integer, "Count");
+  run("setProperty", {"Count", 1}, {{"onMod", {"a"}}, {"onMod", {"b"}}, {"all"}});
+  EXPECT_EQ(count->getValue(), 0);
+  EXPECT_EQ(other->getValue(), 1);
+  EXPECT_EQ(run("setProperty", {"Count", 2}, {{"onMod", {"nobody"}}, {"onMod", {"b"}}}),
+            "error: nobody is not a valid unique path to a Module in the scene.\nfailed");
+  EXPECT_EQ(run("setProperty", {"Count", 2}, {{"type", {"None"}}, {"onMod", {"nobody"}}}),
+            "error: None is not a Module type\nfailed");
+  EXPECT_EQ(other->getValue(), 1);
+}
+
+}  // namespace
