@@ -1,6 +1,7 @@
 #include "commands/keys/KeyClipboard.h"
 #include "commands/keys/KeyTargets.h"
 #include "host/scene/Database.h"
+#include "host/scene/Node.h"
 #include "host/time/HTimeManager.h"
 
 namespace {
@@ -28,9 +29,9 @@ unsigned componentsOfCopy() {
   return mask;
 }
 
-// That of the channel's node; a module that is no node counts in order 0.
-TalixRotation::RotOrder rotationOrderOf(Controller const& channel) {
-  auto const* node = objectAs<Node>(channel.getModule());
+// That of the channel's node; what is no node counts in order 0.
+TalixRotation::RotOrder rotationOrderOf(Controller const* channel) {
+  auto const* node = channel ? objectAs<Node>(channel->getModule()) : nullptr;
   return node ? node->getRotationOrder() : TalixRotation::XYZ;
 }
 
@@ -38,7 +39,10 @@ TalixRotation::RotOrder rotationOrderOf(Controller const& channel) {
 class KeyCopy {
  public:
   KeyCopy(Controller const& channel, Choice choice)
-      : m_channel(channel), m_choice(choice), m_order(rotationOrderOf(channel)), m_mask(componentsOfCopy()) {}
+      : m_channel(channel),
+        m_choice(choice),
+        m_order(rotationOrderOf(&channel)),
+        m_mask(componentsOfCopy()) {}
 
   // Answers the number of keys.
   int run() {
@@ -125,7 +129,7 @@ bool CopyKeysCmd::execute(Given const& given, Args const&, Variable& result) {
   Controller const* channel = activeChannel();
   ClipboardManager* clipboard = g_db->getClipboardManager();
   clipboard->startClipboardCopy(ClipboardManager::ControllerData, clipboardTypeOf(channel),
-                                channel ? rotationOrderOf(*channel) : TalixRotation::XYZ);
+                                rotationOrderOf(channel));
   const int count = channel ? KeyCopy(*channel, choice).run() : 0;
   clipboard->finishClipboardCopy(true);
   logInfo("Copied %d keys to clipboard", count);
