@@ -1,8 +1,12 @@
-#include "commands/PendingCommand.h"
+#include "commands/keys/KeyClipboard.h"
+#include "commands/keys/KeyTargets.h"
+#include "host/scene/Database.h"
+#include "host/scene/Node.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class CopyKeysCmd final : public PendingCommand<CopyKeysCmd> {
+class CopyKeysCmd final : public ScriptCommand<CopyKeysCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "copyKeys",
@@ -11,7 +15,126 @@ class CopyKeysCmd final : public PendingCommand<CopyKeysCmd> {
       .purpose = "Puts keys of the active channels of one selected module on the key clipboard.",
       .options = {{"all", 0, Variable::None, 2}, {"ranges", 0, Variable::None, 1}},
       .returns = Variable::Int};
+
+  bool execute(Given const& given, Args const&, Variable& result) override;
 };
+
+enum class Choice { selected, ranges, all };
+
+// The components that a copy of whole keys takes: those that any active property marks.
+unsigned componentsOfCopy() {
+  unsigned mask = 0;
+  for (int i = 0; i < g_db->getNumActiveProperties(); ++i)
+    mask |= markedComponents(g_db->getActiveProperty(i));
+  return mask;
+}
+
+// That of the channel's node; what is no node counts in order 0.
+TalixRotation::RotOrder rotationOrderOf(Controller const* channel) {
+  auto const* node = channel ? objectAs<Node>(channel->getModule()) : nullptr;
+  return node ? node->getRotationOrder() : TalixRotation::XYZ;
+}
+
+// Puts keys of one channel on the clipboard.
+class KeyCopy {
+ public:
+  KeyCopy(Controller const& channel, Choice choice)
+      : m_channel(channel),
+        m_choice(choice),
+        m_order(rotationOrderOf(&channel)),
+        m_mask(componentsOfCopy()) {}
+
+  // Answers the number of keys.
+  int run() {
+    KeyTrack const* track = m_channel.findActiveTrack();
+    if (!track) return 0;
+    if (m_choice != Choice::ranges) {
+      addKeys(*track, 0, track->count());
+      return m_count;
+    }
+    HTimeManager const* time = HTimeManager::getInstance();
+    for (int i = 0; i < time->getNumSelectedRanges(); ++i) {
+      const HTimeRange range = time->getSelectedTimeRange(i);
+      addKeys(*track, track->lowerBound(range.getStart()), track->lowerBound(range.getEnd() + 1));
+    }
+    return m_count;
+  }
+
+ private:
+  void addKeys(KeyTrack const& track, int64 first, int64 last) {
+    track.forEach(first, last, [&](KeyTrack::Key const& key) {
+      if (m_choice != Choice::selected || key.selected) add(key);
+    });
+  }
+
+  void add(KeyTrack::Key const& key) {
+    ClipboardManager::tagKey record;
+    record.time = key.time;
+    record.components = isOneValued(m_channel)         ? key.components
+                        : m_choice == Choice::selected ? key.selected
+                                                       : m_mask;
+    record.flags = key.components;
+    Vec3 const value = valueOf(key, record.components);
+    value.getValue(record.x, record.y, record.z);
+    g_db->getClipboardManager()->addKey(record);
+    ++m_count;
+  }
+
+  // A component that is copied though the key lacks it has the layer's value there.
+  Vec3 valueOf(KeyTrack::Key const& key, unsigned components) const {
+    if (objectAs<RotController>(&m_channel)) {
+      TalixRotation rotation;
+      rotation.setQuaternion(key.values.data());
+      Vec3 angles;
+      rotation.getAsEuler(m_order, angles);
+      return angles;
+    }
+    Controller::Values values = key.values;
+    if (components & ~static_cast<unsigned>(key.components)) m_channel.evaluateLayer(key.time, values);
+    return Vec3(values.data());
+  }
+
+  Controller const& m_channel;
+  Choice m_choice;
+  TalixRotation::RotOrder m_order;
+  unsigned m_mask;
+  int m_count = 0;
+};
+
+bool CopyKeysCmd::execute(Given const& given, Args const&, Variable& result) {
+  // Step 1: one module, some channel.
+  if (g_db->getNumSelectedModules() != 1) {
+    logError("Can only copy from one selected module");
+    return false;
+  }
+  if (g_db->getNumActiveProperties() == 0) {
+    logError("Must have at least one channel selected");
+    return false;
+  }
+
+  // Step 2: which keys. kept: options are told by name, not by index.
+  Choice choice = Choice::selected;
+  for (CommandOption const& option : given) {
+    if (option.getName() == "all") choice = Choice::all;
+    if (option.getName() == "ranges" && choice != Choice::all) choice = Choice::ranges;
+  }
+
+  // Step 3: one channel.
+  if (!nameOneChannel()) {
+    logWarning("Can only copy from one set of keys");
+    return true;
+  }
+
+  // Step 4: the copy. A channel that the module lacks has no keys.
+  Controller const* channel = activeChannel();
+  ClipboardManager* clipboard = g_db->getClipboardManager();
+  clipboard->startClipboardCopy(ClipboardManager::ControllerData, clipboardTypeOf(channel),
+                                rotationOrderOf(channel));
+  const int count = channel ? KeyCopy(*channel, choice).run() : 0;
+  clipboard->finishClipboardCopy(true);
+  logInfo("Copied %d keys to clipboard", count);
+  return answer(result, count);
+}
 
 }  // namespace
 

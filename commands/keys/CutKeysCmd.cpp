@@ -1,8 +1,11 @@
-#include "commands/PendingCommand.h"
+#include "commands/Targets.h"
+#include "commands/keys/KeyTargets.h"
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class CutKeysCmd final : public PendingCommand<CutKeysCmd> {
+class CutKeysCmd final : public ScriptCommand<CutKeysCmd> {
  public:
   static constexpr CommandInfo info = {.name = "cutKeys",
                                        .displayName = "Cut Keys",
@@ -14,7 +17,104 @@ class CutKeysCmd final : public PendingCommand<CutKeysCmd> {
                                                    {"ranges", 0, Variable::None, 1},
                                                    {"allLayers"},
                                                    {"onMod", 1, Variable::String}}};
+
+  bool execute(Given const& given, Args const&, Variable&) override;
 };
+
+// Removes keys from one channel after the other and counts them.
+class KeyCut {
+ public:
+  KeyCut(bool all, bool ranges, bool allLayers) : m_all(all), m_ranges(ranges), m_allLayers(allLayers) {}
+
+  void cut(Module const& module) {
+    for (int i = 0; i < g_db->getNumActiveProperties(); ++i) {
+      const unsigned id = g_db->getActiveProperty(i);
+      Controller* channel = module.getProperty(id);
+      if (!channel || channel->getNumKeys() == 0 || !channel->isEditable()) continue;
+      const unsigned mask = componentMask(id);
+      // Keys of rotations go whole.
+      const unsigned lost = objectAs<RotController>(channel) ? KeyTrack::kAll : mask;
+      m_all      ? cutAll(*channel, mask, lost)
+      : m_ranges ? cutRanges(*channel, lost)
+                 : cutSelected(*channel, mask, lost);
+    }
+  }
+
+  void report() const {
+    m_keys ? Command::logInfo("Cut %d keys on %d channels", m_keys, m_channels)
+           : Command::logInfo("No keys to cut");
+  }
+
+ private:
+  void cutAll(Controller& channel, unsigned mask, unsigned lost) {
+    m_keys += channel.getNumKeys();
+    KeyTrack const& track = *channel.findActiveTrack();
+    channel.beginDataEdit(m_allLayers ? channel.getKeyRangeInClip(g_db->getActiveClip())
+                                      : rangeBetween(track, track.nextHolding(-1, mask),
+                                                     track.previousHolding(track.count(), mask)));
+    channel.deleteKeys(HTimeRange::forever(), lost, m_allLayers);
+    channel.endDataEdit();
+    ++m_channels;
+  }
+
+  void cutRanges(Controller& channel, unsigned lost) {
+    HTimeManager const* time = HTimeManager::getInstance();
+    for (int i = 0; i < time->getNumSelectedRanges(); ++i) {
+      const HTimeRange range = time->getSelectedTimeRange(i);
+      channel.beginDataEdit(range);
+      m_keys += channel.deleteKeys(range, lost, m_allLayers);
+      channel.endDataEdit();
+    }
+    if (time->getNumSelectedRanges() > 0) ++m_channels;
+  }
+
+  void cutSelected(Controller& channel, unsigned mask, unsigned lost) {
+    const int count = channel.getNumSelectedKeys(mask);
+    if (count == 0) return;
+    KeyTrack const& track = *channel.findActiveTrack();
+    channel.beginDataEdit(
+        rangeBetween(track, track.nextSelected(-1, mask), track.previousSelected(track.count(), mask)));
+    channel.deleteSelectedKeys(lost);
+    channel.endDataEdit();
+    m_keys += count;
+    ++m_channels;
+  }
+
+  // Empty when there are no such keys.
+  static HTimeRange rangeBetween(KeyTrack const& track, int64 first, int64 last) {
+    return first < 0 ? HTimeRange() : HTimeRange(track.timeAt(first), track.timeAt(last));
+  }
+
+  bool m_all, m_ranges, m_allLayers;
+  int m_keys = 0, m_channels = 0;
+};
+
+bool CutKeysCmd::execute(Given const& given, Args const&, Variable&) {
+  // kept: "-onMod" needs a selection as well.
+  if (g_db->getNumSelectedModules() == 0) {
+    logWarning("No items selected for key cutting");
+    return true;
+  }
+  Module const* onMod = nullptr;
+  for (CommandOption const& option : given)
+    if (option.getIndex() == info.option("onMod") &&
+        !(onMod = moduleAt(option.getArg(0).getStringValue(-1),
+                           "%s is not a valid path to a module in the scene")))
+      return false;
+  const GivenOptions options(given);
+  const bool all = options.has(info.option("all")), ranges = options.has(info.option("ranges")),
+             allLayers = options.has(info.option("allLayers"));
+  if (allLayers && !all && !ranges)
+    logWarning("Option -allLayers must be specified with -all or -ranges options. Ignoring");
+
+  KeyCut cut(all, ranges, allLayers);
+  if (onMod)
+    cut.cut(*onMod);
+  else
+    for (int i = 0; i < g_db->getNumSelectedModules(); ++i) cut.cut(*g_db->getSelectedModule(i));
+  cut.report();
+  return true;
+}
 
 }  // namespace
 

@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "commands/keys/KeyTargets.h"
 
 namespace {
 
-class GetKeysCmd final : public PendingCommand<GetKeysCmd> {
+class GetKeysCmd final : public ScriptCommand<GetKeysCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getKeys",
                                        .displayName = "Get Key Times",
@@ -13,7 +13,19 @@ class GetKeysCmd final : public PendingCommand<GetKeysCmd> {
                                        .options = {{"onMod", 1, Variable::String}},
                                        .returns = Variable::IntArray,
                                        .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
 };
+
+bool holds(KeyTrack::Key const& key, unsigned mask) { return (key.components & mask) == mask; }
+
+bool GetKeysCmd::execute(Given const& given, Args const& args, Variable& result) {
+  constexpr KeyQueryTexts texts = {.noKeys = "No keys on Base Clip",
+                                   .badPath = "%s is not a valid unique path to a Module in the scene."};
+  return queryKeys(args, given, info.option("onMod"), texts, [&](Controller const& channel, unsigned mask) {
+    return answer(result, framesOf(channel, mask, holds));
+  });
+}
 
 }  // namespace
 

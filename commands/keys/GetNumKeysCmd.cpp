@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "commands/keys/KeyTargets.h"
 
 namespace {
 
-class GetNumKeysCmd final : public PendingCommand<GetNumKeysCmd> {
+class GetNumKeysCmd final : public ScriptCommand<GetNumKeysCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getNumKeys",
                                        .displayName = "Get Number of Keys",
@@ -13,7 +13,20 @@ class GetNumKeysCmd final : public PendingCommand<GetNumKeysCmd> {
                                        .options = {{"s"}, {"onMod", 1, Variable::String}},
                                        .returns = Variable::Int,
                                        .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
 };
+
+bool GetNumKeysCmd::execute(Given const& given, Args const& args, Variable& result) {
+  constexpr KeyQueryTexts texts = {.noKeys = "No keys on Base Clip",
+                                   .badPath = "%s is not a valid unique path to a Module in the scene."};
+  const bool selected = GivenOptions(given).has(info.option("s"));
+  return queryKeys(args, given, info.option("onMod"), texts, [&](Controller const& channel, unsigned mask) {
+    if (mask == KeyTrack::kAll || isOneValued(channel))
+      return answer(result, selected ? channel.getNumSelectedKeys() : channel.getNumKeys());
+    return answer(result, selected ? channel.getNumSelectedKeys(mask) : channel.getNumKeys(mask));
+  });
+}
 
 }  // namespace
 

@@ -1,8 +1,11 @@
-#include "commands/PendingCommand.h"
+#include "commands/ChannelName.h"
+#include "commands/Targets.h"
+#include "commands/keys/KeyTargets.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class HasKeysCmd final : public PendingCommand<HasKeysCmd> {
+class HasKeysCmd final : public ScriptCommand<HasKeysCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "hasKey",
@@ -18,7 +21,75 @@ class HasKeysCmd final : public PendingCommand<HasKeysCmd> {
                   {"any"}},
       .returns = Variable::Bool,
       .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
+
+ private:
+  static bool timeAsked(Given const& given, int64& time);
 };
+
+// The current time, or that of the last "-frame" or "-seconds". False, with a message, beyond the time line.
+bool HasKeysCmd::timeAsked(Given const& given, int64& time) {
+  HTimeManager const* manager = HTimeManager::getInstance();
+  time = manager->getTime();
+  for (CommandOption const& option : given) {
+    // kept: "-seconds" counts frames as well, from where the animation range begins.
+    const bool isFrame = option.getIndex() == info.option("frame");
+    if (!isFrame && option.getIndex() != info.option("seconds")) continue;
+    const int64 start = manager->getAnimRange().getStart();
+    const int64 origin = isFrame ? 0 : manager->frameTime(start, HTimeManager::RoundDown, 0);
+    if (!timeOfFrame(option.getArg(0).getIntValue(-1), origin, time)) return false;
+  }
+  return true;
+}
+
+// Whether one of the keys, at whole frames from the first one on, holds the components.
+bool hasKeyOnFrames(KeyTrack const* track, unsigned mask, bool selected) {
+  if (!track || track->empty()) return false;
+  const int64 ticks = HTimeManager::getInstance()->getTicksPerFrame(), start = track->timeAt(0);
+  KeyTrack::Reader keys(*track, 0);
+  for (int64 left = track->count(); left > 0; --left) {
+    const KeyTrack::Key key = keys.next();
+    if ((key.components & mask) == mask && (!selected || key.selected & mask) &&
+        (key.time - start) % ticks == 0)
+      return true;
+  }
+  return false;
+}
+
+bool HasKeysCmd::execute(Given const& given, Args const& args, Variable& result) {
+  // Step 1: the time.
+  int64 time = 0;
+  if (!timeAsked(given, time)) return false;
+
+  // Step 2: the channel.
+  Module const* module = moduleAt(args[0].getStringValue(-1),
+                                  "%s  is not a valid unique path to a Module in the scene.");  // kept
+  if (!module) return false;
+  const ChannelName wanted = channelNameFrom(args[1].getStringValue(-1), Suffix::anyCut);
+  Controller const* channel = module->getProperty(wanted.name);
+  if (!channel) {
+    // kept: the module's name stands in the channel's place.
+    Command::logError("Channel \"%s\" not found on module %s", module->getName().GetStr(),
+                      wanted.name.GetStr());
+    return false;
+  }
+
+  // Step 3: its keys.
+  const GivenOptions options(given);
+  const bool selected = options.has(info.option("selected")), any = options.has(info.option("any"));
+  const unsigned mask = wanted.mask();
+  if (!options.has(info.option("allTime"))) {
+    if (any)
+      return answer(result,
+                    selected ? channel->isKeySelectedAt(time, KeyTrack::kAll) : channel->hasKeyAt(time));
+    return answer(result,
+                  channel->hasKeyAt(time, mask) && (!selected || channel->isKeySelectedAt(time, mask)));
+  }
+  if (!any) return answer(result, hasKeyOnFrames(channel->findActiveTrack(), mask, selected));
+  if (selected) return answer(result, channel->getNumSelectedKeys(mask) > 0);
+  return answer(result, (mask == KeyTrack::kAll ? channel->getNumKeys() : channel->getNumKeys(mask)) > 0);
+}
 
 }  // namespace
 

@@ -1,8 +1,11 @@
-#include "commands/PendingCommand.h"
+#include "commands/keys/KeyClipboard.h"
+#include "commands/keys/KeyTargets.h"
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class PasteKeysCmd final : public PendingCommand<PasteKeysCmd> {
+class PasteKeysCmd final : public ScriptCommand<PasteKeysCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "pasteKeys",
@@ -11,7 +14,96 @@ class PasteKeysCmd final : public PendingCommand<PasteKeysCmd> {
       .purpose =
           "Writes the keys on the clipboard to the selected module, from the current time or a frame on.",
       .options = {{"useFrame", 1, Variable::Int}}};
+
+  bool execute(Given const& given, Args const&, Variable&) override;
 };
+
+// Angles that the record does not hold stay as the layer has them.
+TalixRotation rotationOf(ClipboardManager::tagKey const& record, RotController const& channel, int64 time) {
+  const TalixRotation::RotOrder order = g_db->getClipboardManager()->getRotationOrder();
+  TalixRotation rotation;
+  Vec3 angles(record.x, record.y, record.z);
+  if (record.components != KeyTrack::kAll) {
+    Controller::Values values;
+    channel.evaluateLayer(time, values);
+    rotation.setQuaternion(values.data());
+    Vec3 present;
+    rotation.getAsEuler(order, present);
+    for (int i = 0; i < 3; ++i)
+      if (!(record.components >> i & 1)) angles[i] = present[i];
+  }
+  rotation.setAsEuler(order, angles);
+  return rotation;
+}
+
+void paste(ClipboardManager::tagKey const& record, Controller& channel, int64 time) {
+  if (auto* rotations = objectAs<RotController>(&channel)) {
+    if (record.components) rotations->setKey(time, rotationOf(record, *rotations, time), KeyTrack::kAll);
+    return;
+  }
+  const unsigned mask = record.components & (isOneValued(channel) ? 1 : KeyTrack::kAll);
+  if (mask) channel.writeKeyAt(time, {record.x, record.y, record.z}, mask);
+}
+
+// All keys, the first of them at `time`. False, with a message, when they reach beyond the time line.
+bool pasteAll(ClipboardManager const& clipboard, Controller& channel, int64 time) {
+  const HTimeRange source = clipboard.getControllerDataRange();
+  const int64 length = source.getEnd() - source.getStart();
+  if (length > kForever - time) {
+    Command::logError("The pasted keys would lie beyond the time line.");
+    return false;
+  }
+  channel.beginDataEdit(HTimeRange(time, time + length));
+  for (int i = 0; i < clipboard.getNumControllerKeys(); ++i) {
+    const ClipboardManager::tagKey record = clipboard.getControllerKey(i);
+    paste(record, channel, time + (record.time - source.getStart()));
+  }
+  channel.endDataEdit();
+  return true;
+}
+
+bool PasteKeysCmd::execute(Given const& given, Args const&, Variable&) {
+  // Step 1: one module, some channel.
+  if (g_db->getNumSelectedModules() != 1) {
+    logWarning("Can only paste onto one selected module");
+    return true;
+  }
+  if (g_db->getNumActiveProperties() == 0) {
+    logWarning("Must have at least one channel selected");
+    return true;
+  }
+
+  // Step 2: where to.
+  int64 time = HTimeManager::getInstance()->getTime();
+  CommandOption const* frame = GivenOptions(given).find(info.option("useFrame"));
+  if (frame && !timeOfFrame(frame->getArg(0).getIntValue(-1), 0, time)) return false;
+
+  // Step 3: one channel that takes these keys.
+  if (!nameOneChannel()) {
+    logWarning("Can only paste onto one set of keys");
+    return true;
+  }
+  Controller* channel = activeChannel();
+  if (!channel || !channel->isEditable()) {
+    logWarning("Controller is not editable");
+    return true;
+  }
+  ClipboardManager const& clipboard = *g_db->getClipboardManager();
+  if (!clipboard.isEmpty() && clipboard.getControllerDataType() != clipboardTypeOf(channel)) {
+    logError("Channel data types don't match between copyKeys/pasteKeys");
+    return false;
+  }
+
+  // Step 4: the keys.
+  const int count = clipboard.getNumControllerKeys();
+  if (count == 0) {
+    logInfo("Pasted 0 keys");
+    return true;
+  }
+  if (!pasteAll(clipboard, *channel, time)) return false;
+  logInfo("Pasted %d keys from the clipboard", count - 1);  // kept: one less than were pasted
+  return true;
+}
 
 }  // namespace
 

@@ -1,14 +1,17 @@
 #include "host/animation/ClipboardManager.h"
 
-void ClipboardManager::startClipboardCopy(ClipboardDataType, ControllerDataType type) {
+void ClipboardManager::startClipboardCopy(ClipboardDataType, ControllerDataType type,
+                                          TalixRotation::RotOrder order) {
   m_incoming.clear();
   m_incomingType = type;
+  m_incomingOrder = order;
 }
 
 void ClipboardManager::finishClipboardCopy(bool keep) {
   if (keep) {
     m_keys.swap(m_incoming);
     m_type = m_incomingType;
+    m_order = m_incomingOrder;
     m_filled = true;
   }
   m_incoming.clear();

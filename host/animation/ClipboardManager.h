@@ -3,6 +3,7 @@
 
 #include <vector>
 
+#include "host/math/TalixRotation.h"
 #include "host/time/HTimeRange.h"
 
 class ClipboardManager {
@@ -18,13 +19,16 @@ class ClipboardManager {
     unsigned flags = 0;       // the key's own, as its channel reports them
   };
 
-  // What is added until finishClipboardCopy replaces the content; keep: false takes the copy back.
-  void startClipboardCopy(ClipboardDataType data, ControllerDataType type);
+  // What is added until finishClipboardCopy replaces the content; keep: false takes the copy back. order: the
+  // source's, in which the angles of rotations are given.
+  void startClipboardCopy(ClipboardDataType data, ControllerDataType type,
+                          TalixRotation::RotOrder order = TalixRotation::XYZ);
   void addKey(tagKey key) { m_incoming.push_back(key); }
   void finishClipboardCopy(bool keep);
 
   bool isEmpty() const { return !m_filled; }
   ControllerDataType getControllerDataType() const { return m_type; }
+  TalixRotation::RotOrder getRotationOrder() const { return m_order; }
   int getNumControllerKeys() const { return static_cast<int>(m_keys.size()); }
   tagKey getControllerKey(int i) const { return m_keys[static_cast<size_t>(i)]; }
   // From the earliest to the latest key; empty without keys.
@@ -33,5 +37,6 @@ class ClipboardManager {
  private:
   std::vector<tagKey> m_keys, m_incoming;
   ControllerDataType m_type = OtherKeys, m_incomingType = OtherKeys;
+  TalixRotation::RotOrder m_order = TalixRotation::XYZ, m_incomingOrder = TalixRotation::XYZ;
   bool m_filled = false;
 };

@@ -65,6 +65,11 @@ class KeyLeaf final : public KeyNode {
   int previousSelected(int slot, unsigned mask) const {
     return plain() ? -1 : scan<-1>(slot, mask << kSelectionShift);
   }
+  // The same for keys that are selected on no component of the mask.
+  int nextUnselected(int slot, unsigned mask) const { return scan<1, false>(slot, mask << kSelectionShift); }
+  int previousUnselected(int slot, unsigned mask) const {
+    return scan<-1, false>(slot, mask << kSelectionShift);
+  }
 
   void insert(int slot, int64 time, const double* values, unsigned components, unsigned selection = 0);
   // n whole keys behind the last one. The leaf must have room for them.
@@ -87,11 +92,12 @@ class KeyLeaf final : public KeyNode {
   enum class Form : unsigned char { One, Float, Double };
   static constexpr int kSelectionShift = 4;
 
-  template <int Step>
+  // The first slot that has any of the flags, or none of them.
+  template <int Step, bool Any = true>
   int scan(int slot, unsigned flags) const {
-    if (plain()) return slot >= 0 && slot < m_size && flags ? slot : -1;
+    if (plain()) return slot >= 0 && slot < m_size && (flags || !Any) ? slot : -1;
     for (; slot >= 0 && slot < m_size; slot += Step)
-      if (m_flags[slot] & flags) return slot;
+      if (((m_flags[slot] & flags) != 0) == Any) return slot;
     return -1;
   }
 

@@ -39,6 +39,13 @@ struct KeyCounts {
   // Whether some key holds (is selected on) any component of the mask.
   bool holdsAny(unsigned mask) const { return anyOf(held, mask); }
   bool selectedAny(unsigned mask) const { return anyOf(selectedOn, mask); }
+  // Whether some key may be selected on no component of the mask; surely so with one component or all.
+  bool unselectedAny(unsigned mask) const {
+    if (mask == 7) return keys > selected;
+    for (int c = 0; c < 3; ++c)
+      if (mask >> c & 1 && selectedOn[c] == keys) return false;
+    return keys > 0;
+  }
 
  private:
   static bool anyOf(const int64 (&by)[3], unsigned mask) {

@@ -10,19 +10,27 @@
 
 namespace {
 
-// What a walk looks for: keys that hold, or are selected on, any component of the mask.
+// What a walk looks for: keys that hold, or are selected on, any component of the mask, or those that are
+// selected on none.
 struct Wanted {
+  enum Kind { holding, selected, unselected };
   unsigned mask;
-  bool selected;
+  Kind kind;
 
   bool below(KeyNode const& node) const {
-    return selected ? node.counts.selectedAny(mask) : node.counts.holdsAny(mask);
+    return kind == holding    ? node.counts.holdsAny(mask)
+           : kind == selected ? node.counts.selectedAny(mask)
+                              : node.counts.unselectedAny(mask);
   }
   int next(KeyLeaf const& leaf, int slot) const {
-    return selected ? leaf.nextSelected(slot, mask) : leaf.nextHolding(slot, mask);
+    return kind == holding    ? leaf.nextHolding(slot, mask)
+           : kind == selected ? leaf.nextSelected(slot, mask)
+                              : leaf.nextUnselected(slot, mask);
   }
   int previous(KeyLeaf const& leaf, int slot) const {
-    return selected ? leaf.previousSelected(slot, mask) : leaf.previousHolding(slot, mask);
+    return kind == holding    ? leaf.previousHolding(slot, mask)
+           : kind == selected ? leaf.previousSelected(slot, mask)
+                              : leaf.previousUnselected(slot, mask);
   }
 };
 
@@ -205,19 +213,34 @@ int64 KeyTrack::lowerBound(int64 time) const {
 }
 
 int64 KeyTrack::nextHolding(int64 index, unsigned mask) const {
-  return m_root ? findNext(*m_root.get(), std::max<int64>(index + 1, 0), {normal(mask), false}) : -1;
+  return m_root ? findNext(*m_root.get(), std::max<int64>(index + 1, 0), {normal(mask), Wanted::holding})
+                : -1;
 }
 
 int64 KeyTrack::previousHolding(int64 index, unsigned mask) const {
-  return m_root ? findPrevious(*m_root.get(), std::min(index, count()) - 1, {normal(mask), false}) : -1;
+  return m_root ? findPrevious(*m_root.get(), std::min(index, count()) - 1, {normal(mask), Wanted::holding})
+                : -1;
 }
 
 int64 KeyTrack::nextSelected(int64 index, unsigned mask) const {
-  return m_root ? findNext(*m_root.get(), std::max<int64>(index + 1, 0), {normal(mask), true}) : -1;
+  return m_root ? findNext(*m_root.get(), std::max<int64>(index + 1, 0), {normal(mask), Wanted::selected})
+                : -1;
 }
 
 int64 KeyTrack::previousSelected(int64 index, unsigned mask) const {
-  return m_root ? findPrevious(*m_root.get(), std::min(index, count()) - 1, {normal(mask), true}) : -1;
+  return m_root ? findPrevious(*m_root.get(), std::min(index, count()) - 1, {normal(mask), Wanted::selected})
+                : -1;
+}
+
+int64 KeyTrack::nextUnselected(int64 index, unsigned mask) const {
+  return m_root ? findNext(*m_root.get(), std::max<int64>(index + 1, 0), {normal(mask), Wanted::unselected})
+                : -1;
+}
+
+int64 KeyTrack::previousUnselected(int64 index, unsigned mask) const {
+  return m_root
+             ? findPrevious(*m_root.get(), std::min(index, count()) - 1, {normal(mask), Wanted::unselected})
+             : -1;
 }
 
 KeyTrack::Key KeyTrack::Reader::next() {

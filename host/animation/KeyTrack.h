@@ -90,6 +90,9 @@ class KeyTrack {
   int64 previousHolding(int64 index, unsigned mask) const;
   int64 nextSelected(int64 index, unsigned mask) const;
   int64 previousSelected(int64 index, unsigned mask) const;
+  // The same for keys that are selected on no component of the mask; linear for two components.
+  int64 nextUnselected(int64 index, unsigned mask) const;
+  int64 previousUnselected(int64 index, unsigned mask) const;
 
   // Writes the components of `mask` at `time`. An existing key keeps its selection and other components.
   // Appending at the end is amortised constant.

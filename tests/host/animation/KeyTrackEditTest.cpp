@@ -160,6 +160,8 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
       ASSERT_EQ(track.nextSelected(i, m), model.walk(i, 1, &Key::selected, m)) << i << " " << m;
       ASSERT_EQ(track.previousHolding(i, m), model.walk(i, -1, &Key::components, m)) << i << " " << m;
       ASSERT_EQ(track.previousSelected(i, m), model.walk(i, -1, &Key::selected, m)) << i << " " << m;
+      ASSERT_EQ(track.nextUnselected(i, m), model.walk(i, 1, &Key::selected, m, false)) << i << " " << m;
+      ASSERT_EQ(track.previousUnselected(i, m), model.walk(i, -1, &Key::selected, m, false)) << i << " " << m;
     }
     for (int n = 0; n < 4; ++n) {
       const int64 t = time() - 2;

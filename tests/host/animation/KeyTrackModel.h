@@ -38,10 +38,10 @@ class KeyTrackModel {
     return std::count_if(keys.begin(), keys.end(), [mask](Key const& k) { return (k.selected & mask) != 0; });
   }
   // The first key behind `index`, in steps of `step`, whose flags meet the mask.
-  int64 walk(int64 index, int step, unsigned char Key::*flags, unsigned mask) const {
+  int64 walk(int64 index, int step, unsigned char Key::*flags, unsigned mask, bool any = true) const {
     mask = normal(mask);
     for (index = std::clamp<int64>(index, -1, size()) + step; index >= 0 && index < size(); index += step)
-      if (at(index).*flags & mask) return index;
+      if (((at(index).*flags & mask) != 0) == any) return index;
     return -1;
   }
 

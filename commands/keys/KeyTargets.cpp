@@ -1,0 +1,68 @@
+#include "commands/keys/KeyTargets.h"
+
+#include <cstdlib>
+
+#include "commands/ChannelName.h"
+#include "commands/Targets.h"
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
+
+namespace {
+
+Module* onModOrPrimary(Given const& given, int onMod, char const* badPath) {
+  Module* module = nullptr;
+  for (CommandOption const& option : given)
+    if (option.getIndex() == onMod && !(module = moduleAt(option.getArg(0).getStringValue(-1), badPath)))
+      return nullptr;
+  if (!module) module = g_db->getPrimarySelectedModule();
+  if (!module) Command::logError("No primary selected Module.");
+  return module;
+}
+
+}  // namespace
+
+bool hasKeysToList(KeyQueryTexts const& texts) {
+  if (g_db->getActiveClip()) return true;
+  Command::logWarning("%s", texts.noKeys);
+  return false;
+}
+
+ChannelComponents channelNamed(HString const& name, Given const& given, int onMod,
+                               KeyQueryTexts const& texts) {
+  Module const* module = onModOrPrimary(given, onMod, texts.badPath);
+  if (!module) return {};
+  const ChannelName wanted = channelNameFrom(name, Suffix::componentCut);
+  Controller const* channel = module->getProperty(wanted.name);
+  if (!channel)
+    Command::logError("Cannot find property named %s on module %s", name.GetStr(),
+                      module->getName().GetStr());
+  return {channel, wanted.mask()};
+}
+
+Variable framesOf(Controller const& channel, unsigned mask,
+                  bool (*wanted)(KeyTrack::Key const&, unsigned mask)) {
+  TSimpleArray<int> frames(0, 64);
+  HTimeManager const* time = HTimeManager::getInstance();
+  if (KeyTrack const* track = channel.findActiveTrack())
+    track->forEach(0, track->count(), [&](KeyTrack::Key const& key) {
+      if (wanted(key, mask)) frames.add(time->getFrame(key.time));
+    });
+  Variable list(Variable::IntArray, frames.getCount());
+  for (int i = 0; i < frames.getCount(); ++i) list.setValue(frames[i], i);
+  return list;
+}
+
+unsigned componentMask(unsigned id) {
+  const unsigned marked = markedComponents(id);
+  return marked == 3 || marked == 5 || marked == 6 ? 0 : marked;
+}
+
+bool timeOfFrame(int frame, int64 origin, int64& time) {
+  const int64 ticks = HTimeManager::getInstance()->getTicksPerFrame();
+  if (std::abs(int64{frame}) <= kForever / ticks && std::abs(origin + frame * ticks) <= kForever) {
+    time = origin + frame * ticks;
+    return true;
+  }
+  Command::logError("Frame %d lies beyond the time line.", frame);
+  return false;
+}

@@ -1,0 +1,237 @@
+// Key commands on scenes that scripts cannot make: random selections, rotation orders, the ends of time.
+#include <random>
+#include <set>
+
+#include "host/animation/PropertyTable.h"
+#include "host/time/HTimeManager.h"
+#include "tests/plugin/SceneFixture.h"
+
+namespace {
+
+class KeyCommands : public SceneFixture {
+ protected:
+  KeyCommands() { make<Clip>("take"); }
+
+  static HTimeManager& manager() { return *HTimeManager::getInstance(); }
+  static int64 at(int frame) { return manager().getTime(frame); }
+  static int frame() { return manager().getFrame(manager().getTime()); }
+  static void activate(std::initializer_list<char const*> names) {
+    std::vector<unsigned> ids;
+    for (char const* name : names) ids.push_back(Controller::mapPropertyName(name) | PropertyTable::kWhole);
+    g_db->setActiveProperties(ids);
+  }
+  static void selectOnly(Module* module) {
+    g_db->selectAllModules(false);
+    module->setSelected(true);
+  }
+};
+
+class Stepping : public KeyCommands {
+ protected:
+  static constexpr int kFrames = 30;
+
+  // Keys at some frames of two channels of two nodes, some of them selected, some on one component only.
+  void scatter() {
+    activate({"Translation", "Scale"});
+    for (Node* node : nodes) {
+      node->setSelected(true);
+      for (Controller* channel : {node->getProperty("Translation"), node->getProperty("Scale")}) {
+        KeyTrack track(KeyTrack::Shape::Vector, {4, 4});
+        for (int i = 0; i < kFrames; ++i)
+          if (upTo(3)) {
+            track.set(at(i), {}, 7);
+            if (upTo(2)) track.setSelected(track.count() - 1, 1u << upTo(3));
+          }
+        channel->setTrack(g_db->getActiveClip(), 0, track);
+      }
+    }
+    manager().setAnimRange(HTimeRange(at(upTo(8)), at(kFrames - 1 - upTo(8))));
+  }
+
+  // The frames at which runs of selected keys begin (end), looked for key by key.
+  std::set<int> runEnds(bool back) {
+    std::set<int> frames;
+    for (Node* node : nodes)
+      for (Controller* channel : {node->getProperty("Translation"), node->getProperty("Scale")}) {
+        bool inRun = false;
+        for (int i = 0; i < kFrames; ++i) {
+          const int n = back ? kFrames - 1 - i : i;
+          if (!manager().getAnimRange().contains(at(n)) || !channel->hasKeyAt(at(n))) continue;
+          const bool selected = channel->isKeySelectedAt(at(n), 7);
+          if (selected && !inRun) frames.insert(n);
+          inRun = selected;
+        }
+      }
+    return frames;
+  }
+
+  // The frame that a step leads to.
+  int step(bool back) {
+    const std::string said = back ? run("findSelectedKeys", {}, {{"b"}}) : run("findSelectedKeys");
+    EXPECT_EQ(said, "info: Found one or more selected keys\nnothing");
+    return frame();
+  }
+
+  int upTo(int n) { return static_cast<int>(random() % static_cast<unsigned>(n)); }
+
+  std::mt19937 random{1};
+  Node* nodes[2] = {make("a"), make("b")};
+};
+
+TEST_F(Stepping, ComesToEveryRunOnceInARound) {
+  for (int trial = 0; trial < 300; ++trial) {
+    scatter();
+    for (bool back : {false, true}) {
+      const std::set<int> ends = runEnds(back);
+      std::vector<int> round(ends.begin(), ends.end());
+      if (round.empty()) continue;
+      if (back) std::reverse(round.begin(), round.end());
+      manager().setTime(at(upTo(kFrames)), true);
+      // Wherever it starts, from then on it goes around.
+      const int start = step(back);
+      auto next = std::find(round.begin(), round.end(), start);
+      ASSERT_NE(next, round.end()) << "frame " << start << " begins no run";
+      for (size_t i = 0; i < 2 * round.size(); ++i) {
+        if (++next == round.end()) next = round.begin();
+        ASSERT_EQ(step(back), *next) << "trial " << trial << (back ? " back" : "");
+      }
+    }
+  }
+}
+
+TEST_F(Stepping, StartsBehindTheCurrentTime) {
+  for (int trial = 0; trial < 300; ++trial) {
+    scatter();
+    for (bool back : {false, true}) {
+      const std::set<int> ends = runEnds(back);
+      const int from = upTo(kFrames);
+      manager().setTime(at(from), true);
+      const auto next = back ? ends.lower_bound(from) : ends.upper_bound(from);
+      const bool opens = back ? next == ends.end() : next == ends.begin();
+      const bool wraps = back ? next == ends.begin() : next == ends.end();
+      if (ends.empty()) {
+        EXPECT_EQ(run("findSelectedKeys"), "info: No selected keys found\nnothing");
+        EXPECT_EQ(frame(), from);
+      } else if (wraps) {
+        ASSERT_EQ(step(back), back ? *ends.rbegin() : *ends.begin());
+      } else if (!opens) {
+        ASSERT_EQ(step(back), back ? *std::prev(next) : *next);
+      }
+    }
+  }
+}
+
+// A run that begins at the first key of all waits for the second pass.
+TEST_F(Stepping, LeavesTheOpeningRunToTheSecondPass) {
+  activate({"Translation"});
+  Node* node = nodes[0];
+  node->setSelected(true);
+  auto* channel = node->getTranslationChannel();
+  for (int i : {10, 20, 30, 40}) channel->setKey(at(i), {}, 7);
+  for (int i : {10, 30}) channel->selectKeys(HTimeRange(at(i), at(i)), 7);
+  EXPECT_EQ(step(false), 30);
+  EXPECT_EQ(step(false), 10);
+  EXPECT_EQ(step(false), 30);
+  channel->selectKeys(HTimeRange(at(40), at(40)), 7);
+  manager().setTime(at(50), true);
+  EXPECT_EQ(step(true), 10);
+  EXPECT_EQ(step(true), 40);
+  channel->selectKeys(HTimeRange::forever(), 7);
+  manager().setTime(at(15), true);
+  EXPECT_EQ(step(false), 10);
+  EXPECT_EQ(step(false), 10);
+}
+
+TEST_F(Stepping, PrefersTheModuleSelectedFirst) {
+  activate({"Translation"});
+  for (Node* node : {nodes[1], nodes[0]}) {
+    node->setSelected(true);
+    for (int i : {0, 10}) node->getTranslationChannel()->setKey(at(i), {}, 7);
+    node->getTranslationChannel()->selectKeys(HTimeRange(at(10), at(10)), 7);
+  }
+  EXPECT_EQ(g_db->getPrimarySelectedModule(), nodes[0]);
+  step(false);
+  EXPECT_EQ(g_db->getPrimarySelectedModule(), nodes[1]);
+  step(true);
+  EXPECT_EQ(g_db->getPrimarySelectedModule(), nodes[1]);
+}
+
+class RotationKeys : public KeyCommands {
+ protected:
+  RotationKeys() {
+    from->setRotationOrder(TalixRotation::ZYX);
+    to->setRotationOrder(TalixRotation::YZX);
+    activate({"Rotation"});
+    from->getRotationChannel()->setKey(at(3), turn(TalixRotation::ZYX, {10, 40, 70}), 7);
+  }
+
+  static TalixRotation turn(TalixRotation::RotOrder order, Vec3 const& degrees) {
+    TalixRotation rotation;
+    rotation.setAsEuler(order, degrees * (3.14159265358979323846 / 180));
+    return rotation;
+  }
+  static void expectTurn(Node* node, int frame, TalixRotation const& expected) {
+    const TalixRotation rotation = node->getRotationChannel()->getValue(at(frame));
+    Vec3 difference;
+    (rotation.inverse() * expected).getAsVector(difference);
+    EXPECT_LT(difference.length(), 1e-12);
+  }
+  void copyAndPaste() {
+    selectOnly(from);
+    run("copyKeys", {}, {{"all"}});
+    selectOnly(to);
+    EXPECT_EQ(run("pasteKeys", {}, {{"useFrame", {8}}}), "info: Pasted 0 keys from the clipboard\nnothing");
+  }
+
+  Node* from = make("from");
+  Node* to = make("to");
+};
+
+TEST_F(RotationKeys, StayTheSameInAnotherRotationOrder) {
+  copyAndPaste();
+  expectTurn(to, 8, turn(TalixRotation::ZYX, {10, 40, 70}));
+  EXPECT_EQ(run("getKeys", {"Rotation"}), "[8]");
+}
+
+TEST_F(RotationKeys, GiveSingleAngles) {
+  to->getRotationChannel()->setKey(at(0), turn(TalixRotation::ZYX, {1, 2, 3}), 7);
+  g_db->setActiveProperties({Controller::mapPropertyName("Rotation") | PropertyTable::kY});
+  copyAndPaste();
+  expectTurn(to, 8, turn(TalixRotation::ZYX, {1, 40, 3}));
+}
+
+// The way from the point to itself has no direction.
+TEST_F(KeyCommands, CountThePlanesPointAsBehindIt) {
+  Node* node = make("n");
+  for (int i = 0; i < 3; ++i)
+    node->getTranslationChannel()->setKey(at(i), i == 1 ? Vec3(1, 2, 3) : Vec3(1, 2.5, 3), 7);
+  selectOnly(node);
+  EXPECT_EQ(run("findPlaneCrossing", {1, 2, 3, 0, 1, 0}),
+            "info: Found 1 keys that penetrate the plane\nnothing");
+  EXPECT_EQ(run("getSelectedKeys", {"Translation"}), "[1]");
+}
+
+TEST_F(KeyCommands, RefuseTimesBeyondTheTimeLine) {
+  Node* node = make("n");
+  activate({"Translation"});
+  selectOnly(node);
+  for (int i : {0, 5}) node->getTranslationChannel()->setKey(at(i), {}, 7);
+  run("copyKeys", {}, {{"all"}});
+  manager().setTime(kForever - at(4), true);
+  EXPECT_EQ(run("pasteKeys"), "error: The pasted keys would lie beyond the time line.\nfailed");
+  EXPECT_EQ(run("getKeys", {"Translation"}), "[0 5]");
+  manager().setTime(kForever - at(5), true);
+  EXPECT_EQ(run("pasteKeys"), "info: Pasted 1 keys from the clipboard\nnothing");
+
+  HFrameRate slow;
+  slow.setFrameRate(1e-3);
+  manager().setFrameRate(slow);
+  constexpr int kFar = 2147483647;  // 68,000 years at this rate
+  const std::string beyond = "error: Frame 2147483647 lies beyond the time line.\nfailed";
+  EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"frame", {kFar}}}), beyond);
+  EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"seconds", {kFar}}}), beyond);
+  EXPECT_EQ(run("pasteKeys", {}, {{"useFrame", {kFar}}}), beyond);
+  EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"frame", {-2000000}}}), "false");
+}
+
+}  // namespace
