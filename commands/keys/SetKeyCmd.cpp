@@ -3,6 +3,7 @@
 #include "commands/ChannelName.h"
 #include "commands/ChannelValues.h"
 #include "commands/Events.h"
+#include "commands/keys/KeyTargets.h"
 #include "host/time/HTimeManager.h"
 
 namespace {
@@ -104,18 +105,9 @@ bool readKeyValue(Args const& args, DataSource::PropertyType kind, NewKey& key) 
 
 // The time of the last "-t", else now.
 bool readTime(GivenOptions const& options, int64& time) {
-  HTimeManager const& times = *HTimeManager::getInstance();
-  time = times.getTime();
-  CommandOption const* option = options.find(SetKeyCmd::kFrame);
-  if (!option) return true;
-  const int frame = option->getArg(0).getIntValue(-1);
-  const int64 ticks = times.getTicksPerFrame();
-  if (std::abs(int64{frame}) > kForever / ticks) {
-    Command::logError("Frame %d lies beyond the time line.", frame);
-    return false;
-  }
-  time = frame * ticks;
-  return true;
+  time = HTimeManager::getInstance()->getTime();
+  CommandOption const* frame = options.find(SetKeyCmd::kFrame);
+  return !frame || timeOfFrame(frame->getArg(0).getIntValue(-1), 0, time);
 }
 
 bool writeOnMod(NewKey const& key, Module const& module, unsigned id, char const* typed) {
