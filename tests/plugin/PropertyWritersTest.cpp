@@ -1,7 +1,7 @@
 // What scripts cannot see of the property and key writers: events, selection flags, values without a reader.
-#include <gmock/gmock.h>
 #include <array>
 #include <climits>
+#include <gmock/gmock.h>
 #include <typeinfo>
 #include <utility>
 
