@@ -1,3 +1,4 @@
+#include "commands/Angles.h"
 #include "commands/keys/KeyClipboard.h"
 #include "commands/keys/KeyTargets.h"
 #include "host/scene/Database.h"
@@ -29,19 +30,13 @@ unsigned componentsOfCopy() {
   return mask;
 }
 
-// That of the channel's node; what is no node counts in order 0.
-TalixRotation::RotOrder rotationOrderOf(Controller const* channel) {
-  auto const* node = channel ? objectAs<Node>(channel->getModule()) : nullptr;
-  return node ? node->getRotationOrder() : TalixRotation::XYZ;
-}
-
 // Puts keys of one channel on the clipboard.
 class KeyCopy {
  public:
   KeyCopy(Controller const& channel, Choice choice)
       : m_channel(channel),
         m_choice(choice),
-        m_order(rotationOrderOf(&channel)),
+        m_order(rotationOrderOf(*channel.getModule())),
         m_mask(componentsOfCopy()) {}
 
   // Answers the number of keys.
@@ -129,7 +124,7 @@ bool CopyKeysCmd::execute(Given const& given, Args const&, Variable& result) {
   Controller const* channel = activeChannel();
   ClipboardManager* clipboard = g_db->getClipboardManager();
   clipboard->startClipboardCopy(ClipboardManager::ControllerData, clipboardTypeOf(channel),
-                                rotationOrderOf(channel));
+                                channel ? rotationOrderOf(*channel->getModule()) : TalixRotation::XYZ);
   const int count = channel ? KeyCopy(*channel, choice).run() : 0;
   clipboard->finishClipboardCopy(true);
   logInfo("Copied %d keys to clipboard", count);
