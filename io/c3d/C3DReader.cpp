@@ -5,6 +5,7 @@
 
 #include "io/FileError.h"
 #include "io/TakeFormats.h"
+#include "io/TextScanner.h"
 #include "io/c3d/C3DData.h"
 #include "io/c3d/C3DEvents.h"
 #include "io/c3d/C3DLayout.h"
@@ -15,13 +16,6 @@ namespace talix {
 namespace {
 
 constexpr double kFrequentOrigin = 0.01;  // share of the point-frames at 0, 0, 0 that is worth a warning
-
-std::string inShort(double value) {
-  std::string text = std::to_string(value);
-  text.erase(text.find_last_not_of('0') + 1);
-  if (text.back() == '.') text.pop_back();
-  return text;
-}
 
 class Reader {
  public:
@@ -154,8 +148,8 @@ class Reader {
     m_take.analogRate = m_layout.rate * static_cast<double>(m_layout.samplesPerFrame);
     const double rate = parameters().number("ANALOG", "RATE", m_take.analogRate);
     if (std::abs(rate - m_take.analogRate) > 1e-6 * m_take.analogRate)
-      info("ANALOG:RATE " + inShort(rate) + " Hz is not " + std::to_string(m_layout.samplesPerFrame) +
-           " samples per frame; " + inShort(m_take.analogRate) + " Hz is taken");
+      info("ANALOG:RATE " + shortNumber(rate) + " Hz is not " + std::to_string(m_layout.samplesPerFrame) +
+           " samples per frame; " + shortNumber(m_take.analogRate) + " Hz is taken");
     const auto labels = parameters().texts("ANALOG", "LABELS"), units = parameters().texts("ANALOG", "UNITS"),
                descriptions = parameters().texts("ANALOG", "DESCRIPTIONS");
     const auto scales = parameters().numbers("ANALOG", "SCALE"),
@@ -178,7 +172,7 @@ class Reader {
 
   double finiteOr(double value, double fallback) {
     if (std::isfinite(value)) return value;
-    warn("a scale or offset of the analog channels is not a number; " + inShort(fallback) + " is taken");
+    warn("a scale or offset of the analog channels is not a number; " + shortNumber(fallback) + " is taken");
     return fallback;
   }
 
