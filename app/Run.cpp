@@ -103,6 +103,9 @@ int runScripts(RunRequest const& request) {
     // A script that cannot be read and a place that cannot be written are told before anything is run.
     for (std::string const& file : request.saves) checkTakeTarget(file);
     const std::vector<std::string> texts = readParts(request.parts);
+    // A journal is kept only for scripts that use it, and for what is yet to be read.
+    session->setUndo(std::any_of(texts.begin(), texts.end(), usesUndo) ||
+                     std::any_of(request.parts.begin(), request.parts.end(), isStandardInput));
     for (std::string const& file : request.opens)
       if (!runner.runSilently("open " + quotedText(file))) return static_cast<int>(Status::FileFailed);
     runParts(runner, request.parts, texts);

@@ -1,5 +1,6 @@
 #include "session/ScriptRunner.h"
 
+#include <algorithm>
 #include <boost/json.hpp>
 #include <cerrno>
 #include <cstring>
@@ -69,6 +70,19 @@ void ScriptRunner::writeLogLines(LineResult const& result, std::string const& wh
     std::fprintf(m_err, "%s: %s%s\n", getLogLevelName(line.level),
                  line.level == LogLevel::Error ? where.c_str() : "", line.text.c_str());
   }
+}
+
+bool usesUndo(std::string_view script) {
+  static constexpr std::string_view blanks = " \t\r";
+  while (!script.empty()) {
+    const size_t end = std::min(script.find('\n'), script.size());
+    std::string_view line = script.substr(0, end);
+    line.remove_prefix(std::min(line.find_first_not_of(blanks), line.size()));
+    const std::string_view name = line.substr(0, line.find_first_of(blanks));
+    if (name == "undo" || name == "redo") return true;
+    script.remove_prefix(std::min(end + 1, script.size()));
+  }
+  return false;
 }
 
 std::string readScript(std::string const& path) {

@@ -52,6 +52,9 @@ class ScriptRunner {
   std::string m_text;
 };
 
+// Whether a line of a script is an "undo" or a "redo".
+bool usesUndo(std::string_view script);
+
 // A script's text, without a byte order mark. Throws FileError.
 std::string readScript(std::string const& path);
 

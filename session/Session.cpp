@@ -41,18 +41,26 @@ Session::Session(std::string const& plugin) {
   for (auto const& command : m_hostCommands) m_registry.add(command.get(), "host");
 }
 
-Session::~Session() { setAssumeYes(false); }
+Session::~Session() {
+  setAssumeYes(false);
+  setUndo(false);
+}
 
 void Session::setAssumeYes(bool yes) {
   g_interface->setAsker([yes](HString const&) { return yes; });
 }
 
+void Session::setUndo(bool on) { g_db->getUndoJournal().setEnabled(on); }
+
 LineResult const& Session::run(std::string_view line) {
   m_result.log.clear();
   m_result.value = Variable();
   const LogCollector collector(m_result.log);
+  UndoJournal& journal = g_db->getUndoJournal();
+  journal.beginStep();
   m_result.outcome = guarded(line);
   m_result.command = m_line.name();
+  journal.endStep(m_line.name());
   if (m_result.failed()) m_result.value = Variable();
   g_db->releaseRemoved();
   g_theOperationStack.reset();

@@ -50,6 +50,9 @@ class Session {
   // The answer to every question that a command asks; no when not set.
   void setAssumeYes(bool yes);
 
+  // Keeps what lines change, each line a step, for "undo" and "redo"; off at start.
+  void setUndo(bool on);
+
   // Runs one line. The answer lasts until the next one.
   LineResult const& run(std::string_view line);
 

@@ -19,7 +19,21 @@ NLEClip* NLEClip::getNext() const { return g_db->getClipAfter(this); }
 // A blend's values hang on the weights of its sources.
 void NLEClip::dataChanged(Controller const*) { Node::forgetWorldCache(); }
 
-void NLEClip::storeLayerLocks(std::vector<bool> locks) { m_layerLocks = std::move(locks); }
+struct NLEClip::LocksChange : UndoChange {
+  explicit LocksChange(NLEClip& concerned)
+      : UndoChange(&concerned), clip(concerned), locks(concerned.m_layerLocks) {}
+  void swap() override { clip.m_layerLocks.swap(locks); }
+  bool isVoid() const override { return locks == clip.m_layerLocks; }
+  int64 memoryUse() const override { return static_cast<int64>(sizeof *this + locks.capacity() / 8); }
+
+  NLEClip& clip;
+  std::vector<bool> locks;
+};
+
+void NLEClip::storeLayerLocks(std::vector<bool> locks) {
+  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<LocksChange>(*this));
+  m_layerLocks = std::move(locks);
+}
 
 int NLEClip::addLayer() {
   std::vector<bool> locks = m_layerLocks;

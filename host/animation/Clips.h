@@ -31,6 +31,7 @@ class NLEClip : public Module {
   friend class Database;
 
   void storeLayerLocks(std::vector<bool> locks);  // mutator
+  struct LocksChange;
 
   FloatController* m_weight = nullptr;
   std::vector<bool> m_layerLocks{false};

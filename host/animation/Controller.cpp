@@ -94,7 +94,10 @@ bool Controller::isEditable() const {
          !clip->isLayerLocked(g_db->getActiveLayer()) && !(m_module && m_module->isLocked());
 }
 
-void Controller::setLocked(bool locked) { m_locked = locked; }
+void Controller::setLocked(bool locked) {
+  recordSettings();
+  m_locked = locked;
+}
 
 void Controller::beginDefaultEdit() { ++m_editDepth; }
 
@@ -109,18 +112,6 @@ void Controller::changed() {
   if (m_module) m_module->dataChanged(this);
 }
 
-KeyTrack* Controller::editTrack(NLEClip* clip, int layer) {
-  for (ClipTrack& track : m_tracks)
-    if (track.clip == clip && track.layer == layer) return &track.track;
-  m_tracks.push_back({clip, layer, KeyTrack(shapeOf(getPropertyType())), {}});
-  return &m_tracks.back().track;
-}
-
-KeyTrack* Controller::editTrack() {
-  NLEClip* clip = g_db->getActiveClip();
-  return clip && clip->holdsKeys() ? editTrack(clip, g_db->getActiveLayer()) : nullptr;
-}
-
 bool Controller::areFinite(Values const& values, unsigned mask) const {
   const bool split = getPropertyType() == Vec3Property;
   for (int i = 0; i < static_cast<int>(shapeOf(getPropertyType())); ++i)
@@ -130,13 +121,14 @@ bool Controller::areFinite(Values const& values, unsigned mask) const {
 
 void Controller::setDefaultValues(Values const& values) {
   if (!areFinite(values, KeyTrack::kAll)) return;
+  recordSettings();
   m_default = values;
   changed();
 }
 
 void Controller::writeKeyAt(int64 time, Values const& values, unsigned mask) {
   if (!areFinite(values, mask)) return;
-  KeyTrack* track = editTrack();
+  KeyTrack* track = editTrack(time, time);
   if (!track) return;
   // A new key of a one-valued or rotation channel is whole whatever the mask.
   track->set(time, values, track->shape() == KeyTrack::Shape::Vector ? mask : KeyTrack::kAll);
@@ -154,12 +146,12 @@ void Controller::readKey(int key, Values& values) const {
 
 int Controller::selectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  return static_cast<int>(editTrack()->select(range.getStart(), range.getEnd(), mask));
+  return static_cast<int>(editTrack(range.getStart(), range.getEnd())->select(range.getStart(), range.getEnd(), mask));
 }
 
 int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  return static_cast<int>(editTrack()->deselect(range.getStart(), range.getEnd(), mask));
+  return static_cast<int>(editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
 }
 
 int Controller::deleteKey(int64 time, unsigned mask) {
@@ -169,16 +161,20 @@ int Controller::deleteKey(int64 time, unsigned mask) {
 int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers) {
   int64 deleted = 0;
   NLEClip* clip = g_db->getActiveClip();
+  const int64 first = range.getStart(), last = range.getEnd();
   for (ClipTrack const& track : m_tracks)
     if (track.clip == clip && (allLayers || track.layer == g_db->getActiveLayer()))
-      deleted += editTrack(clip, track.layer)->eraseRange(range.getStart(), range.getEnd(), mask);
+      deleted += editTrack(clip, track.layer, first, last)->eraseRange(first, last, mask);
   if (deleted) changed();
   return static_cast<int>(deleted);
 }
 
 int Controller::deleteSelectedKeys(unsigned mask) {
-  if (!findActiveTrack()) return 0;
-  const int64 deleted = editTrack()->eraseSelected(mask);
+  KeyTrack const* track = findActiveTrack();
+  if (!track || track->countSelected() == 0) return 0;
+  const int64 first = track->timeAt(track->selectedIndex(0));
+  const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
+  const int64 deleted = editTrack(first, last)->eraseSelected(mask);
   if (deleted) changed();
   return static_cast<int>(deleted);
 }
@@ -371,6 +367,7 @@ char const* Controller::getInterpTypeName(int i) const {
 
 void Controller::setInterpType(int i) {
   if (i < 0 || i >= m_numInterpTypes) return;
+  recordSettings();
   m_interpolation = static_cast<Interpolation>(i);
   changed();
 }
@@ -379,7 +376,7 @@ void Controller::setInterpType(int i) {
 
 void Controller::setTrack(NLEClip* clip, int layer, KeyTrack track) {
   assert(track.shape() == shapeOf(getPropertyType()));
-  *editTrack(clip, layer) = std::move(track);
+  *editTrack(clip, layer, -kForever, kForever) = std::move(track);
   changed();
 }
 
@@ -402,11 +399,6 @@ void Controller::forgetClip(NLEClip const* clip) {
   std::copy_if(m_tracks.begin(), m_tracks.end(), std::back_inserter(others),
                [&](ClipTrack const& track) { return track.clip != clip; });
   if (others.size() < m_tracks.size()) storeTracks(std::move(others));
-}
-
-void Controller::storeTracks(std::vector<ClipTrack> tracks) {
-  m_tracks = std::move(tracks);
-  changed();
 }
 
 void Controller::restore(State const& state) {

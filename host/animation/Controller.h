@@ -140,16 +140,27 @@ class Controller : public DataSource {
  private:
   friend class Module;
 
+  struct KeyChange;
+  struct TracksChange;
+  struct SettingsChange;
   struct ClipTrack {
     NLEClip* clip;
     int layer;
     KeyTrack track;
-    mutable KeyTrack::Cursor cursor;
+    mutable KeyTrack::Cursor cursor{};
+    uint64 undoMark = 0;
+    KeyChange* change = nullptr;  // that of the undo step in undoMark
   };
   ClipTrack const* find(NLEClip const* clip, int layer) const;
-  // The mutator of a track: that of the active layer, made when there is none. Null on the base clip.
-  KeyTrack* editTrack();
-  KeyTrack* editTrack(NLEClip* clip, int layer);
+  // The mutator of a track: that of the active layer, made when there is none, for an edit of keys from
+  // `first` to `last`. Null on the base clip.
+  KeyTrack* editTrack(int64 first, int64 last);
+  KeyTrack* editTrack(NLEClip* clip, int layer, int64 first, int64 last);
+  ClipTrack& clipTrack(NLEClip* clip, int layer);
+  // The change of a track in this undo step; null when none is to be recorded.
+  KeyChange* changeOf(ClipTrack& track);
+  void recordSettings();
+  int64 memoryAlone() const;
   void evaluateInClip(NLEClip const* clip, int64 time, Values& values) const;
   bool areFinite(Values const& values, unsigned mask) const;
   void changed();
@@ -172,6 +183,7 @@ class Controller : public DataSource {
   bool m_locked = false;
   int m_editDepth = 0;
   std::vector<ClipTrack> m_tracks;
+  uint64 m_settingsMark = 0;  // of undo steps
 };
 
 class FloatController : public Controller {

@@ -59,6 +59,7 @@ class KeyNode {
 
   bool isLeaf() const { return m_level == 0; }
   int level() const { return m_level; }  // 0 for leaves
+  bool isShared() const { return m_references > 1; }
 
   KeyNode& operator=(KeyNode const&) = delete;
 

@@ -84,6 +84,14 @@ int64 bytesOf(KeyNode const& node) {
   return sum;
 }
 
+int64 bytesAloneOf(KeyNode const& node) {
+  if (node.isShared()) return 0;
+  if (node.isLeaf()) return asLeaf(node).memoryUse();
+  int64 sum = static_cast<int64>(sizeof(KeyInner));
+  for (int i = 0; i < asInner(node).size(); ++i) sum += bytesAloneOf(asInner(node).child(i));
+  return sum;
+}
+
 int64 lastTimeOf(KeyNode const& node) {
   if (node.isLeaf()) return asLeaf(node).lastTime();
   auto const& inner = asInner(node);
@@ -272,6 +280,8 @@ bool KeyTrack::sharesAll(KeyTrack const& o) const { return m_shape == o.m_shape 
 int64 KeyTrack::memoryUse() const {
   return static_cast<int64>(sizeof *this) + (m_root ? bytesOf(*m_root.get()) : 0);
 }
+
+int64 KeyTrack::memoryAlone() const { return m_root ? bytesAloneOf(*m_root.get()) : 0; }
 
 const char* KeyTrack::checkInvariants() const {
   const char* broken = m_root ? brokenInvariant(*m_root.get()) : nullptr;

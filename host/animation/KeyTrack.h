@@ -155,6 +155,8 @@ class KeyTrack {
 
   // Bytes held, shared leaves counted in full.
   int64 memoryUse() const;
+  // Bytes held that no other track shares.
+  int64 memoryAlone() const;
   // Tests the invariants; the text of the first broken one, empty when all hold.
   const char* checkInvariants() const;
 

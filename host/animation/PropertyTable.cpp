@@ -1,6 +1,6 @@
 #include "host/animation/PropertyTable.h"
 
-#include "host/scene/Module.h"
+#include "host/scene/Database.h"
 
 PropertyTable& PropertyTable::getInstance() {
   static PropertyTable table;
@@ -38,9 +38,28 @@ DataSource::PropertyType PropertyTable::getType(unsigned id) const {
   return id == 0 || id > m_entries.size() ? DataSource::NoProperty : m_entries[id - 1].type;
 }
 
+// The last name added: later ones have gone before it.
+struct PropertyTable::Addition : UndoChange {
+  Addition(HString const& text, DataSource::PropertyType kind) : UndoChange(nullptr), name(text), type(kind) {}
+  void swap() override {
+    PropertyTable& table = getInstance();
+    table.findId(name) ? table.removeLast() : static_cast<void>(table.store(name, type));
+  }
+  int64 memoryUse() const override { return static_cast<int64>(sizeof *this + name.GetString().size()); }
+
+  HString name;
+  DataSource::PropertyType type;
+};
+
 unsigned PropertyTable::add(HString const& name, DataSource::PropertyType type) {
   if (const unsigned known = findId(name)) return getType(known) == type ? known : 0;
   if (!Module::isValidPropertyName(name) || m_entries.size() == kIdMask) return 0;
+  const unsigned id = store(name, type);
+  if (UndoJournal::isRecording()) g_db->getUndoJournal().add(std::make_unique<Addition>(name, type));
+  return id;
+}
+
+unsigned PropertyTable::store(HString const& name, DataSource::PropertyType type) {
   m_entries.push_back({name, type});
   const auto id = static_cast<unsigned>(m_entries.size());
   m_ids.emplace(name.GetString(), id);
@@ -48,6 +67,16 @@ unsigned PropertyTable::add(HString const& name, DataSource::PropertyType type) 
   lower.MakeLower();
   m_idsByLowerName[lower.GetString()].push_back(id);
   return id;
+}
+
+void PropertyTable::removeLast() {
+  HString lower = m_entries.back().name;
+  m_ids.erase(lower.GetString());
+  lower.MakeLower();
+  const auto known = m_idsByLowerName.find(lower.GetString());
+  known->second.pop_back();
+  if (known->second.empty()) m_idsByLowerName.erase(known);
+  m_entries.pop_back();
 }
 
 HString PropertyTable::restoreCase(HString const& name) const {

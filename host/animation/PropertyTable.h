@@ -40,6 +40,10 @@ class PropertyTable {
  private:
   PropertyTable() { reset(); }
 
+  struct Addition;
+  unsigned store(HString const& name, DataSource::PropertyType type);  // mutator: adds at the end
+  void removeLast();
+
   struct Entry {
     HString name;
     DataSource::PropertyType type;

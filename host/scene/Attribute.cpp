@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "host/scene/Database.h"
+#include "host/services/UndoJournal.h"
 #include "host/time/HTimeManager.h"
 
 H_DEFINE_ABSTRACT_CLASS(Attribute);
@@ -111,7 +112,40 @@ void Attribute::store(Value value, bool set, bool react) {
   put(std::move(value), set, react);
 }
 
+// Setting the value that is there again is no change.
+struct Attribute::Change : UndoChange {
+  explicit Change(Attribute& concerned)
+      : UndoChange(concerned.m_module), attribute(concerned), value(concerned.m_value), set(concerned.m_set) {}
+
+  void swap() override {
+    Value now = attribute.m_value;
+    const bool wasSet = attribute.m_set;
+    attribute.store(std::move(value), set, false);
+    value = std::move(now);
+    set = wasSet;
+  }
+  bool isVoid() const override { return value == attribute.m_value && set == attribute.m_set; }
+  int64 memoryUse() const override {
+    return static_cast<int64>(sizeof *this) + std::max(bytesBeside(value), bytesBeside(attribute.m_value));
+  }
+
+  Attribute& attribute;
+  Value value;
+  bool set;
+};
+
+int64 Attribute::bytesBeside(Value const& value) {
+  size_t bytes = 0;
+  if (auto* text = std::get_if<HString>(&value)) bytes = text->GetString().capacity();
+  if (auto* modules = std::get_if<Modules>(&value)) bytes = modules->capacity() * sizeof(Module*);
+  if (auto* bits = std::get_if<Bits>(&value)) bytes = bits->capacity() / 8;
+  if (auto* matrix = std::get_if<Matrix>(&value)) bytes = matrix->rows() * matrix->cols() * sizeof(double);
+  return static_cast<int64>(bytes);
+}
+
 void Attribute::put(Value value, bool set, bool react) {
+  if (m_module && m_module->isRecorded() && UndoJournal::isDue(m_undoMark))
+    g_db->getUndoJournal().add(std::make_unique<Change>(*this));
   m_value = std::move(value);
   m_set = set;
   if (react && m_reaction && m_module) m_reaction(*m_module, *this);

@@ -88,6 +88,8 @@ class Attribute : public HObject, private ModuleReferrer {
 
   // The mutator: every change of any attribute passes here.
   void put(Value value, bool set, bool react);
+  struct Change;
+  static int64 bytesBeside(Value const& value);  // held outside of the value itself
   void forget(Module* module) override;
   void referTo(Value const& value);
   void releaseFrom(Value const& value);
@@ -100,6 +102,7 @@ class Attribute : public HObject, private ModuleReferrer {
   bool m_custom = false;
   bool m_canBeUnset = false;
   bool m_set = false;
+  uint64 m_undoMark = 0;
 };
 
 // Integers that a kind of attribute holds: getValue and setValue.

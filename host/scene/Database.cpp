@@ -29,6 +29,7 @@ Database::Database()
 Database::~Database() { removeAll(); }
 
 void Database::removeAll() {
+  m_journal.clear();
   for (Module* module : m_modules.toVector())
     if (!module->getParent()) removeFromScene(module, true, true, false, true);
   releaseRemoved();
@@ -80,52 +81,6 @@ bool Database::addToScene(Module* module, bool uniqueName, Character const* char
   enter(module);
   if (parent) module->storeParent(parent);
   if (select) module->setSelected(true);
-  return true;
-}
-
-void Database::enter(Module* module) {
-  module->m_order = ++m_created;
-  m_modules.append(module);
-  m_byId.emplace(module->getID(), module);
-  ++m_countByClass[module->getRuntimeClass()];
-  m_index->add(module);
-  if (auto* node = objectAs<Node>(module)) m_nodes.append(node);
-  if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.append(character);
-  if (auto* clip = objectAs<NLEClip>(module)) {
-    m_clips.append(clip);
-    if (getNumClips() == 1) setActiveClip(clip);
-  }
-}
-
-void Database::leave(Module* module) {
-  m_selection.remove(module);
-  if (m_priority == module) m_priority = nullptr;
-  module->forgetByAll();
-  if (auto* node = objectAs<Node>(module)) m_nodes.remove(node);
-  if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.remove(character);
-  if (auto* clip = objectAs<NLEClip>(module)) {
-    m_clips.remove(clip);
-    if (m_activeClip == clip) setActiveClip(nullptr);
-    for (Module* other : m_modules.toVector())
-      for (int i = 0; i < other->getNumChannels(); ++i) other->getChannel(i)->forgetClip(clip);
-  }
-  m_index->remove(module);
-  m_index->forgetParent(module);
-  --m_countByClass[module->getRuntimeClass()];
-  m_byId.erase(module->getID());
-  m_modules.remove(module);
-}
-
-bool Database::removeFromScene(Module* module, bool, bool, bool, bool) {
-  if (!module || !module->isInScene()) return false;
-  TSimpleArray<Module*> all(64, 4096);
-  module->getModAndDecedents(all);
-  if (module->getParent()) module->storeParent(nullptr);
-  // Children first, so that a module never outlives its parent in the scene.
-  for (int i = all.getCount() - 1; i >= 0; --i) {
-    leave(all[i]);
-    m_removed.emplace_back(all[i]);
-  }
   return true;
 }
 
@@ -191,13 +146,6 @@ NLEClip* Database::getClipAfter(NLEClip const* clip) const {
   return next < getNumClips() ? m_clips.at(next) : nullptr;
 }
 
-void Database::storeActive(NLEClip* clip, int layer) {
-  const bool switched = clip != m_activeClip;
-  m_activeClip = clip;
-  m_activeLayer = layer;
-  if (switched) Node::forgetWorldCache();
-}
-
 void Database::setActiveClip(NLEClip* clip) {
   if (!clip || clip->isInScene()) storeActive(clip, 0);
 }
@@ -209,8 +157,6 @@ bool Database::setActiveLayer(int layer) {
 }
 
 // --- active properties ---
-
-void Database::setActiveProperties(std::vector<unsigned> ids) { m_activeProperties = std::move(ids); }
 
 void Database::syncActiveProperties(bool) {
   std::vector<bool> held(PropertyTable::kIdMask + 1);

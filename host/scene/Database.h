@@ -109,7 +109,13 @@ class Database {
   static Vec3 const& getSelModColor();
   // The axis that points up: 0 x, 1 y, 2 z; -1 until a take or the user sets it.
   int getUpAxis() const { return m_upAxis; }
-  void setUpAxis(int axis) { m_upAxis = axis; }
+  void setUpAxis(int axis);
+  // For mutators of what the journal keeps together: active clip, layer and properties, up axis, frame rate.
+  void recordSettings();
+
+  UndoJournal& getUndoJournal() { return m_journal; }
+  // Puts lists in order again after undo and redo, and forgets what was cached.
+  void settle();
 
   CalibrationMgr* getCalibrationMgr() const { return m_calibration.get(); }
   ClipboardManager* getClipboardManager() const { return m_clipboard.get(); }
@@ -121,11 +127,16 @@ class Database {
  private:
   friend class Module;
 
+  void needsSorting(Module* parent) { m_unsortedParents.push_back(parent); }
   bool mayJoin(Module const* module) const;
   // Mutators of membership: put a set-up module with its name and parent into every index, and take it out.
   void enter(Module* module);
   void leave(Module* module);
   void storeActive(NLEClip* clip, int layer);  // mutator
+  struct Membership;
+  struct SettingsChange;
+  void join(Module* module);   // every index takes it, by its order of creation
+  void unjoin(Module* module);  // and lets it go
   void removeAll();
 
   OrderedList<Module, &Module::m_sceneSlot> m_modules;
@@ -135,6 +146,9 @@ class Database {
   std::unordered_map<HRuntimeClass const*, int> m_countByClass;
   std::unique_ptr<SceneIndex> m_index;
   std::vector<std::unique_ptr<Module>> m_removed;
+  bool m_unsorted = false;              // lists in order of creation
+  std::vector<Module*> m_unsortedParents;
+  UndoJournal m_journal;
   uint64 m_created = 0;
   Selection m_selection;
   Module* m_priority = nullptr;
@@ -144,6 +158,7 @@ class Database {
   bool m_autoUpdateProperties = false;
   bool m_solversBeforeClips = false;
   int m_upAxis = -1;
+  uint64 m_undoMark = 0;
   std::unique_ptr<CalibrationMgr> m_calibration;
   std::unique_ptr<ClipboardManager> m_clipboard;
   std::unique_ptr<SubjectManager> m_subjects;

@@ -3,24 +3,11 @@
 #include <algorithm>
 
 #include "host/scene/Database.h"
+#include "host/scene/ModuleChildren.h"
 #include "host/scene/SceneIndex.h"
 #include "host/time/HTimeManager.h"
 
 H_DEFINE_ABSTRACT_CLASS(Module);
-
-// Children in order; the nodes and the markers among them once more, so that these are found as fast.
-struct Module::Children {
-  OrderedList<Module, &Module::m_childSlot> all;
-  OrderedList<Module, &Module::m_nodeChildSlot> nodes;
-  OrderedList<Module, &Module::m_markerChildSlot> markers;
-
-  template <class Edit>
-  void editFor(Module* child, Edit edit) {
-    edit(all);
-    if (child->isKindOf(&Node::s_classNode)) edit(nodes);
-    if (child->isKindOf(&Marker::s_classMarker)) edit(markers);
-  }
-};
 
 struct Module::DataEdit {
   int depth = 0;
@@ -73,13 +60,6 @@ bool Module::setName(HString const& name) {
   if (!isValidName(name)) return false;
   if (name != m_name) storeName(name);
   return true;
-}
-
-void Module::storeName(HString const& name) {
-  const bool indexed = isInScene();
-  if (indexed) g_db->getIndex().remove(this);
-  m_name = name;
-  if (indexed) g_db->getIndex().add(this);
 }
 
 HString Module::getPath(EPathType type) const {
@@ -191,16 +171,6 @@ bool Module::removeChild(Module* child, bool) {
   return true;
 }
 
-void Module::storeParent(Module* parent) {
-  const bool indexed = isInScene();
-  if (indexed) g_db->getIndex().remove(this);
-  if (m_parent) m_parent->children().editFor(this, [this](auto& list) { list.remove(this); });
-  m_parent = parent;
-  if (m_parent) m_parent->children().editFor(this, [this](auto& list) { list.append(this); });
-  if (indexed) g_db->getIndex().add(this);
-  Node::markMoved(this);
-}
-
 // --- attributes ---
 
 Attribute* Module::getAttribute(char const* name) const {
@@ -223,7 +193,7 @@ Attribute* Module::addAttribute(std::unique_ptr<Attribute> attribute, Attribute:
                             type == Attribute::ModuleReference || type == Attribute::MultiModule;
   // What can be unset starts so; the others always are set.
   attribute->m_set = !attribute->m_canBeUnset;
-  m_attributes.push_back(std::move(attribute));
+  storeAttribute(std::move(attribute));
   return m_attributes.back().get();
 }
 

@@ -15,6 +15,7 @@
 #include "host/scene/Attribute.h"
 #include "host/scene/ModuleReferrer.h"
 #include "host/scene/OrderedList.h"
+#include "host/services/UndoJournal.h"
 
 class Character;
 class Marker;
@@ -130,6 +131,12 @@ class Module : public HObject {
   void setReaction(Attribute* attribute, Attribute::Reaction reaction) { attribute->m_reaction = reaction; }
   // Something that shows in the module's value at a time has changed.
   virtual void dataChanged(Controller const*) {}
+  // Whether the undo journal is to hear of changes of this module: not while it is set up, nor in the step
+  // that brings it into the scene.
+  bool isRecorded() const {
+    return UndoJournal::isRecording() && m_enteredStep != UndoJournal::getStep() &&
+           (isInScene() || m_undoHolds > 0);
+  }
 
  private:
   friend class Attribute;
@@ -139,9 +146,21 @@ class Module : public HObject {
   friend class ModuleReferrer;
   friend class SceneIndex;
   friend class Selection;
+  friend class UndoChange;
 
   void storeName(HString const& name);       // mutator
   void storeParent(Module* parent);          // mutator: unlinks, links at the end
+  void storeAttribute(std::unique_ptr<Attribute> attribute);  // mutator
+  void storeChannel(std::unique_ptr<Controller> channel);     // mutator
+  struct NameChange;
+  struct ParentChange;
+  template <class T>
+  struct Addition;
+  void moveTo(Module* parent, uint64 order);  // links by order
+  void linkToParent();
+  void unlinkFromParent();
+  void sortChildren();
+  int64 memoryUse() const;  // with keys that nothing else shares
   void forgetByAll();                        // every referrer lets go
   std::string suffixText(int levels) const;  // the last `levels` names of the path
 
@@ -157,7 +176,11 @@ class Module : public HObject {
   uint32 m_markerChildSlot = kNoSlot;
   uint32 m_sceneSlot = kNoSlot;
   uint32 m_selectionSlot = kNoSlot;
-  uint64 m_order = 0;  // of creation
+  uint64 m_order = 0;           // of creation
+  uint64 m_childOrder = 0;      // among its siblings
+  uint64 m_selectionOrder = 0;  // among what is selected
+  uint64 m_enteredStep = 0;     // the undo step that brought it into the scene
+  int m_undoHolds = 0;          // changes in the journal that tell of it
   std::vector<std::unique_ptr<Attribute>> m_attributes;
   std::vector<std::unique_ptr<Controller>> m_channels;
   // With the number of references that each holds; null: none yet.

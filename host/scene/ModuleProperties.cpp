@@ -90,7 +90,7 @@ Controller* Module::addChannel(HString const& name, DataSource::PropertyType typ
   std::unique_ptr<Controller> channel = Controller::create(type);
   channel->m_module = this;
   channel->m_propertyId = id;
-  m_channels.push_back(std::move(channel));
+  storeChannel(std::move(channel));
   return m_channels.back().get();
 }
 

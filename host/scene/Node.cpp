@@ -279,7 +279,29 @@ void Node::setConstWSScale(Vec3 const& scale) {
   setConstLocalScale(quotients(scale, constParentWorld().scale));
 }
 
+struct Node::PreTransformChange : UndoChange {
+  explicit PreTransformChange(Node& concerned)
+      : UndoChange(&concerned),
+        node(concerned),
+        translation(concerned.m_preTranslation),
+        rotation(concerned.m_preRotation) {}
+  void swap() override {
+    std::swap(translation, node.m_preTranslation);
+    std::swap(rotation, node.m_preRotation);
+  }
+  bool isVoid() const override {
+    return translation == node.m_preTranslation && rotation == node.m_preRotation;
+  }
+  int64 memoryUse() const override { return sizeof *this; }
+
+  Node& node;
+  Vec3 translation;
+  TalixRotation rotation;
+};
+
 void Node::storePreTransform(Vec3 const& translation, TalixRotation const& rotation) {
+  if (isRecorded() && UndoJournal::isDue(m_preTransformMark))
+    g_db->getUndoJournal().add(std::make_unique<PreTransformChange>(*this));
   m_preTranslation = translation;
   m_preRotation = rotation;
   markMoved(this);
@@ -323,7 +345,25 @@ MarkerConnection* Node::getConnectionTo(Node const* target) {
   return isConnectedTo(target) ? &*findLine(m_lines, target) : nullptr;
 }
 
+struct Node::LinesChange : UndoChange {
+  explicit LinesChange(Node& concerned) : UndoChange(&concerned), node(concerned), lines(concerned.m_lines) {}
+  void swap() override {
+    for (MarkerConnection const& line : lines) node.refer(line.getTarget());
+    for (MarkerConnection const& line : node.m_lines) node.release(line.getTarget());
+    node.m_lines.swap(lines);
+  }
+  int64 memoryUse() const override {
+    return static_cast<int64>(sizeof *this +
+                              std::max(lines.size(), node.m_lines.size()) * sizeof(MarkerConnection));
+  }
+
+  Node& node;
+  std::vector<MarkerConnection> lines;
+};
+
 void Node::storeLine(Node* target, MarkerConnection const* line) {
+  if (isRecorded() && UndoJournal::isDue(m_linesMark))
+    g_db->getUndoJournal().add(std::make_unique<LinesChange>(*this));
   const bool known = isConnectedTo(target);
   if (line && known) {
     *findLine(m_lines, target) = *line;

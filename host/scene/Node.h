@@ -125,6 +125,8 @@ class Node : public Module, private ModuleReferrer {
 
   void forget(Module* module) override;
   void storePreTransform(Vec3 const& translation, TalixRotation const& rotation);  // mutator
+  struct PreTransformChange;
+  struct LinesChange;
   // Mutator: the line to a target, null for none.
   void storeLine(Node* target, MarkerConnection const* line);
   // Caches this node's world frame; the parent's (null: none) holds already.
@@ -146,6 +148,8 @@ class Node : public Module, private ModuleReferrer {
   Vec3 m_preTranslation;
   TalixRotation m_preRotation;
   std::vector<MarkerConnection> m_lines;
+
+  uint64 m_preTransformMark = 0, m_linesMark = 0;  // of undo steps
 
   mutable Placement m_world;        // at the cache's time
   mutable uint64 m_worldEpoch = 0;  // of the cache; m_world holds when they are equal

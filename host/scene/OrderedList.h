@@ -6,6 +6,7 @@
 // when they outnumber the objects.
 #pragma once
 
+#include <algorithm>
 #include <bit>
 #include <vector>
 
@@ -54,6 +55,12 @@ class OrderedList {
   void assign(std::vector<T*> const& objects) {
     clear();
     for (T* object : objects) append(object);
+  }
+  template <class Less>
+  void sort(Less less) {
+    std::vector<T*> all = toVector();
+    std::sort(all.begin(), all.end(), less);
+    assign(all);
   }
   void clear() {
     for (T* object : m_objects)

@@ -13,6 +13,8 @@ class Selection {
   void remove(Module* module);
   void clear();
   void setPrimary(Module* module);  // null: none
+  // Puts the lists in order again after undo and redo.
+  void settle();
 
   Module* getPrimary() const { return m_primary; }
   int getCount() const { return m_modules.getCount(); }
@@ -27,10 +29,19 @@ class Selection {
   LabelingBone* getLabelingBone(int i) const { return m_bones.at(i); }
 
  private:
+  struct Change;
+  void record(Module* module);  // a module that is about to be selected or deselected, null: primary only
+  void insert(Module* module);
+  void take(Module* module);
+
   OrderedList<Module, &Module::m_selectionSlot> m_modules;
   OrderedList<Node, &Node::m_selectedNodeSlot> m_nodes;
   OrderedList<Marker, &Marker::m_selectedMarkerSlot> m_markers;
   OrderedList<Character, &Character::m_selectedSubjectSlot> m_characters;
   OrderedList<LabelingBone, &LabelingBone::m_selectedLabelingBoneSlot> m_bones;
   Module* m_primary = nullptr;
+  uint64 m_selected = 0;  // counts what was ever selected
+  bool m_unsorted = false;
+  uint64 m_undoMark = 0;
+  Change* m_change = nullptr;  // that of the step in m_undoMark
 };

@@ -4,6 +4,8 @@
 #include <charconv>
 #include <cmath>
 
+#include "host/scene/Database.h"
+
 HTimeManager::HTimeManager() { reset(); }
 
 HTimeManager* HTimeManager::getInstance() {
@@ -16,6 +18,11 @@ void HTimeManager::reset() {
   m_time = 0;
   m_animRange = m_playRange = HTimeRange(0, getTime(100));
   m_selected.clear();
+}
+
+void HTimeManager::setFrameRate(HFrameRate const& rate) {
+  g_db->recordSettings();
+  m_rate = rate;
 }
 
 void HTimeManager::setTime(int64 time, bool) { m_time = std::clamp(time, -kForever, kForever); }

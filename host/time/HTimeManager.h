@@ -17,7 +17,7 @@ class HTimeManager {
 
   HFrameRate const& getFrameRate() const { return m_rate; }
   // Changes the rate only: times, ranges and keys stay where they are in ticks.
-  void setFrameRate(HFrameRate const& rate) { m_rate = rate; }
+  void setFrameRate(HFrameRate const& rate);
   int64 getTicksPerFrame() const { return m_rate.getTicksPerFrame(); }
 
   // Current time.

@@ -20,7 +20,9 @@ namespace talix {
   X(AddChannelCmd)             \
   X(OpenCmd)                   \
   X(SaveCmd)                   \
-  X(NewSceneCmd)
+  X(NewSceneCmd)               \
+  X(UndoCmd)                   \
+  X(RedoCmd)
 
 #define TALIX_DECLARE(Name) Command* new##Name();
 TALIX_HOST_COMMANDS(TALIX_DECLARE)

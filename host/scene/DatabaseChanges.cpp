@@ -1,0 +1,157 @@
+// The mutators of the scene itself: what modules it has, what is active.
+#include <algorithm>
+
+#include "host/scene/CalibrationMgr.h"
+#include "host/scene/Database.h"
+#include "host/scene/SceneIndex.h"
+#include "host/scene/SubjectManager.h"
+#include "host/time/HTimeManager.h"
+
+// --- membership ---
+
+// A module came into the scene or left it; it keeps its parent, its children and its place among all.
+struct Database::Membership : UndoChange {
+  explicit Membership(Module& concerned) : UndoChange(&concerned), module(concerned) {}
+  void swap() override { module.isInScene() ? g_db->unjoin(&module) : g_db->join(&module); }
+  int64 memoryUse() const override { return sizeof *this + module.memoryUse(); }
+
+  Module& module;
+};
+
+void Database::enter(Module* module) {
+  if (UndoJournal::isRecording()) {
+    m_journal.add(std::make_unique<Membership>(*module));
+    module->m_enteredStep = UndoJournal::getStep();
+  }
+  module->m_order = ++m_created;
+  join(module);
+  if (auto* clip = objectAs<NLEClip>(module); clip && getNumClips() == 1) setActiveClip(clip);
+}
+
+void Database::join(Module* module) {
+  if (getNumModules() > 0 && getModule(getNumModules() - 1)->m_order > module->m_order) m_unsorted = true;
+  m_modules.append(module);
+  m_byId.emplace(module->getID(), module);
+  ++m_countByClass[module->getRuntimeClass()];
+  m_index->add(module);
+  if (auto* node = objectAs<Node>(module)) m_nodes.append(node);
+  if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.append(character);
+  if (auto* clip = objectAs<NLEClip>(module)) m_clips.append(clip);
+  module->linkToParent();
+}
+
+void Database::leave(Module* module) {
+  m_selection.remove(module);
+  if (m_priority == module) m_priority = nullptr;
+  module->forgetByAll();
+  if (auto* clip = objectAs<NLEClip>(module)) {
+    if (m_activeClip == clip) setActiveClip(nullptr);
+    for (Module* other : m_modules.toVector())
+      for (int i = 0; i < other->getNumChannels(); ++i) other->getChannel(i)->forgetClip(clip);
+  }
+  if (UndoJournal::isRecording()) m_journal.add(std::make_unique<Membership>(*module));
+  unjoin(module);
+}
+
+void Database::unjoin(Module* module) {
+  if (m_priority == module) m_priority = nullptr;
+  module->unlinkFromParent();
+  if (auto* node = objectAs<Node>(module)) m_nodes.remove(node);
+  if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.remove(character);
+  if (auto* clip = objectAs<NLEClip>(module)) m_clips.remove(clip);
+  m_index->remove(module);
+  m_index->forgetParent(module);
+  --m_countByClass[module->getRuntimeClass()];
+  m_byId.erase(module->getID());
+  m_modules.remove(module);
+}
+
+bool Database::removeFromScene(Module* module, bool, bool, bool, bool) {
+  if (!module || !module->isInScene()) return false;
+  TSimpleArray<Module*> all(64, 4096);
+  module->getModAndDecedents(all);
+  if (module->getParent()) module->storeParent(nullptr);
+  // Children first, so that a module never outlives its parent in the scene.
+  for (int i = all.getCount() - 1; i >= 0; --i) {
+    leave(all[i]);
+    // What the journal tells of is the journal's to destroy.
+    if (all[i]->m_undoHolds == 0) m_removed.emplace_back(all[i]);
+  }
+  return true;
+}
+
+// --- what is active ---
+
+// The frame rate is among it: what frames mean hangs on it. Small, and changed together as often as not.
+struct Database::SettingsChange : UndoChange {
+  SettingsChange()
+      : UndoChange(nullptr),
+        clip(g_db->m_activeClip),
+        layer(g_db->m_activeLayer),
+        upAxis(g_db->m_upAxis),
+        properties(g_db->m_activeProperties),
+        rate(HTimeManager::getInstance()->getFrameRate()) {}
+  void swap() override {
+    std::swap(clip, g_db->m_activeClip);
+    std::swap(layer, g_db->m_activeLayer);
+    std::swap(upAxis, g_db->m_upAxis);
+    std::swap(properties, g_db->m_activeProperties);
+    const HFrameRate now = HTimeManager::getInstance()->getFrameRate();
+    HTimeManager::getInstance()->setFrameRate(rate);
+    rate = now;
+  }
+  bool isVoid() const override {
+    return clip == g_db->m_activeClip && layer == g_db->m_activeLayer && upAxis == g_db->m_upAxis &&
+           properties == g_db->m_activeProperties && rate == HTimeManager::getInstance()->getFrameRate();
+  }
+  int64 memoryUse() const override {
+    return static_cast<int64>(sizeof *this + sizeof(unsigned) * (properties.size() + g_db->m_activeProperties.size()));
+  }
+
+  NLEClip* clip;
+  int layer;
+  int upAxis;
+  std::vector<unsigned> properties;
+  HFrameRate rate;
+};
+
+void Database::recordSettings() {
+  if (UndoJournal::isDue(m_undoMark)) m_journal.add(std::make_unique<SettingsChange>());
+}
+
+void Database::storeActive(NLEClip* clip, int layer) {
+  recordSettings();
+  const bool switched = clip != m_activeClip;
+  m_activeClip = clip;
+  m_activeLayer = layer;
+  if (switched) Node::forgetWorldCache();
+}
+
+void Database::setActiveProperties(std::vector<unsigned> ids) {
+  recordSettings();
+  m_activeProperties = std::move(ids);
+}
+
+void Database::setUpAxis(int axis) {
+  recordSettings();
+  m_upAxis = axis;
+}
+
+// --- after undo and redo ---
+
+void Database::settle() {
+  if (m_unsorted) {
+    const auto earlier = [](Module const* a, Module const* b) { return a->m_order < b->m_order; };
+    m_modules.sort(earlier);
+    m_nodes.sort(earlier);
+    m_clips.sort(earlier);
+    m_subjects->m_subjects.sort(earlier);
+    m_unsorted = false;
+  }
+  std::sort(m_unsortedParents.begin(), m_unsortedParents.end());
+  m_unsortedParents.erase(std::unique(m_unsortedParents.begin(), m_unsortedParents.end()), m_unsortedParents.end());
+  for (Module* parent : m_unsortedParents) parent->sortChildren();
+  m_unsortedParents.clear();
+  m_selection.settle();
+  Node::forgetWorldCache();
+}

@@ -1,0 +1,124 @@
+// The mutators of a module: its name, its parent, what attributes and channels it has.
+#include "host/scene/Database.h"
+#include "host/scene/ModuleChildren.h"
+#include "host/scene/SceneIndex.h"
+
+// --- name ---
+
+struct Module::NameChange : UndoChange {
+  explicit NameChange(Module& concerned) : UndoChange(&concerned), module(concerned), name(module.m_name) {}
+  void swap() override {
+    HString now = module.m_name;
+    module.storeName(name);
+    name = std::move(now);
+  }
+  bool isVoid() const override { return name == module.m_name; }
+  int64 memoryUse() const override {
+    return static_cast<int64>(sizeof *this + std::max(name.GetString().size(), module.m_name.GetString().size()));
+  }
+
+  Module& module;
+  HString name;
+};
+
+void Module::storeName(HString const& name) {
+  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<NameChange>(*this));
+  const bool indexed = isInScene();
+  if (indexed) g_db->getIndex().remove(this);
+  m_name = name;
+  if (indexed) g_db->getIndex().add(this);
+}
+
+// --- parent ---
+
+struct Module::ParentChange : UndoChange {
+  explicit ParentChange(Module& concerned)
+      : UndoChange(&concerned), module(concerned), parent(module.m_parent), order(module.m_childOrder) {}
+  void swap() override {
+    Module* now = module.m_parent;
+    const uint64 orderNow = module.m_childOrder;
+    module.moveTo(parent, order);
+    parent = now;
+    order = orderNow;
+  }
+  int64 memoryUse() const override { return sizeof *this; }
+
+  Module& module;
+  Module* parent;
+  uint64 order;
+};
+
+void Module::storeParent(Module* parent) {
+  static uint64 s_linked = 0;
+  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<ParentChange>(*this));
+  moveTo(parent, ++s_linked);
+}
+
+void Module::moveTo(Module* parent, uint64 order) {
+  const bool indexed = isInScene();
+  if (indexed) g_db->getIndex().remove(this);
+  unlinkFromParent();
+  m_parent = parent;
+  m_childOrder = order;
+  linkToParent();
+  if (indexed) g_db->getIndex().add(this);
+  Node::markMoved(this);
+}
+
+void Module::linkToParent() {
+  if (!m_parent || m_childSlot != kNoSlot) return;
+  auto const& siblings = m_parent->children().all;
+  const int count = siblings.getCount();
+  if (count > 0 && siblings.at(count - 1)->m_childOrder > m_childOrder) g_db->needsSorting(m_parent);
+  m_parent->children().editFor(this, [this](auto& list) { list.append(this); });
+}
+
+void Module::unlinkFromParent() {
+  if (m_parent && m_childSlot != kNoSlot)
+    m_parent->children().editFor(this, [this](auto& list) { list.remove(this); });
+}
+
+void Module::sortChildren() {
+  const auto earlier = [](Module const* a, Module const* b) { return a->m_childOrder < b->m_childOrder; };
+  children().all.sort(earlier);
+  children().nodes.sort(earlier);
+  children().markers.sort(earlier);
+}
+
+// --- attributes and channels that a module has ---
+
+// Of attributes (channels), the last one: later ones have gone before it.
+template <class T>
+struct Module::Addition : UndoChange {
+  Addition(Module& concerned, std::vector<std::unique_ptr<T>>& list) : UndoChange(&concerned), items(list) {}
+  void swap() override {
+    if (held) {
+      items.push_back(std::move(held));
+    } else {
+      held = std::move(items.back());
+      items.pop_back();
+    }
+  }
+  int64 memoryUse() const override { return sizeof *this + sizeof(T); }
+
+  std::vector<std::unique_ptr<T>>& items;
+  std::unique_ptr<T> held;
+};
+
+void Module::storeAttribute(std::unique_ptr<Attribute> attribute) {
+  m_attributes.push_back(std::move(attribute));
+  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<Addition<Attribute>>(*this, m_attributes));
+}
+
+void Module::storeChannel(std::unique_ptr<Controller> channel) {
+  m_channels.push_back(std::move(channel));
+  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<Addition<Controller>>(*this, m_channels));
+}
+
+int64 Module::memoryUse() const {
+  size_t bytes = sizeof(Node) + m_attributes.size() * (sizeof(StringAttribute) + sizeof(void*)) +
+                 m_channels.size() * (sizeof(Vec3Controller) + sizeof(void*)) + m_name.GetString().size();
+  int64 keys = 0;
+  for (auto const& channel : m_channels) keys += channel->memoryAlone();
+  return static_cast<int64>(bytes) + keys;
+}

@@ -1,0 +1,104 @@
+// What was changed, step by step, so that it can be taken back and done again.
+//
+// Every kind of scene state has one mutator, which records the state that it replaces. A change holds the
+// *other* state of what it concerns: undoing and redoing both swap it with the present one. A step undoes its
+// changes from the last to the first and redoes them from the first to the last.
+//
+//  1. Within a step a field that depends on nothing else (a value, a track of keys) is recorded once, at its
+//     first change; what depends on order (names, parents, membership, selection) is recorded each time.
+//  2. A module that came into the scene within the step needs no records of its own: it comes and goes whole.
+//  3. A module lives as long as a change tells of it, in the scene or out of it.
+//  4. A new step that changed something drops what could be redone.
+//
+// Current time, ranges and the priority module are no part of it.
+#pragma once
+
+#include <deque>
+#include <memory>
+#include <vector>
+
+#include "host/base/HString.h"
+
+class Module;
+
+class UndoChange {
+ public:
+  // `owner`: the module that the change tells of; null for the scene's own state.
+  explicit UndoChange(Module* owner);
+  virtual ~UndoChange();
+  UndoChange(UndoChange const&) = delete;
+  UndoChange& operator=(UndoChange const&) = delete;
+
+  virtual void swap() = 0;
+  // Whether both states are the same.
+  virtual bool isVoid() const { return false; }
+  // Bytes held, in whichever of its states holds more.
+  virtual int64 memoryUse() const = 0;
+
+ private:
+  Module* m_owner;
+};
+
+class UndoJournal {
+ public:
+  UndoJournal() = default;
+  ~UndoJournal() { clear(); }
+  UndoJournal(UndoJournal const&) = delete;
+  UndoJournal& operator=(UndoJournal const&) = delete;
+
+  // Off at start: nothing is recorded. Switching off forgets everything.
+  void setEnabled(bool enabled);
+  bool isEnabled() const { return m_enabled; }
+
+  // Steps may stand inside each other: the outermost counts.
+  void beginStep();
+  // `name`: what is shown when the step is undone. Nothing changed, no step.
+  void endStep(HString const& name);
+
+  // Takes back the last step (does the next one again). False when there is none. A step that is open must
+  // have changed nothing yet. `name`: that of the step.
+  bool undo(HString& name);
+  bool redo(HString& name);
+  int getNumUndoSteps() const { return static_cast<int>(m_done.size()); }
+  int getNumRedoSteps() const { return static_cast<int>(m_undone.size()); }
+  void clear();
+
+  // Bytes that the steps may hold; the oldest go first. A step that is larger by itself goes as well, with a
+  // warning.
+  void setMemoryLimit(int64 bytes) { m_memoryLimit = bytes; }
+  int64 getMemoryUse() const { return m_memoryUse; }
+
+  // --- for mutators ---
+  // The step that is open and being recorded; 0 for none.
+  static uint64 getStep() { return s_step; }
+  static bool isRecording() { return s_step != 0; }
+  // Whether a field that was last recorded in step `mark` has to be recorded now; marks it.
+  static bool isDue(uint64& mark) {
+    if (mark == s_step) return false;
+    mark = s_step;
+    return s_step != 0;
+  }
+  // Only while recording.
+  void add(std::unique_ptr<UndoChange> change);
+
+ private:
+  struct Step {
+    std::vector<std::unique_ptr<UndoChange>> changes;
+    HString name;
+    int64 memory = 0;
+  };
+
+  bool move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name);
+  void drop(std::deque<Step>& steps, bool front);
+  void keepWithinLimit();
+
+  static uint64 s_step;
+
+  bool m_enabled = false;
+  int m_depth = 0;
+  uint64 m_lastStep = 0;
+  std::vector<std::unique_ptr<UndoChange>> m_open;
+  std::deque<Step> m_done, m_undone;  // the next one to be undone or redone is at the back
+  int64 m_memoryUse = 0;
+  int64 m_memoryLimit = int64{1} << 30;
+};
