@@ -41,26 +41,21 @@ void UndoJournal::endStep(HString const& name) {
   step.memory = static_cast<int64>(sizeof step + step.changes.capacity() * sizeof step.changes[0]);
   for (auto const& change : step.changes) step.memory += change->memoryUse();
   m_memoryUse += step.memory;
-  while (!m_undone.empty()) drop(m_undone, false);
+  for (Step const& undone : m_undone) m_memoryUse -= undone.memory;
+  m_undone.clear();
   m_done.push_back(std::move(step));
   keepWithinLimit();
-}
-
-// Redo steps go newest first, undo steps oldest first: no step outlives one that made what it tells of.
-void UndoJournal::drop(std::deque<Step>& steps, bool front) {
-  m_memoryUse -= front ? steps.front().memory : steps.back().memory;
-  front ? steps.pop_front() : steps.pop_back();
 }
 
 void UndoJournal::keepWithinLimit() {
   while (!m_done.empty() && m_memoryUse > m_memoryLimit) {
     if (m_done.size() == 1) {
-      writeLog(LogLevel::Warning,
-               m_done.front().name.GetString() + " needs more memory to be undone (" +
-                   std::to_string(m_memoryUse / 1000000) + " MB) than undo may use (" +
-                   std::to_string(m_memoryLimit / 1000000) + " MB) and cannot be undone.");
+      writeLog(LogLevel::Warning, m_done.front().name.GetString() + " needs more memory to be undone (" +
+                                      std::to_string(m_memoryUse / 1000000) + " MB) than undo may use (" +
+                                      std::to_string(m_memoryLimit / 1000000) + " MB) and cannot be undone.");
     }
-    drop(m_done, true);
+    m_memoryUse -= m_done.front().memory;
+    m_done.pop_front();
   }
 }
 
@@ -87,6 +82,9 @@ bool UndoJournal::move(std::deque<Step>& from, std::deque<Step>& to, bool backwa
 }
 
 void UndoJournal::clear() {
-  while (!m_undone.empty()) drop(m_undone, false);
-  while (!m_done.empty()) drop(m_done, true);
+  s_step = 0;
+  m_undone.clear();
+  m_open.clear();
+  m_done.clear();
+  m_memoryUse = 0;
 }

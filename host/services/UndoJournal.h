@@ -61,6 +61,7 @@ class UndoJournal {
   bool redo(HString& name);
   int getNumUndoSteps() const { return static_cast<int>(m_done.size()); }
   int getNumRedoSteps() const { return static_cast<int>(m_undone.size()); }
+  // Forgets everything, the step that is open included, which is not recorded any further.
   void clear();
 
   // Bytes that the steps may hold; the oldest go first. A step that is larger by itself goes as well, with a
@@ -89,7 +90,6 @@ class UndoJournal {
   };
 
   bool move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name);
-  void drop(std::deque<Step>& steps, bool front);
   void keepWithinLimit();
 
   static uint64 s_step;

@@ -253,11 +253,14 @@ class AttributeCmd final : public ScriptCommand<AttributeCmd> {
 // Logs at every level, then fails as it is told.
 class FailCmd final : public ScriptCommand<FailCmd> {
  public:
-  static constexpr CommandInfo info = {
-      .name = "fail", .displayName = "Fail", .category = "Testing", .options = {{"text"}, {"memory"}}};
+  static constexpr CommandInfo info = {.name = "fail",
+                                       .displayName = "Fail",
+                                       .category = "Testing",
+                                       .options = {{"text"}, {"memory"}, {"deselect"}}};
 
   bool execute(Given const& given, Args const&, Variable& result) override {
     result.setValue(1, -1);
+    if (GivenOptions(given).has(info.option("deselect"))) g_db->selectAllModules(false);
     if (GivenOptions(given).has(info.option("text"))) throw "E1224: Out of memory in TSimpleArray::addSpace";
     if (GivenOptions(given).has(info.option("memory"))) throw std::bad_alloc();
     logInfo("about to fail");

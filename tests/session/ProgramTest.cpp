@@ -147,7 +147,8 @@ TEST_F(ProgramTest, CommandsAreDescribed) {
   EXPECT_EQ(boost::json::parse(m_out), boost::json::parse(R"([{
       "name": "fail", "displayName": "Fail", "category": "Testing", "subCategory": "", "purpose": "",
       "syntax": null, "options": [{"name": "text", "args": 0, "type": 0, "mask": 0, "hidden": false},
-                                  {"name": "memory", "args": 0, "type": 0, "mask": 0, "hidden": false}],
+                                  {"name": "memory", "args": 0, "type": 0, "mask": 0, "hidden": false},
+                                  {"name": "deselect", "args": 0, "type": 0, "mask": 0, "hidden": false}],
       "returns": 0, "solo": true, "source": "Sample Commands"}])"));
   ASSERT_EQ(run("talix commands $sample echo"), 0);
   const std::string page = m_out;

@@ -4,6 +4,7 @@
 #include <random>
 
 #include "session/ScriptLine.h"
+#include "session/ScriptRunner.h"
 #include "session/ScriptText.h"
 
 namespace talix {
@@ -150,6 +151,13 @@ TEST_F(ScriptTextTest, LongLinesAreReadWhole) {
   ASSERT_EQ(read(text + "]"), ScriptLine::Outcome::Command);
   EXPECT_EQ(m_line.args()[0].getNumItems(), 100000);
   EXPECT_STREQ(m_line.args()[0].getStringValue(99999), "name99999");
+}
+
+TEST(UsesUndo, FindsTheLinesThatNameIt) {
+  EXPECT_TRUE(usesUndo("select a\n  undo 3"));
+  EXPECT_TRUE(usesUndo("\tredo\r\n"));
+  EXPECT_FALSE(usesUndo("# undo\nselect undo\nundoing\n\n"));
+  EXPECT_FALSE(usesUndo(""));
 }
 
 TEST_F(ScriptTextTest, TwoCommandsOfOneNameAreRefused) {

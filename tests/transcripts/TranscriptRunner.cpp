@@ -10,6 +10,7 @@
 // Lines after "> " are run in order against a fresh scene; the lines below each are what must be printed: log
 // lines, the result, and "failed" when the command failed. A printed line that is empty or begins with "#",
 // ">" or "|" stands after "| ". The working folder is the folder of the tests.
+// In the end every line is undone and redone, and the scene compared with what it was.
 //
 //   transcripts [--update] --plugin LIBRARY FILE...      --update rewrites the files instead
 
@@ -22,9 +23,12 @@
 
 #include "session/ScriptText.h"
 #include "session/Session.h"
+#include "tests/SceneText.h"
 
 namespace {
 
+using talix_tests::firstDifference;
+using talix_tests::SceneText;
 using Lines = std::vector<std::string>;
 
 constexpr std::string_view kPrompt = "> ";
@@ -55,19 +59,61 @@ void addResult(talix::LineResult const& result, Lines& lines) {
   if (result.failed()) lines.emplace_back("failed");
 }
 
+// What the scene was after each step: undo and redo have to bring it back, and a line that leaves no step
+// must have changed nothing.
+class UndoCheck {
+ public:
+  UndoCheck() : m_states{SceneText().write()} {}
+
+  void lineDone(std::string const& line) {
+    const auto steps = static_cast<size_t>(m_journal.getNumUndoSteps());
+    const bool fresh = steps == m_steps + 1 && m_journal.getNumRedoSteps() == 0 && !line.starts_with("redo");
+    if (line.starts_with("newScene")) m_states.clear();
+    if (fresh || m_states.empty()) {
+      m_states.resize(steps);
+      m_states.push_back(SceneText().write());
+    } else {
+      compare(steps, line);
+    }
+    m_steps = steps;
+  }
+  // Undoes and redoes everything.
+  void finish() {
+    HString step;
+    while (m_journal.undo(step)) compare(static_cast<size_t>(m_journal.getNumUndoSteps()), "undo");
+    while (m_journal.redo(step)) compare(static_cast<size_t>(m_journal.getNumUndoSteps()), "redo");
+  }
+
+ private:
+  void compare(size_t steps, std::string const& line) const {
+    const std::string difference = firstDifference(m_states.at(steps), SceneText().write());
+    if (!difference.empty())
+      throw std::runtime_error("after " + std::to_string(steps) + " steps, line " + line + ":\n  " +
+                               difference);
+  }
+
+  UndoJournal& m_journal = g_db->getUndoJournal();
+  std::vector<std::string> m_states;  // by number of steps
+  size_t m_steps = 0;
+};
+
 // The file as it ought to be.
 Lines replayed(Lines const& file, std::string const& plugin) {
   talix::Session session(plugin);
   session.run("newScene");
+  session.setUndo(true);
+  UndoCheck check;
   Lines lines;
   for (std::string const& line : file) {
     if (line.starts_with(kPrompt)) {
       lines.push_back(line);
       addResult(session.run(std::string_view(line).substr(kPrompt.size())), lines);
+      check.lineDone(line.substr(kPrompt.size()));
     } else if (line.empty() || line.front() == '#') {
       lines.push_back(line);
     }
   }
+  check.finish();
   return lines;
 }
 
@@ -101,7 +147,7 @@ void writeFile(std::string const& path, Lines const& lines) {
 
 int main(int argc, char** argv) {
   bool update = false, same = true;
-  std::string plugin;
+  std::string plugin, current;
   std::vector<std::string> paths;
   for (int i = 1; i < argc; ++i) {
     const std::string arg = argv[i];
@@ -120,6 +166,7 @@ int main(int argc, char** argv) {
   try {
     std::filesystem::current_path(TALIX_TESTS_FOLDER);
     for (std::string const& path : paths) {
+      current = path;
       const Lines expected = readFile(path);
       const Lines found = replayed(expected, plugin);
       if (found == expected) continue;
@@ -131,7 +178,7 @@ int main(int argc, char** argv) {
       }
     }
   } catch (std::exception const& error) {
-    std::cout << error.what() << "\n";
+    std::cout << current << ": " << error.what() << "\n";
     return 2;
   }
   return same ? 0 : 1;
