@@ -4,12 +4,14 @@
 #include <boost/json.hpp>
 #include <cerrno>
 #include <cstdio>
+#include <cstdlib>
 #include <cstring>
 #include <filesystem>
 #include <iostream>
 #include <unistd.h>
 
 #include "host/scene/Database.h"
+#include "host/services/HInterface.h"
 #include "io/FileError.h"
 #include "io/TakeFormats.h"
 #include "session/CommandHelp.h"
@@ -28,6 +30,21 @@ std::string programFolder() {
   std::error_code error;
   const auto program = std::filesystem::read_symlink("/proc/self/exe", error);
   return error ? "." : program.parent_path().string();
+}
+
+// The user's settings: the file that TALIX_PROFILE names (none when it is empty), else talix/profile.ini in
+// the folder for configuration. Writing settings makes it when it is missing.
+void loadUserProfile() {
+  char const* given = std::getenv("TALIX_PROFILE");
+  std::filesystem::path file = given ? given : "";
+  if (!given) {
+    char const* folder = std::getenv("XDG_CONFIG_HOME");
+    if (char const* home = std::getenv("HOME"); folder && *folder)
+      file = std::filesystem::path(folder) / "talix/profile.ini";
+    else if (home && *home)
+      file = std::filesystem::path(home) / ".config/talix/profile.ini";
+  }
+  if (!file.empty()) g_interface->loadProfile(file.string());
 }
 
 int failed(Status status, std::string const& text) {
@@ -90,6 +107,7 @@ void runParts(ScriptRunner& runner, std::vector<RunRequest::Part> const& parts,
 }  // namespace
 
 int runScripts(RunRequest const& request) {
+  loadUserProfile();
   int status = 0;
   const std::unique_ptr<Session> session = makeSession(request.plugin, status);
   if (!session) return status;

@@ -3,12 +3,12 @@
 #include <cerrno>
 #include <cstring>
 #include <fcntl.h>
-#include <filesystem>
-#include <fstream>
 #include <sys/mman.h>
 #include <sys/stat.h>
+#include <system_error>
 #include <unistd.h>
 
+#include "host/base/ReplaceFile.h"
 #include "io/FileError.h"
 
 namespace talix {
@@ -54,27 +54,10 @@ void FileBytes::release(size_t offset) const {
 }
 
 void writeFileAtomically(const std::string& path, const std::function<void(std::ostream&)>& write) {
-  std::string temporary = path + ".XXXXXX";
-  Descriptor file{::mkstemp(temporary.data())};
-  if (file.fd < 0) throw FileError(path, "cannot be written: " + systemReason());
   try {
-    {
-      std::ofstream out(temporary, std::ios::binary | std::ios::trunc);
-      write(out);
-      out.flush();
-      if (!out) throw FileError(path, "cannot be written: " + systemReason());
-    }
-    // A new file gets the rights that the user's mask allows, as if it had been created under its own name.
-    struct stat status {};
-    const mode_t mask = ::umask(0);
-    ::umask(mask);
-    ::fchmod(file.fd, ::stat(path.c_str(), &status) == 0 ? status.st_mode & 07777 : 0666 & ~mask);
-    if (::fsync(file.fd) != 0) throw FileError(path, "cannot be written: " + systemReason());
-    if (::rename(temporary.c_str(), path.c_str()) != 0)
-      throw FileError(path, "cannot be written: " + systemReason());
-  } catch (...) {
-    ::unlink(temporary.c_str());
-    throw;
+    replaceFile(path, write);
+  } catch (const std::system_error& error) {
+    throw FileError(path, "cannot be written: " + error.code().message());
   }
 }
 

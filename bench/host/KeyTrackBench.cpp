@@ -1,10 +1,10 @@
 // Key tracks at the sizes of a long take (20,000 keys) and of an analog channel (1,000,000).
 #include <algorithm>
 #include <benchmark/benchmark.h>
-#include <numeric>
 #include <random>
 #include <vector>
 
+#include "bench/Shuffled.h"
 #include "host/animation/KeyTrack.h"
 
 namespace {
@@ -24,13 +24,6 @@ KeyTrack makeTrack(int64 keys) {
   KeyTrack track(KeyTrack::Shape::Vector);
   track.append(0, kPeriod, randomValues(keys * 3).data(), keys);
   return track;
-}
-
-std::vector<int64> shuffled(int64 n) {
-  std::vector<int64> order(static_cast<size_t>(n));
-  std::iota(order.begin(), order.end(), 0);
-  std::shuffle(order.begin(), order.end(), std::mt19937_64(7));
-  return order;
 }
 
 void appendBulk(benchmark::State& state) {

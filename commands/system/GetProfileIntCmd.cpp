@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/services/HInterface.h"
 
 namespace {
 
-class GetProfileIntCmd final : public PendingCommand<GetProfileIntCmd> {
+class GetProfileIntCmd final : public ScriptCommand<GetProfileIntCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getProfileInt",
                                        .displayName = "Get Int Value From Profile",
@@ -15,6 +17,12 @@ class GetProfileIntCmd final : public PendingCommand<GetProfileIntCmd> {
                                        .options = {{"file", 1, Variable::String}},
                                        .returns = Variable::Int,
                                        .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override {
+    const HString file = GivenOptions(given).textOr(info.option("file"), "");
+    return answer(result, g_interface->getProfileInt(args[0].getStringValue(-1), args[1].getStringValue(-1),
+                                                     args[2].getIntValue(-1), file));
+  }
 };
 
 }  // namespace

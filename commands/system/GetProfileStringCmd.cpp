@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/services/HInterface.h"
 
 namespace {
 
-class GetProfileStringCmd final : public PendingCommand<GetProfileStringCmd> {
+class GetProfileStringCmd final : public ScriptCommand<GetProfileStringCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getProfileString",
                                        .displayName = "Get HString Value From Profile",
@@ -15,6 +17,13 @@ class GetProfileStringCmd final : public PendingCommand<GetProfileStringCmd> {
                                        .options = {{"file", 1, Variable::String}},
                                        .returns = Variable::String,
                                        .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override {
+    const HString file = GivenOptions(given).textOr(info.option("file"), "");
+    return answer(result,
+                  g_interface->getProfileString(args[0].getStringValue(-1), args[1].getStringValue(-1),
+                                                args[2].getStringValue(-1), file));
+  }
 };
 
 }  // namespace

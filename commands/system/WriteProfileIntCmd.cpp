@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/services/HInterface.h"
 
 namespace {
 
-class WriteProfileIntCmd final : public PendingCommand<WriteProfileIntCmd> {
+class WriteProfileIntCmd final : public ScriptCommand<WriteProfileIntCmd> {
  public:
   static constexpr CommandInfo info = {.name = "writeProfileInt",
                                        .displayName = "Write Int Value To Profile",
@@ -15,6 +17,12 @@ class WriteProfileIntCmd final : public PendingCommand<WriteProfileIntCmd> {
                                        .options = {{"file", 1, Variable::String}},
                                        .returns = Variable::Bool,
                                        .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override {
+    const HString file = GivenOptions(given).textOr(info.option("file"), "");
+    return answer(result, g_interface->writeProfileInt(args[0].getStringValue(-1), args[1].getStringValue(-1),
+                                                       args[2].getIntValue(-1), file));
+  }
 };
 
 }  // namespace

@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/services/HInterface.h"
 
 namespace {
 
-class WriteProfileStringCmd final : public PendingCommand<WriteProfileStringCmd> {
+class WriteProfileStringCmd final : public ScriptCommand<WriteProfileStringCmd> {
  public:
   static constexpr CommandInfo info = {.name = "writeProfileString",
                                        .displayName = "Write HString Value To Profile",
@@ -15,6 +17,13 @@ class WriteProfileStringCmd final : public PendingCommand<WriteProfileStringCmd>
                                        .options = {{"file", 1, Variable::String}},
                                        .returns = Variable::Bool,
                                        .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override {
+    const HString file = GivenOptions(given).textOr(info.option("file"), "");
+    return answer(result,
+                  g_interface->writeProfileString(args[0].getStringValue(-1), args[1].getStringValue(-1),
+                                                  args[2].getStringValue(-1), file));
+  }
 };
 
 }  // namespace

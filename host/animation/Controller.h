@@ -11,7 +11,9 @@
 // 1 or 7.
 #pragma once
 
+#include <functional>
 #include <memory>
+#include <span>
 #include <vector>
 
 #include "host/animation/DataSource.h"
@@ -25,6 +27,7 @@
 
 class Module;
 class NLEClip;
+struct ReductionTolerances;
 
 class Controller : public DataSource {
   H_DECLARE_CLASS(Controller, DataSource)
@@ -83,6 +86,11 @@ class Controller : public DataSource {
   virtual int deleteKey(int64 time, unsigned mask);
   virtual int deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers);
   virtual int deleteSelectedKeys(unsigned mask);
+  // Removes the keys in the ranges (sorted and disjoint; the selected keys) that the curve of the layer does not
+  // need within the tolerances, measured against the curve as it is now (KeyReduction.h says how). A marker's
+  // fill type becomes "reduced" at the key before each run that goes. They answer how many keys lost something.
+  int reduceKeys(std::span<HTimeRange const> ranges, ReductionTolerances const& tolerances);
+  int reduceSelectedKeys(ReductionTolerances const& tolerances);
 
   // Raw values: 1, 3 or 4 doubles (a rotation's quaternion), as KeyTrack holds them.
   void readKey(int key, Values& values) const;
@@ -162,6 +170,7 @@ class Controller : public DataSource {
   void recordSettings();
   int64 memoryAlone() const;
   void evaluateInClip(NLEClip const* clip, int64 time, Values& values) const;
+  int reduce(std::function<bool(KeyTrack::Key const&)> mayGo, ReductionTolerances const& tolerances);
   bool areFinite(Values const& values, unsigned mask) const;
   void changed();
 

@@ -1,51 +1,6 @@
 // Evaluation of the key track between its keys.
-#include <ImathQuat.h>
-#include <cmath>
-
+#include "host/animation/KeyInterpolation.h"
 #include "host/animation/KeyTrackPlace.h"
-
-namespace {
-
-// The slope at the key between two intervals, of the parabola through its three keys, times the length of one
-// interval: weights for the differences over that interval and over the other one.
-struct Tangent {
-  double own = 1, other = 0;  // one-sided
-
-  Tangent() = default;
-  Tangent(double ownLength, double otherLength)
-      : own(otherLength / (ownLength + otherLength)),
-        other(ownLength * ownLength / (otherLength * (ownLength + otherLength))) {}
-
-  template <class T>
-  T operator()(T const& ownDifference, T const& otherDifference) const {
-    return ownDifference * own + otherDifference * other;
-  }
-};
-
-double hermite(double u, double p0, double m0, double p1, double m1) {
-  const double d = p1 - p0;
-  return p0 + u * (m0 + u * ((3 * d - 2 * m0 - m1) + u * (m0 + m1 - 2 * d)));
-}
-
-using Quat = Imath::Quatd;
-using V3 = Imath::V3d;
-
-// The rotation from a to b as axis times half the angle, and back.
-V3 logBetween(Quat const& a, Quat const& b) { return (~a * b).log().v; }
-Quat turned(Quat const& q, V3 const& by) { return q * Quat(0, by).exp(); }
-
-Quat nearest(Quat const& q, Quat const& to) { return (q ^ to) < 0 ? -q : q; }
-
-Quat squad(double u, Tangent const& leaving, Tangent const& arriving, Quat const& before, Quat const& a,
-           Quat const& b, Quat const& after) {
-  const V3 forth = logBetween(a, b), back = -logBetween(b, a);
-  const V3 start = leaving(forth, -logBetween(a, nearest(before, a)));
-  const V3 end = arriving(back, logBetween(b, nearest(after, b)));
-  const Quat nearA = turned(a, (start - forth) * 0.5), nearB = turned(b, (back - end) * 0.5);
-  return Imath::slerp(Imath::slerp(a, b, u), Imath::slerp(nearA, nearB, u), 2 * u * (1 - u));
-}
-
-}  // namespace
 
 // As placeAtOrBefore(time), with the search spared while the time stays in the cursor's leaf or enters the
 // next.
@@ -105,40 +60,12 @@ void KeyTrack::evaluateAt(int64 time, Interpolation interpolation, unsigned mask
   const Place b = neighbour(a, 1, mask, cursor);
   if (!b) return hold(a);
 
-  const auto length = static_cast<double>(b.time() - a.time());
-  const double u = static_cast<double>(time - a.time()) / length;
   Place before, after;
-  Tangent leaving, arriving;
   if (interpolation == Interpolation::Cubic) {
     before = neighbour(a, -1, mask, cursor);
     after = neighbour(b, 1, mask, cursor);
-    if (before) leaving = {length, static_cast<double>(a.time() - before.time())};
-    if (after) arriving = {length, static_cast<double>(after.time() - b.time())};
-    if (!before) before = a;
-    if (!after) after = b;
   }
-
-  if (m_shape == Shape::Rotation) {
-    const auto quatAt = [](Place const& key) {
-      return Quat(key.value(3), key.value(0), key.value(1), key.value(2));
-    };
-    const Quat qa = quatAt(a), qb = nearest(quatAt(b), qa);
-    const Quat q = interpolation == Interpolation::Linear
-                       ? Imath::slerp(qa, qb, u)
-                       : squad(u, leaving, arriving, quatAt(before), qa, qb, quatAt(after));
-    values = {q.v.x, q.v.y, q.v.z, q.r};
-    return;
-  }
-  for (int c = 0; c < width(); ++c) {
-    if (!wanted(c)) continue;
-    const double pa = a.value(c), pb = b.value(c), d = pb - pa;
-    double& out = values[static_cast<size_t>(c)];
-    if (interpolation == Interpolation::Linear) {
-      out = pa + d * u;
-    } else {
-      out = hermite(u, pa, leaving(d, pa - before.value(c)), pb, arriving(d, after.value(c) - pb));
-    }
-  }
+  interpolateKeys(m_shape, interpolation, time, before, a, b, after, wanted, values);
 }
 
 void KeyTrack::evaluate(int64 time, Interpolation interpolation, Values const& defaults, Values& values,

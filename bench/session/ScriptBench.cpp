@@ -1,0 +1,119 @@
+// What a script line costs: the program's plug-in on a session, line by line.
+//
+// Each editing line has a benchmark of its own; those of undoing and redoing it belong behind it, at the
+// marks "undo".
+#include <benchmark/benchmark.h>
+#include <memory>
+
+#include "bench/Shuffled.h"
+#include "host/scene/Database.h"
+#include "host/scene/Marker.h"
+#include "host/time/HTimeManager.h"
+#include "session/Session.h"
+
+namespace {
+
+using talix::Session;
+
+constexpr int64 kKeys = 100'000;
+constexpr int64 kLines = 500'000;
+
+// A session on a new scene with an active clip and the marker M.
+class Fixture {
+ public:
+  Fixture() : m_session(TALIX_PLUGIN) {
+    g_db->newScene();
+    clip = static_cast<NLEClip*>(g_db->createModule(&Clip::staticClass(), "take", nullptr));
+    marker = static_cast<Marker*>(g_db->createModule(&Marker::staticClass(), "M", nullptr));
+    run("select M");
+    run("selectChannels Translation");
+  }
+  ~Fixture() { g_db->newScene(); }
+
+  bool run(std::string const& line) { return !m_session.run(line).failed(); }
+
+  NLEClip* clip;
+  Marker* marker;
+
+ private:
+  Session m_session;
+};
+
+void runLines(benchmark::State& state, std::vector<std::string> const& lines) {
+  for (auto _ : state) {
+    state.PauseTiming();
+    auto fixture = std::make_unique<Fixture>();
+    state.ResumeTiming();
+    for (std::string const& line : lines)
+      if (!fixture->run(line)) state.SkipWithError(line.c_str());
+    state.PauseTiming();
+    fixture.reset();
+    state.ResumeTiming();
+  }
+  state.SetItemsProcessed(state.iterations() * static_cast<int64>(lines.size()));
+}
+
+std::vector<std::string> setKeyLines(std::vector<int64> const& order) {
+  std::vector<std::string> lines;
+  for (const int64 i : order)
+    lines.push_back("setKey Translation " + std::to_string(i) + ".5 1 2 -t " + std::to_string(i));
+  return lines;
+}
+
+void setKeyLineInOrder(benchmark::State& state) { runLines(state, setKeyLines(inOrder(kKeys))); }
+BENCHMARK(setKeyLineInOrder)->Unit(benchmark::kMillisecond);
+void setKeyLineAtRandom(benchmark::State& state) { runLines(state, setKeyLines(shuffled(kKeys))); }
+BENCHMARK(setKeyLineAtRandom)->Unit(benchmark::kMillisecond);
+// undo: setKeyLineInOrder, setKeyLineAtRandom
+
+// Reading and dispatching alone: the cheapest of lines, one that is refused, one with all kinds of values.
+void manyLines(benchmark::State& state, char const* line, bool fails) {
+  Fixture fixture;
+  for (auto _ : state)
+    for (int64 i = 0; i < kLines; ++i)
+      if (fixture.run(line) == fails) return state.SkipWithError(line);
+  state.SetItemsProcessed(state.iterations() * kLines);
+}
+BENCHMARK_CAPTURE(manyLines, comment, "# nothing to do here", false)->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(manyLines, getTime, "getTime", false)->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(manyLines, getNumKeys, "getNumKeys Translation.x -onMod M", false)
+    ->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(manyLines, refused, "getNumKeys 1 <1 2 3> [a b c] \"text\" 'more' 4.5e3 on", true)
+    ->Unit(benchmark::kMillisecond);
+
+// One line on a take of 100 markers by 20,000 frames, all selected; `before` is run first.
+void oneLine(benchmark::State& state, char const* before, char const* line, int64 items) {
+  Fixture fixture;
+  std::vector<double> values;
+  for (int64 i = 0; i < 20'000; ++i)
+    values.insert(values.end(), {1.5 * static_cast<double>(i), 300.0 * ((i / 50) % 2), 7});
+  KeyTrack track(KeyTrack::Shape::Vector);
+  track.append(0, HTimeManager::getInstance()->getTicksPerFrame(), values.data(), 20'000);
+  std::vector<Marker*> markers;
+  for (int m = 0; m < 100; ++m)
+    markers.push_back(static_cast<Marker*>(
+        g_db->createModule(&Marker::staticClass(), HString("m" + std::to_string(m)), nullptr)));
+  for (auto _ : state) {
+    state.PauseTiming();
+    for (Marker* marker : markers) {
+      marker->getTranslationChannel()->setTrack(fixture.clip, 0, track);
+      if (Controller* types = marker->getChannel("FillType"))
+        types->deleteKeys(HTimeRange::forever(), KeyTrack::kAll, true);
+    }
+    fixture.run("select -type Marker");
+    if (*before && !fixture.run(before)) return state.SkipWithError(before);
+    state.ResumeTiming();
+    if (!fixture.run(line)) return state.SkipWithError(line);
+  }
+  state.SetItemsProcessed(state.iterations() * items);
+}
+BENCHMARK_CAPTURE(oneLine, cutKeys, "selectTime 5000 9999", "cutKeys -ranges", 500'000)
+    ->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(oneLine, reduceKeys, "", "reduceKeys -all", 2'000'000)->Unit(benchmark::kMillisecond);
+// 1,000 selected keys on each of 100 markers.
+BENCHMARK_CAPTURE(oneLine, setProperty, "selectKeys Translation -frames 1 1000",
+                  "setProperty Translation.y 5", 100'000)
+    ->Unit(benchmark::kMillisecond);
+// undo: oneLine
+
+}  // namespace

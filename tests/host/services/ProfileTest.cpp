@@ -1,0 +1,89 @@
+// Settings and their file.
+#include <filesystem>
+#include <fstream>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+
+#include "host/services/HInterface.h"
+#include "host/services/Log.h"
+
+namespace {
+
+class ProfileTest : public testing::Test, private LogSink {
+ protected:
+  ProfileTest() : m_folder(std::filesystem::path(testing::TempDir()) / "talix-profile") {
+    std::filesystem::remove_all(m_folder);
+    std::filesystem::create_directory(m_folder);
+    m_former = setLogSink(this);
+  }
+  ~ProfileTest() override {
+    setLogSink(m_former);
+    std::filesystem::remove_all(m_folder);
+  }
+
+  std::string file(std::string const& name) const { return (m_folder / name).string(); }
+  std::string contentOf(std::string const& name) const {
+    std::ifstream in(file(name));
+    return {std::istreambuf_iterator<char>(in), {}};
+  }
+  void put(std::string const& name, std::string const& content) { std::ofstream(file(name)) << content; }
+
+  std::string m_log;
+
+ private:
+  void write(LogLevel, std::string_view text) override { m_log += std::string(text) + "\n"; }
+
+  std::filesystem::path m_folder;
+  LogSink* m_former;
+};
+
+TEST_F(ProfileTest, IsKeptInItsFileBesideWhatOthersWrite) {
+  HInterface one, other;
+  const std::string path = file("new/folder/profile.ini");
+  EXPECT_TRUE(one.loadProfile(path));
+  EXPECT_TRUE(other.loadProfile(path));
+  EXPECT_TRUE(one.writeProfileDouble("Reduction", "LengthMM", 0.25));
+  EXPECT_TRUE(other.writeProfileBool("Demo", "on", true));
+  EXPECT_EQ(contentOf("new/folder/profile.ini"), "[Reduction]\nLengthMM=0.25\n[Demo]\non=true\n");
+
+  HInterface later;
+  EXPECT_TRUE(later.loadProfile(path));
+  EXPECT_EQ(later.getProfile(profile::kReductionLength), 0.25);
+  EXPECT_TRUE(later.getProfileBool("Demo", "on", false));
+  EXPECT_EQ(m_log, "");
+}
+
+TEST_F(ProfileTest, ABrokenFileIsToldAndLeftAlone) {
+  put("broken.ini", "[Undo]\nMemoryMB=5\nwhat\n");
+  HInterface face;
+  EXPECT_FALSE(face.loadProfile(file("broken.ini")));
+  EXPECT_THAT(m_log, testing::StartsWith(file("broken.ini") + ", line 3: "));
+  EXPECT_EQ(face.getProfile(profile::kUndoMemory), 1024);
+  EXPECT_TRUE(face.writeProfileInt("Undo", "MemoryMB", 6));
+  EXPECT_EQ(face.getProfile(profile::kUndoMemory), 6);
+  EXPECT_EQ(contentOf("broken.ini"), "[Undo]\nMemoryMB=5\nwhat\n");
+}
+
+TEST_F(ProfileTest, AValueThatCannotBeWrittenStillCounts) {
+  put("a file", "");
+  HInterface face;
+  EXPECT_TRUE(face.loadProfile(file("a file/profile.ini")));
+  EXPECT_FALSE(face.writeProfileInt("Demo", "n", 3));
+  EXPECT_THAT(m_log, testing::HasSubstr("a file/profile.ini: cannot be written: "));
+  EXPECT_EQ(face.getProfileInt("Demo", "n", 0), 3);
+}
+
+TEST_F(ProfileTest, KnownValuesAreNumbersNotBelowTheirLeast) {
+  HInterface face;
+  for (char const* bad : {"-0.1", "abc", "", "nan", "1e999", "0.1mm"}) {
+    m_log.clear();
+    EXPECT_TRUE(face.writeProfileString("Reduction", "LengthMM", bad));
+    EXPECT_EQ(face.getProfile(profile::kReductionLength), 0.1) << bad;
+    EXPECT_EQ(m_log, "Profile value Reduction LengthMM is \"" + std::string(bad) +
+                         "\", not a number of at least 0; 0.1 is used\n");
+  }
+  EXPECT_TRUE(face.writeProfileString("Reduction", "LengthMM", "0"));
+  EXPECT_EQ(face.getProfile(profile::kReductionLength), 0);
+}
+
+}  // namespace
