@@ -60,6 +60,11 @@ LineResult const& Session::run(std::string_view line) {
   journal.beginStep();
   m_result.outcome = guarded(line);
   m_result.command = m_line.name();
+  if (journal.isEnabled()) {
+    // The line may have set it.
+    constexpr int64 kMebibyte = 1 << 20;
+    journal.setMemoryLimit(g_interface->getProfile(profile::kUndoMemory) * kMebibyte);
+  }
   journal.endStep(m_line.name());
   if (m_result.failed()) m_result.value = Variable();
   g_db->releaseRemoved();

@@ -1,7 +1,5 @@
 // Edits through the C++ interface, on a take of 100 markers by 20,000 frames.
 //
-// Each edit has a benchmark of its own; those of undoing and redoing it belong behind it, at the marks
-// "undo".
 #include <benchmark/benchmark.h>
 #include <cmath>
 #include <memory>
@@ -95,7 +93,6 @@ void setKeyInOrder(benchmark::State& state) { setKey(state, inOrder(kKeys)); }
 BENCHMARK(setKeyInOrder)->Unit(benchmark::kMillisecond);
 void setKeyAtRandom(benchmark::State& state) { setKey(state, shuffled(kKeys)); }
 BENCHMARK(setKeyAtRandom)->Unit(benchmark::kMillisecond);
-// undo: setKeyInOrder, setKeyAtRandom
 
 // A tenth of the keys of every marker, in 20 ranges.
 void cutKeyRanges(benchmark::State& state) {
@@ -116,7 +113,6 @@ void cutKeyRanges(benchmark::State& state) {
   state.SetItemsProcessed(state.iterations() * kMarkers * kFrames / 10);
 }
 BENCHMARK(cutKeyRanges)->Unit(benchmark::kMillisecond);
-// undo: cutKeyRanges
 
 void reduceTake(benchmark::State& state, Curve curve, Interpolation interpolation) {
   Scene scene(kMarkers);
@@ -142,7 +138,6 @@ BENCHMARK_CAPTURE(reduceTake, walk, Curve::Walk, Interpolation::Linear)->Unit(be
 BENCHMARK_CAPTURE(reduceTake, walkCubic, Curve::Walk, Interpolation::Cubic)->Unit(benchmark::kMillisecond);
 BENCHMARK_CAPTURE(reduceTake, noise, Curve::Noise, Interpolation::Linear)->Unit(benchmark::kMillisecond);
 BENCHMARK_CAPTURE(reduceTake, rest, Curve::Rest, Interpolation::Linear)->Unit(benchmark::kMillisecond);
-// undo: reduceTake
 
 // The decision alone, on long curves: near-linear whatever the curve.
 void redundantKeys(benchmark::State& state, Curve curve, Interpolation interpolation) {

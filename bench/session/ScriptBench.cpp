@@ -1,7 +1,4 @@
-// What a script line costs: the program's plug-in on a session, line by line.
-//
-// Each editing line has a benchmark of its own; those of undoing and redoing it belong behind it, at the
-// marks "undo".
+// What a script line costs, and taking it back: the program's plug-in on a session, line by line.
 #include <benchmark/benchmark.h>
 #include <memory>
 
@@ -30,6 +27,7 @@ class Fixture {
   }
   ~Fixture() { g_db->newScene(); }
 
+  void setUndo(bool on) { m_session.setUndo(on); }
   bool run(std::string const& line) { return !m_session.run(line).failed(); }
 
   NLEClip* clip;
@@ -39,13 +37,24 @@ class Fixture {
   Session m_session;
 };
 
-void runLines(benchmark::State& state, std::vector<std::string> const& lines) {
+// What of lines is timed.
+enum class Timed { Lines, LinesWithJournal, Undo, Redo };
+
+void runLines(benchmark::State& state, std::vector<std::string> const& lines, Timed timed) {
+  const std::string count = " " + std::to_string(lines.size());
   for (auto _ : state) {
     state.PauseTiming();
     auto fixture = std::make_unique<Fixture>();
-    state.ResumeTiming();
+    fixture->setUndo(timed != Timed::Lines);
+    if (timed == Timed::Lines || timed == Timed::LinesWithJournal) state.ResumeTiming();
     for (std::string const& line : lines)
       if (!fixture->run(line)) state.SkipWithError(line.c_str());
+    if (timed == Timed::Undo) state.ResumeTiming();
+    if (timed == Timed::Undo || timed == Timed::Redo) fixture->run("undo" + count);
+    if (timed == Timed::Redo) {
+      state.ResumeTiming();
+      fixture->run("redo" + count);
+    }
     state.PauseTiming();
     fixture.reset();
     state.ResumeTiming();
@@ -60,11 +69,19 @@ std::vector<std::string> setKeyLines(std::vector<int64> const& order) {
   return lines;
 }
 
-void setKeyLineInOrder(benchmark::State& state) { runLines(state, setKeyLines(inOrder(kKeys))); }
-BENCHMARK(setKeyLineInOrder)->Unit(benchmark::kMillisecond);
-void setKeyLineAtRandom(benchmark::State& state) { runLines(state, setKeyLines(shuffled(kKeys))); }
-BENCHMARK(setKeyLineAtRandom)->Unit(benchmark::kMillisecond);
-// undo: setKeyLineInOrder, setKeyLineAtRandom
+void setKeyLineInOrder(benchmark::State& state, Timed timed) {
+  runLines(state, setKeyLines(inOrder(kKeys)), timed);
+}
+void setKeyLineAtRandom(benchmark::State& state, Timed timed) {
+  runLines(state, setKeyLines(shuffled(kKeys)), timed);
+}
+#define LINES_BENCHMARK(name)                                                                   \
+  BENCHMARK_CAPTURE(name, lines, Timed::Lines)->Unit(benchmark::kMillisecond);                  \
+  BENCHMARK_CAPTURE(name, withJournal, Timed::LinesWithJournal)->Unit(benchmark::kMillisecond); \
+  BENCHMARK_CAPTURE(name, undo, Timed::Undo)->Unit(benchmark::kMillisecond);                    \
+  BENCHMARK_CAPTURE(name, redo, Timed::Redo)->Unit(benchmark::kMillisecond)
+LINES_BENCHMARK(setKeyLineInOrder);
+LINES_BENCHMARK(setKeyLineAtRandom);
 
 // Reading and dispatching alone: the cheapest of lines, one that is refused, one with all kinds of values.
 void manyLines(benchmark::State& state, char const* line, bool fails) {
@@ -82,8 +99,9 @@ BENCHMARK_CAPTURE(manyLines, refused, "getNumKeys 1 <1 2 3> [a b c] \"text\" 'mo
     ->Unit(benchmark::kMillisecond);
 
 // One line on a take of 100 markers by 20,000 frames, all selected; `before` is run first.
-void oneLine(benchmark::State& state, char const* before, char const* line, int64 items) {
+void oneLine(benchmark::State& state, char const* before, char const* line, int64 items, Timed timed) {
   Fixture fixture;
+  fixture.setUndo(timed != Timed::Lines);
   std::vector<double> values;
   for (int64 i = 0; i < 20'000; ++i)
     values.insert(values.end(), {1.5 * static_cast<double>(i), 300.0 * ((i / 50) % 2), 7});
@@ -102,18 +120,28 @@ void oneLine(benchmark::State& state, char const* before, char const* line, int6
     }
     fixture.run("select -type Marker");
     if (*before && !fixture.run(before)) return state.SkipWithError(before);
-    state.ResumeTiming();
+    if (timed == Timed::Lines || timed == Timed::LinesWithJournal) state.ResumeTiming();
     if (!fixture.run(line)) return state.SkipWithError(line);
+    if (timed == Timed::Undo) state.ResumeTiming();
+    if (timed == Timed::Undo || timed == Timed::Redo) fixture.run("undo");
+    if (timed != Timed::Redo) continue;
+    state.ResumeTiming();
+    fixture.run("redo");
   }
   state.SetItemsProcessed(state.iterations() * items);
 }
-BENCHMARK_CAPTURE(oneLine, cutKeys, "selectTime 5000 9999", "cutKeys -ranges", 500'000)
-    ->Unit(benchmark::kMillisecond);
-BENCHMARK_CAPTURE(oneLine, reduceKeys, "", "reduceKeys -all", 2'000'000)->Unit(benchmark::kMillisecond);
+void cutKeys(benchmark::State& state, Timed timed) {
+  oneLine(state, "selectTime 5000 9999", "cutKeys -ranges", 500'000, timed);
+}
+LINES_BENCHMARK(cutKeys);
+void reduceKeys(benchmark::State& state, Timed timed) {
+  oneLine(state, "", "reduceKeys -all", 2'000'000, timed);
+}
+LINES_BENCHMARK(reduceKeys);
 // 1,000 selected keys on each of 100 markers.
-BENCHMARK_CAPTURE(oneLine, setProperty, "selectKeys Translation -frames 1 1000",
-                  "setProperty Translation.y 5", 100'000)
-    ->Unit(benchmark::kMillisecond);
-// undo: oneLine
+void setProperty(benchmark::State& state, Timed timed) {
+  oneLine(state, "selectKeys Translation -frames 1 1000", "setProperty Translation.y 5", 100'000, timed);
+}
+LINES_BENCHMARK(setProperty);
 
 }  // namespace
