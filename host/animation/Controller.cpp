@@ -376,7 +376,7 @@ void Controller::setInterpType(int i) {
 
 void Controller::setTrack(NLEClip* clip, int layer, KeyTrack track) {
   assert(track.shape() == shapeOf(getPropertyType()));
-  *editTrack(clip, layer, -kForever, kForever) = std::move(track);
+  replaceTrack(clip, layer) = std::move(track);
   changed();
 }
 

@@ -86,9 +86,10 @@ class Controller : public DataSource {
   virtual int deleteKey(int64 time, unsigned mask);
   virtual int deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers);
   virtual int deleteSelectedKeys(unsigned mask);
-  // Removes the keys in the ranges (sorted and disjoint; the selected keys) that the curve of the layer does not
-  // need within the tolerances, measured against the curve as it is now (KeyReduction.h says how). A marker's
-  // fill type becomes "reduced" at the key before each run that goes. They answer how many keys lost something.
+  // Removes the keys in the ranges (sorted and disjoint; the selected keys) that the curve of the layer does
+  // not need within the tolerances, measured against the curve as it is now (KeyReduction.h says how). A
+  // marker's fill type becomes "reduced" at the key before each run that goes. They answer how many keys lost
+  // something.
   int reduceKeys(std::span<HTimeRange const> ranges, ReductionTolerances const& tolerances);
   int reduceSelectedKeys(ReductionTolerances const& tolerances);
 
@@ -161,9 +162,11 @@ class Controller : public DataSource {
   };
   ClipTrack const* find(NLEClip const* clip, int layer) const;
   // The mutator of a track: that of the active layer, made when there is none, for an edit of keys from
-  // `first` to `last`. Null on the base clip.
+  // `first` to `last`; only at a single time it may add one. Null on the base clip.
   KeyTrack* editTrack(int64 first, int64 last);
   KeyTrack* editTrack(NLEClip* clip, int layer, int64 first, int64 last);
+  // The same for all keys, with keys at other times.
+  KeyTrack& replaceTrack(NLEClip* clip, int layer);
   ClipTrack& clipTrack(NLEClip* clip, int layer);
   // The change of a track in this undo step; null when none is to be recorded.
   KeyChange* changeOf(ClipTrack& track);

@@ -114,6 +114,13 @@ KeyTrack* Controller::editTrack(NLEClip* clip, int layer, int64 first, int64 las
   return &track.track;
 }
 
+KeyTrack& Controller::replaceTrack(NLEClip* clip, int layer) {
+  ClipTrack& track = clipTrack(clip, layer);
+  KeyChange* change = UndoJournal::isRecording() ? changeOf(track) : nullptr;
+  if (change && !change->snapshot) change->takeSnapshot(track.track);
+  return track.track;
+}
+
 KeyTrack* Controller::editTrack(int64 first, int64 last) {
   NLEClip* clip = g_db->getActiveClip();
   return clip && clip->holdsKeys() ? editTrack(clip, g_db->getActiveLayer(), first, last) : nullptr;

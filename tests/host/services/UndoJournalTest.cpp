@@ -65,7 +65,13 @@ class UndoTest : public SceneTest {
     const HTimeRange range(anyTime(), anyTime());
     const auto mask = static_cast<unsigned>(1 + below(7));
     channel.beginDataEdit(range);
-    switch (below(6)) {
+    switch (below(7)) {
+      case 6: {
+        KeyTrack track(Controller::shapeOf(channel.getPropertyType()));
+        for (size_t n = below(80); n-- > 0;) track.set(anyTime(), {uniform(-9, 9), 1, 2, 3});
+        channel.setTrack(g_db->getActiveClip(), g_db->getActiveLayer(), std::move(track));
+        break;
+      }
       case 0:
         channel.deleteKeys(range, mask, below(2) == 0);
         break;
