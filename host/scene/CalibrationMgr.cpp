@@ -2,6 +2,7 @@
 
 #include "host/scene/Database.h"
 #include "host/scene/Devices.h"
+#include "host/scene/SceneIndex.h"
 
 FreeDeviceNumbers::FreeDeviceNumbers() {
   for (Module* camera : g_db->getModulesOfType(&OpticalCamera::s_classOpticalCamera))
@@ -26,5 +27,7 @@ Module* CalibrationMgr::findSystemGroup() {
 void CalibrationMgr::addToSystemGroup(Module* module) {
   Module* group = findSystemGroup();
   if (!group) group = g_db->createModule(&SystemGroup::s_classSystemGroup, "System", nullptr);
-  if (group) group->addChild(module);
+  if (!group || module->getParent() == group) return;
+  const HString name = g_db->getIndex().freeName(group, module->getName());
+  if (group->addChild(module)) module->setName(name);
 }

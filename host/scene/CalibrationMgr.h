@@ -11,7 +11,8 @@ class CalibrationMgr {
  public:
   // The lowest number from 1 that no camera has. Looks at all modules: FreeDeviceNumbers serves many cameras.
   uint32 getNextAvailableDeviceID() const;
-  // Hangs a module under the system group, which is made ("System") when there is none.
+  // Hangs a module under the system group, which is made ("System") when there is none, with a name that its
+  // siblings do not have there.
   void addToSystemGroup(Module* module);
 
  private:

@@ -190,7 +190,7 @@ class Baking {
 
   Times const& frameTimes(Node const* parent);
   Times timesOf(Marker const& marker, bool moves);
-  bool isMeasured(Marker const& marker, Times const& own) const;
+  bool isMeasured(Marker const& marker) const;
   void put(NewTrack& made) const;
 
   NLEClip* m_clip;
@@ -216,23 +216,23 @@ Times const& Baking::frameTimes(Node const* parent) {
   return times;
 }
 
-bool Baking::isMeasured(Marker const& marker, Times const& own) const {
-  if (!own.empty()) {
-    Controller const* fillType = marker.getChannel("FillType");
-    if (fillType && fillType->hasKeysInClip(m_clip)) return true;
-    for (size_t i = 1; i < own.size(); ++i)
-      if (own[i] - own[i - 1] <= kSlowestSampling) return true;
-    return false;
-  }
-  // A point that was never seen has a track without keys.
-  return marker.getTranslationChannel()->findTrack(m_clip, 0) != nullptr;
+// By its lowest layer: those above hold edits.
+bool Baking::isMeasured(Marker const& marker) const {
+  KeyTrack const* track = marker.getTranslationChannel()->findTrack(m_clip, 0);
+  if (!track) return false;
+  if (track->empty()) return true;  // a point that was never seen
+  Controller const* fillType = marker.getChannel("FillType");
+  if (fillType && fillType->hasKeysInClip(m_clip)) return true;
+  for (int64 i = 1; i < track->count(); ++i)
+    if (track->timeAt(i) - track->timeAt(i - 1) <= kSlowestSampling) return true;
+  return false;
 }
 
 Times Baking::timesOf(Marker const& marker, bool moves) {
   Times own = keyTimes(*marker.getTranslationChannel(), m_clip);
   if (!moves) return own;
   Times const& follow = frameTimes(marker.getNodeParent());
-  if (!isMeasured(marker, own)) return merged(own, follow);
+  if (!isMeasured(marker)) return merged(own, follow);
   if (!marker.getChannel("FillType")) return own;
   // Between a key that stands for reduced ones and the next key there is data.
   Times reduced;
