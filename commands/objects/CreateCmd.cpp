@@ -35,19 +35,19 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
                        kMultiple = info.option("multiple");
 
   bool execute(Given const& given, Args const& args, Variable&) override {
-    Order order;
-    if (!order.read(given)) return false;
+    Request request;
+    if (!request.read(given)) return false;
     const HString typeName = args[0].getStringValue(-1);
     HRuntimeClass* type = typeToCreate(typeName);
     if (!type) return false;
 
     TSimpleArray<Module*> created;
     std::optional<FreeDeviceNumbers> deviceNumbers;  // once for all cameras
-    for (HString const& name : namesToCreate(args, order.multiple)) {
-      Module* module = g_db->createModule(type, name.GetStr(), order.parent);
+    for (HString const& name : namesToCreate(args, request.multiple)) {
+      Module* module = g_db->createModule(type, name.GetStr(), request.parent);
       if (!module) continue;
-      if (auto* node = objectAs<Node>(module); node && order.parent) order.place(*node);
-      if (auto* camera = objectAs<OpticalCamera>(module); camera && !order.parent) {
+      if (auto* node = objectAs<Node>(module); node && request.parent) request.place(*node);
+      if (auto* camera = objectAs<OpticalCamera>(module); camera && !request.parent) {
         g_db->getCalibrationMgr()->addToSystemGroup(camera);
         if (!deviceNumbers) deviceNumbers.emplace();
         camera->setDeviceID(deviceNumbers->take());
@@ -59,9 +59,9 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
       return false;
     }
 
-    if (!order.addSelect) g_db->selectAllModules(false);
+    if (!request.addSelect) g_db->selectAllModules(false);
     for (Module* module : created) {
-      for (NLEClip* clip : order.inactiveClips) module->addToClip(clip);
+      for (NLEClip* clip : request.inactiveClips) module->addToClip(clip);
       module->setSelected(true);
     }
     return true;
@@ -69,7 +69,7 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
 
  private:
   // What the options ask for.
-  struct Order {
+  struct Request {
     bool addSelect = false;
     Module* parent = nullptr;
     Vec3 preTranslation, preRotation;  // the rotation in degrees

@@ -10,6 +10,7 @@
 //
 // Below parents that stand still in a clip the keys stay and their values change. Below moving ones each
 // channel gets keys, in the lowest layer, at its own key times and at those of the parents with the whole
-// frames between; but where a measured marker was not seen it gets no key, and so moves as it likes. The
-// selection of keys is kept. A blend of clips in which the parents move differently is not reproduced.
+// frames between. A measured marker gets no key where it was not seen, so that its gaps stay gaps; between
+// its keys there it moves straight. The selection of keys is kept. In a blend of clips motion is kept only
+// below parents that stand still.
 void keepMotionAsRoots(std::vector<Marker*> const& markers);

@@ -90,6 +90,8 @@ TEST_F(SubjectTest, BelowACharacterThatStandsStill) {
     animate(direct, clip, 1, 3);
     animate(direct, other, 0, 10);
     direct->getScaleChannel()->setTrack(clip, 1, *direct->getTranslationChannel()->findTrack(clip, 1));
+    direct->getTranslationChannel()->setInterpType(static_cast<int>(Interpolation::Cubic));
+    direct->getRotationChannel()->setInterpType(static_cast<int>(Interpolation::Cubic));
     const std::vector<Marker*> markers{direct, deep, nested};
     const auto before = sampled(markers, {-3, 0, 0.5, 7.3, 21, 40, 50});
     // Components keyed one by one are right at the keys.
