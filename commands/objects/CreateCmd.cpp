@@ -1,8 +1,8 @@
+#include <algorithm>
 #include <optional>
 
 #include "commands/ChannelValues.h"
 #include "host/animation/Clips.h"
-#include "host/base/HStringArray.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/CalibrationMgr.h"
 #include "host/scene/Database.h"
@@ -41,19 +41,7 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
     HRuntimeClass* type = typeToCreate(typeName);
     if (!type) return false;
 
-    TSimpleArray<Module*> created;
-    std::optional<FreeDeviceNumbers> deviceNumbers;  // once for all cameras
-    for (HString const& name : namesToCreate(args, request.multiple)) {
-      Module* module = g_db->createModule(type, name.GetStr(), request.parent);
-      if (!module) continue;
-      if (auto* node = objectAs<Node>(module); node && request.parent) request.place(*node);
-      if (auto* camera = objectAs<OpticalCamera>(module); camera && !request.parent) {
-        g_db->getCalibrationMgr()->addToSystemGroup(camera);
-        if (!deviceNumbers) deviceNumbers.emplace();
-        camera->setDeviceID(deviceNumbers->take());
-      }
-      created.add(module);
-    }
+    const TSimpleArray<Module*> created = makeModules(type, args, request);
     if (created.getCount() == 0) {
       logError("Unknown module type name: %s", typeName.GetStr());  // kept: whatever the reason was
       return false;
@@ -144,12 +132,24 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
     return type;
   }
 
-  // All names once, then the first one again until there are `multiple` of it.
-  static HStringArray namesToCreate(Args const& args, int multiple) {
-    HStringArray names;
-    for (int i = 1; i < args.getCount(); ++i) names.add(args[i].getStringValue(-1));
-    for (int i = 1; i < multiple; ++i) names.add(args[1].getStringValue(-1));
-    return names;
+  static TSimpleArray<Module*> makeModules(HRuntimeClass* type, Args const& args, Request const& request) {
+    TSimpleArray<Module*> created;
+    std::optional<FreeDeviceNumbers> deviceNumbers;  // once for all cameras
+    // All names once, then the first one again until there are `multiple` of it.
+    const int names = args.getCount() - 1;
+    for (int64 i = 0; i < names + std::max<int64>(0, int64{request.multiple} - 1); ++i) {
+      char const* name = args[i < names ? static_cast<int>(i) + 1 : 1].getStringValue(-1);
+      Module* module = g_db->createModule(type, name, request.parent);
+      if (!module) continue;
+      if (auto* node = objectAs<Node>(module); node && request.parent) request.place(*node);
+      if (auto* camera = objectAs<OpticalCamera>(module); camera && !request.parent) {
+        g_db->getCalibrationMgr()->addToSystemGroup(camera);
+        if (!deviceNumbers) deviceNumbers.emplace();
+        camera->setDeviceID(deviceNumbers->take());
+      }
+      created.add(module);
+    }
+    return created;
   }
 };
 
