@@ -134,7 +134,7 @@ void Duplication::copyNode(Node const& original, Node& copy) const {
   for (int i = 0; i < original.getNumConnectingLines(); ++i) {
     MarkerConnection const& line = original.getConnectingLine(i);
     MarkerConnection own(static_cast<Node*>(counterpart(line.getTarget())));
-    own.setConnectingColor(MarkerConnection(line).getConnectingColor());
+    own.setConnectingColor(line.getConnectingColor());
     copy.addConnectingLine(own);
   }
 }

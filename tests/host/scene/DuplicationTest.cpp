@@ -1,7 +1,6 @@
 // Copies have all that their originals have, and the relations of the selection become their own.
 #include <map>
 
-#include "host/scene/Devices.h"
 #include "tests/host/scene/SceneFixture.h"
 
 namespace {
@@ -184,19 +183,6 @@ TEST_F(DuplicationTest, ClipsWithTheirKeysAndLayers) {
   EXPECT_EQ(marker->getLocalPos(0), Vec3(1, 0, 0));
   g_db->setActiveClip(clip);
   EXPECT_EQ(marker->getLocalPos(0), Vec3(11, 0, 0)) << "the clips have parted";
-}
-
-TEST_F(DuplicationTest, DevicesAndSingleObjects) {
-  auto* group = create<SystemGroup>("System");
-  auto *first = create<OpticalCamera>("a", group), *unnumbered = create<OpticalCamera>("b", group);
-  first->setDeviceID(4);
-  for (Module* module : std::initializer_list<Module*>{first, group, unnumbered}) module->setSelected(true);
-  g_db->duplicateSelectedObjects();
-  ASSERT_EQ(g_db->getNumSelectedModules(), 2);
-  auto* copy = static_cast<OpticalCamera*>(g_db->getSelectedModule(0));
-  EXPECT_EQ(copy->getParent(), group) << "the group was not copied";
-  EXPECT_EQ(copy->getDeviceID(), 1);
-  EXPECT_EQ(static_cast<OpticalCamera*>(g_db->getSelectedModule(1))->getDeviceID(), 0);
 }
 
 }  // namespace
