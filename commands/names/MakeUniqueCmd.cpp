@@ -25,7 +25,7 @@ NumberedName split(std::string_view name) {
   const size_t last = name.find_last_not_of("0123456789");
   const bool numbered = last != std::string_view::npos && last > 0 && last + 1 < name.size();
   int64 number = 0;
-  if (!numbered || name[last - 1] != '_' || name.size() - last > kMostDigits) return {name, 0};
+  if (!numbered || name[last - 1] != '_' || name.size() - last - 1 > kMostDigits) return {name, 0};
   std::from_chars(name.data() + last + 1, name.data() + name.size(), number);
   return {name.substr(0, last - 1), number};
 }

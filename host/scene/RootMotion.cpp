@@ -210,8 +210,8 @@ Times const& Baking::frameTimes(Node const* parent) {
   const int64 first = times.front() / period, last = times.back() / period;
   const size_t keys = times.size();
   if (last - first > kMostFrames) return times;
-  for (int64 frame = first; frame <= last; ++frame)
-    if (frame * period >= times[0] && frame * period <= times[keys - 1]) times.push_back(frame * period);
+  for (int64 time = first * period; time <= last * period; time += period)
+    if (time > times[0] && time < times[keys - 1]) times.push_back(time);
   sortTimes(times);
   return times;
 }
@@ -342,11 +342,12 @@ void keepMotionAsRoots(std::vector<Marker*> const& markers) {
     Baking baking(clip);
     for (auto const& [marker, frame] : concerned) {
       const bool moves = (frame->moving & bit) != 0;
+      if (!moves && frame->isWorld()) continue;
       if (moves || hasPartialKeys(*marker->getTranslationChannel(), clip) ||
           hasPartialKeys(*marker->getScaleChannel(), clip)) {
         active.use(clip);
         baking.bake(*marker, *frame, moves);
-      } else if (!frame->isWorld()) {
+      } else {
         moveKeys(*marker, frame->still, clip);
       }
     }
