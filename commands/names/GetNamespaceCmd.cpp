@@ -1,8 +1,9 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "commands/names/Namespaces.h"
 
 namespace {
 
-class GetNamespaceCmd final : public PendingCommand<GetNamespaceCmd> {
+class GetNamespaceCmd final : public ScriptCommand<GetNamespaceCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getNamespace",
                                        .displayName = "Get Namespace",
@@ -11,6 +12,15 @@ class GetNamespaceCmd final : public PendingCommand<GetNamespaceCmd> {
                                        .options = {{"onMod", 1, Variable::String}},
                                        .returns = Variable::String,
                                        .solo = Solo::no};
+  static constexpr int kOnMod = info.option("onMod");
+
+  bool execute(Given const& given, Args const&, Variable& result) override {
+    Module const* module = moduleToRead(given, kOnMod);
+    if (!module) return false;
+    HString name;
+    module->getNamespace(name);
+    return answer(result, name.GetStr());
+  }
 };
 
 }  // namespace

@@ -1,8 +1,9 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "commands/names/Namespaces.h"
 
 namespace {
 
-class GetNamespacesCmd final : public PendingCommand<GetNamespacesCmd> {
+class GetNamespacesCmd final : public ScriptCommand<GetNamespacesCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getNamespaces",
                                        .displayName = "Get Namespace",
@@ -11,6 +12,17 @@ class GetNamespacesCmd final : public PendingCommand<GetNamespacesCmd> {
                                        .options = {{"onMod", 1, Variable::String}},
                                        .returns = Variable::StringArray,
                                        .solo = Solo::no};
+  static constexpr int kOnMod = info.option("onMod");
+
+  bool execute(Given const& given, Args const&, Variable& result) override {
+    Module const* module = moduleToRead(given, kOnMod);
+    if (!module) return false;
+    TArray<HString> names;
+    module->getNamespaces(names);
+    Variable list(Variable::StringArray, names.getCount());
+    for (int i = 0; i < names.getCount(); ++i) list.setValue(names[i].GetStr(), i);
+    return answer(result, list);
+  }
 };
 
 }  // namespace

@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "commands/names/Namespaces.h"
 
 namespace {
 
-class RemoveNamespaceCmd final : public PendingCommand<RemoveNamespaceCmd> {
+class RemoveNamespaceCmd final : public ScriptCommand<RemoveNamespaceCmd> {
  public:
   static constexpr CommandInfo info = {.name = "removeNamespace",
                                        .displayName = "Remove Namespace",
@@ -11,6 +11,12 @@ class RemoveNamespaceCmd final : public PendingCommand<RemoveNamespaceCmd> {
                                        .args = {"namespace", 1, 1, {Variable::String}},
                                        .options = {{"onMod", 1, Variable::String}},
                                        .solo = Solo::no};
+  static constexpr int kOnMod = info.option("onMod");
+
+  bool execute(Given const& given, Args const& args, Variable&) override {
+    const HString name = args[0].getStringValue(-1);
+    return changeNamespaces(given, kOnMod, [&](Module& module) { return module.removeNamespace(name); });
+  }
 };
 
 }  // namespace

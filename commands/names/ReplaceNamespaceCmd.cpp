@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "commands/names/Namespaces.h"
 
 namespace {
 
-class ReplaceNamespaceCmd final : public PendingCommand<ReplaceNamespaceCmd> {
+class ReplaceNamespaceCmd final : public ScriptCommand<ReplaceNamespaceCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "replaceNamespace",
@@ -12,6 +12,13 @@ class ReplaceNamespaceCmd final : public PendingCommand<ReplaceNamespaceCmd> {
       .args = {"oldNamespace newNamespace", 2, 2, {Variable::String, Variable::String}},
       .options = {{"onMod", 1, Variable::String}},
       .solo = Solo::no};
+  static constexpr int kOnMod = info.option("onMod");
+
+  bool execute(Given const& given, Args const& args, Variable&) override {
+    const HString former = args[0].getStringValue(-1), name = args[1].getStringValue(-1);
+    return changeNamespaces(given, kOnMod,
+                            [&](Module& module) { return module.replaceNamespace(former, name); });
+  }
 };
 
 }  // namespace

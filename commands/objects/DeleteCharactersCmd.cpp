@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
+#include "host/scene/SubjectManager.h"
 
 namespace {
 
-class DeleteCharactersCmd final : public PendingCommand<DeleteCharactersCmd> {
+class DeleteCharactersCmd final : public ScriptCommand<DeleteCharactersCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "deleteCharacters",
@@ -10,6 +12,30 @@ class DeleteCharactersCmd final : public PendingCommand<DeleteCharactersCmd> {
       .category = "Data Editing",
       .purpose = "Deletes the selected characters, or all, with their setups.",
       .options = {{"all"}, {"keepLabels"}}};
+  static constexpr int kAll = info.option("all"), kKeepLabels = info.option("keepLabels");
+
+  bool execute(Given const& given, Args const&, Variable&) override {
+    SubjectManager* subjects = g_db->getSubjectManager();
+    const GivenOptions options(given);
+    const bool all = options.has(kAll);
+    if (subjects->getNumSelectedSubjects() == 0 && !all) {
+      logWarning("No Characters selected for deletion");
+      return true;
+    }
+    if (all) {
+      const int count = static_cast<int>(subjects->getNumSubjects());
+      subjects->removeAllSubjects(true, true, true);  // kept: labels go even with "-keepLabels"
+      logInfo("%d Characters deleted", count);
+      return true;
+    }
+    TSimpleArray<Character*> selected;
+    for (uint64 i = 0; i < subjects->getNumSelectedSubjects(); ++i)
+      selected.add(subjects->getSelectedSubject(i));
+    for (Character* subject : selected)
+      subjects->removeSubject(subject, !options.has(kKeepLabels), true, true);
+    logInfo("%d Characters deleted", selected.getCount());
+    return true;
+  }
 };
 
 }  // namespace

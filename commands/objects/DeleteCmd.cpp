@@ -1,8 +1,11 @@
-#include "commands/PendingCommand.h"
+#include <algorithm>
+
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
 
 namespace {
 
-class DeleteCmd final : public PendingCommand<DeleteCmd> {
+class DeleteCmd final : public ScriptCommand<DeleteCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "delete",
@@ -10,6 +13,40 @@ class DeleteCmd final : public PendingCommand<DeleteCmd> {
       .category = "Data Editing",
       .purpose = "Deletes the selected modules, or all, with everything below them.",
       .options = {{"all", 0, Variable::None, 2}, {"primary", 0, Variable::None, 1}}};
+  static constexpr int kAll = info.option("all"), kPrimary = info.option("primary");
+
+  bool execute(Given const& given, Args const&, Variable&) override {
+    const GivenOptions options(given);
+    const bool all = options.has(kAll);
+    if (g_db->getNumSelectedModules() == 0 && !all) {
+      logWarning("No items selected for deletion");
+      return true;
+    }
+    const TSimpleArray<Module*> modules = modulesToDelete(all, options.has(kPrimary));
+
+    const bool autoUpdate = g_db->getAutoUpdateProperties();
+    g_db->setAutoUpdateProperties(false);
+    // One that went along with its parent is no longer in the scene, which is no matter.
+    for (Module* module : modules) g_db->removeFromScene(module, true, true, true, true);
+    g_db->setAutoUpdateProperties(autoUpdate);
+
+    logInfo("%d items deleted", modules.getCount());  // kept: without what went along
+    return true;
+  }
+
+ private:
+  static TSimpleArray<Module*> modulesToDelete(bool all, bool primary) {
+    const int most = std::max(1, all ? g_db->getNumModules() : g_db->getNumSelectedModules());
+    TSimpleArray<Module*> modules(most, most);
+    if (all) {
+      for (int i = 0; i < g_db->getNumModules(); ++i) modules.add(g_db->getModule(i));
+    } else if (primary) {
+      if (Module* module = g_db->getPrimarySelectedModule()) modules.add(module);
+    } else {
+      for (int i = 0; i < g_db->getNumSelectedModules(); ++i) modules.add(g_db->getSelectedModule(i));
+    }
+    return modules;
+  }
 };
 
 }  // namespace

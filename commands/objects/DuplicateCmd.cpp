@@ -1,14 +1,20 @@
-#include "commands/PendingCommand.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
 
 namespace {
 
-class DuplicateCmd final : public PendingCommand<DuplicateCmd> {
+class DuplicateCmd final : public ScriptCommand<DuplicateCmd> {
  public:
   static constexpr CommandInfo info = {.name = "duplicate",
                                        .displayName = "Duplicate Object",
                                        .category = "Data Editing",
                                        .purpose = "Makes a copy of every selected module.",
                                        .solo = Solo::yes};
+
+  bool execute(Given const&, Args const&, Variable&) override {
+    g_db->duplicateSelectedObjects();
+    return true;
+  }
 };
 
 }  // namespace

@@ -1,25 +1,33 @@
 #include "host/scene/CalibrationMgr.h"
 
-#include <algorithm>
-#include <vector>
-
 #include "host/scene/Database.h"
 #include "host/scene/Devices.h"
+#include "host/scene/SceneIndex.h"
 
-uint32 CalibrationMgr::getNextAvailableDeviceID() const {
-  std::vector<int> taken;
+FreeDeviceNumbers::FreeDeviceNumbers() {
   for (Module* camera : g_db->getModulesOfType(&OpticalCamera::s_classOpticalCamera))
-    taken.push_back(static_cast<OpticalCamera*>(camera)->getDeviceID());
-  std::sort(taken.begin(), taken.end());
-  int next = 1;
-  for (const int id : taken)
-    if (id == next) ++next;
-  return static_cast<uint32>(next);
+    m_taken.insert(static_cast<uint32>(static_cast<OpticalCamera*>(camera)->getDeviceID()));
+}
+
+uint32 FreeDeviceNumbers::take() {
+  while (m_taken.contains(m_next)) ++m_next;
+  return m_next++;
+}
+
+uint32 CalibrationMgr::getNextAvailableDeviceID() const { return FreeDeviceNumbers().take(); }
+
+Module* CalibrationMgr::findSystemGroup() {
+  Module* group = g_db->getModule(m_systemGroup);
+  if (group || !g_db->moduleOfTypeExists(&SystemGroup::s_classSystemGroup)) return group;
+  group = g_db->getModulesOfType(&SystemGroup::s_classSystemGroup)[0];
+  m_systemGroup = group->getID();
+  return group;
 }
 
 void CalibrationMgr::addToSystemGroup(Module* module) {
-  TSimpleArray<Module*> groups = g_db->getModulesOfType(&SystemGroup::s_classSystemGroup);
-  Module* group =
-      groups.getCount() ? groups[0] : g_db->createModule(&SystemGroup::s_classSystemGroup, "System", nullptr);
-  if (group) group->addChild(module);
+  Module* group = findSystemGroup();
+  if (!group) group = g_db->createModule(&SystemGroup::s_classSystemGroup, "System", nullptr);
+  if (!group || module->getParent() == group) return;
+  const HString name = g_db->getIndex().freeName(group, module->getName());
+  if (group->addChild(module)) module->setName(name);
 }

@@ -1,14 +1,33 @@
 // The capture system: the one group above the cameras and the numbers of its devices.
 #pragma once
 
-#include "host/base/Types.h"
+#include <unordered_set>
+
+#include "host/control/ControlID.h"
 
 class Module;
 
 class CalibrationMgr {
  public:
-  // The lowest number from 1 that no camera has.
+  // The lowest number from 1 that no camera has. Looks at all modules: FreeDeviceNumbers serves many cameras.
   uint32 getNextAvailableDeviceID() const;
-  // Hangs a module under the system group, which is made ("System") when there is none.
+  // Hangs a module under the system group, which is made ("System") when there is none, with a name that its
+  // siblings do not have there.
   void addToSystemGroup(Module* module);
+
+ private:
+  Module* findSystemGroup();
+
+  ControlID m_systemGroup{ControlID::CreateBlank};  // as last seen
+};
+
+// Hands out the numbers that no camera had when this was made, lowest first, each once.
+class FreeDeviceNumbers {
+ public:
+  FreeDeviceNumbers();
+  uint32 take();
+
+ private:
+  std::unordered_set<uint32> m_taken;
+  uint32 m_next = 1;
 };

@@ -38,6 +38,11 @@ class Database {
   // releaseRemoved. False when it is not in the scene. The flags: with its children, from the selection,
   // undoable, notify; children always go with it.
   bool removeFromScene(Module* module, bool children, bool deselect, bool undoable, bool notify);
+  // Copies the selected modules with all that they hold, clips with their keys on every module; children only
+  // when they are selected. A copy stands below the copy of its original's parent when there is one, else
+  // below that parent itself, under a name that its siblings do not have. The copies become the selection.
+  // One that would pass a limit of the scene is left out with a warning.
+  void duplicateSelectedObjects();
   // Destroys what was removed since; whoever runs commands calls it after each line.
   void releaseRemoved();
 

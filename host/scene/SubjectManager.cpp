@@ -1,6 +1,8 @@
 #include "host/scene/SubjectManager.h"
 
 #include "host/scene/Database.h"
+#include "host/scene/RootMotion.h"
+#include "host/scene/SceneIndex.h"
 
 Character* SubjectManager::getSubject(HString const& name) const {
   for (int i = 0; i < m_subjects.getCount(); ++i)
@@ -14,4 +16,29 @@ uint64 SubjectManager::getNumSelectedSubjects() const {
 
 Character* SubjectManager::getSelectedSubject(uint64 i) const {
   return g_db->getSelection().getCharacter(static_cast<int>(i));
+}
+
+bool SubjectManager::removeSubject(Character* subject, bool removeLabels, bool undoable, bool notify) {
+  if (!subject || !subject->isInScene()) return false;
+  TSimpleArray<Module*> all(64, 4096);
+  subject->getModAndDecedents(all);
+  std::vector<Marker*> markers;
+  for (Module* module : all)
+    if (auto* marker = objectAs<Marker>(module)) markers.push_back(marker);
+
+  keepMotionAsRoots(markers);
+  const HString name = subject->getName();
+  for (Marker* marker : markers) {
+    marker->getParent()->removeChild(marker, false);
+    // A namespace that the marker has already, or a name that can be none, is not put in front.
+    if (removeLabels)
+      marker->setName(g_db->getIndex().freeName(nullptr, "unlabeled"));
+    else
+      marker->addNamespace(name);
+  }
+  return g_db->removeFromScene(subject, true, true, undoable, notify);
+}
+
+void SubjectManager::removeAllSubjects(bool removeLabels, bool undoable, bool notify) {
+  for (Character* subject : m_subjects.toVector()) removeSubject(subject, removeLabels, undoable, notify);
 }

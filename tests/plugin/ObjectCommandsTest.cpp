@@ -1,0 +1,109 @@
+// Creating below a parent, and unique paths against the rule taken literally.
+#include <algorithm>
+#include <random>
+
+#include "tests/plugin/SceneFixture.h"
+
+namespace {
+
+class ObjectCommands : public SceneFixture {
+ protected:
+  static std::vector<std::string> names() {
+    std::vector<std::string> all;
+    for (int i = 0; i < g_db->getNumModules(); ++i) all.push_back(g_db->getModule(i)->getName().GetString());
+    return all;
+  }
+};
+
+TEST_F(ObjectCommands, OffsetsCountBelowAParentOnly) {
+  make("parent");
+  const Vec3 offset(1, 2, 3), quarter(90, 0, 0);
+  const auto created = [&](std::vector<GivenOption> options) {
+    EXPECT_EQ(run("create", {"Node", "node"}, options).find("failed"), std::string::npos);
+    return static_cast<Node*>(g_db->getPrimarySelectedModule());
+  };
+  Node const* root = created({{"preTranslation", {offset}}, {"preRotation", {quarter}}});
+  EXPECT_TRUE(root->getPreTranslation() == Vec3() && root->getPreRotation() == TalixRotation());
+  Node const* child =
+      created({{"preTranslation", {offset}}, {"parent", {"parent"}}, {"preRotation", {quarter}}});
+  EXPECT_EQ(child->getPreTranslation(), offset);
+  Vec3 angles;
+  child->getPreRotation().getAsEuler(TalixRotation::XYZ, angles);
+  EXPECT_NEAR((angles - Vec3(std::acos(0), 0, 0)).length(), 0, 1e-12);
+  Node const* later =
+      created({{"parent", {"parent"}}, {"positionOffset", {quarter}}, {"preTranslation", {offset}}});
+  EXPECT_EQ(later->getPreTranslation(), offset);
+  Node const* former = created({{"parent", {"parent"}},
+                                {"preTranslation", {quarter}},
+                                {"preRotation", {quarter}},
+                                {"rotationOffset", {Vec3()}},
+                                {"positionOffset", {offset}}});
+  EXPECT_EQ(former->getPreTranslation(), offset);
+  EXPECT_EQ(former->getPreRotation(), TalixRotation());
+}
+
+// The rule step by step: a list of seen paths, every candidate tried from the start.
+void makeUniqueLiterally() {
+  std::vector<HString> seen;
+  const int count = g_db->getNumModules();
+  for (int i = 0; i < count; ++i) {
+    Module* module = g_db->getModule(i);
+    const HString path = module->getFullPathString();
+    if (std::find(seen.begin(), seen.end(), path) == seen.end()) {
+      seen.push_back(path);
+      continue;
+    }
+    const HString name = module->getName();
+    const int length = name.GetLength();
+    int last = length - 1;
+    while (last >= 0 && name[last] >= '0' && name[last] <= '9') --last;
+    HString base = name;
+    int number = 0;
+    if (last != length - 1 && last > 0 && name[last - 1] == '_') {
+      base = name.Left(static_cast<uint64>(last - 1));
+      number = std::stoi(name.Right(static_cast<uint64>(length - last - 1)).GetString());
+    }
+    const HString parent = module->getParent() ? module->getParent()->getFullPathString() : HString();
+    HString candidate;
+    do candidate.Format("%s_%d", base.GetStr(), ++number);
+    while (g_db->getModuleWithPath(parent + "\\" + candidate, nullptr, false));
+    module->setName(candidate);
+  }
+}
+
+TEST_F(ObjectCommands, UniquePathsFollowTheRule) {
+  // Parents made before and after their children, names that are one another's candidates.
+  const auto build = [&](unsigned seed) {
+    static constexpr char const* kNames[] = {"a",    "a_1", "a_2", "a_x1", "a_x2",
+                                             "a__1", "7",   "_2",  "a_3",  "a_y2"};
+    std::mt19937 random(seed);
+    const auto below = [&](size_t end) { return std::uniform_int_distribution<size_t>(0, end - 1)(random); };
+    g_db->newScene();
+    std::vector<Module*> modules;
+    const size_t names = 1 + below(10);
+    for (size_t i = 0; i < 60; ++i) modules.push_back(make("x"));
+    for (Module* module : modules) module->setName(kNames[below(names)]);
+    for (size_t i = 0; i < 40; ++i) modules[below(modules.size())]->addChild(modules[below(modules.size())]);
+  };
+  for (unsigned seed = 0; seed < 300; ++seed) {
+    build(seed);
+    makeUniqueLiterally();
+    const std::vector<std::string> expected = names();
+    build(seed);
+    ASSERT_NE(expected, names());
+    EXPECT_EQ(run("makeUnique"), "nothing");
+    ASSERT_EQ(names(), expected) << seed;
+  }
+}
+
+TEST_F(ObjectCommands, HugeNumbersInNames) {
+  for (char const* name : {"a_b2147483647", "a_b99999999999999999999"}) {
+    make(name);
+    make("x")->setName(name);
+  }
+  EXPECT_EQ(run("makeUnique"), "nothing");
+  EXPECT_EQ(names(), (std::vector<std::string>{"a_b2147483647", "a_2147483648", "a_b99999999999999999999",
+                                               "a_b99999999999999999999_1"}));
+}
+
+}  // namespace
