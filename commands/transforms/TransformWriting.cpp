@@ -19,8 +19,10 @@ bool readWrite(Given const& given, Args const& args, WriteOptions const& which, 
 }
 
 bool areFinite(Vec3 const& values, char const* command) {
-  // By the length, which a rotation vector is taken by.
-  if (std::isfinite(values.length())) return true;
+  // The length as well: a rotation vector is taken by it.
+  if (std::isfinite(values.x) && std::isfinite(values.y) && std::isfinite(values.z) &&
+      std::isfinite(values.length()))
+    return true;
   Command::logError("%s needs finite numbers.", command);
   return false;
 }
