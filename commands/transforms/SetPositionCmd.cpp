@@ -20,32 +20,33 @@ class SetPositionCmd final : public ScriptCommand<SetPositionCmd> {
   bool execute(Given const& given, Args const& args, Variable&) override;
 };
 
-void writePosition(TransformWrite const& write) {
+// False when nothing could be written.
+bool writePosition(TransformWrite const& write) {
   Node& node = *write.node;
   if (write.preTransform) {
     write.world ? node.setPreTranslationWS(write.vector)
                 : static_cast<void>(node.setPreTranslation(write.vector));
-    return;
+    return true;
   }
   Controller* channel = node.getTranslationChannel();
   if (write.byDefault) {
     channel->beginDefaultEdit();
     write.world ? node.setConstWSPos(write.vector) : node.setConstLocalPos(write.vector);
   } else {
-    if (!isWritable(channel)) return;
+    if (!isWritable(channel)) return false;
     channel->beginDataEdit(write.edited());
     write.world ? node.setWSPos(write.time, write.vector) : node.setLocalPos(write.time, write.vector);
   }
   channel->endDataEdit();
+  return true;
 }
 
 bool SetPositionCmd::execute(Given const& given, Args const& args, Variable&) {
   TransformWrite write;
   if (!readWrite(given, args, kOptions, info.name, write)) return false;
-  writePosition(write);
+  auto* marker = objectAs<Marker>(write.node);
   // Kept: whatever the options were.
-  if (auto* marker = objectAs<Marker>(write.node))
-    marker->setFillType(write.time, Marker::EditedByHand, true);
+  if (writePosition(write) && marker) marker->setFillType(write.time, Marker::EditedByHand, true);
   return true;
 }
 

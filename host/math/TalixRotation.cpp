@@ -27,7 +27,8 @@ void set(TalixRotation& rotation, Quat const& q) {
   rotation.setQuaternion(xyzw);
 }
 
-double withinHalfTurn(double angle) { return std::remainder(angle, 2 * std::numbers::pi); }
+// Never -0.
+double withinHalfTurn(double angle) { return std::remainder(angle, 2 * std::numbers::pi) + 0.0; }
 
 }  // namespace
 
