@@ -8,16 +8,18 @@
 
 namespace {
 
-// The keys that a node has in the active clip, whatever the layer.
+// The keys that a node's transform has in the active clip, whatever the layer.
 class NodeKeys {
  public:
   explicit NodeKeys(Node const* node) {
     NLEClip const* clip = g_db->getActiveClip();
-    Controller const* channel = node->getTransformChannel();
     if (!clip) return;
-    m_range = channel->getKeyRangeInClip(clip);
-    for (int layer = 0; layer < clip->getNumLayers(); ++layer)
-      if (KeyTrack const* track = channel->findTrack(clip, layer)) m_tracks.push_back(track);
+    for (Controller const* channel : std::initializer_list<Controller const*>{
+             node->getTranslationChannel(), node->getRotationChannel(), node->getScaleChannel()}) {
+      m_range.include(channel->getKeyRangeInClip(clip));
+      for (int layer = 0; layer < clip->getNumLayers(); ++layer)
+        if (KeyTrack const* track = channel->findTrack(clip, layer)) m_tracks.push_back(track);
+    }
   }
   HTimeRange range() const { return m_range; }
   bool at(int64 time) const {

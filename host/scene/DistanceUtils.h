@@ -2,7 +2,8 @@
 //
 // Statistics measure once a frame: at the times that are a whole number of steps from time 0 and lie in the
 // range, or in one of the ranges; where ranges overlap a time counts once for each. mustHaveKeys: only where
-// both nodes have a key at that very time on their transform channels, in any layer of the active clip.
+// both nodes have a key at that very time, on their translation, rotation or scale, in any layer of the
+// active clip.
 // Where nothing is measured the answer is 0. The standard deviation is that of all that was measured
 // (divided by the count).
 //

@@ -19,16 +19,21 @@ class DistanceTest : public SceneTest {
       for (int frame = -20; frame < 40; ++frame) {
         if (below(3) == 0) continue;
         g_db->setActiveLayer(static_cast<int>(below(2)));
-        node->setLocalPos(frame * kFrame, randomVec(500));
+        // What turns has keys as well as what moves.
+        if (below(4))
+          node->setLocalPos(frame * kFrame, randomVec(500));
+        else
+          node->setLocalRot(frame * kFrame, randomRotation());
       }
   }
 
   bool hasKey(Node const* node, int64 time) const {
     bool found = false;
-    for (int layer = 0; layer < 2; ++layer) {
-      KeyTrack const* track = node->getTranslationChannel()->findTrack(m_clip, layer);
-      found = found || (track && track->find(time) >= 0);
-    }
+    for (int channel = 0; channel < node->getNumChannels(); ++channel)
+      for (int layer = 0; layer < 2; ++layer) {
+        KeyTrack const* track = node->getChannel(channel)->findTrack(m_clip, layer);
+        found = found || (track && track->find(time) >= 0);
+      }
     return found;
   }
 
