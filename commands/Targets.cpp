@@ -8,3 +8,9 @@ Module* moduleAt(HString const& path, char const* badPath) {
   if (!module) Command::logError(badPath, path.GetStr());
   return module;
 }
+
+Node* nodeAt(HString const& path, char const* badPath) {
+  Node* node = objectAs<Node>(g_db->getModuleWithPath(path, &Node::s_classNode, false));
+  if (!node) Command::logError(badPath, path.GetStr());
+  return node;
+}

@@ -5,35 +5,12 @@
 #include <string>
 #include <vector>
 
-#include "host/scene/Database.h"
+#include "bench/host/BenchScene.h"
+#include "host/scene/Character.h"
 #include "host/scene/Devices.h"
 #include "host/time/HTimeManager.h"
 
 namespace {
-
-constexpr int64 kFrame = kTicksPerSecond / 120;
-
-template <class T>
-T* create(std::string const& name, Module* parent = nullptr) {
-  return static_cast<T*>(g_db->createModule(&T::staticClass(), name.c_str(), parent));
-}
-
-// Keyed at every frame, as a take is.
-void animate(Node* node, int frames) {
-  std::vector<double> positions, rotations;
-  for (int i = 0; i < frames; ++i) {
-    const double part = i * 0.01;
-    for (const double v : {part, 2 * part, 100.0}) positions.push_back(v);
-    double xyzw[4];
-    TalixRotation(Vec3(part, 0.2, 0.1)).getQuaternion(xyzw);
-    rotations.insert(rotations.end(), xyzw, xyzw + 4);
-  }
-  KeyTrack moving(KeyTrack::Shape::Vector), turning(KeyTrack::Shape::Rotation);
-  moving.append(0, kFrame, positions.data(), frames);
-  turning.append(0, kFrame, rotations.data(), frames);
-  node->getTranslationChannel()->setTrack(g_db->getActiveClip(), 0, std::move(moving));
-  node->getRotationChannel()->setTrack(g_db->getActiveClip(), 0, std::move(turning));
-}
 
 // 20 skeletons of 50 bones: a spine of five with limbs of nine.
 std::vector<Node*> skeletons(int frames) {
@@ -92,10 +69,7 @@ void worldPositionsAfterAnEdit(benchmark::State& state) {
 BENCHMARK(worldPositionsAfterAnEdit);
 
 void deepChain(benchmark::State& state) {
-  g_db->newScene();
-  create<Clip>("take");
-  Node* last = nullptr;
-  for (int i = 0; i < 60; ++i) animate(last = create<SolvingBone>("bone", last), 300);
+  Node const* last = chain(60, 300);
   int64 frame = 0;
   for (auto _ : state) benchmark::DoNotOptimize(last->getWSPos(++frame % 300 * kFrame));
   state.SetItemsProcessed(state.iterations() * 60);

@@ -1,8 +1,12 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Constraints.h"
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class GetConstraintOffsetCmd final : public PendingCommand<GetConstraintOffsetCmd> {
+class GetConstraintOffsetCmd final : public ScriptCommand<GetConstraintOffsetCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getConstraintOffset",
@@ -14,7 +18,24 @@ class GetConstraintOffsetCmd final : public PendingCommand<GetConstraintOffsetCm
       .options = {{"ws"}},
       .returns = Variable::Vector,
       .solo = Solo::no};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
 };
+
+bool GetConstraintOffsetCmd::execute(Given const& given, Args const& args, Variable& result) {
+  const HString path = args[0].getStringValue(-1);
+  Module* module = g_db->getModuleWithPath(path, &SolvingConstraint::s_classSolvingConstraint, false);
+  if (!module) module = g_db->getModuleWithPath(path, &LabelingConstraint::s_classLabelingConstraint, false);
+  auto const* constraint = objectAs<PositionConstraintBase>(module);
+  if (!constraint) {
+    logError("%s is not a valid path to a LabelingConstraint or SolvingConstraint in the scene",
+             path.GetStr());
+    return false;
+  }
+  const bool world = GivenOptions(given).has(info.option("ws"));
+  return answer(result, world ? constraint->getConstraintOffsetWS(HTimeManager::getInstance()->getTime())
+                              : constraint->getConstraintOffset());
+}
 
 }  // namespace
 

@@ -1,8 +1,11 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Constraints.h"
+#include "host/scene/Database.h"
 
 namespace {
 
-class GetLabelingClusterOffsetCmd final : public PendingCommand<GetLabelingClusterOffsetCmd> {
+class GetLabelingClusterOffsetCmd final : public ScriptCommand<GetLabelingClusterOffsetCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getLabelingClusterOffsets",
@@ -13,7 +16,25 @@ class GetLabelingClusterOffsetCmd final : public PendingCommand<GetLabelingClust
       .args = {"'LabelingCluster name'", 1, 1, {Variable::String}},
       .returns = Variable::VectorArray,
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable& result) override;
 };
+
+bool GetLabelingClusterOffsetCmd::execute(Given const&, Args const& args, Variable& result) {
+  const HString path = args[0].getStringValue(-1);
+  auto const* cluster = objectAs<LabelingCluster>(
+      g_db->getModuleWithPath(path, &LabelingCluster::s_classLabelingCluster, false));
+  if (!cluster) {
+    // Kept: it speaks of constraints.
+    logError("%s is not a valid path to a LabelingConstraint or SolvingConstraint in the scene",
+             path.GetStr());
+    return false;
+  }
+  const TSimpleArray<Vec3> offsets = cluster->getMarkerOffsets();
+  Variable list(Variable::VectorArray, offsets.getCount());
+  for (int i = 0; i < offsets.getCount(); ++i) list.setValue(offsets[i], i);
+  return answer(result, list);
+}
 
 }  // namespace
 

@@ -1,8 +1,9 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "commands/transforms/TransformReading.h"
 
 namespace {
 
-class GetRotationAngleAxisCmd final : public PendingCommand<GetRotationAngleAxisCmd> {
+class GetRotationAngleAxisCmd final : public ScriptCommand<GetRotationAngleAxisCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getRotationAngleAxis",
@@ -18,7 +19,22 @@ class GetRotationAngleAxisCmd final : public PendingCommand<GetRotationAngleAxis
                   {"def", 0, Variable::None, 4}},
       .returns = Variable::Vector,
       .solo = Solo::no};
+  static constexpr QueryOptions kOptions = {info.option("ws"), info.option("inSpaceOf"), info.option("def"),
+                                            info.option("preRot")};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
 };
+
+bool GetRotationAngleAxisCmd::execute(Given const& given, Args const& args, Variable& result) {
+  constexpr QueryTexts texts = {
+      "%s is not a valid unique path to a Node in the scene.",
+      "%s  is not a valid unique path to a Node in the scene."};  // kept: two spaces
+  TransformQuery query;
+  if (!readQuery(given, args, kOptions, texts, query)) return false;
+  Vec3 vector;
+  rotationFor(query).getAsVector(vector);
+  return answer(result, vector);
+}
 
 }  // namespace
 

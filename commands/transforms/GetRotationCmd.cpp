@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/Angles.h"
+#include "commands/Results.h"
+#include "commands/transforms/TransformReading.h"
 
 namespace {
 
-class GetRotationCmd final : public PendingCommand<GetRotationCmd> {
+class GetRotationCmd final : public ScriptCommand<GetRotationCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getRotation",
@@ -17,7 +19,20 @@ class GetRotationCmd final : public PendingCommand<GetRotationCmd> {
                   {"def", 0, Variable::None, 4}},
       .returns = Variable::Vector,
       .solo = Solo::no};
+  static constexpr QueryOptions kOptions = {info.option("ws"), info.option("inSpaceOf"), info.option("def"),
+                                            info.option("preRot")};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
 };
+
+bool GetRotationCmd::execute(Given const& given, Args const& args, Variable& result) {
+  constexpr QueryTexts texts = {
+      "%s is not a valid unique path to a Node in the scene.",
+      "%s  is not a valid unique path to a Node in the scene."};  // kept: two spaces
+  TransformQuery query;
+  return readQuery(given, args, kOptions, texts, query) &&
+         answer(result, eulerDegrees(rotationFor(query), query.node->getRotationOrder()));
+}
 
 }  // namespace
 

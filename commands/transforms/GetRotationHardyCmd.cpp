@@ -1,8 +1,11 @@
-#include "commands/PendingCommand.h"
+#include "commands/transforms/JointBone.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class GetRotationHardyCmd final : public PendingCommand<GetRotationHardyCmd> {
+class GetRotationHardyCmd final : public ScriptCommand<GetRotationHardyCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getRotationHardy",
@@ -11,7 +14,20 @@ class GetRotationHardyCmd final : public PendingCommand<GetRotationHardyCmd> {
       .subCategory = "Data Retrieval",
       .purpose = "Logs the two joint angles of the first selected labelling bone.",
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const&, Variable&) override;
 };
+
+bool GetRotationHardyCmd::execute(Given const&, Args const&, Variable&) {
+  LabelingBone const* bone = selectedLabelingBone();
+  if (!bone) return false;
+  double major = 0, minor = 0;
+  bone->getLocalRot(HTimeManager::getInstance()->getTime())
+      .getAsHardySpicerRotation(major, minor, bone->getMajorAxisIndex(), bone->getMinorAxisIndex());
+  g_db->logInfo("Major angle: %f", major);
+  g_db->logInfo("Minor angle: %f", minor);
+  return true;
+}
 
 }  // namespace
 

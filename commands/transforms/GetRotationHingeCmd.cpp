@@ -1,8 +1,11 @@
-#include "commands/PendingCommand.h"
+#include "commands/transforms/JointBone.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class GetRotationHingeCmd final : public PendingCommand<GetRotationHingeCmd> {
+class GetRotationHingeCmd final : public ScriptCommand<GetRotationHingeCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getRotationHinge",
@@ -11,7 +14,17 @@ class GetRotationHingeCmd final : public PendingCommand<GetRotationHingeCmd> {
       .subCategory = "Data Retrieval",
       .purpose = "Logs the hinge angle of the first selected labelling bone.",
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const&, Variable&) override;
 };
+
+bool GetRotationHingeCmd::execute(Given const&, Args const&, Variable&) {
+  LabelingBone const* bone = selectedLabelingBone();
+  if (!bone) return false;
+  const TalixRotation rotation = bone->getLocalRot(HTimeManager::getInstance()->getTime());
+  g_db->logInfo("Major angle: %f", rotation.getAsHingeRotation(bone->getMajorAxisIndex()));
+  return true;
+}
 
 }  // namespace
 

@@ -1,8 +1,9 @@
-#include "commands/PendingCommand.h"
+#include "commands/Results.h"
+#include "commands/transforms/TransformReading.h"
 
 namespace {
 
-class GetScaleCmd final : public PendingCommand<GetScaleCmd> {
+class GetScaleCmd final : public ScriptCommand<GetScaleCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getScale",
                                        .displayName = "Get Node Scale",
@@ -13,7 +14,25 @@ class GetScaleCmd final : public PendingCommand<GetScaleCmd> {
                                        .options = {{"ws"}, {"inSpaceOf", 1, Variable::String, 1}, {"def"}},
                                        .returns = Variable::Vector,
                                        .solo = Solo::no};
+  static constexpr QueryOptions kOptions = {info.option("ws"), info.option("inSpaceOf"), info.option("def")};
+
+  bool execute(Given const& given, Args const& args, Variable& result) override;
 };
+
+Vec3 scaleFor(TransformQuery const& query) {
+  Node const& node = *query.node;
+  if (query.value == TransformQuery::Default)
+    return query.local ? node.getConstLocalScale() : node.getConstScaleInSpaceOfNode(query.space);
+  return query.local ? node.getLocalScale(query.time) : node.getScaleInSpaceOfNode(query.time, query.space);
+}
+
+bool GetScaleCmd::execute(Given const& given, Args const& args, Variable& result) {
+  // Kept: two spaces in both.
+  constexpr QueryTexts texts = {"%s  is not a valid unique path to a Node in the scene.",
+                                "%s  is not a valid unique path to a Node in the scene."};
+  TransformQuery query;
+  return readQuery(given, args, kOptions, texts, query) && answer(result, scaleFor(query));
+}
 
 }  // namespace
 

@@ -1,9 +1,11 @@
 #include "commands/Arguments.h"
-#include "commands/PendingCommand.h"
+#include "commands/transforms/TransformWriting.h"
+#include "host/scene/Bones.h"
+#include "host/scene/Database.h"
 
 namespace {
 
-class SetBoneLengthCmd final : public PendingCommand<SetBoneLengthCmd> {
+class SetBoneLengthCmd final : public ScriptCommand<SetBoneLengthCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setBoneLength",
@@ -18,7 +20,60 @@ class SetBoneLengthCmd final : public PendingCommand<SetBoneLengthCmd> {
   bool checkArgSyntax(Args const& args, Given const&) const override {
     return args.getCount() == 1 && areNumbers(args);
   }
+
+  bool execute(Given const& given, Args const& args, Variable&) override;
 };
+
+struct NewPlace {
+  Node* node;
+  Vec3 preTranslation;
+};
+
+// Where a bone's children, and with `adjust` their own node children, go for a length, or for a factor.
+std::vector<NewPlace> placesFor(Node const& bone, double length, bool relative, bool adjust) {
+  std::vector<NewPlace> places;
+  for (int i = 0; i < bone.getNumNodeChildren(); ++i) {
+    Node* child = bone.getNodeChild(i);
+    Vec3 offset = child->getPreTranslation();
+    const double former = offset.length(), wanted = relative ? former * length : length;
+    offset.setLength(wanted);
+    places.push_back({child, offset});
+    for (int k = 0; adjust && k < child->getNumNodeChildren(); ++k) {
+      Node* grandchild = child->getNodeChild(k);
+      Vec3 theirs = grandchild->getPreTranslation();
+      // Below 0 when the bone passes it by: then it lies behind the child.
+      theirs.setLength(theirs.length() - (wanted - former));
+      places.push_back({grandchild, theirs});
+    }
+  }
+  return places;
+}
+
+bool SetBoneLengthCmd::execute(Given const& given, Args const& args, Variable&) {
+  Module* primary = g_db->getPrimarySelectedModule();
+  auto* bone = objectAs<BaseBone>(primary);
+  if (!bone) {
+    logError("Primary selection must be a LabelingBone or SolvingBone.");
+    return false;
+  }
+  if (bone->getNumNodeChildren() == 0) {
+    logError("Primary selection must have at least one child that is a Node");
+    return false;
+  }
+  const double length = args[0].getFloatValue(-1);
+  if (!areFinite({length, 0, 0}, info.name)) return false;
+  if (length < 0) {
+    logError("Length parameter must be positive");  // kept: 0 will do
+    return false;
+  }
+  const GivenOptions options(given);
+  const std::vector<NewPlace> places = placesFor(*bone, length, options.has(info.option("relative")),
+                                                 options.has(info.option("adjustChildren")));
+  for (NewPlace const& place : places)
+    if (!areFinite(place.preTranslation, info.name)) return false;
+  for (NewPlace const& place : places) place.node->setPreTranslation(place.preTranslation);
+  return true;
+}
 
 }  // namespace
 

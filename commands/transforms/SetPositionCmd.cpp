@@ -1,8 +1,9 @@
-#include "commands/PendingCommand.h"
+#include "commands/transforms/TransformWriting.h"
+#include "host/scene/Marker.h"
 
 namespace {
 
-class SetPositionCmd final : public PendingCommand<SetPositionCmd> {
+class SetPositionCmd final : public ScriptCommand<SetPositionCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setPosition",
@@ -13,7 +14,41 @@ class SetPositionCmd final : public PendingCommand<SetPositionCmd> {
       .args = {"\"moduleName\" posVec", 2, 2, {Variable::String, Variable::Vector}},
       .options = {{"ws"}, {"preTrans", 0, Variable::None, 4}, {"default", 0, Variable::None, 2}},
       .solo = Solo::no};
+  static constexpr WriteOptions kOptions = {info.option("ws"), info.option("default"),
+                                            info.option("preTrans")};
+
+  bool execute(Given const& given, Args const& args, Variable&) override;
 };
+
+// False when nothing could be written.
+bool writePosition(TransformWrite const& write) {
+  Node& node = *write.node;
+  if (write.preTransform) {
+    write.world ? node.setPreTranslationWS(write.vector)
+                : static_cast<void>(node.setPreTranslation(write.vector));
+    return true;
+  }
+  Controller* channel = node.getTranslationChannel();
+  if (write.byDefault) {
+    channel->beginDefaultEdit();
+    write.world ? node.setConstWSPos(write.vector) : node.setConstLocalPos(write.vector);
+  } else {
+    if (!isWritable(channel)) return false;
+    channel->beginDataEdit(write.edited());
+    write.world ? node.setWSPos(write.time, write.vector) : node.setLocalPos(write.time, write.vector);
+  }
+  channel->endDataEdit();
+  return true;
+}
+
+bool SetPositionCmd::execute(Given const& given, Args const& args, Variable&) {
+  TransformWrite write;
+  if (!readWrite(given, args, kOptions, info.name, write)) return false;
+  auto* marker = objectAs<Marker>(write.node);
+  // Kept: whatever the options were.
+  if (writePosition(write) && marker) marker->setFillType(write.time, Marker::EditedByHand, true);
+  return true;
+}
 
 }  // namespace
 

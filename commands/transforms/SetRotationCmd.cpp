@@ -1,8 +1,9 @@
-#include "commands/PendingCommand.h"
+#include "commands/ChannelValues.h"
+#include "commands/transforms/TransformWriting.h"
 
 namespace {
 
-class SetRotationCmd final : public PendingCommand<SetRotationCmd> {
+class SetRotationCmd final : public ScriptCommand<SetRotationCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setRotation",
@@ -13,7 +14,19 @@ class SetRotationCmd final : public PendingCommand<SetRotationCmd> {
       .args = {"\"moduleName\" rotVec", 2, 2, {Variable::String, Variable::Vector}},
       .options = {{"ws"}, {"preRot", 0, Variable::None, 4}, {"def", 0, Variable::None, 2}},
       .solo = Solo::no};
+  static constexpr WriteOptions kOptions = {info.option("ws"), info.option("def"), info.option("preRot")};
+
+  bool execute(Given const& given, Args const& args, Variable&) override;
 };
+
+bool SetRotationCmd::execute(Given const& given, Args const& args, Variable&) {
+  TransformWrite write;
+  if (!readWrite(given, args, kOptions, info.name, write)) return false;
+  TalixRotation rotation;
+  // Kept: XYZ whatever the node's own order, which "getRotation" reads in.
+  rotation.setAsEuler(TalixRotation::XYZ, write.vector * kRadiansPerDegree);
+  return writeRotation(write, rotation);
+}
 
 }  // namespace
 

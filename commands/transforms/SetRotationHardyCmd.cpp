@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/transforms/JointBone.h"
+#include "commands/transforms/TransformWriting.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class SetRotationHardyCmd final : public PendingCommand<SetRotationHardyCmd> {
+class SetRotationHardyCmd final : public ScriptCommand<SetRotationHardyCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setRotationHardy",
@@ -12,7 +14,21 @@ class SetRotationHardyCmd final : public PendingCommand<SetRotationHardyCmd> {
       .purpose = "Sets the two joint angles of the first selected labelling bone, in radians.",
       .args = {nullptr, 2, 2, {Variable::Float, Variable::Float}},
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable&) override;
 };
+
+bool SetRotationHardyCmd::execute(Given const&, Args const& args, Variable&) {
+  LabelingBone* bone = selectedLabelingBone();
+  const double major = args[0].getFloatValue(-1), minor = args[1].getFloatValue(-1);
+  if (!bone || !areFinite({major, minor, 0}, info.name)) return false;
+  TalixRotation rotation;
+  rotation.setAsHardySpicerRotation(major, minor, bone->getMajorAxisIndex(), bone->getMinorAxisIndex(),
+                                    bone->getPreRotation());
+  if (isWritable(bone->getRotationChannel()))
+    bone->setLocalRot(HTimeManager::getInstance()->getTime(), rotation);
+  return true;
+}
 
 }  // namespace
 

@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/transforms/JointBone.h"
+#include "commands/transforms/TransformWriting.h"
+#include "host/time/HTimeManager.h"
 
 namespace {
 
-class SetRotationHingeCmd final : public PendingCommand<SetRotationHingeCmd> {
+class SetRotationHingeCmd final : public ScriptCommand<SetRotationHingeCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setRotationHinge",
@@ -12,7 +14,20 @@ class SetRotationHingeCmd final : public PendingCommand<SetRotationHingeCmd> {
       .purpose = "Sets the hinge angle of the first selected labelling bone, in radians.",
       .args = {nullptr, 1, 1, {Variable::Float}},
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable&) override;
 };
+
+bool SetRotationHingeCmd::execute(Given const&, Args const& args, Variable&) {
+  LabelingBone* bone = selectedLabelingBone();
+  const double angle = args[0].getFloatValue(-1);
+  if (!bone || !areFinite({angle, 0, 0}, info.name)) return false;
+  TalixRotation rotation;
+  rotation.setAsHingeRotation(angle, bone->getMajorAxisIndex());
+  if (isWritable(bone->getRotationChannel()))
+    bone->setLocalRot(HTimeManager::getInstance()->getTime(), rotation);
+  return true;
+}
 
 }  // namespace
 

@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "commands/transforms/TransformWriting.h"
 
 namespace {
 
-class SetScaleCmd final : public PendingCommand<SetScaleCmd> {
+class SetScaleCmd final : public ScriptCommand<SetScaleCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setScale",
@@ -13,7 +13,31 @@ class SetScaleCmd final : public PendingCommand<SetScaleCmd> {
       .args = {"\"moduleName\" scaleVec", 2, 2, {Variable::String, Variable::Vector}},
       .options = {{"ws"}, {"def"}},
       .solo = Solo::no};
+  static constexpr WriteOptions kOptions = {info.option("ws"), info.option("def")};
+
+  bool execute(Given const& given, Args const& args, Variable&) override;
 };
+
+// The local scale that gives a scale in the world below the parent as it is at a time.
+Vec3 localScale(Node const& node, Vec3 const& inWorld, int64 time) {
+  Node const* parent = node.getNodeParent();
+  return parent ? parent->getWorldPlacement(time).seen(Placement{{}, {}, inWorld}).scale : inWorld;
+}
+
+bool SetScaleCmd::execute(Given const& given, Args const& args, Variable&) {
+  TransformWrite write;
+  if (!readWrite(given, args, kOptions, info.name, write)) return false;
+  Node& node = *write.node;
+  if (write.byDefault) {
+    // Kept: the write of the default value stands in the bracket, the one at a time does not.
+    node.beginDataEdit(write.edited());
+    node.setConstLocalScale(write.world ? localScale(node, write.vector, write.time) : write.vector);
+    node.endDataEdit();
+  } else if (isWritable(node.getScaleChannel())) {
+    write.world ? node.setWSScale(write.time, write.vector) : node.setLocalScale(write.time, write.vector);
+  }
+  return true;
+}
 
 }  // namespace
 

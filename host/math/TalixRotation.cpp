@@ -22,12 +22,18 @@ Quat aboutAxis(int axis, double angle) {
   return Quat(std::cos(angle / 2), v);
 }
 
+void set(TalixRotation& rotation, Quat const& q) {
+  const double xyzw[4] = {q.v.x, q.v.y, q.v.z, q.r};
+  rotation.setQuaternion(xyzw);
+}
+
+// Never -0.
+double withinHalfTurn(double angle) { return std::remainder(angle, 2 * std::numbers::pi) + 0.0; }
+
 }  // namespace
 
 TalixRotation& TalixRotation::operator*=(TalixRotation const& o) {
-  const Quat product = Quat(m_w, m_x, m_y, m_z) * Quat(o.m_w, o.m_x, o.m_y, o.m_z);
-  const double xyzw[4] = {product.v.x, product.v.y, product.v.z, product.r};
-  setQuaternion(xyzw);
+  set(*this, Quat(m_w, m_x, m_y, m_z) * Quat(o.m_w, o.m_x, o.m_y, o.m_z));
   return *this;
 }
 
@@ -45,10 +51,8 @@ Vec3 TalixRotation::rotate(Vec3 const& v) const {
 
 void TalixRotation::setAsEuler(RotOrder order, Vec3 const& angles) {
   const auto& axes = kAxes[order];
-  const Quat q = aboutAxis(axes[2], angles[axes[2]]) * aboutAxis(axes[1], angles[axes[1]]) *
-                 aboutAxis(axes[0], angles[axes[0]]);
-  const double xyzw[4] = {q.v.x, q.v.y, q.v.z, q.r};
-  setQuaternion(xyzw);
+  set(*this, aboutAxis(axes[2], angles[axes[2]]) * aboutAxis(axes[1], angles[axes[1]]) *
+                 aboutAxis(axes[0], angles[axes[0]]));
 }
 
 void TalixRotation::getAsEuler(RotOrder order, Vec3& angles) const {
@@ -95,6 +99,37 @@ void TalixRotation::getAsVector(Vec3& rotationVector) const {
   rotationVector = axis * (sine < 1e-9 ? 2.0 : angle / sine);
 }
 
+void TalixRotation::setAsHardySpicerRotation(double major, double minor, int majorAxis, int minorAxis,
+                                             TalixRotation) {
+  set(*this, aboutAxis(majorAxis, major) * aboutAxis(minorAxis, minor));
+}
+
+void TalixRotation::getAsHardySpicerRotation(double& major, double& minor, int majorAxis,
+                                             int minorAxis) const {
+  if (majorAxis == minorAxis) {
+    major = getAsHingeRotation(majorAxis);
+    minor = 0;
+    return;
+  }
+  // With half angles A and B about axes i and j, and e_i e_j = s e_k, the joint's quaternion is
+  // (cos A cos B, e_i sin A cos B, e_j cos A sin B, e_k s sin A sin B). Its dot product with (w, x, y, z),
+  // written along i, j, k, is a sum of a wave in A + B and one in A - B, each of which is greatest where its
+  // own angle is that of its coefficients.
+  const double along[3] = {m_x, m_y, m_z};
+  const double x = along[majorAxis], y = along[minorAxis];
+  const double z = along[3 - majorAxis - minorAxis] * ((minorAxis - majorAxis + 3) % 3 == 1 ? 1 : -1);
+  const double sum = std::atan2(x + y, m_w - z), difference = std::atan2(x - y, m_w + z);
+  major = withinHalfTurn(sum + difference);
+  minor = withinHalfTurn(sum - difference);
+}
+
+void TalixRotation::setAsHingeRotation(double angle, int axis) { set(*this, aboutAxis(axis, angle)); }
+
+double TalixRotation::getAsHingeRotation(int axis) const {
+  const double along[3] = {m_x, m_y, m_z};
+  return withinHalfTurn(2 * std::atan2(along[axis], m_w));
+}
+
 void TalixRotation::setQuaternion(double const* xyzw) {
   const double length =
       std::sqrt(xyzw[0] * xyzw[0] + xyzw[1] * xyzw[1] + xyzw[2] * xyzw[2] + xyzw[3] * xyzw[3]);
@@ -110,11 +145,9 @@ void TalixRotation::getQuaternion(double* xyzw) const {
 }
 
 TalixRotation TalixRotation::slerp(TalixRotation const& a, TalixRotation const& b, double part) {
-  const Quat q =
-      Imath::slerpShortestArc(Quat(a.m_w, a.m_x, a.m_y, a.m_z), Quat(b.m_w, b.m_x, b.m_y, b.m_z), part);
-  const double xyzw[4] = {q.v.x, q.v.y, q.v.z, q.r};
   TalixRotation result;
-  result.setQuaternion(xyzw);
+  set(result,
+      Imath::slerpShortestArc(Quat(a.m_w, a.m_x, a.m_y, a.m_z), Quat(b.m_w, b.m_x, b.m_y, b.m_z), part));
   return result;
 }
 

@@ -34,6 +34,23 @@ class TalixRotation {
   // Length at most pi.
   void getAsVector(Vec3& rotationVector) const;
 
+  // --- joints: axes are 0 x, 1 y, 2 z ---
+  // A universal (Hardy-Spicer) joint turns by `major` about its major axis, which stays with the parent, and
+  // then by `minor` about the minor axis, which the first turn carries along: R = R_major * R_minor. Its axes
+  // are those of the frame in which the rotation counts. A local rotation counts after the pre-rotation,
+  // which thus has turned the axes already and changes nothing in the formula; it is part of the host's
+  // interface.
+  void setAsHardySpicerRotation(double major, double minor, int majorAxis, int minorAxis,
+                                TalixRotation preRotation);
+  // The angles of the joint's rotation that is nearest to this one, so that the least turn is left over; each
+  // within [-pi, pi]. They read back what was set, for all angles. With one axis for both, `minor` is 0.
+  void getAsHardySpicerRotation(double& major, double& minor, int majorAxis, int minorAxis) const;
+  // A hinge turns about one axis.
+  void setAsHingeRotation(double angle, int axis);
+  // The angle of the nearest turn about that axis, within [-pi, pi]; 0 where all are as near, as for half a
+  // turn about another axis.
+  double getAsHingeRotation(int axis) const;
+
   // Quaternion x y z w. Setting normalises; a quaternion of length 0 or not finite is no rotation.
   void setQuaternion(double const* xyzw);
   void getQuaternion(double* xyzw) const;

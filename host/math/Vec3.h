@@ -45,6 +45,7 @@ class Vec3 {
   void setLength(double wanted) {
     const double former = length();
     if (former > 0) *this *= wanted / former;
+    *this += Vec3();  // no component is -0
   }
 };
 

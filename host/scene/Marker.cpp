@@ -22,7 +22,10 @@ Marker* Marker::createInstance() {
 bool Marker::isUnlabeled() const { return getCharacterParent() == nullptr; }
 
 void Marker::setFillType(int64 const& time, EFillType const& type, bool) {
+  NLEClip const* clip = g_db->getActiveClip();
+  if (!clip || !clip->holdsKeys() || isLocked()) return;
   Controller* channel = addChannel("FillType", DataSource::IntProperty);
+  if (!channel || !channel->isEditable()) return;
   channel->beginDataEdit(HTimeRange(time - 1, time + 1));
   static_cast<IntController*>(channel)->setKey(time, type, KeyTrack::kAll);
   channel->endDataEdit();

@@ -14,7 +14,8 @@ class Marker : public Node {
   static Marker* createInstance();
 
   bool isUnlabeled() const;
-  // Keys the fill type at a time. notify: views are told.
+  // Keys the fill type at a time, where keys can be edited; an attribute of that name is in the way of it.
+  // notify: views are told.
   void setFillType(int64 const& time, EFillType const& type, bool notify);
   EFillType getFillType(int64 time) const;
 

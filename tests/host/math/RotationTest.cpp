@@ -149,6 +149,72 @@ TEST_P(RotationOrder, ACurveThroughGimbalLockUnrollsWithoutJumps) {
 
 INSTANTIATE_TEST_SUITE_P(All, RotationOrder, testing::Range(0, 6));
 
+// Of two axes, which may be one.
+class RotationJoint : public testing::TestWithParam<int> {
+ protected:
+  int major() const { return GetParam() / 3; }
+  int minor() const { return GetParam() % 3; }
+  TalixRotation joint(double a, double b) const {
+    TalixRotation rotation;
+    rotation.setAsHardySpicerRotation(a, b, major(), minor(), randomRotation());
+    return rotation;
+  }
+};
+
+TEST_P(RotationJoint, TurnsAboutItsMajorAxisAndTheCarriedMinorOne) {
+  for (int n = 0; n < 200; ++n) {
+    const double a = uniform(-7, 7), b = uniform(-7, 7);
+    // For row vectors the carried axis comes first.
+    EXPECT_LT(apart(joint(a, b), aboutAxis(minor(), b) * aboutAxis(major(), a)), 1e-14);
+    TalixRotation hinge;
+    hinge.setAsHingeRotation(a, major());
+    EXPECT_LT(apart(hinge, joint(a, 0)), 1e-14);
+  }
+}
+
+TEST_P(RotationJoint, AnglesReadBack) {
+  for (int n = 0; n < 400; ++n) {
+    // Every second time at quarter turns, where Euler angles would lock.
+    const double unit = n % 2 ? kPi / 2 : 1;
+    const double a = n % 2 ? unit * (n / 2 % 5 - 2) : uniform(-kPi, kPi);
+    const double b = n % 2 ? unit * (n / 10 % 5 - 2) : uniform(-kPi, kPi);
+    double readA = 0, readB = 0;
+    joint(a, b).getAsHardySpicerRotation(readA, readB, major(), minor());
+    EXPECT_LT(apart(joint(readA, readB), joint(a, b)), 1e-14);
+    if (major() != minor()) {
+      EXPECT_NEAR(std::remainder(readA - a, 2 * kPi), 0, 1e-14);
+      EXPECT_NEAR(std::remainder(readB - b, 2 * kPi), 0, 1e-14);
+    } else {
+      EXPECT_NEAR(std::remainder(joint(a, b).getAsHingeRotation(major()) - a - b, 2 * kPi), 0, 1e-14);
+      EXPECT_EQ(readB, 0);
+    }
+    EXPECT_LE(std::abs(readA), kPi);
+    EXPECT_LE(std::abs(readB), kPi);
+  }
+}
+
+TEST_P(RotationJoint, AnglesAreThoseOfTheNearestJointAndHinge) {
+  const auto away = [](TalixRotation const& from, TalixRotation const& to) {
+    Vec3 way;
+    (from.inverse() * to).getAsVector(way);
+    return way.length();
+  };
+  for (int n = 0; n < 50; ++n) {
+    const TalixRotation rotation = randomRotation();
+    double a = 0, b = 0;
+    rotation.getAsHardySpicerRotation(a, b, major(), minor());
+    const double left = away(joint(a, b), rotation),
+                 leftOfHinge = away(joint(rotation.getAsHingeRotation(major()), 0), rotation);
+    for (int other = 0; other < 200; ++other) {
+      const double x = uniform(-kPi, kPi), y = uniform(-kPi, kPi);
+      ASSERT_LE(left, away(joint(x, y), rotation) + 1e-12);
+      ASSERT_LE(leftOfHinge, away(joint(x, 0), rotation) + 1e-12);
+    }
+  }
+}
+
+INSTANTIATE_TEST_SUITE_P(AllAxes, RotationJoint, testing::Range(0, 9));
+
 TEST(Rotation, ProductTurnsByTheRightFactorFirst) {
   for (int n = 0; n < 200; ++n) {
     const TalixRotation a = randomRotation(), b = randomRotation(), c = randomRotation();

@@ -1,0 +1,51 @@
+#include "commands/transforms/TransformWriting.h"
+
+#include <cmath>
+
+#include "commands/Targets.h"
+#include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
+
+bool readWrite(Given const& given, Args const& args, WriteOptions const& which, char const* command,
+               TransformWrite& write) {
+  write.time = HTimeManager::getInstance()->getTime();
+  const GivenOptions options(given);
+  write.world = options.has(which.world);
+  write.byDefault = options.has(which.byDefault);
+  write.preTransform = options.has(which.preTransform);
+  write.node = nodeAt(args[0].getStringValue(-1), "%s is not a valid path to a node in the scene.");
+  write.vector = args[1].getVecValue(-1);
+  return write.node && areFinite(write.vector, command);
+}
+
+bool areFinite(Vec3 const& values, char const* command) {
+  // The length as well: a rotation vector is taken by it.
+  if (std::isfinite(values.x) && std::isfinite(values.y) && std::isfinite(values.z) &&
+      std::isfinite(values.length()))
+    return true;
+  Command::logError("%s needs finite numbers.", command);
+  return false;
+}
+
+bool isWritable(Controller const* channel) {
+  if (!g_db->getActiveClip() || channel->isEditable()) return true;
+  Command::logWarning("%s is not editable on %s: nothing was written. This may be due to the active clip.",
+                      channel->getName().GetStr(), channel->getModule()->getName().GetStr());
+  return false;
+}
+
+bool writeRotation(TransformWrite const& write, TalixRotation const& rotation) {
+  Node& node = *write.node;
+  if (!write.byDefault && !isWritable(node.getRotationChannel())) return true;
+  // Kept: the pre-rotation is written besides, not instead.
+  if (write.preTransform)
+    write.world ? node.setPreRotationWS(rotation) : static_cast<void>(node.setPreRotation(rotation, false));
+  if (write.byDefault) {
+    write.world ? node.setConstWSRot(rotation) : node.setConstLocalRot(rotation, true);
+    return true;
+  }
+  node.beginDataEdit(write.edited());
+  write.world ? node.setWSRot(write.time, rotation) : node.setLocalRot(write.time, rotation);
+  node.endDataEdit();
+  return true;
+}
