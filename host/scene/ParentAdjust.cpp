@@ -361,19 +361,15 @@ KeyTrack Adjustment::keyed(Controller const& channel, Times const& times,
 // Keys beside the ends of the range that hold what lies outside, where it would change. An end at which the
 // motion of all nodes ends has nothing outside.
 void Adjustment::guard(Controller const& channel, Kind kind, KeyTrack& track) const {
-  const auto hold = [&](int64 time, HTimeRange const& beside) {
+  const auto hold = [&](int64 time) {
     Values value;
     track.evaluate(time, channel.getInterpolation(), {}, value);
-    const int64 next = track.lowerBound(beside.getStart());
-    const bool held = next < track.count() && track.timeAt(next) <= beside.getEnd();
-    if (!held && hasData(HTimeRange(time, time)) && stray(channel, kind, time, value) > 1)
+    if (hasData(HTimeRange(time, time)) && stray(channel, kind, time, value) > 1)
       track.set(time, goal(channel, kind, time));
   };
   const int64 start = m_range.getStart(), end = m_range.getEnd();
-  if (hasEnd(start) && (m_motion.isEmpty() || m_motion.getStart() < start))
-    hold(frameAtOrBefore(start - 1), {frameAtOrBefore(start - 1), start - 1});
-  if (hasEnd(end) && (m_motion.isEmpty() || m_motion.getEnd() > end))
-    hold(frameAfter(end), {end + 1, frameAfter(end)});
+  if (hasEnd(start) && (m_motion.isEmpty() || m_motion.getStart() < start)) hold(frameAtOrBefore(start - 1));
+  if (hasEnd(end) && (m_motion.isEmpty() || m_motion.getEnd() > end)) hold(frameAfter(end));
 }
 
 // Halves the spans in which the curve strays, until none does.

@@ -24,6 +24,11 @@ double apart(Placement const& a, Placement const& b, double length, double angle
                    angleBetween(a.rotation, b.rotation) / angle, (a.scale - b.scale).length() / angle});
 }
 
+// How far a node strayed, in units of what it may between keys.
+double strayed(Vec3 const& p, TalixRotation const& r, Vec3 const& q, TalixRotation const& s) {
+  return std::max((p - q).length() / 0.0100001, angleBetween(r, s) / (0.0100001 * kDegree));
+}
+
 class ParentAdjustTest : public SceneTest {
  protected:
   static Controller* channel(Node* node, size_t i) {
@@ -131,13 +136,162 @@ TEST_F(ParentAdjustTest, TheWorldStaysAsItIs) {
     for (const int64 time : frames) {
       const size_t i = static_cast<size_t>(std::find(m_nodes.begin(), m_nodes.end(), node) - m_nodes.begin());
       Placement const &was = before[time][i], is = node->getWorldPlacement(time);
-      const double strayed = std::max((was.position - is.position).length() / 0.0100001,
-                                      angleBetween(was.rotation, is.rotation) / (0.0100001 * kDegree));
-      ASSERT_LT(strayed, 1) << "round " << round << ", frame " << time / kFrame;
-      most = std::max(most, strayed);
+      const double far = strayed(was.position, was.rotation, is.position, is.rotation);
+      ASSERT_LT(far, 1) << "round " << round << ", frame " << time / kFrame;
+      most = std::max(most, far);
     }
   }
   RecordProperty("mostStrayed", std::to_string(most * 0.01));
+}
+
+// Inside selected ranges the world stays as it is, outside the node stays as it is below its parent.
+TEST_F(ParentAdjustTest, RangesAreAdjustedAloneAndOnce) {
+  for (int round = 0; round < 2000; ++round) {
+    build(round % 2, 1 + static_cast<size_t>(round % 3));
+    Node *node, *target;
+    choose(node, target);
+    std::set<int64> times;
+    collect(times, node);
+    collect(times, target);
+    const int first = times.empty() ? 0 : static_cast<int>((*times.begin() + kFrame - 1) / kFrame),
+              last = times.empty() ? kFrames : static_cast<int>(*times.rbegin() / kFrame);
+    std::vector<HTimeRange> ranges;
+    for (int at = first + static_cast<int>(below(10)); at <= last;) {
+      const int end = std::min(last, at + static_cast<int>(below(12)));
+      ranges.emplace_back(at * kFrame, end * kFrame);
+      at = end + 1 + static_cast<int>(below(10));
+    }
+    std::map<int64, Placement> world, local;
+    const auto localOf = [&](int64 time) {
+      return Placement{node->getLocalPos(time), node->getLocalRot(time), node->getLocalScale(time)};
+    };
+    for (int i = first; i <= last; ++i) times.insert(i * kFrame);
+    for (const int64 time : times) {
+      world[time] = node->getWorldPlacement(time);
+      local[time] = localOf(time);
+    }
+
+    for (HTimeRange const& range : ranges) ASSERT_TRUE(node->parentAdjust(target, range));
+    const bool moved = target != node->getNodeParent();
+    hang(node, target);
+
+    for (const int64 time : times) {
+      const bool inside = std::any_of(ranges.begin(), ranges.end(),
+                                      [&](HTimeRange const& range) { return range.contains(time); });
+      const bool whole = time % kFrame == 0;
+      // Adjusting one range may change a cubic curve between the frames of the next.
+      if (!whole && round % 3 == 2) continue;
+      if (inside && moved) {
+        Placement const &was = world[time], is = node->getWorldPlacement(time);
+        ASSERT_LT(whole ? strayed(was.position, was.rotation, is.position, is.rotation)
+                        : apart(was, is, 1e-9, 1e-9),
+                  1)
+            << "round " << round << ", frame " << time / kFrame;
+      } else if (whole) {
+        Placement const &was = local[time], is = localOf(time);
+        ASSERT_LT(strayed(was.position, was.rotation, is.position, is.rotation), 1)
+            << "round " << round << ", outside at frame " << time / kFrame;
+      }
+    }
+  }
+}
+
+TEST_F(ParentAdjustTest, KeysAreOnlyAddedWhereTheyAreNeeded) {
+  auto* clip = create<Clip>("take");
+  auto* root = create<Node>("root");
+  auto *from = create<Node>("from", root), *to = create<Node>("to", root);
+  auto *sparse = create<Node>("sparse", from), *still = create<Node>("still", from);
+  for (int i = 0; i <= kFrames; ++i) root->setLocalRot(i * kFrame, TalixRotation({0, 0, 0.02 * i}));
+  from->setConstLocalRot(TalixRotation({1, 0, 0}), true);
+  to->setConstLocalPos({0, 70, 0});
+  still->setConstLocalPos({9, 0, 0});
+  for (const int frame : {0, 10, 40}) sparse->setLocalPos(frame * kFrame, {10.0 * frame, 5, 0});
+  sparse->getTranslationChannel()->selectKeys(HTimeRange(10 * kFrame, 10 * kFrame), 7);
+  for (Node* node : {sparse, still}) {
+    const Vec3 before = node->getWSPos(7 * kFrame);
+    ASSERT_TRUE(node->parentAdjust(to, HTimeRange::forever()));
+    hang(node, to);
+    EXPECT_LT((node->getWSPos(7 * kFrame) - before).length(), 1e-9);
+  }
+  EXPECT_EQ(sparse->getTranslationChannel()->getNumKeys(), 3);
+  EXPECT_TRUE(sparse->getTranslationChannel()->isKeySelectedAt(10 * kFrame, 7));
+  EXPECT_EQ(sparse->getTranslationChannel()->getNumSelectedKeys(), 1);
+  EXPECT_FALSE(sparse->getRotationChannel()->hasKeysInClip(clip)) << "the default value turns";
+  EXPECT_FALSE(still->hasKeysInClip(clip, true));
+  // Out of the turning root both need keys.
+  ASSERT_TRUE(still->parentAdjust(nullptr, HTimeRange::forever()));
+  EXPECT_EQ(still->getRotationChannel()->getNumKeys(), kFrames + 1);
+  EXPECT_EQ(still->getTranslationChannel()->getNumKeys(), kFrames + 1);
+  EXPECT_FALSE(still->getScaleChannel()->hasKeysInClip(clip));
+  // A parent that is nowhere else than the former one changes nothing, ends of ranges included.
+  auto* beside = create<Node>("beside", root);
+  to->setConstLocalPos({0, 0, 0});
+  ASSERT_TRUE(sparse->parentAdjust(beside, HTimeRange(3 * kFrame, 5 * kFrame)));
+  EXPECT_EQ(sparse->getTranslationChannel()->getNumKeys(), 3);
+}
+
+TEST_F(ParentAdjustTest, MarkersGainNoDataInTheirGaps) {
+  create<Clip>("take");
+  auto* parent = create<Node>("parent");
+  auto* marker = create<Marker>("marker", parent);
+  parent->getRotationChannel()->setKey(0, TalixRotation({0, 0, 0}), 7);
+  parent->getRotationChannel()->setKey(kFrames * kFrame, TalixRotation({0, 0, 3}), 7);
+  const std::set<int> seen = {3, 4, 5, 20, 30};
+  for (const int frame : seen) marker->setLocalPos(frame * kFrame, {100.0 * frame, 0, 0});
+  marker->setFillType(20 * kFrame, Marker::Reduced, false);  // to 30 thinned out, so there is data
+  marker->getTranslationChannel()->deleteKey(3 * kFrame, 2 | 4);
+  std::map<int, Vec3> before;
+  for (int i = 0; i <= kFrames; ++i) before[i] = marker->getWSPos(i * kFrame);
+  for (HTimeRange const& range : {HTimeRange::forever(), HTimeRange(10 * kFrame, 25 * kFrame)}) {
+    marker->beginDataEdit(range);
+    ASSERT_TRUE(marker->parentAdjust(nullptr, range));
+    hang(marker, nullptr);
+    for (int i = 0; i <= kFrames; ++i) {
+      const bool data = seen.contains(i) || (i >= 20 && i <= 30);
+      for (size_t k = 0; k < 2; ++k)
+        EXPECT_TRUE(data || !channel(marker, k)->hasKeyAt(i * kFrame)) << "frame " << i;
+      const double far = (marker->getWSPos(i * kFrame) - before[i]).length();
+      EXPECT_TRUE(far < 0.0100001 || !data || !range.contains(i * kFrame)) << "frame " << i;
+    }
+    EXPECT_EQ(marker->getDataRange(), HTimeRange(3 * kFrame, 30 * kFrame));
+    marker->discardDataEdit();
+    hang(marker, parent);
+  }
+  // One that never was measured rides on its parent at all times.
+  auto* riding = create<Marker>("riding", parent);
+  riding->setConstLocalPos({100, 0, 0});
+  const Vec3 there = riding->getWSPos(17 * kFrame);
+  ASSERT_TRUE(riding->parentAdjust(nullptr, HTimeRange::forever()));
+  hang(riding, nullptr);
+  EXPECT_LT((riding->getWSPos(17 * kFrame) - there).length(), 0.0100001);
+}
+
+TEST_F(ParentAdjustTest, DefaultsLocksAndTargetsBelow) {
+  auto *from = create<Node>("from"), *node = create<Node>("node", from), *child = create<Node>("child", node);
+  from->setConstLocalRot(TalixRotation({1, 2, 3}), true);
+  from->setConstLocalScale({2, 2, 2});
+  node->setConstLocalPos({1, 2, 3});
+  const Placement before = child->getWorldPlacement(0);
+  ASSERT_TRUE(node->parentAdjust(nullptr, HTimeRange::forever()));
+  hang(node, nullptr);
+  EXPECT_LT(apart(before, child->getWorldPlacement(0), 1e-12, 1e-12), 1);
+
+  auto* clip = create<Clip>("take");
+  node->setLocalPos(0, {5, 5, 5});
+  const KeyTrack was = *node->getTranslationChannel()->findTrack(clip, 0);
+  EXPECT_FALSE(node->parentAdjust(child, HTimeRange::forever()));
+  EXPECT_FALSE(node->parentAdjust(node, HTimeRange::forever()));
+  node->getTranslationChannel()->setLocked(true);
+  EXPECT_FALSE(node->parentAdjust(from, HTimeRange::forever()));
+  EXPECT_TRUE(*node->getTranslationChannel()->findTrack(clip, 0) == was);
+  EXPECT_LT(angleBetween(from->getWSRot(0) * node->getLocalRot(0), before.rotation), 1e-9);
+
+  // Values beyond what a number holds.
+  node->getTranslationChannel()->setLocked(false);
+  from->setConstLocalScale({1e-300, 1, 1});
+  node->setLocalPos(0, {1e300, 0, 0});
+  EXPECT_FALSE(node->parentAdjust(from, HTimeRange::forever()));
+  EXPECT_EQ(node->getLocalPos(0).x, 1e300);
 }
 
 }  // namespace
