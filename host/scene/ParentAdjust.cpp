@@ -30,10 +30,12 @@ void merge(Times& times, Times const& more) {
   times = std::move(all);
 }
 
-Times timesOf(KeyTrack const& track) {
+Times timesOf(KeyTrack const& track, bool wholeOnly = false) {
   Times times;
   times.reserve(static_cast<size_t>(track.count()));
-  track.forEach(0, track.count(), [&](KeyTrack::Key const& key) { times.push_back(key.time); });
+  track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
+    if (!wholeOnly || key.components == KeyTrack::kAll) times.push_back(key.time);
+  });
   return times;
 }
 
@@ -381,7 +383,8 @@ void Adjustment::refine(Controller const& channel, Kind kind, KeyTrack& track) c
     track.evaluate(time, channel.getInterpolation(), {}, values, &cursor);
     return values;
   };
-  Times times = timesOf(track);
+  // A key of some components pins only these, so it ends no span.
+  Times times = timesOf(track, true);
   merge(times, m_times);
   for (std::vector<HTimeRange> spans = spansBetween(times); !spans.empty();) {
     Times added;
@@ -391,7 +394,11 @@ void Adjustment::refine(Controller const& channel, Kind kind, KeyTrack& track) c
       added.push_back((frames.getStart() + (frames.getEnd() - frames.getStart()) / 2) * period);
     }
     for (const int64 time : added) track.set(time, goal(channel, kind, time));
-    spans = spansAround(track, added);
+    if (added.empty()) return;
+    // A cubic curve of a component that only some keys hold changes further away.
+    const bool far = channel.getInterpolation() == Interpolation::Cubic &&
+                     track.countHolding(KeyTrack::kAll) < track.count();
+    spans = far ? spansBetween(timesOf(track, true)) : spansAround(track, added);
   }
 }
 

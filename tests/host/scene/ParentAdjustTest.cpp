@@ -146,7 +146,7 @@ TEST_F(ParentAdjustTest, TheWorldStaysAsItIs) {
 
 // Inside selected ranges the world stays as it is, outside the node stays as it is below its parent.
 TEST_F(ParentAdjustTest, RangesAreAdjustedAloneAndOnce) {
-  for (int round = 0; round < 2000; ++round) {
+  for (int round = 0; round < 600; ++round) {
     build(round % 2, 1 + static_cast<size_t>(round % 3));
     Node *node, *target;
     choose(node, target);
