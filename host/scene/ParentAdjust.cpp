@@ -313,7 +313,9 @@ Times Adjustment::keysNeeded(Controller const& channel, std::vector<Values> cons
   for (const int64 end : {m_range.getStart(), m_range.getEnd()})
     if (hasEnd(end)) merge(own, {end});
   keepOnly(own, [this](int64 time) { return std::binary_search(m_times.begin(), m_times.end(), time); });
-  if (own.empty() || own.size() == m_times.size()) return m_times;
+  // Keys that are added later change a cubic curve beyond their neighbours.
+  const bool local = channel.getInterpolation() != Interpolation::Cubic;
+  if (own.empty() || own.size() == m_times.size() || !local) return m_times;
 
   const KeyTrack track = keyed(channel, own, goals);
   KeyTrack::Cursor cursor;
@@ -329,8 +331,6 @@ Times Adjustment::keysNeeded(Controller const& channel, std::vector<Values> cons
       track.evaluate(m_times[end], channel.getInterpolation(), {}, value, &cursor);
       right = same(channel, goals[end], value);
     }
-    // A key more changes a cubic curve beyond its neighbours.
-    if (!right && channel.getInterpolation() == Interpolation::Cubic) return m_times;
     const auto begin = m_times.begin();
     if (!right)
       needed.insert(needed.end(), begin + static_cast<ptrdiff_t>(i), begin + static_cast<ptrdiff_t>(end));

@@ -185,13 +185,18 @@ TEST_F(ProgramTest, InterruptsCancelATaskOnce) {
 // Through a terminal of its own: what it shows, and what is typed at questions.
 TEST_F(ProgramTest, TerminalsShowProgressAndAnswerQuestions) {
   write("terminal.py", R"(
-import os, pty, sys
+import os, pty, sys, termios
 pid, fd = pty.fork()
-if pid == 0: os.execv(sys.argv[2], sys.argv[2:])
-os.write(fd, sys.argv[1].encode())
-seen = b""
+if pid == 0:
+    quiet = termios.tcgetattr(0)
+    quiet[3] &= ~termios.ECHO
+    termios.tcsetattr(0, termios.TCSANOW, quiet)
+    os.execv(sys.argv[2], sys.argv[2:])
+seen, typed = b"", sys.argv[1].encode()
 try:
-    while chunk := os.read(fd, 4096): seen += chunk
+    while chunk := os.read(fd, 4096):
+        seen += chunk
+        if typed: os.write(fd, typed); typed = b""
 except OSError: pass
 sys.stdout.buffer.write(seen.replace(b"\r\n", b"\n").replace(b"\r", b"<"))
 sys.exit(os.waitstatus_to_exitcode(os.waitpid(pid, 0)[1]))
