@@ -30,12 +30,22 @@ void merge(Times& times, Times const& more) {
   times = std::move(all);
 }
 
-Times timesOf(KeyTrack const& track, bool wholeOnly = false) {
+Times timesOf(KeyTrack const& track) {
   Times times;
   times.reserve(static_cast<size_t>(track.count()));
+  track.forEach(0, track.count(), [&](KeyTrack::Key const& key) { times.push_back(key.time); });
+  return times;
+}
+
+// Where a track's curve is pinned: at its whole keys (one of some components pins only these), and just
+// outside of all.
+Times limitsOf(KeyTrack const& track) {
+  Times times;
   track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
-    if (!wholeOnly || key.components == KeyTrack::kAll) times.push_back(key.time);
+    if (key.components == KeyTrack::kAll) times.push_back(key.time);
   });
+  merge(times, {track.timeAt(0) - 1});
+  merge(times, {track.timeAt(track.count() - 1) + 1});
   return times;
 }
 
@@ -383,8 +393,7 @@ void Adjustment::refine(Controller const& channel, Kind kind, KeyTrack& track) c
     track.evaluate(time, channel.getInterpolation(), {}, values, &cursor);
     return values;
   };
-  // A key of some components pins only these, so it ends no span.
-  Times times = timesOf(track, true);
+  Times times = limitsOf(track);
   merge(times, m_times);
   for (std::vector<HTimeRange> spans = spansBetween(times); !spans.empty();) {
     Times added;
@@ -395,10 +404,9 @@ void Adjustment::refine(Controller const& channel, Kind kind, KeyTrack& track) c
     }
     for (const int64 time : added) track.set(time, goal(channel, kind, time));
     if (added.empty()) return;
-    // A cubic curve of a component that only some keys hold changes further away.
-    const bool far = channel.getInterpolation() == Interpolation::Cubic &&
-                     track.countHolding(KeyTrack::kAll) < track.count();
-    spans = far ? spansBetween(timesOf(track, true)) : spansAround(track, added);
+    // A key changes the curve of a component that only some keys hold further away.
+    const bool far = track.countHolding(KeyTrack::kAll) < track.count();
+    spans = far ? spansBetween(limitsOf(track)) : spansAround(track, added);
   }
 }
 
