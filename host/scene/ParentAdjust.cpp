@@ -380,8 +380,11 @@ void Adjustment::guard(Controller const& channel, Kind kind, KeyTrack& track) co
       track.set(time, goal(channel, kind, time));
   };
   const int64 start = m_range.getStart(), end = m_range.getEnd();
-  if (hasEnd(start) && (m_motion.isEmpty() || m_motion.getStart() < start)) hold(frameAtOrBefore(start - 1));
-  if (hasEnd(end) && (m_motion.isEmpty() || m_motion.getEnd() > end)) hold(frameAfter(end));
+  const int64 first = m_motion.getStart(), last = m_motion.getEnd();
+  const bool startsAll = !m_motion.isEmpty() && first >= start && frameAtOrBefore(first) <= start;
+  const bool endsAll = !m_motion.isEmpty() && last <= end && frameAfter(last) > end;
+  if (hasEnd(start) && !startsAll) hold(frameAtOrBefore(start - 1));
+  if (hasEnd(end) && !endsAll) hold(frameAfter(end));
 }
 
 // Halves the spans in which the curve strays, until none does.

@@ -146,7 +146,7 @@ TEST_F(ParentAdjustTest, TheWorldStaysAsItIs) {
 
 // Inside selected ranges the world stays as it is, outside the node stays as it is below its parent.
 TEST_F(ParentAdjustTest, RangesAreAdjustedAloneAndOnce) {
-  for (int round = 0; round < 600; ++round) {
+  for (int round = 0; round < 400; ++round) {
     build(round % 2, 1 + static_cast<size_t>(round % 3));
     Node *node, *target;
     choose(node, target);
@@ -157,7 +157,7 @@ TEST_F(ParentAdjustTest, RangesAreAdjustedAloneAndOnce) {
               last = times.empty() ? kFrames : static_cast<int>(*times.rbegin() / kFrame);
     std::vector<HTimeRange> ranges;
     for (int at = first + static_cast<int>(below(10)); at <= last;) {
-      const int end = std::min(last, at + static_cast<int>(below(12)));
+      const int end = std::min(last, at + 1 + static_cast<int>(below(11)));
       ranges.emplace_back(at * kFrame, end * kFrame);
       at = end + 1 + static_cast<int>(below(10));
     }
