@@ -33,6 +33,9 @@ Values: 12  1.5  true  <1 2 3>  [a b c]  "a string"  word. In a string "\" is an
 Results go to standard output, "error:", "warning:" and "info:" lines to standard error. With --json
 standard output holds one object a line: file, line, command, ok, result, log.
 
+Ctrl-C cancels an operation that shows its progress, and the line fails; otherwise, and the second time, it
+ends the program. Questions are put at a terminal; without one the answer is no.
+
 Exit status: 0 all succeeded, 1 a command failed, 2 the command line is wrong, 3 a file could not be
 read or written.
 )";
@@ -75,7 +78,8 @@ CLI::App* addRun(CLI::App& app, RunArguments& run) {
       ->type_name("FILE");
   sub->add_flag("--json", run.request.json, "Print one JSON object for each line that is run");
   sub->add_flag("--keep-going", run.request.keepGoing, "Go on after a failed line, and save all the same");
-  sub->add_flag("--yes", run.request.assumeYes, "Answer yes to every question");
+  sub->add_flag("--yes", run.request.assumeYes,
+                "Answer yes to every question; else it is put at the terminal");
   run.lineOption = addRepeatable(*sub, "-c", run.lines, "Line to run; repeatable")->type_name("LINE");
   run.scriptOption = sub->add_option("SCRIPT", run.scripts,
                                      "Script files, \"-\" for standard input; run in the order "

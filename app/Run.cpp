@@ -10,6 +10,7 @@
 #include <iostream>
 #include <unistd.h>
 
+#include "app/Progress.h"
 #include "host/scene/Database.h"
 #include "host/services/HInterface.h"
 #include "io/FileError.h"
@@ -111,7 +112,11 @@ int runScripts(RunRequest const& request) {
   int status = 0;
   const std::unique_ptr<Session> session = makeSession(request.plugin, status);
   if (!session) return status;
-  session->setAssumeYes(request.assumeYes);
+  if (request.assumeYes)
+    session->setAssumeYes(true);
+  else if (canAsk())
+    g_interface->setAsker([](HString const& question) { return askAtTerminal(question.GetString()); });
+  const Progress progress;
   RunStyle style{
       .json = request.json, .keepGoing = request.keepGoing, .nameLines = isatty(STDERR_FILENO) != 0};
   for (RunRequest::Part const& part : request.parts) style.flushLines |= isStandardInput(part);

@@ -1,8 +1,14 @@
-#include "commands/PendingCommand.h"
+#include "commands/hierarchy/Adjusting.h"
+#include "host/scene/Bones.h"
+#include "host/scene/Character.h"
+#include "host/scene/Constraints.h"
+#include "host/scene/Database.h"
+#include "host/scene/Setups.h"
+#include "host/services/OperationStack.h"
 
 namespace {
 
-class ParentCmd final : public PendingCommand<ParentCmd> {
+class ParentCmd final : public ScriptCommand<ParentCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "parent",
@@ -14,7 +20,105 @@ class ParentCmd final : public PendingCommand<ParentCmd> {
                   {"showProgress"},
                   {"ranges"},
                   {"adjustOnly", 0, Variable::None, 1}}};
+
+  bool execute(Given const& given, Args const&, Variable&) override;
 };
+
+bool isOneOf(Module const* module, HRuntimeClass const& a, HRuntimeClass const& b) {
+  return module->isKindOf(&a) || module->isKindOf(&b);
+}
+
+// The selected nodes that will be adjusted.
+int countNodesBelow(Module const* parent) {
+  int count = 0;
+  for (int i = 0; i < g_db->getNumSelectedNodes(); ++i) {
+    Node const* node = g_db->getSelectedNode(i);
+    count += node != parent && !node->isKindOf(&Character::s_classCharacter);
+  }
+  return count;
+}
+
+// Bones and constraints stay within setups of their own kind.
+bool mayHang(Module const* module, Module const* parent) {
+  if (isOneOf(module, LabelingBone::s_classLabelingBone, LabelingConstraint::s_classLabelingConstraint) &&
+      parent->isKindOf(&SolvingSetup::s_classSolvingSetup)) {
+    g_db->logError("LabelingBones and LabelingConstraints may not be parented to a SolvingSetup");
+    return false;
+  }
+  if (isOneOf(module, SolvingBone::s_classSolvingBone, SolvingConstraint::s_classSolvingConstraint) &&
+      parent->isKindOf(&LabelingSetup::s_classLabelingSetup)) {
+    g_db->logError("SolvingBones and SolvingConstraints may not be parented to a LabelingSetup");
+    return false;
+  }
+  return true;
+}
+
+// False when the user cancelled.
+bool adjust(Adjusting const& adjusting, Module* module, Node* target) {
+  auto* node = objectAs<Node>(module);
+  if (!node) {
+    warnOfNoData(*module);
+    return true;
+  }
+  if (adjusting.showProgress) {
+    HString caption;
+    caption.Format("Parent adjusting %s to %s", node->getName().GetStr(),
+                   target ? target->getName().GetStr() : "the world");
+    g_theOperationStack.setTaskCaption(caption);
+    if (g_theOperationStack.isCancelled()) return false;
+  }
+  adjustNode(*node, target, adjusting.ranges);
+  if (adjusting.showProgress) {
+    g_theOperationStack.stepTask();
+    if (g_theOperationStack.isCancelled()) return false;
+  }
+  return true;
+}
+
+bool ParentCmd::execute(Given const& given, Args const&, Variable&) {
+  const int count = g_db->getNumSelectedModules();
+  if (count < 2) {
+    logError("Must have at least 2 Modules selected");
+    return false;
+  }
+  Module* parent = g_db->getPrimarySelectedModule();
+  if (!parent) {
+    logError("No primary selected Module.");
+    return false;
+  }
+  const Adjusting adjusting = Adjusting::from<ParentCmd>(given);
+  Node* target = objectAs<Node>(parent) ? static_cast<Node*>(parent) : parent->getNodeParent();
+
+  // kept: without adjusting no task is pushed, yet one is moved and popped at the end; and whoever returns
+  // early leaves the task pushed.
+  int steps = 0;
+  if (adjusting.showProgress && adjusting.adjust) {
+    steps = countNodesBelow(parent);
+    g_theOperationStack.pushTask(0, steps, 0, 1, true, "");
+  } else if (adjusting.showProgress) {
+    logWarning("Can't use -showProgress flag without -adjust flag. Ignoring");
+  }
+
+  for (int i = 0; i < count; ++i) {
+    Module* module = g_db->getSelectedModule(i);
+    if (module == parent) continue;
+    if (module->isKindOf(&Character::s_classCharacter)) {
+      HString text;
+      text.Format("Object %s is a Character. Characters must be root nodes. Skipping",
+                  module->getName().GetStr());
+      logWarning("%s", text.GetStr());
+      continue;
+    }
+    if (adjusting.adjust && !adjust(adjusting, module, target)) return false;
+    if (adjusting.move && !(mayHang(module, parent) && parent->addChild(module))) return false;
+  }
+
+  if (adjusting.showProgress) {
+    g_theOperationStack.setTaskPos(steps);
+    g_theOperationStack.popTask();
+  }
+  return true;
+}
 
 }  // namespace
 

@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/hierarchy/Adjusting.h"
+#include "host/scene/Database.h"
+#include "host/services/OperationStack.h"
 
 namespace {
 
-class UnparentCmd final : public PendingCommand<UnparentCmd> {
+class UnparentCmd final : public ScriptCommand<UnparentCmd> {
  public:
   static constexpr CommandInfo info = {.name = "unparent",
                                        .displayName = "Unparent Nodes",
@@ -13,7 +15,49 @@ class UnparentCmd final : public PendingCommand<UnparentCmd> {
                                                    {"showProgress"},
                                                    {"ranges"},
                                                    {"adjustOnly", 0, Variable::None, 1}}};
+
+  bool execute(Given const& given, Args const&, Variable&) override;
 };
+
+// False when the user cancelled.
+bool adjust(Adjusting const& adjusting, Module* module) {
+  auto* node = objectAs<Node>(module);
+  if (!node) {
+    warnOfNoData(*module);
+    return true;
+  }
+  if (adjusting.showProgress) {
+    HString caption;
+    caption.Format("Unparent adjusting %s", node->getName().GetStr());
+    g_theOperationStack.setTaskCaption(caption);
+  }
+  adjustNode(*node, nullptr, adjusting.ranges);
+  if (!adjusting.showProgress) return true;
+  g_theOperationStack.stepTask();
+  return !g_theOperationStack.isCancelled();
+}
+
+bool UnparentCmd::execute(Given const& given, Args const&, Variable&) {
+  const int count = g_db->getNumSelectedModules();
+  if (count < 1) {
+    logError("No modules selected");
+    return false;
+  }
+  const Adjusting adjusting = Adjusting::from<UnparentCmd>(given);
+  // kept: whoever returns early leaves the task pushed.
+  if (adjusting.showProgress) g_theOperationStack.pushTask(0, g_db->getNumSelectedNodes(), 0, 1, true, "");
+
+  for (int i = 0; i < count; ++i) {
+    Module* module = g_db->getSelectedModule(i);
+    Module* parent = module->getParent();
+    if (!parent) continue;
+    if (adjusting.adjust && !adjust(adjusting, module)) return false;
+    if (adjusting.move) parent->removeChild(module, true);
+  }
+
+  if (adjusting.showProgress) g_theOperationStack.popTask();
+  return true;
+}
 
 }  // namespace
 

@@ -6,6 +6,7 @@
 #include "host/animation/Controller.h"
 #include "host/animation/KeyReduction.h"
 #include "host/scene/Database.h"
+#include "host/scene/Devices.h"
 #include "host/scene/Marker.h"
 #include "host/services/HInterface.h"
 #include "host/time/HTimeManager.h"
@@ -126,7 +127,8 @@ int Controller::reduce(std::function<bool(KeyTrack::Key const&)> mayGo,
                      .tolerance = toleranceFor(*this, original, tolerances),
                      .framePeriod = HTimeManager::getInstance()->getTicksPerFrame(),
                      .isWhole = getPropertyType() == IntProperty,
-                     .mayGo = std::move(mayGo)};
+                     .mayGo = std::move(mayGo),
+                     .hasGaps = marker || objectAs<AnalogDevice>(m_module)};
   if (marker) rule.isBridged = [marker](int64 time) { return marker->getFillType(time) == Marker::Reduced; };
   KeyTrack reduced = original;
   const int64 removed = eraseComponents(reduced, redundantKeys(original, rule));

@@ -84,7 +84,7 @@ class Curve {
     for (int64 i = 0; i + 1 < size(); ++i) {
       m_hasFrames[at(i)] = firstFrameBehind(m_times[at(i)]) < m_times[at(i + 1)];
       const bool bridged = component < 0 && m_rule.isBridged;
-      if (m_hasFrames[at(i)] && !(bridged && m_rule.isBridged(m_times[at(i)])))
+      if (m_rule.hasGaps && m_hasFrames[at(i)] && !(bridged && m_rule.isBridged(m_times[at(i)])))
         m_stays[at(i)] = m_stays[at(i + 1)] = true;
     }
   }

@@ -32,6 +32,8 @@ struct ReductionRule {
   bool isWhole = false;   // values are rounded where they are read
   // Which keys may go; absent: any. Keys at either end of the curve or of a gap stay all the same.
   std::function<bool(KeyTrack::Key const&)> mayGo = {};
+  // Whether frames without a key are gaps, as where keys are measurements; else the curve is all there is.
+  bool hasGaps = true;
   // Whether the frames without a key behind the key at a time have data; absent: they are gaps.
   std::function<bool(int64 time)> isBridged = {};
 };

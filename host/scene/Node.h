@@ -95,6 +95,16 @@ class Node : public Module, private ModuleReferrer {
   virtual void setConstLocalScale(Vec3 const& scale);
   virtual void setConstWSScale(Vec3 const& scale);
 
+  // Re-expresses the motion within a range relative to `target` (null: the world) instead of the present node
+  // parent, so that the node and all below it stay as they are in the world once it hangs there. The active
+  // layer of the active clip is changed; with no active clip the default values are. Exact at every key time
+  // of the node and its old and new ancestors; between them within 0.01 mm and 0.01 degrees at whole frames.
+  // Pre-transforms stay. Frames at which a marker has no data get none; what lies outside the range stays as
+  // it is relative to its parent. Along an axis that the target scales by 0 everything is at 0.
+  // False when something could not be kept: the target lies below the node, a channel is not editable, or a
+  // value would not be finite. The target and non-finite cases leave the node as it was.
+  virtual bool parentAdjust(Node* target, HTimeRange const& range);
+
   // False for values that are not finite. keepWorld: the default rotation turns so that the node stays as it
   // is.
   bool setPreRotation(TalixRotation const& rotation, bool keepWorld);

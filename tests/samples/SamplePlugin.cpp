@@ -2,6 +2,7 @@
 // and show things in the scene, and that fail in every way there is.
 
 #include <cmath>
+#include <csignal>
 #include <initializer_list>
 #include <new>
 
@@ -9,6 +10,8 @@
 #include "host/command/CommandPluginBase.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
+#include "host/services/HInterface.h"
+#include "host/services/OperationStack.h"
 #include "host/time/HTimeManager.h"
 
 namespace {
@@ -270,6 +273,37 @@ class FailCmd final : public ScriptCommand<FailCmd> {
   }
 };
 
+// Works on a task and presses Ctrl-C so often meanwhile; fails when that cancels it.
+class WorkCmd final : public ScriptCommand<WorkCmd> {
+ public:
+  static constexpr CommandInfo info = {
+      .name = "work",
+      .displayName = "Work",
+      .category = "Testing",
+      .args = {"caption interrupts", 2, 2, {Variable::String, Variable::Int}}};
+
+  bool execute(Given const&, Args const& args, Variable&) override {
+    g_theOperationStack.pushTask(0, 4, 1, 1, true, args[0].getStringValue(-1));
+    for (int i = 0; i < args[1].getIntValue(-1); ++i) std::raise(SIGINT);
+    if (g_theOperationStack.isCancelled()) return false;
+    g_theOperationStack.popTask();
+    return true;
+  }
+};
+
+class AskCmd final : public ScriptCommand<AskCmd> {
+ public:
+  static constexpr CommandInfo info = {.name = "ask",
+                                       .displayName = "Ask",
+                                       .category = "Testing",
+                                       .args = {"question", 1, 1, {Variable::String}}};
+
+  bool execute(Given const&, Args const& args, Variable& result) override {
+    result.setValue(g_interface->askQuestion(args[0].getStringValue(-1), 1), -1);
+    return true;
+  }
+};
+
 class SamplePlugin final : public CommandPluginBase {
  public:
   HString getVendor() const override { return "Talix"; }
@@ -285,7 +319,7 @@ class SamplePlugin final : public CommandPluginBase {
   bool initialise() override {
     for (Command* command : std::initializer_list<Command*>{
              new EchoCmd, new TypesCmd, new MakeCmd, new KeyCmd, new KeysCmd, new SelectionCmd,
-             new ChannelsCmd, new RangesCmd, new AttributeCmd, new FailCmd})
+             new ChannelsCmd, new RangesCmd, new AttributeCmd, new FailCmd, new WorkCmd, new AskCmd})
       m_commands.add(command);
     m_commands.add(nullptr);  // one that could not be made
 #ifdef SAMPLE_CLASHES

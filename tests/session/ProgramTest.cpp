@@ -173,4 +173,46 @@ TEST_F(ProgramTest, LostOutputIsAFailureWithoutACrash) {
   EXPECT_THAT(m_err, HasSubstr("error: standard output: "));
 }
 
+TEST_F(ProgramTest, InterruptsCancelATaskOnce) {
+  EXPECT_EQ(run("talix run $sample -c 'work a 0' -c 'work b 1' -c 'echo 1'"), 1);
+  EXPECT_EQ(m_out + m_err, "");
+  EXPECT_EQ(run("talix run $sample --keep-going -c 'work a 1' -c 'work b 1' -c 'work c 0' -c 'echo 1'"), 1);
+  EXPECT_EQ(m_out, "1\n");
+  // 128 + SIGINT, as the shell tells of programs that it ends; those told to ignore it go on.
+  EXPECT_EQ(run("talix run $sample -c 'work a 2' -c 'echo 1'; test $? = 130"), 0);
+  EXPECT_EQ(run("trap '' INT; talix run $sample -c 'work a 2' -c 'echo 1'"), 0);
+}
+
+// Through a terminal of its own: what it shows, and what is typed at questions.
+TEST_F(ProgramTest, TerminalsShowProgressAndAnswerQuestions) {
+  write("terminal.py", R"(
+import os, pty, sys, termios
+pid, fd = pty.fork()
+if pid == 0:
+    quiet = termios.tcgetattr(0)
+    quiet[3] &= ~termios.ECHO
+    termios.tcsetattr(0, termios.TCSANOW, quiet)
+    os.execv(sys.argv[2], sys.argv[2:])
+seen, typed = b"", sys.argv[1].encode()
+try:
+    while chunk := os.read(fd, 4096):
+        seen += chunk
+        if typed: os.write(fd, typed); typed = b""
+except OSError: pass
+sys.stdout.buffer.write(seen.replace(b"\r\n", b"\n").replace(b"\r", b"<"))
+sys.exit(os.waitstatus_to_exitcode(os.waitpid(pid, 0)[1]))
+)");
+  const std::string terminal = "python3 terminal.py ";
+  const std::string program = " '" TALIX_BIN "/talix' run $sample ";
+  ASSERT_EQ(run(terminal + "''" + program + "-c 'work \"Fitting\" 0' -c 'echo done'"), 0) << m_err;
+  const std::string bar = "[#####---------------]  25%  Fitting";
+  EXPECT_EQ(m_out, "<" + bar + "<" + std::string(bar.size(), ' ') + "<done\n");
+  ASSERT_EQ(run(terminal + "'y\nno\n'" + program + "-c 'ask Sure?' -c 'ask \"And now?\"'"), 0) << m_err;
+  EXPECT_THAT(m_out, HasSubstr("Sure? [y/N] 1\nAnd now? [y/N] 0\n"));
+  ASSERT_EQ(run(terminal + "''" + program + "--yes -c 'ask Sure?'"), 0) << m_err;
+  EXPECT_EQ(m_out, "1\n");
+  EXPECT_EQ(run("talix run $sample -c 'ask Sure?' && talix run --yes $sample -c 'ask Sure?'"), 0);
+  EXPECT_EQ(m_out + m_err, "0\n1\n");
+}
+
 }  // namespace

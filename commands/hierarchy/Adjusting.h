@@ -1,0 +1,26 @@
+// What "parent" and "unparent" share: the options about adjusting, and the adjusting of one node.
+#pragma once
+
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Node.h"
+
+struct Adjusting {
+  bool adjust;        // keep the motion in the world
+  bool move;          // change the hierarchy
+  bool showProgress;  // and let the user cancel
+  bool ranges;        // adjust in the selected time ranges only
+
+  // The options as given to a command.
+  template <class Cmd>
+  static Adjusting from(Given const& given) {
+    const GivenOptions options(given);
+    const bool only = options.has(Cmd::info.option("adjustOnly"));
+    return {only || options.has(Cmd::info.option("adjust")), !only,
+            options.has(Cmd::info.option("showProgress")), options.has(Cmd::info.option("ranges"))};
+  }
+};
+
+// Keeps the motion of a node in the world for a new parent (null: the world).
+void adjustNode(Node& node, Node* target, bool ranges);
+// Says that a module that is no node has nothing to adjust.
+void warnOfNoData(Module const& module);
