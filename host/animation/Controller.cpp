@@ -9,6 +9,7 @@
 #include "host/animation/Clips.h"
 #include "host/animation/PropertyTable.h"
 #include "host/scene/Database.h"
+#include "host/scene/MarkerRuns.h"
 
 H_DEFINE_ABSTRACT_CLASS(DataSource);
 H_DEFINE_ABSTRACT_CLASS(Controller);
@@ -146,12 +147,14 @@ void Controller::readKey(int key, Values& values) const {
 
 int Controller::selectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  return static_cast<int>(editTrack(range.getStart(), range.getEnd())->select(range.getStart(), range.getEnd(), mask));
+  return static_cast<int>(
+      editTrack(range.getStart(), range.getEnd())->select(range.getStart(), range.getEnd(), mask));
 }
 
 int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  return static_cast<int>(editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
+  return static_cast<int>(
+      editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
 }
 
 int Controller::deleteKey(int64 time, unsigned mask) {
@@ -162,6 +165,7 @@ int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayer
   int64 deleted = 0;
   NLEClip* clip = g_db->getActiveClip();
   const int64 first = range.getStart(), last = range.getEnd();
+  const CutRuns cut(*this, first, last);
   for (ClipTrack const& track : m_tracks)
     if (track.clip == clip && (allLayers || track.layer == g_db->getActiveLayer()))
       deleted += editTrack(clip, track.layer, first, last)->eraseRange(first, last, mask);
@@ -174,6 +178,7 @@ int Controller::deleteSelectedKeys(unsigned mask) {
   if (!track || track->countSelected() == 0) return 0;
   const int64 first = track->timeAt(track->selectedIndex(0));
   const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
+  const CutRuns cut(*this, first, last);
   const int64 deleted = editTrack(first, last)->eraseSelected(mask);
   if (deleted) changed();
   return static_cast<int>(deleted);

@@ -24,8 +24,9 @@ struct Slot {
   }
 
   bool operator==(Slot const& o) const {
-    return present == o.present && (!present || (key.values == o.key.values && key.components == o.key.components &&
-                                                 key.selected == o.key.selected));
+    return present == o.present &&
+           (!present || (key.values == o.key.values && key.components == o.key.components &&
+                         key.selected == o.key.selected));
   }
   // Makes the track so at this time.
   void putInto(KeyTrack& track) const {
@@ -172,7 +173,8 @@ struct Controller::SettingsChange : UndoChange {
     std::swap(locked, channel.m_locked);
   }
   bool isVoid() const override {
-    return byDefault == channel.m_default && interpolation == channel.m_interpolation && locked == channel.m_locked;
+    return byDefault == channel.m_default && interpolation == channel.m_interpolation &&
+           locked == channel.m_locked;
   }
   int64 memoryUse() const override { return sizeof *this; }
 

@@ -4,6 +4,7 @@
 
 #include "host/scene/Character.h"
 #include "host/scene/Database.h"
+#include "host/time/HTimeManager.h"
 
 H_DEFINE_CLASS(Marker);
 
@@ -19,6 +20,14 @@ Marker* Marker::createInstance() {
   return marker;
 }
 
+namespace {
+
+int64 frameBehind(int64 time) {
+  return HTimeManager::getInstance()->frameTime(time + 1, HTimeManager::RoundUp, 0);
+}
+
+}  // namespace
+
 bool Marker::isUnlabeled() const { return getCharacterParent() == nullptr; }
 
 void Marker::setFillType(int64 const& time, EFillType const& type, bool) {
@@ -26,9 +35,29 @@ void Marker::setFillType(int64 const& time, EFillType const& type, bool) {
   if (!clip || !clip->holdsKeys() || isLocked()) return;
   Controller* channel = addChannel("FillType", DataSource::IntProperty);
   if (!channel || !channel->isEditable()) return;
-  channel->beginDataEdit(HTimeRange(time - 1, time + 1));
+  // The rest of a reduced run stays one.
+  const int64 next = frameBehind(time);
+  const bool goesOn = type != Reduced && isReducedBehind(time) && !channel->hasKeyAt(next);
+  channel->beginDataEdit(HTimeRange(time - 1, next));
   static_cast<IntController*>(channel)->setKey(time, type, KeyTrack::kAll);
+  if (goesOn) static_cast<IntController*>(channel)->setKey(next, Reduced, KeyTrack::kAll);
   channel->endDataEdit();
+}
+
+bool Marker::isReducedBehind(int64 time) const {
+  NLEClip const* clip = g_db->getActiveClip();
+  Controller const* channel = getChannel("FillType");
+  const int64 frame = frameBehind(time);
+  int64 latest = -kForever - 1;
+  double type = Recorded;
+  for (int layer = clip && channel ? clip->getNumLayers() : 0; layer-- > 0;) {
+    KeyTrack const* track = channel->findTrack(clip, layer);
+    const int64 key = track ? track->lowerBound(frame + 1) - 1 : -1;
+    if (key < 0 || track->timeAt(key) <= latest) continue;
+    latest = track->timeAt(key);
+    type = track->at(key).values[0];
+  }
+  return std::lround(type) == Reduced;
 }
 
 // Each key speaks for its own time only: without one the data was recorded. Fill types of layers do not add

@@ -18,6 +18,9 @@ class Marker : public Node {
   // notify: views are told.
   void setFillType(int64 const& time, EFillType const& type, bool notify);
   EFillType getFillType(int64 time) const;
+  // Whether the frames behind a time, up to the next key, have data although keys are missing there, because
+  // reduction took these out: the fill type that was keyed last holds there.
+  bool isReducedBehind(int64 time) const;
 
   BoolController* getOccludedChannel() const { return m_occluded; }
   FloatController* getResidualChannel() const { return m_residual; }

@@ -160,7 +160,7 @@ std::optional<std::vector<HTimeRange>> dataOf(Marker const& marker, NLEClip cons
       data.back().include(key);
     else
       data.emplace_back(key, key);
-    bridged = marker.getFillType(key) == Marker::Reduced;
+    bridged = marker.isReducedBehind(key);
   }
   return data;
 }

@@ -237,7 +237,7 @@ Times Baking::timesOf(Marker const& marker, bool moves) {
   // Between a key that stands for reduced ones and the next key there is data.
   Times reduced;
   for (size_t i = 0; i + 1 < own.size(); ++i) {
-    if (marker.getFillType(own[i]) != Marker::Reduced) continue;
+    if (!marker.isReducedBehind(own[i])) continue;
     const auto from = std::upper_bound(follow.begin(), follow.end(), own[i]);
     reduced.insert(reduced.end(), from, std::lower_bound(from, follow.end(), own[i + 1]));
   }

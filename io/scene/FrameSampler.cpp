@@ -102,7 +102,7 @@ std::vector<bool> FrameSampler::framesWithData(const Controller& channel, const 
       for (int64 i = next; i < std::min(frame, m_grid.count); ++i) frames[static_cast<size_t>(i)] = true;
     if (m_grid.contains(key.time)) frames[static_cast<size_t>(frame)] = true;
     next = firstAtOrAfter(key.time + 1);
-    bridged = reduced && reduced->getFillType(key.time) == Marker::Reduced;
+    bridged = reduced && reduced->isReducedBehind(key.time);
   });
   return frames;
 }

@@ -188,8 +188,35 @@ TEST_F(ReduceChannelTest, FillTypesOfAMarkerTellWhatWasReduced) {
   EXPECT_EQ(keys(m_channel, 16), "x    x   xx x  x");
   EXPECT_EQ(fillTypes(m_marker, 16), "4    2      4  0");
   EXPECT_EQ(reduceAll(m_channel, m_tolerances), 0);
-  fill(m_channel, "x x  x");
-  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 0) << "behind the new key there is a gap";
+}
+
+// The frames that count as data although they hold no key.
+TEST_F(ReduceChannelTest, EditsInAReducedRunKeepWhatWasSeen) {
+  const auto data = [&] {
+    std::string text;
+    for (int i = 0; i < 16; ++i)
+      text += m_channel->hasKeyAt(i * kFrame) ? 'x' : m_marker->isReducedBehind((i - 1) * kFrame) ? '-' : ' ';
+    return text;
+  };
+  fill(m_channel, "xxxxxxxxxxxx  xx");
+  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 10);
+  EXPECT_EQ(data(), "x----------x  xx");
+  m_channel->setKey(4 * kFrame, {4, 1, 0}, KeyTrack::kAll);
+  EXPECT_EQ(data(), "x---x------x  xx");
+  m_marker->setLocalPos(8 * kFrame, {8, 1, 0});
+  m_marker->setFillType(8 * kFrame, Marker::EditedByHand, true);
+  EXPECT_EQ(data(), "x---x---x--x  xx");
+  EXPECT_EQ(m_marker->getFillType(8 * kFrame), Marker::EditedByHand);
+
+  // What is cut was not seen, up to the keys on either side.
+  m_channel->deleteKeys(HTimeRange(4 * kFrame, 6 * kFrame), KeyTrack::kAll, false);
+  EXPECT_EQ(data(), "x       x--x  xx");
+  EXPECT_EQ(m_marker->getFillType(8 * kFrame), Marker::EditedByHand);
+  m_channel->selectKeys(HTimeRange(11 * kFrame, 14 * kFrame), KeyTrack::kAll);
+  m_channel->deleteSelectedKeys(KeyTrack::kAll);
+  EXPECT_EQ(data(), "x       x      x");
+  m_channel->deleteKeys(HTimeRange::forever(), KeyTrack::kAll, true);
+  EXPECT_EQ(data(), std::string(16, ' '));
 }
 
 TEST_F(ReduceChannelTest, ReducedCurvesCanBeReducedFurther) {
