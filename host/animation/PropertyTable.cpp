@@ -40,7 +40,8 @@ DataSource::PropertyType PropertyTable::getType(unsigned id) const {
 
 // The last name added: later ones have gone before it.
 struct PropertyTable::Addition : UndoChange {
-  Addition(HString const& text, DataSource::PropertyType kind) : UndoChange(nullptr), name(text), type(kind) {}
+  Addition(HString const& text, DataSource::PropertyType kind)
+      : UndoChange(nullptr), name(text), type(kind) {}
   void swap() override {
     PropertyTable& table = getInstance();
     table.findId(name) ? table.removeLast() : static_cast<void>(table.store(name, type));

@@ -115,7 +115,10 @@ void Attribute::store(Value value, bool set, bool react) {
 // Setting the value that is there again is no change.
 struct Attribute::Change : UndoChange {
   explicit Change(Attribute& concerned)
-      : UndoChange(concerned.m_module), attribute(concerned), value(concerned.m_value), set(concerned.m_set) {}
+      : UndoChange(concerned.m_module),
+        attribute(concerned),
+        value(concerned.m_value),
+        set(concerned.m_set) {}
 
   void swap() override {
     Value now = attribute.m_value;

@@ -140,7 +140,7 @@ class Database {
   void storeActive(NLEClip* clip, int layer);  // mutator
   struct Membership;
   struct SettingsChange;
-  void join(Module* module);   // every index takes it, by its order of creation
+  void join(Module* module);    // every index takes it, by its order of creation
   void unjoin(Module* module);  // and lets it go
   void removeAll();
 
@@ -151,7 +151,7 @@ class Database {
   std::unordered_map<HRuntimeClass const*, int> m_countByClass;
   std::unique_ptr<SceneIndex> m_index;
   std::vector<std::unique_ptr<Module>> m_removed;
-  bool m_unsorted = false;              // lists in order of creation
+  bool m_unsorted = false;  // lists in order of creation
   std::vector<Module*> m_unsortedParents;
   UndoJournal m_journal;
   uint64 m_created = 0;

@@ -105,7 +105,8 @@ struct Database::SettingsChange : UndoChange {
            properties == g_db->m_activeProperties && rate == HTimeManager::getInstance()->getFrameRate();
   }
   int64 memoryUse() const override {
-    return static_cast<int64>(sizeof *this + sizeof(unsigned) * (properties.size() + g_db->m_activeProperties.size()));
+    return static_cast<int64>(sizeof *this +
+                              sizeof(unsigned) * (properties.size() + g_db->m_activeProperties.size()));
   }
 
   NLEClip* clip;
@@ -149,7 +150,8 @@ void Database::settle() {
     m_unsorted = false;
   }
   std::sort(m_unsortedParents.begin(), m_unsortedParents.end());
-  m_unsortedParents.erase(std::unique(m_unsortedParents.begin(), m_unsortedParents.end()), m_unsortedParents.end());
+  m_unsortedParents.erase(std::unique(m_unsortedParents.begin(), m_unsortedParents.end()),
+                          m_unsortedParents.end());
   for (Module* parent : m_unsortedParents) parent->sortChildren();
   m_unsortedParents.clear();
   m_selection.settle();

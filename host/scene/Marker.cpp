@@ -35,9 +35,10 @@ void Marker::setFillType(int64 const& time, EFillType const& type, bool) {
   if (!clip || !clip->holdsKeys() || isLocked()) return;
   Controller* channel = addChannel("FillType", DataSource::IntProperty);
   if (!channel || !channel->isEditable()) return;
-  // The rest of a reduced run stays one.
+  // The rest of a reduced run stays one, but where recorded data says that it ends.
   const int64 next = frameBehind(time);
-  const bool goesOn = type != Reduced && isReducedBehind(time) && !channel->hasKeyAt(next);
+  const bool goesOn =
+      type != Reduced && type != Recorded && isReducedBehind(time) && !channel->hasKeyAt(next);
   channel->beginDataEdit(HTimeRange(time - 1, next));
   static_cast<IntController*>(channel)->setKey(time, type, KeyTrack::kAll);
   if (goesOn) static_cast<IntController*>(channel)->setKey(next, Reduced, KeyTrack::kAll);

@@ -148,8 +148,8 @@ class Module : public HObject {
   friend class Selection;
   friend class UndoChange;
 
-  void storeName(HString const& name);       // mutator
-  void storeParent(Module* parent);          // mutator: unlinks, links at the end
+  void storeName(HString const& name);                        // mutator
+  void storeParent(Module* parent);                           // mutator: unlinks, links at the end
   void storeAttribute(std::unique_ptr<Attribute> attribute);  // mutator
   void storeChannel(std::unique_ptr<Controller> channel);     // mutator
   struct NameChange;
@@ -160,7 +160,7 @@ class Module : public HObject {
   void linkToParent();
   void unlinkFromParent();
   void sortChildren();
-  int64 memoryUse() const;  // with keys that nothing else shares
+  int64 memoryUse() const;                   // with keys that nothing else shares
   void forgetByAll();                        // every referrer lets go
   std::string suffixText(int levels) const;  // the last `levels` names of the path
 

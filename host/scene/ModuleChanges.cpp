@@ -14,7 +14,8 @@ struct Module::NameChange : UndoChange {
   }
   bool isVoid() const override { return name == module.m_name; }
   int64 memoryUse() const override {
-    return static_cast<int64>(sizeof *this + std::max(name.GetString().size(), module.m_name.GetString().size()));
+    return static_cast<int64>(sizeof *this +
+                              std::max(name.GetString().size(), module.m_name.GetString().size()));
   }
 
   Module& module;

@@ -112,7 +112,9 @@ void Selection::setPrimary(Module* module) {
 
 void Selection::settle() {
   if (!m_unsorted) return;
-  const auto earlier = [](Module const* a, Module const* b) { return a->m_selectionOrder < b->m_selectionOrder; };
+  const auto earlier = [](Module const* a, Module const* b) {
+    return a->m_selectionOrder < b->m_selectionOrder;
+  };
   m_modules.sort(earlier);
   m_nodes.sort(earlier);
   m_markers.sort(earlier);

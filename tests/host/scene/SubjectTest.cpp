@@ -128,6 +128,7 @@ TEST_F(SubjectTest, BelowMovingParents) {
     animate(measured, other, 0, 1, 10, 30);
     animate(reduced, clip, 0, 10);
     reduced->setFillType(0, Marker::Reduced, false);
+    reduced->setFillType(10 * kFrame, Marker::Recorded, false);
     never->getTranslationChannel()->setTrack(clip, 0, KeyTrack(KeyTrack::Shape::Vector));
 
     std::vector<double> all;

@@ -31,6 +31,7 @@ TEST_F(TakeExportTest, ReducedRunsAreDataOtherGapsAreNot) {
   auto* marker = at<Marker>("\\Bob\\M");
   EXPECT_EQ(seen(onlyPoint()), "x x x");
   marker->setFillType(at100(1), Marker::Reduced, false);
+  marker->setFillType(at100(3), Marker::Recorded, false);
   EXPECT_EQ(seen(onlyPoint()), "xxx x");
   EXPECT_EQ(onlyPoint().at(1).values[0], 1);
   // Behind the last key there is nothing to reduce.
