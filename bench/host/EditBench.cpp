@@ -6,6 +6,7 @@
 #include <random>
 
 #include "bench/Shuffled.h"
+#include "bench/Timed.h"
 #include "host/animation/KeyReduction.h"
 #include "host/scene/Database.h"
 #include "host/scene/Marker.h"
@@ -71,48 +72,67 @@ class Scene {
   std::vector<Marker*> m_markers;
 };
 
-void setKey(benchmark::State& state, std::vector<int64> const& order) {
+// Makes what edit() changes one step of the journal.
+template <class Edit>
+void editTimed(benchmark::State& state, Timed timed, Edit edit) {
+  UndoJournal& journal = g_db->getUndoJournal();
+  HString name;
+  journal.setEnabled(timed != Timed::Edit);
+  runTimed(
+      state, timed,
+      [&] {
+        journal.beginStep();
+        edit();
+        journal.endStep("edit");
+      },
+      [&] { journal.undo(name); }, [&] { journal.redo(name); });
+  journal.setEnabled(false);
+}
+
+void setKey(benchmark::State& state, std::vector<int64> const& order, Timed timed) {
   for (auto _ : state) {
     state.PauseTiming();
     auto scene = std::make_unique<Scene>(1);
     Vec3Controller* channel = scene->channel(0);
-    state.ResumeTiming();
-    for (const int64 i : order) {
-      const HTimeRange range(i * period(), i * period());
-      channel->beginDataEdit(range);
-      channel->setKey(i * period(), Vec3(static_cast<double>(i), 1, 2), KeyTrack::kAll);
-      channel->endDataEdit();
-    }
-    state.PauseTiming();
+    editTimed(state, timed, [&] {
+      for (const int64 i : order) {
+        const HTimeRange range(i * period(), i * period());
+        channel->beginDataEdit(range);
+        channel->setKey(i * period(), Vec3(static_cast<double>(i), 1, 2), KeyTrack::kAll);
+        channel->endDataEdit();
+      }
+    });
     scene.reset();
     state.ResumeTiming();
   }
   state.SetItemsProcessed(state.iterations() * kKeys);
 }
-void setKeyInOrder(benchmark::State& state) { setKey(state, inOrder(kKeys)); }
-BENCHMARK(setKeyInOrder)->Unit(benchmark::kMillisecond);
-void setKeyAtRandom(benchmark::State& state) { setKey(state, shuffled(kKeys)); }
-BENCHMARK(setKeyAtRandom)->Unit(benchmark::kMillisecond);
+void setKeyInOrder(benchmark::State& state, Timed timed) { setKey(state, inOrder(kKeys), timed); }
+TIMED_BENCHMARKS(setKeyInOrder);
+void setKeyAtRandom(benchmark::State& state, Timed timed) { setKey(state, shuffled(kKeys), timed); }
+TIMED_BENCHMARKS(setKeyAtRandom);
 
 // A tenth of the keys of every marker, in 20 ranges.
-void cutKeyRanges(benchmark::State& state) {
+void cutKeyRanges(benchmark::State& state, Timed timed) {
   Scene scene(kMarkers);
   const KeyTrack walk = curveOf(Curve::Walk, kFrames);
   for (auto _ : state) {
     state.PauseTiming();
     scene.fill(walk);
+    editTimed(state, timed, [&] {
+      for (int m = 0; m < kMarkers; ++m)
+        for (int64 first = 0; first < kFrames; first += 1000) {
+          const HTimeRange range(first * period(), (first + 99) * period());
+          scene.channel(m)->beginDataEdit(range);
+          scene.channel(m)->deleteKeys(range, KeyTrack::kAll, false);
+          scene.channel(m)->endDataEdit();
+        }
+    });
     state.ResumeTiming();
-    for (int m = 0; m < kMarkers; ++m)
-      for (int64 first = 0; first < kFrames; first += 1000) {
-        const HTimeRange range(first * period(), (first + 99) * period());
-        scene.channel(m)->beginDataEdit(range);
-        scene.channel(m)->deleteKeys(range, KeyTrack::kAll, false);
-        scene.channel(m)->endDataEdit();
-      }
   }
   state.SetItemsProcessed(state.iterations() * kMarkers * kFrames / 10);
 }
-BENCHMARK(cutKeyRanges)->Unit(benchmark::kMillisecond);
+TIMED_BENCHMARKS(cutKeyRanges);
 
 void reduceTake(benchmark::State& state, Curve curve, Interpolation interpolation) {
   Scene scene(kMarkers);

@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "bench/Shuffled.h"
+#include "bench/Timed.h"
 #include "host/scene/Database.h"
 #include "host/scene/Marker.h"
 #include "host/time/HTimeManager.h"
@@ -37,25 +38,19 @@ class Fixture {
   Session m_session;
 };
 
-// What of lines is timed.
-enum class Timed { Lines, LinesWithJournal, Undo, Redo };
-
 void runLines(benchmark::State& state, std::vector<std::string> const& lines, Timed timed) {
   const std::string count = " " + std::to_string(lines.size());
   for (auto _ : state) {
     state.PauseTiming();
     auto fixture = std::make_unique<Fixture>();
-    fixture->setUndo(timed != Timed::Lines);
-    if (timed == Timed::Lines || timed == Timed::LinesWithJournal) state.ResumeTiming();
-    for (std::string const& line : lines)
-      if (!fixture->run(line)) state.SkipWithError(line.c_str());
-    if (timed == Timed::Undo) state.ResumeTiming();
-    if (timed == Timed::Undo || timed == Timed::Redo) fixture->run("undo" + count);
-    if (timed == Timed::Redo) {
-      state.ResumeTiming();
-      fixture->run("redo" + count);
-    }
-    state.PauseTiming();
+    fixture->setUndo(timed != Timed::Edit);
+    runTimed(
+        state, timed,
+        [&] {
+          for (std::string const& line : lines)
+            if (!fixture->run(line)) state.SkipWithError(line.c_str());
+        },
+        [&] { fixture->run("undo" + count); }, [&] { fixture->run("redo" + count); });
     fixture.reset();
     state.ResumeTiming();
   }
@@ -75,13 +70,8 @@ void setKeyLineInOrder(benchmark::State& state, Timed timed) {
 void setKeyLineAtRandom(benchmark::State& state, Timed timed) {
   runLines(state, setKeyLines(shuffled(kKeys)), timed);
 }
-#define LINES_BENCHMARK(name)                                                                   \
-  BENCHMARK_CAPTURE(name, lines, Timed::Lines)->Unit(benchmark::kMillisecond);                  \
-  BENCHMARK_CAPTURE(name, withJournal, Timed::LinesWithJournal)->Unit(benchmark::kMillisecond); \
-  BENCHMARK_CAPTURE(name, undo, Timed::Undo)->Unit(benchmark::kMillisecond);                    \
-  BENCHMARK_CAPTURE(name, redo, Timed::Redo)->Unit(benchmark::kMillisecond)
-LINES_BENCHMARK(setKeyLineInOrder);
-LINES_BENCHMARK(setKeyLineAtRandom);
+TIMED_BENCHMARKS(setKeyLineInOrder);
+TIMED_BENCHMARKS(setKeyLineAtRandom);
 
 // Reading and dispatching alone: the cheapest of lines, one that is refused, one with all kinds of values.
 void manyLines(benchmark::State& state, char const* line, bool fails) {
@@ -101,7 +91,7 @@ BENCHMARK_CAPTURE(manyLines, refused, "getNumKeys 1 <1 2 3> [a b c] \"text\" 'mo
 // One line on a take of 100 markers by 20,000 frames, all selected; `before` is run first.
 void oneLine(benchmark::State& state, char const* before, char const* line, int64 items, Timed timed) {
   Fixture fixture;
-  fixture.setUndo(timed != Timed::Lines);
+  fixture.setUndo(timed != Timed::Edit);
   std::vector<double> values;
   for (int64 i = 0; i < 20'000; ++i)
     values.insert(values.end(), {1.5 * static_cast<double>(i), 300.0 * ((i / 50) % 2), 7});
@@ -120,28 +110,27 @@ void oneLine(benchmark::State& state, char const* before, char const* line, int6
     }
     fixture.run("select -type Marker");
     if (*before && !fixture.run(before)) return state.SkipWithError(before);
-    if (timed == Timed::Lines || timed == Timed::LinesWithJournal) state.ResumeTiming();
-    if (!fixture.run(line)) return state.SkipWithError(line);
-    if (timed == Timed::Undo) state.ResumeTiming();
-    if (timed == Timed::Undo || timed == Timed::Redo) fixture.run("undo");
-    if (timed != Timed::Redo) continue;
+    bool done = true;
+    runTimed(
+        state, timed, [&] { done = fixture.run(line); }, [&] { fixture.run("undo"); },
+        [&] { fixture.run("redo"); });
+    if (!done) return state.SkipWithError(line);
     state.ResumeTiming();
-    fixture.run("redo");
   }
   state.SetItemsProcessed(state.iterations() * items);
 }
 void cutKeys(benchmark::State& state, Timed timed) {
   oneLine(state, "selectTime 5000 9999", "cutKeys -ranges", 500'000, timed);
 }
-LINES_BENCHMARK(cutKeys);
+TIMED_BENCHMARKS(cutKeys);
 void reduceKeys(benchmark::State& state, Timed timed) {
   oneLine(state, "", "reduceKeys -all", 2'000'000, timed);
 }
-LINES_BENCHMARK(reduceKeys);
+TIMED_BENCHMARKS(reduceKeys);
 // 1,000 selected keys on each of 100 markers.
 void setProperty(benchmark::State& state, Timed timed) {
   oneLine(state, "selectKeys Translation -frames 1 1000", "setProperty Translation.y 5", 100'000, timed);
 }
-LINES_BENCHMARK(setProperty);
+TIMED_BENCHMARKS(setProperty);
 
 }  // namespace
