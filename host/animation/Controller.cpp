@@ -167,7 +167,8 @@ int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayer
   const int64 first = range.getStart(), last = range.getEnd();
   const CutRuns cut(*this, first, last);
   for (ClipTrack const& track : m_tracks)
-    if (track.clip == clip && (allLayers || track.layer == g_db->getActiveLayer()))
+    if (track.clip == clip &&
+        (track.layer == g_db->getActiveLayer() || (allLayers && !clip->isLayerLocked(track.layer))))
       deleted += editTrack(clip, track.layer, first, last)->eraseRange(first, last, mask);
   if (deleted) changed();
   return static_cast<int>(deleted);

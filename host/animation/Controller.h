@@ -82,7 +82,8 @@ class Controller : public DataSource {
 
   virtual int selectKeys(HTimeRange const& range, unsigned mask);
   virtual int deselectKeys(HTimeRange const& range, unsigned mask);
-  // These answer how many keys lost something. allLayers: in every layer of the active clip.
+  // These answer how many keys lost something. allLayers: in every layer of the active clip that
+  // is not locked.
   virtual int deleteKey(int64 time, unsigned mask);
   virtual int deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers);
   virtual int deleteSelectedKeys(unsigned mask);

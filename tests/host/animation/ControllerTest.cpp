@@ -105,7 +105,15 @@ TEST_F(ControllerTest, LocksAnywhereForbidEdits) {
   m_clip->setLayerLocked(1, true);
   m_clip->setLayerLocked(7, true);
   EXPECT_TRUE(editable());
+  for (int layer = 0; layer < 2; ++layer) {
+    KeyTrack keys(KeyTrack::Shape::Scalar);
+    keys.set(0, {1});
+    length->setTrack(m_clip, layer, keys);
+  }
+  EXPECT_EQ(length->deleteKeys(HTimeRange::forever(), KeyTrack::kAll, true), 1)
+      << "the locked layer keeps its key";
   g_db->setActiveLayer(1);
+  EXPECT_EQ(length->getNumKeys(), 1);
   EXPECT_FALSE(editable());
   EXPECT_FALSE(g_db->setActiveLayer(2));
   EXPECT_FALSE(g_db->setActiveLayer(-1));
