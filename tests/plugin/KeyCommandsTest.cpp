@@ -231,6 +231,7 @@ TEST_F(KeyCommands, RefuseTimesBeyondTheTimeLine) {
   EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"frame", {kFar}}}), beyond);
   EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"seconds", {kFar}}}), beyond);
   EXPECT_EQ(run("pasteKeys", {}, {{"useFrame", {kFar}}}), beyond);
+  EXPECT_EQ(run("setKey", {"tx", 1}, {{"t", {kFar}}, {"onMod", {"n"}}}), beyond);
   EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"frame", {-2000000}}}), "false");
 }
 

@@ -2,9 +2,7 @@
 #include <map>
 #include <set>
 
-#include "host/scene/Constraints.h"
 #include "host/scene/Devices.h"
-#include "host/time/HTimeManager.h"
 #include "tests/plugin/SceneFixture.h"
 
 namespace {
@@ -15,25 +13,6 @@ class PropertyReaders : public SceneFixture {
   T* add(Module* module, Attribute::Type type, char const* name, std::vector<HString> labels = {}) {
     auto shared = std::make_shared<std::vector<HString> const>(std::move(labels));
     return static_cast<T*>(module->addCustomAttribute(Attribute::create(type, name, shared)));
-  }
-  // A channel with two keys, one at frame 0 and one at frame 10, and a default value.
-  template <class Channel, class Value>
-  void key(Module* module, char const* name, DataSource::PropertyType kind, Value at0, Value at10,
-           Value byDefault) {
-    auto* channel = static_cast<Channel*>(module->addChannel(name, kind));
-    if constexpr (std::is_same_v<Channel, Vec3Controller>)
-      channel->setConstValue(byDefault, true, false);
-    else
-      channel->setConstValue(byDefault, true);
-    HTimeManager* time = HTimeManager::getInstance();
-    module->beginDataEdit(HTimeRange::forever());
-    channel->setKey(time->getTime(0), at0, 7);
-    channel->setKey(time->getTime(10), at10, 7);
-    module->endDataEdit();
-  }
-  void goTo(int frame) {
-    HTimeManager* time = HTimeManager::getInstance();
-    time->setTime(time->getTime(frame), true);
   }
 };
 
@@ -126,33 +105,6 @@ TEST_F(PropertyReaders, NameTheGetterToUseForOtherKinds) {
   EXPECT_EQ(run("getVectorProperty", {"n", "float"}), "error: Unknown property: float\nfailed");
 }
 
-TEST_F(PropertyReaders, ReadChannelsNowOrByDefault) {
-  make<Clip>("take");
-  Node* node = make("n");
-  key<FloatController>(node, "Speed", DataSource::FloatProperty, 2.9, -2.9, 7.5);
-  key<IntController>(node, "Count", DataSource::IntProperty, 3, 4, 5);
-  key<BoolController>(node, "On", DataSource::BoolProperty, true, false, true);
-  key<Vec3Controller>(node, "Push", DataSource::Vec3Property, Vec3(1, 2, 3), Vec3(3, 2, 1), Vec3(9, 9, 9));
-
-  EXPECT_EQ(run("getIntProperty", {"n", "Speed"}), "2");
-  EXPECT_EQ(run("getFloatProperty", {"n", "Speed"}), "float 2.9");
-  EXPECT_EQ(run("getBooleanProperty", {"n", "On"}), "true");
-  EXPECT_EQ(run("getVectorProperty", {"n", "Push"}), "<1 2 3>");
-  goTo(10);
-  EXPECT_EQ(run("getIntProperty", {"n", "Speed"}), "-2");
-  EXPECT_EQ(run("getIntProperty", {"n", "Count"}), "4");
-  EXPECT_EQ(run("getProperty", {"n", "Push.z"}), "float 1");
-  EXPECT_EQ(run("getBooleanProperty", {"n", "On"}), "false");
-  for (char const* option : {"c", "d"}) {
-    EXPECT_EQ(run("getIntProperty", {"n", "Speed"}, {{option}}), "7");
-    EXPECT_EQ(run("getIntProperty", {"n", "Count"}, {{option}}), "5");
-    EXPECT_EQ(run("getFloatProperty", {"n", "Push.z"}, {{option}}), "float 9");
-    EXPECT_EQ(run("getBooleanProperty", {"n", "On"}, {{option}}), "true");
-    EXPECT_EQ(run("getVectorProperty", {"n", "Push"}, {{option}}), "<9 9 9>");
-  }
-  EXPECT_EQ(run("getVectorProperty", {"n", "Speed"}), "<0 0 0>");  // a channel, but no vector
-}
-
 TEST_F(PropertyReaders, AnswerRotationsInDegreesInTheNodesOwnOrder) {
   Node* node = make("n");
   auto* attribute = add<RotationAttribute>(node, Attribute::Rotation, "Turn");
@@ -172,39 +124,6 @@ TEST_F(PropertyReaders, AnswerRotationsInDegreesInTheNodesOwnOrder) {
   auto* device = make<AnalogDevice>("device");
   add<RotationAttribute>(device, Attribute::Rotation, "Turn")->setValue(rotation, true, true, true, true);
   EXPECT_EQ(run("getVectorProperty", {"device", "Turn"}), "<10 40 70>");
-}
-
-TEST_F(PropertyReaders, TruncateTimesAndColours) {
-  Clip* clip = make<Clip>("take");
-  clip->setSmpteOffset(-HTimeManager::getInstance()->getTicksPerFrame() * 29 / 10);
-  EXPECT_EQ(run("getIntProperty", {"take", "SmpteOffset"}), "-2");
-  EXPECT_EQ(run("getStringProperty", {"take", "SmpteOffset"}), "\"-00:00:00:02\"");
-
-  auto* color = static_cast<ColorAttribute*>(clip->getAttribute("Color"));
-  color->setValue({12.9, 255, 0.2}, true, true, true, true);
-  EXPECT_EQ(run("getIntArrayProperty", {"take", "Color"}), "[12 255 0]");
-  EXPECT_EQ(run("getVectorProperty", {"take", "Color"}), "<12.9 255 0.2>");
-}
-
-TEST_F(PropertyReaders, AnswerReferencesAsPaths) {
-  Node* left = make("left");
-  Node* source = make("m", left);
-  make("m", make("right"));
-  auto* constraint = make<SolvingConstraint>("tie");
-  EXPECT_EQ(run("getStringProperty", {"tie", "Source"}), "\"\"");
-  constraint->setSource(source);
-  EXPECT_EQ(run("getStringProperty", {"tie", "Source"}), "\"left\\m\"");
-  EXPECT_EQ(run("getStringProperty", {"tie", "Source"}, {{"fullPath"}}), "\"\\left\\m\"");
-
-  auto* cluster = make<LabelingCluster>("cluster");
-  EXPECT_EQ(run("getStringArrayProperty", {"cluster", "Markers"}), "[]");
-  TSimpleArray<Module*> markers;
-  for (Module* module :
-       {static_cast<Module*>(source), static_cast<Module*>(nullptr), static_cast<Module*>(left)})
-    markers.add(module);
-  static_cast<MultiModAttribute*>(cluster->getAttribute("Markers"))
-      ->setValue(markers, true, true, true, true);
-  EXPECT_EQ(run("getStringArrayProperty", {"cluster", "Markers"}), "[\"left\\m\" \"\" \"left\"]");
 }
 
 }  // namespace

@@ -160,16 +160,5 @@ TEST(UsesUndo, FindsTheLinesThatNameIt) {
   EXPECT_FALSE(usesUndo(""));
 }
 
-TEST_F(ScriptTextTest, TwoCommandsOfOneNameAreRefused) {
-  AnyCmd other;
-  try {
-    m_registry.add(&other, "other");
-    FAIL() << "added";
-  } catch (std::runtime_error const& error) {
-    EXPECT_STREQ(error.what(), "Two commands are named any: one of test, one of other");
-  }
-  EXPECT_EQ(m_registry.entries().size(), 1u);
-}
-
 }  // namespace
 }  // namespace talix

@@ -1,5 +1,4 @@
 // Names and paths against a search of the whole scene, under clashing names and random edits.
-#include <algorithm>
 #include <set>
 
 #include "host/scene/Devices.h"
@@ -188,72 +187,6 @@ TEST_F(PathTest, NewNamesAreTheLowestFree) {
         modules.erase(modules.begin() + static_cast<std::ptrdiff_t>(at));
     }
   }
-}
-
-// With a cost that grew with the siblings these would take minutes.
-TEST_F(PathTest, CrowdsOfOneNameAreNoProblem) {
-  constexpr int kMany = 30'000;
-  auto* parent = create<Node>("parent");
-  for (int i = 0; i < kMany; ++i) create<AnalogDevice>("a", parent);
-  EXPECT_EQ(parent->getChild(kMany - 1)->getName(), ("a_" + std::to_string(kMany - 1)).c_str());
-  for (int i = 0; i < kMany; ++i) {  // the lowest number is freed and taken again, beside a new one
-    remove(parent->getChild(1));
-    create<AnalogDevice>("a", parent);
-    EXPECT_EQ(parent->getChild(kMany - 1)->getParent(), parent);
-  }
-  for (int i = kMany; i-- > 0;) parent->getChild(i)->setName("same");
-  for (int i = 0; i < kMany; ++i) {
-    Module* first = named("\\parent\\same");
-    ASSERT_NE(first, nullptr);
-    remove(first);
-  }
-  EXPECT_EQ(parent->getNumChildren(), 0);
-
-  std::vector<Module*> twins;
-  for (int i = 0; i < kMany; ++i) twins.push_back(create<AnalogDevice>("Hips", create<Node>("S", nullptr)));
-  for (Module* twin : twins) EXPECT_EQ(twin->getMinimumPathString(false).Right(5), "\\Hips");
-  std::shuffle(twins.begin(), twins.end(), m_random);
-  for (Module* twin : twins) remove(twin);
-  EXPECT_EQ(named("S\\Hips"), nullptr);
-}
-
-class NamespaceTest : public SceneTest {
- protected:
-  static std::vector<std::string> parts(Module const* module) {
-    TArray<HString> names;
-    module->getNamespaces(names);
-    std::vector<std::string> all;
-    for (HString const& name : names) all.push_back(name.GetString());
-    return all;
-  }
-};
-
-TEST_F(NamespaceTest, PartsAddedRemovedAndReplaced) {
-  using Parts = std::vector<std::string>;
-  auto* node = create<Node>("Hips");
-  HString whole("left over");
-  node->getNamespace(whole);
-  EXPECT_TRUE(whole.IsEmpty());
-  EXPECT_EQ(parts(node), Parts{});
-  EXPECT_TRUE(node->addNamespace("actor1"));
-  EXPECT_TRUE(node->addNamespace("stage"));
-  EXPECT_EQ(node->getName(), "stage:actor1:Hips");
-  node->getNamespace(whole);
-  EXPECT_EQ(whole, "stage:actor1");
-  EXPECT_EQ(parts(node), (Parts{"stage", "actor1"}));
-  for (char const* refused : {"stage", "actor1", "stage:actor1", "", "a\\b", ":a", "a:"})
-    EXPECT_FALSE(node->addNamespace(refused)) << refused;
-  for (char const* absent : {"stag", "tage", "actor", "Hips", "actor1:stage", "", ":"}) {
-    EXPECT_FALSE(node->removeNamespace(absent)) << absent;
-    EXPECT_FALSE(node->replaceNamespace(absent, "x")) << absent;
-  }
-  EXPECT_TRUE(node->replaceNamespace("actor1", "b:c"));
-  EXPECT_EQ(node->getName(), "stage:b:c:Hips");
-  EXPECT_FALSE(node->replaceNamespace("stage", ""));
-  EXPECT_TRUE(node->removeNamespace("b:c"));
-  EXPECT_TRUE(node->removeNamespace("stage"));
-  EXPECT_EQ(node->getName(), "Hips");
-  EXPECT_EQ(named("\\Hips"), node);
 }
 
 }  // namespace

@@ -120,16 +120,6 @@ TEST(Timecode, RefusesTextsThatAreNone) {
   EXPECT_EQ(frame, 1'000'000'000LL * 3600 * 25 - 1);
 }
 
-TEST(TimeManager, NewScene) {
-  HTimeManager time;
-  EXPECT_EQ(time.getFrameRate(), HFrameRate());
-  EXPECT_EQ(time.getFrameRate().getTimecodeStandard(), CUSTOM);
-  EXPECT_EQ(time.getTime(), 0);
-  EXPECT_EQ(time.getAnimRange(), HTimeRange(0, 100 * k120));
-  EXPECT_EQ(time.getPlayRange(), HTimeRange(0, 100 * k120));
-  EXPECT_EQ(time.getNumSelectedRanges(), 0);
-}
-
 TEST(TimeManager, FramesAndTicks) {
   HTimeManager time;
   EXPECT_EQ(time.getTime(-3), -3 * k120);
