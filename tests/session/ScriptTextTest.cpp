@@ -145,14 +145,6 @@ TEST_F(ScriptTextTest, LineEndsAndTabsAreBlanks) {
   EXPECT_EQ(m_line.read("\r", m_registry), ScriptLine::Outcome::Blank);
 }
 
-TEST_F(ScriptTextTest, LongLinesAreReadWhole) {
-  std::string text = "[";
-  for (int i = 0; i < 100000; ++i) text += "name" + std::to_string(i) + " ";
-  ASSERT_EQ(read(text + "]"), ScriptLine::Outcome::Command);
-  EXPECT_EQ(m_line.args()[0].getNumItems(), 100000);
-  EXPECT_STREQ(m_line.args()[0].getStringValue(99999), "name99999");
-}
-
 TEST(UsesUndo, FindsTheLinesThatNameIt) {
   EXPECT_TRUE(usesUndo("select a\n  undo 3"));
   EXPECT_TRUE(usesUndo("\tredo\r\n"));

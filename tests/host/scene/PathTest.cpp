@@ -144,17 +144,6 @@ TEST_F(PathTest, OfEqualFullPathsTheFirstCreatedIsMeant) {
   EXPECT_EQ(c->getMinimumPathString(false), "a");
 }
 
-TEST_F(PathTest, RefusedNames) {
-  auto* node = create<Node>("node");
-  EXPECT_FALSE(node->setName(""));
-  EXPECT_FALSE(node->setName("a\\b"));
-  EXPECT_TRUE(node->setName("a b:.ü"));
-  EXPECT_EQ(named("a b:.ü"), node);
-  EXPECT_EQ(create<Node>("a\\b"), nullptr);
-  EXPECT_EQ(create<Node>("")->getName(), "Node");
-  EXPECT_EQ(create<Node>(nullptr)->getName(), "Node_1");
-}
-
 // The lowest free number, whatever came and went before.
 TEST_F(PathTest, NewNamesAreTheLowestFree) {
   std::vector<Module*> parents{nullptr, create<Node>("p"), create<Node>("q")};

@@ -176,12 +176,6 @@ TEST_F(TakeImportTest, MarkersBelowAMovedSubjectKeepTheirPlaceInTheWorld) {
   EXPECT_THAT(Vec3(save().points[0].positions.at(2).values.data()), Near(3.0, 2.0, 3.0));
 }
 
-TEST_F(TakeImportTest, ConversionsAreSaidOnce) {
-  openFile("probe_nan_01.c3d");
-  EXPECT_THAT(notes(), HasSubstr("info: probe_nan_01.c3d: lengths converted from m to mm\n"));
-  EXPECT_EQ(notes().find("from m to mm"), notes().rfind("from m to mm"));
-}
-
 TEST_F(TakeImportTest, JointsBecomeBonesWithTheOffsetAsPreTranslation) {
   open(skeletonTake("walk"));
   auto* hips = at<SolvingBone>("\\walk\\Hips");
