@@ -136,14 +136,9 @@ TEST_F(PropertyWriters, FillSquareMatrices) {
   EXPECT_EQ(grid->getValue().rows(), 3u);
 }
 
-TEST_F(PropertyWriters, MarkAttributesSetAndUnset) {
+TEST_F(PropertyWriters, SetAndUnsetEvents) {
   Node* node = make("n");
-  auto* paint = add<ColorAttribute>(node, Attribute::Color, "Paint");
   auto* button = add<EventAttribute>(node, Attribute::Event, "Go");
-  run("setProperty", {"Paint", Vec3(1, 2, 3)}, {{"onMod", {"n"}}});
-  EXPECT_FALSE(paint->isDefaultMode());
-  run("setProperty", {"Paint", "default"}, {{"onMod", {"n"}}});
-  EXPECT_TRUE(paint->isDefaultMode());
   run("setProperty", {"Go", "now", 5}, {{"onMod", {"n"}}});
   EXPECT_TRUE(button->isSet());
   run("unsetProperty", {"Go"}, {{"onMod", {"n"}}});

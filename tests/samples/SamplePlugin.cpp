@@ -11,7 +11,6 @@
 #include "host/scene/Database.h"
 #include "host/services/HInterface.h"
 #include "host/services/OperationStack.h"
-#include "host/time/HTimeManager.h"
 
 namespace {
 
@@ -117,25 +116,6 @@ class ChannelsCmd final : public ScriptCommand<ChannelsCmd> {
   }
 };
 
-// Play, animation and selected ranges in frames, start and end of each.
-class RangesCmd final : public ScriptCommand<RangesCmd> {
- public:
-  static constexpr CommandInfo info = {
-      .name = "ranges", .displayName = "Get Ranges", .category = "Testing", .returns = Variable::FloatArray};
-
-  bool execute(Given const&, Args const&, Variable& result) override {
-    HTimeManager const& times = *HTimeManager::getInstance();
-    std::vector<HTimeRange> ranges{times.getPlayRange(), times.getAnimRange()};
-    for (int i = 0; i < times.getNumSelectedRanges(); ++i) ranges.push_back(times.getSelectedTimeRange(i));
-    result = Variable(Variable::FloatArray, static_cast<int>(2 * ranges.size()));
-    for (size_t i = 0; i < ranges.size(); ++i) {
-      result.setValue(times.getFrameDouble(ranges[i].getStart()), static_cast<int>(2 * i));
-      result.setValue(times.getFrameDouble(ranges[i].getEnd()), static_cast<int>(2 * i + 1));
-    }
-    return true;
-  }
-};
-
 // Logs at every level, then fails as it is told.
 class FailCmd final : public ScriptCommand<FailCmd> {
  public:
@@ -200,9 +180,9 @@ class SamplePlugin final : public CommandPluginBase {
   Command* getCommand(int index) const override { return m_commands[index]; }
 
   bool initialise() override {
-    for (Command* command : std::initializer_list<Command*>{new EchoCmd, new TypesCmd, new MakeCmd,
-                                                            new SelectionCmd, new ChannelsCmd, new RangesCmd,
-                                                            new FailCmd, new WorkCmd, new AskCmd})
+    for (Command* command :
+         std::initializer_list<Command*>{new EchoCmd, new TypesCmd, new MakeCmd, new SelectionCmd,
+                                         new ChannelsCmd, new FailCmd, new WorkCmd, new AskCmd})
       m_commands.add(command);
     m_commands.add(nullptr);  // one that could not be made
 #ifdef SAMPLE_CLASHES

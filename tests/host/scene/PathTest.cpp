@@ -2,7 +2,6 @@
 #include <set>
 
 #include "host/scene/Devices.h"
-#include "host/scene/ModulePath.h"
 #include "host/scene/SceneIndex.h"
 #include "tests/host/scene/SceneFixture.h"
 
@@ -122,13 +121,6 @@ TEST_F(PathTest, FormsOfAPath) {
   EXPECT_EQ(named("\\Hips")->getParent(), nullptr);
   for (char const* none : {"", "\\", "Hips", "subject", "\\Subject\\Hips\\", "Subject\\\\Hips", "ect\\Hips"})
     EXPECT_EQ(named(none), nullptr) << none;
-  ModulePath path(hips);
-  EXPECT_EQ(path.getFullPathString(), "\\Subject\\Hips");
-  EXPECT_EQ(path.pop(), hips);
-  EXPECT_EQ(path.getFullPathString(), "\\Subject");
-  EXPECT_EQ(path.pop(), subject);
-  EXPECT_EQ(path.pop(), nullptr);
-  EXPECT_TRUE(path.getFullPathString().IsEmpty());
 }
 
 TEST_F(PathTest, OfEqualFullPathsTheFirstCreatedIsMeant) {
