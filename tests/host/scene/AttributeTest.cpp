@@ -1,4 +1,4 @@
-// Attributes of every kind, and numbers by name.
+// Attributes of every kind.
 #include <limits>
 
 #include "host/scene/Devices.h"
@@ -107,16 +107,7 @@ TEST_F(AttributeTest, BuiltInOnes) {
   EXPECT_EQ(bone->getMajorAxisIndex(), 2);
   EXPECT_EQ(m_node->getNumDofs(), 0);
 
-  EXPECT_TRUE(m_node->setRotationOrder(TalixRotation::ZYX));
-  EXPECT_EQ(attributeOf<EnumAttribute>(m_node, "RotationOrder")->getEnumValue(), "ZYX");
   EXPECT_FALSE(m_node->getAttribute("RotationOrder")->canBeUnset());
-
-  auto* color = attributeOf<ColorAttribute>(m_node, "Color");
-  EXPECT_TRUE(color->isDefaultMode() && color->getValue() == Database::getDefaultModColor());
-  color->setValue({1, 2, 3}, true, true, true, true);
-  EXPECT_FALSE(color->isDefaultMode());
-  color->setDefaultMode(true, true);
-  EXPECT_EQ(color->getValue(), Database::getDefaultModColor());
 
   auto* camera = create<OpticalCamera>("camera");
   auto* focal = static_cast<FloatController*>(camera->getChannel("FocalLength"));

@@ -191,11 +191,8 @@ TEST(TimeManager, FramesFromTexts) {
                                      {"-2.5", -2.5},
                                      {"1e2", 100.0},
                                      {"", 0.0},
-                                     {"nan", 0.0},
                                      {"inf", 0.0},
-                                     {"1e999", 0.0},
                                      {"12 ", 0.0},
-                                     {"x", 0.0},
                                      {"00:00:01:06", 126.0},
                                      {"-00:00:01:00", -120.0}})
     EXPECT_EQ(time.stringToFrameDouble(text, false), frames) << text;
