@@ -171,6 +171,17 @@ TEST_F(ControllerTest, BlendsAreWeightedMeans) {
   EXPECT_EQ(length->getValue(0), 7) << "no source counts";
 }
 
+TEST_F(ControllerTest, KeysOfComponents) {
+  auto* place = m_node->getTranslationChannel();
+  place->setComponentKey(10, 5, 2);
+  place->setKey(20, {1, 2, 3}, 7);
+  EXPECT_EQ(place->getNumKeys(1), 1);
+  EXPECT_TRUE(place->keyHasComponents(0, 2) && !place->keyHasComponents(0, 7));
+  EXPECT_EQ(place->getComponentValue(10, 1), 1) << "x is keyed at 20 only";
+  EXPECT_EQ(place->getKeyRange(), HTimeRange(10, 20));
+  EXPECT_EQ(m_node->getDataRange(), HTimeRange(10, 20));
+}
+
 TEST_F(ControllerTest, UnsoundNumbersGoNowhere) {
   auto* length = channel<FloatController>("Length", DataSource::FloatProperty);
   length->setConstValue(kNan, true);
