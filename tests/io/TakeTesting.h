@@ -32,6 +32,11 @@ std::string errorOf(const std::function<void()>& work);
 // All notes, a line each.
 std::string notesOf(const std::vector<TakeNote>& notes);
 
+// The first difference between what two takes hold; empty: none. How a file held it does not count: format,
+// name, variant, notes, analog scaling. Numbers may differ by `tolerance` times their size (at least 1),
+// rotations by 1e-10 at most.
+std::string differenceOf(const Take& a, const Take& b, double tolerance = 1e-9);
+
 // Reads every shortened and many damaged forms of a file's content: each must give a take or a FileError that
 // names the file. `damages` random changes of one to four bytes come from a fixed seed.
 void expectSurvivesDamage(const std::string& content, const std::string& suffix, size_t step, int damages,

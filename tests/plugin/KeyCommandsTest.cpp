@@ -200,17 +200,6 @@ TEST_F(RotationKeys, GiveSingleAngles) {
   expectTurn(to, 8, turn(TalixRotation::ZYX, {1, 40, 3}));
 }
 
-// The way from the point to itself has no direction.
-TEST_F(KeyCommands, CountThePlanesPointAsBehindIt) {
-  Node* node = make("n");
-  for (int i = 0; i < 3; ++i)
-    node->getTranslationChannel()->setKey(at(i), i == 1 ? Vec3(1, 2, 3) : Vec3(1, 2.5, 3), 7);
-  selectOnly(node);
-  EXPECT_EQ(run("findPlaneCrossing", {1, 2, 3, 0, 1, 0}),
-            "info: Found 1 keys that penetrate the plane\nnothing");
-  EXPECT_EQ(run("getSelectedKeys", {"Translation"}), "[1]");
-}
-
 TEST_F(KeyCommands, RefuseTimesBeyondTheTimeLine) {
   Node* node = make("n");
   activate({"Translation"});
@@ -231,6 +220,7 @@ TEST_F(KeyCommands, RefuseTimesBeyondTheTimeLine) {
   EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"frame", {kFar}}}), beyond);
   EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"seconds", {kFar}}}), beyond);
   EXPECT_EQ(run("pasteKeys", {}, {{"useFrame", {kFar}}}), beyond);
+  EXPECT_EQ(run("setKey", {"tx", 1}, {{"t", {kFar}}, {"onMod", {"n"}}}), beyond);
   EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"frame", {-2000000}}}), "false");
 }
 

@@ -1,13 +1,11 @@
 // What scripts cannot see of the property and key writers: events, selection flags, values without a reader.
 #include <array>
-#include <climits>
 #include <gmock/gmock.h>
 #include <typeinfo>
 #include <utility>
 
 #include "host/animation/PropertyTable.h"
 #include "host/services/HEvent.h"
-#include "host/time/HTimeManager.h"
 #include "tests/plugin/SceneFixture.h"
 
 namespace {
@@ -80,20 +78,6 @@ TEST_F(PropertyWriters, TellAttributeViewsOfFailuresOnly) {
   EXPECT_THAT(events(), ElementsAre("HReloadAttributesEvent"));
 }
 
-TEST_F(PropertyWriters, KeyNothingBeyondTheTimeLine) {
-  Node* node = make("n");
-  const auto keyAt = [&](int frame) {
-    return run("setKey", {"Translation", Vec3(1, 2, 3)}, {{"t", {frame}}, {"onMod", {"n"}}});
-  };
-  EXPECT_EQ(keyAt(INT_MIN), "nothing");
-  HFrameRate rate;
-  rate.setFrameRate(0.1);
-  HTimeManager::getInstance()->setFrameRate(rate);
-  EXPECT_EQ(keyAt(INT_MAX), "error: Frame 2147483647 lies beyond the time line.\nfailed");
-  EXPECT_EQ(keyAt(INT_MIN), "error: Frame -2147483648 lies beyond the time line.\nfailed");
-  EXPECT_EQ(node->getTranslationChannel()->getNumKeys(), 1);
-}
-
 TEST_F(PropertyWriters, DropActivePropertiesThatNobodyHasWhenTheyFollow) {
   make("n");
   PropertyTable& table = PropertyTable::getInstance();
@@ -152,33 +136,13 @@ TEST_F(PropertyWriters, FillSquareMatrices) {
   EXPECT_EQ(grid->getValue().rows(), 3u);
 }
 
-TEST_F(PropertyWriters, MarkAttributesSetAndUnset) {
+TEST_F(PropertyWriters, SetAndUnsetEvents) {
   Node* node = make("n");
-  auto* paint = add<ColorAttribute>(node, Attribute::Color, "Paint");
   auto* button = add<EventAttribute>(node, Attribute::Event, "Go");
-  run("setProperty", {"Paint", Vec3(1, 2, 3)}, {{"onMod", {"n"}}});
-  EXPECT_FALSE(paint->isDefaultMode());
-  run("setProperty", {"Paint", "default"}, {{"onMod", {"n"}}});
-  EXPECT_TRUE(paint->isDefaultMode());
   run("setProperty", {"Go", "now", 5}, {{"onMod", {"n"}}});
   EXPECT_TRUE(button->isSet());
   run("unsetProperty", {"Go"}, {{"onMod", {"n"}}});
   EXPECT_FALSE(button->isSet());
-}
-
-// The last "-onMod" decides, and each must name a module; it goes before every other choice.
-TEST_F(PropertyWriters, FindTheirModules) {
-  Node *a = make("a"), *b = make("b");
-  auto* count = add<IntAttribute>(a, Attribute::Integer, "Count");
-  auto* other = add<IntAttribute>(b, Attribute::Integer, "Count");
-  run("setProperty", {"Count", 1}, {{"onMod", {"a"}}, {"onMod", {"b"}}, {"all"}});
-  EXPECT_EQ(count->getValue(), 0);
-  EXPECT_EQ(other->getValue(), 1);
-  EXPECT_EQ(run("setProperty", {"Count", 2}, {{"onMod", {"nobody"}}, {"onMod", {"b"}}}),
-            "error: nobody is not a valid unique path to a Module in the scene.\nfailed");
-  EXPECT_EQ(run("setProperty", {"Count", 2}, {{"type", {"None"}}, {"onMod", {"nobody"}}}),
-            "error: None is not a Module type\nfailed");
-  EXPECT_EQ(other->getValue(), 1);
 }
 
 }  // namespace

@@ -1,7 +1,6 @@
 // A small command plug-in for the tests of the session: commands that answer what they were given, that make
 // and show things in the scene, and that fail in every way there is.
 
-#include <cmath>
 #include <csignal>
 #include <initializer_list>
 #include <new>
@@ -12,7 +11,6 @@
 #include "host/scene/Database.h"
 #include "host/services/HInterface.h"
 #include "host/services/OperationStack.h"
-#include "host/time/HTimeManager.h"
 
 namespace {
 
@@ -80,55 +78,6 @@ class MakeCmd final : public ScriptCommand<MakeCmd> {
   }
 };
 
-// Keys a whole channel with zeros at some frames.
-class KeyCmd final : public ScriptCommand<KeyCmd> {
- public:
-  static constexpr CommandInfo info = {
-      .name = "key",
-      .displayName = "Set Keys",
-      .category = "Testing",
-      .args = {"path channel frame ...", 3, ArgsInfo::kAny, {Variable::String, Variable::String}}};
-
-  bool execute(Given const&, Args const& args, Variable&) override {
-    Controller* channel = moduleAt(args[0])->getChannel(args[1].getStringValue(-1));
-    if (!channel || !channel->isEditable()) {
-      logError("%s cannot be edited", args[1].getStringValue(-1));
-      return false;
-    }
-    channel->beginDataEdit(HTimeRange::forever());
-    for (int i = 2; i < args.getCount(); ++i)
-      channel->writeKeyAt(HTimeManager::getInstance()->getTime(args[i].getIntValue(-1)), {0, 0, 0, 1}, 7);
-    channel->endDataEdit();
-    return true;
-  }
-};
-
-// The frames of the keys of a channel, or of those selected in all components of a mask.
-class KeysCmd final : public ScriptCommand<KeysCmd> {
- public:
-  static constexpr CommandInfo info = {.name = "keys",
-                                       .displayName = "Get Keys",
-                                       .category = "Testing",
-                                       .args = {"path channel", 2, 2, {Variable::String, Variable::String}},
-                                       .options = {{"selected", 1, Variable::Int}},
-                                       .returns = Variable::IntArray};
-
-  bool execute(Given const& given, Args const& args, Variable& result) override {
-    Controller const& channel = *moduleAt(args[0])->getChannel(args[1].getStringValue(-1));
-    CommandOption const* selected = GivenOptions(given).find(0);
-    std::vector<int> frames;
-    for (int i = 0; i < channel.getNumKeys(); ++i) {
-      const int64 time = channel.getKeyTime(i);
-      if (!selected ||
-          channel.isKeySelectedAt(time, static_cast<unsigned>(selected->getArg(0).getIntValue(-1))))
-        frames.push_back(HTimeManager::getInstance()->getFrame(time));
-    }
-    result = Variable(Variable::IntArray, static_cast<int>(frames.size()));
-    for (size_t i = 0; i < frames.size(); ++i) result.setValue(frames[i], static_cast<int>(i));
-    return true;
-  }
-};
-
 // The selected modules; the primary one last, after a blank name.
 class SelectionCmd final : public ScriptCommand<SelectionCmd> {
  public:
@@ -164,92 +113,6 @@ class ChannelsCmd final : public ScriptCommand<ChannelsCmd> {
                       i);
     }
     return true;
-  }
-};
-
-// Play, animation and selected ranges in frames, start and end of each.
-class RangesCmd final : public ScriptCommand<RangesCmd> {
- public:
-  static constexpr CommandInfo info = {
-      .name = "ranges", .displayName = "Get Ranges", .category = "Testing", .returns = Variable::FloatArray};
-
-  bool execute(Given const&, Args const&, Variable& result) override {
-    HTimeManager const& times = *HTimeManager::getInstance();
-    std::vector<HTimeRange> ranges{times.getPlayRange(), times.getAnimRange()};
-    for (int i = 0; i < times.getNumSelectedRanges(); ++i) ranges.push_back(times.getSelectedTimeRange(i));
-    result = Variable(Variable::FloatArray, static_cast<int>(2 * ranges.size()));
-    for (size_t i = 0; i < ranges.size(); ++i) {
-      result.setValue(times.getFrameDouble(ranges[i].getStart()), static_cast<int>(2 * i));
-      result.setValue(times.getFrameDouble(ranges[i].getEnd()), static_cast<int>(2 * i + 1));
-    }
-    return true;
-  }
-};
-
-// An attribute's value, or its default; whether it is set is a line of information.
-class AttributeCmd final : public ScriptCommand<AttributeCmd> {
- public:
-  static constexpr CommandInfo info = {.name = "attribute",
-                                       .displayName = "Get Attribute",
-                                       .category = "Testing",
-                                       .args = {"path name", 2, 2, {Variable::String, Variable::String}},
-                                       .options = {{"default"}, {"labels"}}};
-
-  bool execute(Given const& given, Args const& args, Variable& result) override {
-    Attribute const* attribute = moduleAt(args[0])->getAttribute(args[1].getStringValue(-1));
-    if (!attribute) {
-      logError("no such attribute");
-      return false;
-    }
-    if (GivenOptions(given).has(info.option("labels"))) {
-      auto const* bits = objectAs<BitFieldAttribute>(attribute);
-      auto const& labels =
-          *(bits ? bits->getLabels() : static_cast<EnumAttribute const*>(attribute)->getLabels());
-      result = Variable(Variable::StringArray, static_cast<int>(labels.size()));
-      for (size_t i = 0; i < labels.size(); ++i) result.setValue(labels[i].GetStr(), static_cast<int>(i));
-      return true;
-    }
-    if (attribute->isSet()) logInfo("set");
-    const bool byDefault = GivenOptions(given).has(info.option("default"));
-    std::visit([&](auto const& value) { show(value, result); },
-               byDefault ? attribute->getRawDefault() : attribute->getRawValue());
-    return true;
-  }
-
- private:
-  static void show(std::monostate, Variable&) {}
-  static void show(int value, Variable& result) { result.setValue(value, -1); }
-  static void show(double value, Variable& result) { result.setValue(value, -1); }
-  static void show(bool value, Variable& result) {
-    result.setValue(value ? Variable::True : Variable::False, -1);
-  }
-  static void show(HString const& value, Variable& result) { result.setValue(value.GetStr(), -1); }
-  static void show(Vec3 const& value, Variable& result) { result.setValue(value, -1); }
-  static void show(int64 value, Variable& result) {
-    result.setValue(HTimeManager::getInstance()->getFrameDouble(value), -1);
-  }
-  static void show(Module* value, Variable& result) {
-    result.setValue(value ? value->getName().GetStr() : "", -1);
-  }
-  static void show(TalixRotation const& value, Variable& result) {
-    Vec3 angles;
-    value.getAsEuler(TalixRotation::XYZ, angles);
-    for (int i = 0; i < 3; ++i) angles[i] = std::round(angles[i] * 57.29577951308232) + 0.0;  // no -0
-    result.setValue(angles, -1);
-  }
-  static void show(Attribute::Bits const& value, Variable& result) {
-    result = Variable(Variable::BoolArray, static_cast<int>(value.size()));
-    for (size_t i = 0; i < value.size(); ++i) result.setValue(value[i] ? 1 : 0, static_cast<int>(i));
-  }
-  static void show(Attribute::Modules const& value, Variable& result) {
-    result = Variable(Variable::StringArray, static_cast<int>(value.size()));
-    for (size_t i = 0; i < value.size(); ++i)
-      result.setValue(value[i]->getName().GetStr(), static_cast<int>(i));
-  }
-  static void show(Matrix const& value, Variable& result) {
-    result = Variable(Variable::FloatArray, static_cast<int>(value.rows() * value.cols()));
-    for (uint64 i = 0; i < value.rows() * value.cols(); ++i)
-      result.setValue(value[i / value.cols()][i % value.cols()], static_cast<int>(i));
   }
 };
 
@@ -317,9 +180,9 @@ class SamplePlugin final : public CommandPluginBase {
   Command* getCommand(int index) const override { return m_commands[index]; }
 
   bool initialise() override {
-    for (Command* command : std::initializer_list<Command*>{
-             new EchoCmd, new TypesCmd, new MakeCmd, new KeyCmd, new KeysCmd, new SelectionCmd,
-             new ChannelsCmd, new RangesCmd, new AttributeCmd, new FailCmd, new WorkCmd, new AskCmd})
+    for (Command* command :
+         std::initializer_list<Command*>{new EchoCmd, new TypesCmd, new MakeCmd, new SelectionCmd,
+                                         new ChannelsCmd, new FailCmd, new WorkCmd, new AskCmd})
       m_commands.add(command);
     m_commands.add(nullptr);  // one that could not be made
 #ifdef SAMPLE_CLASHES

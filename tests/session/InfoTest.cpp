@@ -29,21 +29,6 @@ Shown info(std::string const& arguments, std::string const& errors = "2>&1") {
   return shown;
 }
 
-TEST(Info, ShowsATrialAtAGlance) {
-  const Shown shown = info("walkset_a_le_int.c3d");
-  EXPECT_EQ(shown.status, 0);
-  EXPECT_THAT(shown.text, testing::StartsWith("walkset_a_le_int.c3d\n"
-                                              "  format    C3D, Intel, integer\n"
-                                              "  frames    450 (1 to 450) at 50 a second, 9 s\n"
-                                              "  unit      mm\n"));
-  // Markers with gaps, the worst first; the others are only counted.
-  EXPECT_THAT(shown.text, HasSubstr("    marker  frames missing     %  gaps  longest\n"
-                                    "    PV2                 59  13.1     2       47\n"));
-  EXPECT_THAT(shown.text, HasSubstr("    16 markers are complete\n"));
-  EXPECT_THAT(shown.text, HasSubstr("  analog channels (16) at 200 a second\n"));
-  EXPECT_THAT(shown.text, HasSubstr("    2.720 s   RIC\n"));
-}
-
 TEST(Info, ShowsASkeletonAsATreeWithItsEndsFolded) {
   const Shown shown = info("two_frames_01.bvh");
   EXPECT_THAT(shown.text, HasSubstr("  skeleton: 18 joints, 5 end sites, 57 channels\n"

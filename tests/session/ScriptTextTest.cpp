@@ -145,30 +145,11 @@ TEST_F(ScriptTextTest, LineEndsAndTabsAreBlanks) {
   EXPECT_EQ(m_line.read("\r", m_registry), ScriptLine::Outcome::Blank);
 }
 
-TEST_F(ScriptTextTest, LongLinesAreReadWhole) {
-  std::string text = "[";
-  for (int i = 0; i < 100000; ++i) text += "name" + std::to_string(i) + " ";
-  ASSERT_EQ(read(text + "]"), ScriptLine::Outcome::Command);
-  EXPECT_EQ(m_line.args()[0].getNumItems(), 100000);
-  EXPECT_STREQ(m_line.args()[0].getStringValue(99999), "name99999");
-}
-
 TEST(UsesUndo, FindsTheLinesThatNameIt) {
   EXPECT_TRUE(usesUndo("select a\n  undo 3"));
   EXPECT_TRUE(usesUndo("\tredo\r\n"));
   EXPECT_FALSE(usesUndo("# undo\nselect undo\nundoing\n\n"));
   EXPECT_FALSE(usesUndo(""));
-}
-
-TEST_F(ScriptTextTest, TwoCommandsOfOneNameAreRefused) {
-  AnyCmd other;
-  try {
-    m_registry.add(&other, "other");
-    FAIL() << "added";
-  } catch (std::runtime_error const& error) {
-    EXPECT_STREQ(error.what(), "Two commands are named any: one of test, one of other");
-  }
-  EXPECT_EQ(m_registry.entries().size(), 1u);
 }
 
 }  // namespace

@@ -142,25 +142,6 @@ TEST(KeyTrack, AMillionKeysDeletedOneByOne) {
   EXPECT_EQ(full.count(), kMany);
 }
 
-TEST(KeyTrack, InRandomOrder) {
-  constexpr int64 kMany = 200'000;
-  std::vector<int64> order(kMany);
-  for (int64 i = 0; i < kMany; ++i) order[static_cast<size_t>(i)] = i;
-  std::shuffle(order.begin(), order.end(), std::mt19937(1));
-  KeyTrack track(Shape::Vector);
-  for (const int64 i : order) track.set(i * 3, {static_cast<double>(i) / 7, 0, 0});
-  ASSERT_STREQ(track.checkInvariants(), "");
-  ASSERT_EQ(track.count(), kMany);
-  int64 i = 0;
-  track.forEach(0, kMany, [&](Key const& key) {
-    ASSERT_EQ(key.time, i * 3);
-    ASSERT_EQ(key.values[0], static_cast<double>(i++) / 7);
-  });
-  EXPECT_EQ(track.eraseRange(3, (kMany - 2) * 3), kMany - 2);
-  EXPECT_EQ(track.count(), 2);
-  EXPECT_STREQ(track.checkInvariants(), "");
-}
-
 TEST(KeyTrack, ComparesKeysFlagsAndSelection) {
   KeyTrack a(Shape::Vector), b(Shape::Vector);
   for (const int64 t : {3, 1, 2}) a.set(t, {1, 2, 3});

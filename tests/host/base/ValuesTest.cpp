@@ -73,19 +73,6 @@ TEST(TSimpleArray, GrowsBySixteen) {
   EXPECT_THAT(capacities, ElementsAre(16, 32, 48, 64, 80, 96));
 }
 
-TEST(TSimpleArray, LargeArraysGrowInProportion) {
-  TSimpleArray<int> array;
-  int grown = 0;
-  for (int i = 0, capacity = 0; i < 1'000'000; ++i) {
-    array.add(i);
-    grown += array.getCapacity() != capacity;
-    capacity = array.getCapacity();
-  }
-  EXPECT_LT(grown, 150);
-  EXPECT_EQ(array[999'999], 999'999);
-  EXPECT_EQ(array.getCount(), 1'000'000);
-}
-
 TEST(TSimpleArray, CopiesAndMoves) {
   TSimpleArray<int> array(2, 3);
   for (int i = 0; i < 5; ++i) array.add(i * i);
@@ -122,26 +109,6 @@ TEST(RuntimeClass, KnowsItsAncestors) {
     EXPECT_EQ(HRuntimeClass::findClass(abstract)->getCreateFunction(), nullptr) << abstract;
   EXPECT_TRUE(SystemGroup::s_classSystemGroup.isSingleInstance());
   EXPECT_FALSE(bone->isSingleInstance());
-}
-
-TEST(Variable, TypesAndCounts) {
-  for (const auto type :
-       {Variable::None, Variable::Int, Variable::Float, Variable::String, Variable::Bool, Variable::Vector}) {
-    Variable single(type, 5);
-    EXPECT_EQ(single.getType(), type);
-    EXPECT_FALSE(single.isArray());
-    EXPECT_EQ(single.getNumItems(), type == Variable::None ? 0 : 1);
-    EXPECT_EQ(single.isNumber(), type == Variable::Int || type == Variable::Float || type == Variable::Bool);
-    if (type == Variable::None) continue;
-    Variable array(static_cast<Variable::VarType>(type + Variable::kArray), 3);
-    EXPECT_EQ(array.getType(), type + 16);
-    EXPECT_TRUE(array.isArray() && !array.isNumber());
-    EXPECT_EQ(array.getNumItems(), 3);
-    EXPECT_EQ(array.getArrayValue(2).getType(), type);
-    EXPECT_EQ(array.getArrayValue(3).getType(), Variable::None);
-    EXPECT_EQ(array.getArrayValue(-1).getType(), Variable::None);
-  }
-  EXPECT_EQ(Variable(Variable::IntArray, -3).getNumItems(), 0);
 }
 
 TEST(Variable, NumbersReadAsEachOther) {

@@ -1,7 +1,6 @@
-// Attributes of every kind, and numbers by name.
+// Attributes of every kind.
 #include <limits>
 
-#include "host/scene/Constraints.h"
 #include "host/scene/Devices.h"
 #include "host/scene/Setups.h"
 #include "tests/host/scene/SceneFixture.h"
@@ -60,17 +59,10 @@ TEST_F(AttributeTest, ValuesReadBackAndBadOnesAreRefused) {
 
   auto* choice = add<EnumAttribute>("e", Attribute::Enumeration, labels({"low", "high"}));
   EXPECT_TRUE(choice->setValue("high", true, true, true, true));
-  EXPECT_FALSE(choice->setValue("High", true, true, true, true));
   EXPECT_FALSE(choice->setIndex(2, true, true, true, true));
   EXPECT_FALSE(choice->setIndex(-1, true, true, true, true));
   EXPECT_TRUE(choice->getIndex() == 1 && choice->getEnumValue() == "high");
   EXPECT_TRUE(add<EnumAttribute>("none", Attribute::Enumeration)->getEnumValue().IsEmpty());
-
-  auto* bits = add<BitFieldAttribute>("b", Attribute::BitField, labels({"x", "y", "z"}));
-  EXPECT_TRUE(bits->setValue("y", true, true, true, true, true));
-  EXPECT_FALSE(bits->setValue("w", true, true, true, true, true));
-  EXPECT_TRUE(!bits->getField(0) && bits->getField(1) && bits->getField("y") && !bits->getField("w"));
-  EXPECT_TRUE(!bits->getField(-1) && !bits->getField(3) && bits->getLabel(2) == "z");
 
   auto* real = add<FloatAttribute>("f", Attribute::Float);
   EXPECT_TRUE(real->setValue(1e300, true, true, true, true));
@@ -88,9 +80,6 @@ TEST_F(AttributeTest, ValuesReadBackAndBadOnesAreRefused) {
   matrix->setValue(values, true, true, true, true);
   EXPECT_TRUE(matrix->getValue().rows() == 2 && matrix->getValue()[1][0] == 5 &&
               matrix->getValue()[0][1] == 0);
-  auto* text = add<MultiStringAttribute>("t", Attribute::MultiString);
-  text->setValue("a\nb", true, true, true, true);
-  EXPECT_EQ(text->getValue(), "a\nb");
 }
 
 TEST_F(AttributeTest, TimesAreFramesAndTimecode) {
@@ -110,85 +99,21 @@ TEST_F(AttributeTest, TimesAreFramesAndTimecode) {
   EXPECT_EQ(moment->getTime(), -kForever);
 }
 
-TEST_F(AttributeTest, NamesRename) {
-  auto* name = attributeOf<StringAttribute>(m_node, "Name");
-  EXPECT_EQ(name->getValue(), "node");
-  EXPECT_TRUE(name->setValue("other", true, true, 0, true, true));
-  EXPECT_EQ(named("\\other"), m_node);
-  EXPECT_FALSE(name->setValue("a\\b", true, true, 0, true, true));
-  EXPECT_FALSE(name->setValue("", true, true, 0, true, true));
-  EXPECT_EQ(name->getValue(), "other");
-}
-
-TEST_F(AttributeTest, NamesOfAttributesAndChannelsDiffer) {
-  EXPECT_EQ(add<IntAttribute>("Translation", Attribute::Integer), nullptr);
-  EXPECT_EQ(add<IntAttribute>("Visible", Attribute::Integer), nullptr);
-  EXPECT_EQ(add<IntAttribute>("a.b", Attribute::Integer), nullptr);
-  EXPECT_EQ(add<IntAttribute>("a\\b", Attribute::Integer), nullptr);
-  EXPECT_EQ(add<IntAttribute>("", Attribute::Integer), nullptr);
-  ASSERT_NE(add<IntAttribute>("visible", Attribute::Integer), nullptr) << "case counts";
-  EXPECT_EQ(m_node->addChannel("visible", DataSource::IntProperty), nullptr);
-  EXPECT_EQ(m_node->addChannel("a.b", DataSource::IntProperty), nullptr);
-}
-
 TEST_F(AttributeTest, BuiltInOnes) {
   auto* bone = create<SolvingBone>("bone");
   EXPECT_EQ(bone->getNumDofs(), 3);
-  auto* dofs = bone->getDofs();
-  char const* const names[] = {"Tx", "Ty", "Tz", "Rx", "Ry", "Rz"};
-  for (int i = 0; i < 6; ++i) {
-    EXPECT_EQ(dofs->getLabel(i), names[i]);
-    EXPECT_EQ(dofs->getField(i), i >= 3);
-  }
   EXPECT_EQ(bone->getMajorAxisIndex(), 0);
   attributeOf<EnumAttribute>(bone, "MajorAxis")->setValue("Z", true, true, true, true);
   EXPECT_EQ(bone->getMajorAxisIndex(), 2);
   EXPECT_EQ(m_node->getNumDofs(), 0);
 
-  EXPECT_TRUE(m_node->setRotationOrder(TalixRotation::ZYX));
-  EXPECT_EQ(attributeOf<EnumAttribute>(m_node, "RotationOrder")->getEnumValue(), "ZYX");
   EXPECT_FALSE(m_node->getAttribute("RotationOrder")->canBeUnset());
-  EXPECT_TRUE(m_node->isVisible());
-  m_node->setVisible(false, true);
-  EXPECT_FALSE(attributeOf<BoolAttribute>(m_node, "Visible")->getValue());
-
-  auto* color = attributeOf<ColorAttribute>(m_node, "Color");
-  EXPECT_TRUE(color->isDefaultMode() && color->getValue() == Database::getDefaultModColor());
-  color->setValue({1, 2, 3}, true, true, true, true);
-  EXPECT_FALSE(color->isDefaultMode());
-  color->setDefaultMode(true, true);
-  EXPECT_EQ(color->getValue(), Database::getDefaultModColor());
 
   auto* camera = create<OpticalCamera>("camera");
   auto* focal = static_cast<FloatController*>(camera->getChannel("FocalLength"));
   focal->setConstValue(35, true);
   attributeOf<EventAttribute>(camera, "Reset")->doCallBack();
   EXPECT_EQ(focal->getConstValue(), 0);
-}
-
-TEST_F(AttributeTest, ConstraintsAndClusters) {
-  auto* target = create<SolvingBone>("bone");
-  auto* constraint = create<LabelingConstraint>("k");
-  ASSERT_TRUE(constraint->setConstraintOffset({1, 0, 0}));
-  EXPECT_FALSE(constraint->setConstraintOffset({kNan, 0, 0}));
-  EXPECT_EQ(constraint->getConstraintOffsetWS(0), Vec3(1, 0, 0));
-  target->setConstLocalPos({10, 0, 0});
-  target->setConstLocalScale({2, 2, 2});
-  target->setConstLocalRot(TalixRotation({0, 0, 1.5707963267948966}), true);
-  constraint->setTarget(target);
-  EXPECT_LT((constraint->getConstraintOffsetWS(0) - Vec3(10, 2, 0)).length(), 1e-12);
-
-  auto* cluster = create<LabelingCluster>("cluster");
-  cluster->setConstLocalPos({0, 5, 0});
-  auto* marker = create<Marker>("m");
-  marker->setConstLocalPos({1, 2, 3});
-  TSimpleArray<Module*> list;
-  for (Module* module : {static_cast<Module*>(marker), static_cast<Module*>(nullptr)}) list.add(module);
-  attributeOf<MultiModAttribute>(cluster, "Markers")->setValue(list, true, true, true, true);
-  const TSimpleArray<Vec3> offsets = cluster->getMarkerOffsets();
-  ASSERT_EQ(offsets.getCount(), 2);
-  EXPECT_EQ(offsets[0], Vec3(1, -3, 3));
-  EXPECT_EQ(offsets[1], Vec3());
 }
 
 TEST_F(AttributeTest, ParametersAreTheNumbersOfASetup) {
@@ -204,41 +129,6 @@ TEST_F(AttributeTest, ParametersAreTheNumbersOfASetup) {
   EXPECT_EQ(setup->getParameter("text"), nullptr);
   EXPECT_EQ(setup->getParameter(2), nullptr);
   EXPECT_EQ(setup->getParameter(-1), nullptr);
-}
-
-TEST_F(AttributeTest, NumbersByName) {
-  auto* camera = create<OpticalCamera>("cam");
-  camera->setConstLocalPos({1, 2, 3});
-  camera->setRotationOrder(TalixRotation::ZXY);
-  TalixRotation rotation;
-  rotation.setAsEuler(TalixRotation::ZXY, {0.1, 0.2, 0.3});
-  camera->setConstLocalRot(rotation, true);
-  camera->setDeviceID(4);
-  const auto number = [&](char const* name) {
-    double value = kNan;
-    EXPECT_EQ(camera->getPropertyVal(name, value, false), "") << name;
-    return value;
-  };
-  EXPECT_EQ(number("Translation.y"), 2);
-  EXPECT_EQ(number("Translation.Z"), 3);
-  EXPECT_NEAR(number("Rotation.x"), 0.1 * 180 / 3.141592653589793, 1e-12);
-  EXPECT_EQ(number("Threshold"), 0);
-  EXPECT_EQ(number("DeviceID"), 4);
-  EXPECT_EQ(number("RotationOrder"), 4);
-  EXPECT_EQ(number("Visible"), 1);
-  EXPECT_EQ(number("Temperature"), 0);
-  double value = 5;
-  EXPECT_EQ(camera->getPropertyVal("Rotation", value, false),
-            "Use getVectorProperty for this type of property");
-  EXPECT_EQ(camera->getPropertyVal("Nothing", value, false), "Unknown property type: Nothing");
-  EXPECT_EQ(camera->getPropertyVal("Length", value, false),
-            "Cannot find property named Length on module cam");
-  EXPECT_EQ(value, 5);
-  create<Clip>("clip");
-  camera->setLocalPos(0, {9, 9, 9});
-  EXPECT_EQ(number("Translation.x"), 9);
-  EXPECT_EQ(camera->getPropertyVal("Translation.x", value, true), "");
-  EXPECT_EQ(value, 1) << "the default value";
 }
 
 }  // namespace

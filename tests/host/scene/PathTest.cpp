@@ -1,9 +1,7 @@
 // Names and paths against a search of the whole scene, under clashing names and random edits.
-#include <algorithm>
 #include <set>
 
 #include "host/scene/Devices.h"
-#include "host/scene/ModulePath.h"
 #include "host/scene/SceneIndex.h"
 #include "tests/host/scene/SceneFixture.h"
 
@@ -123,13 +121,6 @@ TEST_F(PathTest, FormsOfAPath) {
   EXPECT_EQ(named("\\Hips")->getParent(), nullptr);
   for (char const* none : {"", "\\", "Hips", "subject", "\\Subject\\Hips\\", "Subject\\\\Hips", "ect\\Hips"})
     EXPECT_EQ(named(none), nullptr) << none;
-  ModulePath path(hips);
-  EXPECT_EQ(path.getFullPathString(), "\\Subject\\Hips");
-  EXPECT_EQ(path.pop(), hips);
-  EXPECT_EQ(path.getFullPathString(), "\\Subject");
-  EXPECT_EQ(path.pop(), subject);
-  EXPECT_EQ(path.pop(), nullptr);
-  EXPECT_TRUE(path.getFullPathString().IsEmpty());
 }
 
 TEST_F(PathTest, OfEqualFullPathsTheFirstCreatedIsMeant) {
@@ -143,17 +134,6 @@ TEST_F(PathTest, OfEqualFullPathsTheFirstCreatedIsMeant) {
   b->setName("x");
   EXPECT_EQ(named("\\a"), c);
   EXPECT_EQ(c->getMinimumPathString(false), "a");
-}
-
-TEST_F(PathTest, RefusedNames) {
-  auto* node = create<Node>("node");
-  EXPECT_FALSE(node->setName(""));
-  EXPECT_FALSE(node->setName("a\\b"));
-  EXPECT_TRUE(node->setName("a b:.ü"));
-  EXPECT_EQ(named("a b:.ü"), node);
-  EXPECT_EQ(create<Node>("a\\b"), nullptr);
-  EXPECT_EQ(create<Node>("")->getName(), "Node");
-  EXPECT_EQ(create<Node>(nullptr)->getName(), "Node_1");
 }
 
 // The lowest free number, whatever came and went before.
@@ -188,72 +168,6 @@ TEST_F(PathTest, NewNamesAreTheLowestFree) {
         modules.erase(modules.begin() + static_cast<std::ptrdiff_t>(at));
     }
   }
-}
-
-// With a cost that grew with the siblings these would take minutes.
-TEST_F(PathTest, CrowdsOfOneNameAreNoProblem) {
-  constexpr int kMany = 30'000;
-  auto* parent = create<Node>("parent");
-  for (int i = 0; i < kMany; ++i) create<AnalogDevice>("a", parent);
-  EXPECT_EQ(parent->getChild(kMany - 1)->getName(), ("a_" + std::to_string(kMany - 1)).c_str());
-  for (int i = 0; i < kMany; ++i) {  // the lowest number is freed and taken again, beside a new one
-    remove(parent->getChild(1));
-    create<AnalogDevice>("a", parent);
-    EXPECT_EQ(parent->getChild(kMany - 1)->getParent(), parent);
-  }
-  for (int i = kMany; i-- > 0;) parent->getChild(i)->setName("same");
-  for (int i = 0; i < kMany; ++i) {
-    Module* first = named("\\parent\\same");
-    ASSERT_NE(first, nullptr);
-    remove(first);
-  }
-  EXPECT_EQ(parent->getNumChildren(), 0);
-
-  std::vector<Module*> twins;
-  for (int i = 0; i < kMany; ++i) twins.push_back(create<AnalogDevice>("Hips", create<Node>("S", nullptr)));
-  for (Module* twin : twins) EXPECT_EQ(twin->getMinimumPathString(false).Right(5), "\\Hips");
-  std::shuffle(twins.begin(), twins.end(), m_random);
-  for (Module* twin : twins) remove(twin);
-  EXPECT_EQ(named("S\\Hips"), nullptr);
-}
-
-class NamespaceTest : public SceneTest {
- protected:
-  static std::vector<std::string> parts(Module const* module) {
-    TArray<HString> names;
-    module->getNamespaces(names);
-    std::vector<std::string> all;
-    for (HString const& name : names) all.push_back(name.GetString());
-    return all;
-  }
-};
-
-TEST_F(NamespaceTest, PartsAddedRemovedAndReplaced) {
-  using Parts = std::vector<std::string>;
-  auto* node = create<Node>("Hips");
-  HString whole("left over");
-  node->getNamespace(whole);
-  EXPECT_TRUE(whole.IsEmpty());
-  EXPECT_EQ(parts(node), Parts{});
-  EXPECT_TRUE(node->addNamespace("actor1"));
-  EXPECT_TRUE(node->addNamespace("stage"));
-  EXPECT_EQ(node->getName(), "stage:actor1:Hips");
-  node->getNamespace(whole);
-  EXPECT_EQ(whole, "stage:actor1");
-  EXPECT_EQ(parts(node), (Parts{"stage", "actor1"}));
-  for (char const* refused : {"stage", "actor1", "stage:actor1", "", "a\\b", ":a", "a:"})
-    EXPECT_FALSE(node->addNamespace(refused)) << refused;
-  for (char const* absent : {"stag", "tage", "actor", "Hips", "actor1:stage", "", ":"}) {
-    EXPECT_FALSE(node->removeNamespace(absent)) << absent;
-    EXPECT_FALSE(node->replaceNamespace(absent, "x")) << absent;
-  }
-  EXPECT_TRUE(node->replaceNamespace("actor1", "b:c"));
-  EXPECT_EQ(node->getName(), "stage:b:c:Hips");
-  EXPECT_FALSE(node->replaceNamespace("stage", ""));
-  EXPECT_TRUE(node->removeNamespace("b:c"));
-  EXPECT_TRUE(node->removeNamespace("stage"));
-  EXPECT_EQ(node->getName(), "Hips");
-  EXPECT_EQ(named("\\Hips"), node);
 }
 
 }  // namespace

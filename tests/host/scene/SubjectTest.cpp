@@ -180,15 +180,6 @@ TEST_F(SubjectTest, WhatStaysAndWhatGoes) {
   EXPECT_EQ(g_db->getActiveLayer(), 1);
   removeSubject(two, false);
   EXPECT_EQ(b->getName(), "two:b") << "it has the namespace already";
-
-  auto* three = create<Character>("three");
-  for (int i = 0; i < 3; ++i) create<Marker>("m", three);
-  create<Marker>("unlabeled_1");
-  create<Character>("four");
-  g_db->getSubjectManager()->removeAllSubjects(true, true, true);
-  EXPECT_EQ(g_db->getSubjectManager()->getNumSubjects(), 0u);
-  for (char const* name : {"\\unlabeled", "\\unlabeled_1", "\\unlabeled_2", "\\unlabeled_3"})
-    EXPECT_TRUE(named(name) && named(name)->isKindOf(&Marker::s_classMarker)) << name;
 }
 
 }  // namespace

@@ -290,13 +290,9 @@ TEST_F(TransformTest, FlatAndUnsoundValuesDoNoHarm) {
   node->setConstLocalPos({0, nan, 0});
   node->setWSPos(0, {0, 0, nan});
   EXPECT_EQ(node->getLocalPos(0), Vec3(0, 6, 7));
-  auto* clip = create<Clip>("clip");
+  create<Clip>("clip");
   node->setLocalPos(0, {nan, 0, 0});
   EXPECT_EQ(node->getTranslationChannel()->getNumKeys(), 0);
-  clip->getAttribute("Locked");
-  static_cast<BoolAttribute*>(clip->getAttribute("Locked"))->setValue(true, true, true, true, true);
-  node->setLocalPos(0, {1, 1, 1});
-  EXPECT_EQ(node->getTranslationChannel()->getNumKeys(), 0) << "a locked clip takes no keys";
 }
 
 TEST_F(TransformTest, DeepChainsAreNoProblem) {

@@ -8,7 +8,6 @@
 #include "host/services/HEvent.h"
 #include "host/services/HInterface.h"
 #include "host/services/Log.h"
-#include "host/services/Manipulator.h"
 #include "host/services/OperationStack.h"
 
 namespace {
@@ -149,9 +148,6 @@ TEST(Interface, WithoutAnyoneToAskTheAnswerIsNo) {
   EXPECT_EQ(g_interface->askQuestion("Sure?", 0), 1);
   EXPECT_EQ(asked, "Sure?");
   g_interface->setAsker(nullptr);
-  Manipulator::setCurrentToolType(Manipulator::Rotate);
-  EXPECT_EQ(Manipulator::getCurrentToolType(), Manipulator::Rotate);
-  Manipulator::setCurrentToolType(Manipulator::Select);
 }
 
 class Lines : public LogSink {

@@ -120,16 +120,6 @@ TEST(Timecode, RefusesTextsThatAreNone) {
   EXPECT_EQ(frame, 1'000'000'000LL * 3600 * 25 - 1);
 }
 
-TEST(TimeManager, NewScene) {
-  HTimeManager time;
-  EXPECT_EQ(time.getFrameRate(), HFrameRate());
-  EXPECT_EQ(time.getFrameRate().getTimecodeStandard(), CUSTOM);
-  EXPECT_EQ(time.getTime(), 0);
-  EXPECT_EQ(time.getAnimRange(), HTimeRange(0, 100 * k120));
-  EXPECT_EQ(time.getPlayRange(), HTimeRange(0, 100 * k120));
-  EXPECT_EQ(time.getNumSelectedRanges(), 0);
-}
-
 TEST(TimeManager, FramesAndTicks) {
   HTimeManager time;
   EXPECT_EQ(time.getTime(-3), -3 * k120);
@@ -201,11 +191,8 @@ TEST(TimeManager, FramesFromTexts) {
                                      {"-2.5", -2.5},
                                      {"1e2", 100.0},
                                      {"", 0.0},
-                                     {"nan", 0.0},
                                      {"inf", 0.0},
-                                     {"1e999", 0.0},
                                      {"12 ", 0.0},
-                                     {"x", 0.0},
                                      {"00:00:01:06", 126.0},
                                      {"-00:00:01:00", -120.0}})
     EXPECT_EQ(time.stringToFrameDouble(text, false), frames) << text;

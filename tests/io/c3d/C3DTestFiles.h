@@ -13,11 +13,6 @@ namespace talix {
 
 bool hasNote(const std::vector<TakeNote>& notes, TakeNote::Level level, const std::string& part);
 
-// Everything but name, variant, notes and analog scaling, which say how a file held it. Values may differ by
-// `tolerance` times their size (at least 1).
-void expectSameTake(const Take& a, const Take& b, double tolerance);
-void expectSameTrack(const KeyTrack& a, const KeyTrack& b, double tolerance, const std::string& what);
-
 // An Intel file with integer coordinates and two points, made by hand. Change what is of interest, then take
 // its bytes.
 struct SmallC3D {

@@ -43,8 +43,4 @@ Take smallTake(const std::string& name, int64 frames = 5, int64 first = 1);
 TakePoint& addPoint(Take& take, const std::string& subject, const std::string& label, const Vec3& start,
                     const std::string& seen = "");
 
-// The first difference between what a take read from a file and one made from the scene hold; empty: none.
-// Lengths may differ by rounding.
-std::string differenceOf(const Take& read, const Take& made);
-
 }  // namespace talix

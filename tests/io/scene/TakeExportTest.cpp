@@ -2,6 +2,7 @@
 
 #include "host/scene/Bones.h"
 #include "host/scene/Character.h"
+#include "tests/io/TakeTesting.h"
 #include "tests/io/scene/SceneTesting.h"
 
 namespace talix {

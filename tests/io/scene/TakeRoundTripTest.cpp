@@ -27,7 +27,12 @@ TEST_F(TakeRoundTrip, EveryRealTakeComesBackAsItWasRead) {
     g_db->newScene();
     HTimeManager::getInstance()->reset();
     open(take);
-    EXPECT_EQ(differenceOf(take, save()), "") << name;
+    const Take made = save();
+    EXPECT_EQ(differenceOf(take, made), "") << name;
+    EXPECT_EQ(made.format + " " + made.name, take.format + " " + take.name);
+    for (size_t i = 0; i < take.analog.size(); ++i)
+      EXPECT_TRUE(made.analog[i].scale == take.analog[i].scale &&
+                  made.analog[i].offset == take.analog[i].offset);
     EXPECT_FALSE(warned("left out")) << name << ": " << notes();
     ++read;
   }
