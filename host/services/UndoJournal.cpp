@@ -34,7 +34,11 @@ void UndoJournal::endStep(HString const& name) {
   step.changes.swap(m_open);
   const bool changed = std::any_of(step.changes.begin(), step.changes.end(),
                                    [](auto const& change) { return !change->isVoid(); });
-  if (!changed) return;
+  if (!changed) {
+    // What is hidden, as the numbers behind the order of the selection, becomes what earlier steps know.
+    swapAll(step.changes, true);
+    return;
+  }
 
   step.name = name;
   step.changes.shrink_to_fit();
@@ -59,6 +63,15 @@ void UndoJournal::keepWithinLimit() {
   }
 }
 
+void UndoJournal::swapAll(Changes& changes, bool backward) {
+  if (backward) {
+    for (auto change = changes.rbegin(); change != changes.rend(); ++change) (*change)->swap();
+  } else {
+    for (auto const& change : changes) change->swap();
+  }
+  g_db->settle();
+}
+
 bool UndoJournal::undo(HString& name) { return move(m_done, m_undone, true, name); }
 
 bool UndoJournal::redo(HString& name) { return move(m_undone, m_done, false, name); }
@@ -69,13 +82,7 @@ bool UndoJournal::move(std::deque<Step>& from, std::deque<Step>& to, bool backwa
   s_step = 0;
   to.push_back(std::move(from.back()));
   from.pop_back();
-  auto& changes = to.back().changes;
-  if (backward) {
-    for (auto change = changes.rbegin(); change != changes.rend(); ++change) (*change)->swap();
-  } else {
-    for (auto const& change : changes) change->swap();
-  }
-  g_db->settle();
+  swapAll(to.back().changes, backward);
   s_step = step;
   name = to.back().name;
   return true;

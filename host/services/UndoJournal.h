@@ -83,13 +83,15 @@ class UndoJournal {
   void add(std::unique_ptr<UndoChange> change);
 
  private:
+  using Changes = std::vector<std::unique_ptr<UndoChange>>;
   struct Step {
-    std::vector<std::unique_ptr<UndoChange>> changes;
+    Changes changes;
     HString name;
     int64 memory = 0;
   };
 
   bool move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name);
+  static void swapAll(Changes& changes, bool backward);
   void keepWithinLimit();
 
   static uint64 s_step;
@@ -97,7 +99,7 @@ class UndoJournal {
   bool m_enabled = false;
   int m_depth = 0;
   uint64 m_lastStep = 0;
-  std::vector<std::unique_ptr<UndoChange>> m_open;
+  Changes m_open;
   std::deque<Step> m_done, m_undone;  // the next one to be undone or redone is at the back
   int64 m_memoryUse = 0;
   int64 m_memoryLimit = int64{1} << 30;
