@@ -6,8 +6,11 @@
 #include <fstream>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <pty.h>
 #include <sstream>
 #include <sys/wait.h>
+#include <termios.h>
+#include <unistd.h>
 
 namespace {
 
@@ -34,6 +37,40 @@ class ProgramTest : public testing::Test {
     const int status = std::system(command.c_str());
     m_out = text("out");
     m_err = text("err");
+    return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
+  }
+  // Runs "talix run" at a terminal without echo and types. What it shows is in m_out, "<" for a carriage
+  // return.
+  int runAtTerminal(std::vector<std::string> args, std::string const& typed) {
+    const std::string bin = TALIX_BIN;
+    args.insert(args.begin(), {bin + "/talix", "run", "--plugin", bin + "/sample/Sample.so"});
+    std::vector<char*> words;
+    for (std::string& arg : args) words.push_back(arg.data());
+    words.push_back(nullptr);
+    int terminal = -1;
+    const pid_t child = forkpty(&terminal, nullptr, nullptr, nullptr);
+    if (child == 0) {
+      termios quiet{};
+      tcgetattr(0, &quiet);
+      quiet.c_lflag &= ~static_cast<tcflag_t>(ECHO);
+      tcsetattr(0, TCSANOW, &quiet);
+      execv(words[0], words.data());
+      _exit(127);
+    }
+    if (child < 0) return -1;
+    m_out.clear();
+    char chunk[4096];
+    bool toType = !typed.empty();
+    for (ssize_t size = 0; (size = read(terminal, chunk, sizeof chunk)) > 0;) {
+      for (const char c : std::string_view(chunk, static_cast<size_t>(size))) {
+        if (c == '\n' && m_out.ends_with('<')) m_out.pop_back();
+        m_out += c == '\r' ? '<' : c;
+      }
+      if (toType) toType = ::write(terminal, typed.data(), typed.size()) < 0;
+    }
+    close(terminal);
+    int status = 0;
+    waitpid(child, &status, 0);
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
   }
   std::string text(std::string const& file) const {
@@ -185,31 +222,12 @@ TEST_F(ProgramTest, InterruptsCancelATaskOnce) {
 
 // Through a terminal of its own: what it shows, and what is typed at questions.
 TEST_F(ProgramTest, TerminalsShowProgressAndAnswerQuestions) {
-  write("terminal.py", R"(
-import os, pty, sys, termios
-pid, fd = pty.fork()
-if pid == 0:
-    quiet = termios.tcgetattr(0)
-    quiet[3] &= ~termios.ECHO
-    termios.tcsetattr(0, termios.TCSANOW, quiet)
-    os.execv(sys.argv[2], sys.argv[2:])
-seen, typed = b"", sys.argv[1].encode()
-try:
-    while chunk := os.read(fd, 4096):
-        seen += chunk
-        if typed: os.write(fd, typed); typed = b""
-except OSError: pass
-sys.stdout.buffer.write(seen.replace(b"\r\n", b"\n").replace(b"\r", b"<"))
-sys.exit(os.waitstatus_to_exitcode(os.waitpid(pid, 0)[1]))
-)");
-  const std::string terminal = "python3 terminal.py ";
-  const std::string program = " '" TALIX_BIN "/talix' run $sample ";
-  ASSERT_EQ(run(terminal + "''" + program + "-c 'work \"Fitting\" 0' -c 'echo done'"), 0) << m_err;
+  ASSERT_EQ(runAtTerminal({"-c", "work \"Fitting\" 0", "-c", "echo done"}, ""), 0) << m_out;
   const std::string bar = "[#####---------------]  25%  Fitting";
   EXPECT_EQ(m_out, "<" + bar + "<" + std::string(bar.size(), ' ') + "<done\n");
-  ASSERT_EQ(run(terminal + "'y\nno\n'" + program + "-c 'ask Sure?' -c 'ask \"And now?\"'"), 0) << m_err;
+  ASSERT_EQ(runAtTerminal({"-c", "ask Sure?", "-c", "ask \"And now?\""}, "y\nno\n"), 0) << m_out;
   EXPECT_THAT(m_out, HasSubstr("Sure? [y/N] 1\nAnd now? [y/N] 0\n"));
-  ASSERT_EQ(run(terminal + "''" + program + "--yes -c 'ask Sure?'"), 0) << m_err;
+  ASSERT_EQ(runAtTerminal({"--yes", "-c", "ask Sure?"}, ""), 0) << m_out;
   EXPECT_EQ(m_out, "1\n");
   EXPECT_EQ(run("talix run $sample -c 'ask Sure?' && talix run --yes $sample -c 'ask Sure?'"), 0);
   EXPECT_EQ(m_out + m_err, "0\n1\n");
