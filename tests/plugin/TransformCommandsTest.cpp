@@ -1,4 +1,4 @@
-// Transform commands on what scripts cannot make: developers' commands, constraints, clusters, bad numbers.
+// Transform commands on what scripts cannot make: sources and targets that are missing, bad numbers.
 #include <limits>
 
 #include "host/scene/Constraints.h"
@@ -8,67 +8,7 @@
 
 namespace {
 
-class TransformCommands : public SceneFixture {
- protected:
-  static void set(Module* module, char const* attribute, char const* label) {
-    ASSERT_TRUE(static_cast<EnumAttribute*>(module->getAttribute(attribute))
-                    ->setValue(label, true, true, true, true));
-  }
-};
-
-constexpr char const kNoBone[] = "error: No selected LabelingBone.\nfailed";
-
-TEST_F(TransformCommands, JointAnglesAreThoseOfTheFirstSelectedLabelingBone) {
-  for (char const* name : {"getRotationHardy", "getRotationHinge"}) EXPECT_EQ(run(name), kNoBone);
-  auto* bone = make<LabelingBone>("bone");
-  EXPECT_EQ(run("setRotationHardy", {0.5, 0.25}), kNoBone);
-  EXPECT_EQ(run("setRotationHinge", {0.5}), kNoBone);
-  make<SolvingBone>("other")->setSelected(true);
-  EXPECT_EQ(run("getRotationHardy"), kNoBone);
-
-  make<Clip>("take");
-  bone->setSelected(true);
-  make<LabelingBone>("second")->setSelected(true);
-  set(bone, "MajorAxis", "Z");
-  set(bone, "MinorAxis", "X");
-  bone->setPreRotation(TalixRotation({1, 2, 3}), false);
-  EXPECT_EQ(run("setRotationHardy", {0.5, 2.25}), "nothing");
-  EXPECT_EQ(run("getRotationHardy"), "info: Major angle: 0.500000\ninfo: Minor angle: 2.250000\nnothing");
-  EXPECT_EQ(run("setRotationHinge", {-1.5}), "nothing");
-  EXPECT_EQ(run("getRotationHinge"), "info: Major angle: -1.500000\nnothing");
-  EXPECT_EQ(run("getRotationHardy"), "info: Major angle: -1.500000\ninfo: Minor angle: 0.000000\nnothing");
-  EXPECT_EQ(run("getRotationAngleAxis", {"bone"}), "<0 0 -1.5>");
-  EXPECT_TRUE(bone->getRotationChannel()->hasKeyAt(0));
-  EXPECT_EQ(bone->getConstLocalRot(true), TalixRotation());
-
-  bone->getRotationChannel()->setLocked(true);
-  const std::string locked =
-      "warning: Rotation is not editable on bone: nothing was written. This may be due to the active "
-      "clip.\nnothing";
-  EXPECT_EQ(run("setRotationHardy", {0.5, 0.25}), locked);
-  EXPECT_EQ(run("setRotationHinge", {0.5}), locked);
-  EXPECT_EQ(run("getRotationHinge"), "info: Major angle: -1.500000\nnothing");
-}
-
-TEST_F(TransformCommands, AngleAxisIsARotationVectorInRadians) {
-  auto* node = make("node");
-  auto* child = make("child", node);
-  make<Clip>("take");
-  EXPECT_EQ(run("setRotationAngleAxis", {"node", Vec3(0, 0, 0.5)}), "nothing");
-  EXPECT_EQ(run("getRotationAngleAxis", {"node"}), "<0 0 0.5>");
-  EXPECT_EQ(run("getRotationAngleAxis", {"node"}, {{"def"}}), "<0 0 0>");
-  EXPECT_EQ(run("getRotationAngleAxis", {"child"}, {{"ws"}}), "<0 0 0.5>");
-  EXPECT_EQ(run("setRotationAngleAxis", {"child", Vec3(0, 0, 0.25)}, {{"preRot"}, {"def"}}), "nothing");
-  EXPECT_EQ(run("getRotationAngleAxis", {"child"}, {{"preRot"}}), "<0 0 0.25>");
-  EXPECT_EQ(run("getRotationAngleAxis", {"child"}, {{"inSpaceOf", {"node"}}}), "<0 0 0.5>");
-  EXPECT_EQ(child->getRotationChannel()->getNumKeys(), 0);
-  EXPECT_EQ(run("getRotationAngleAxis", {"nobody"}),
-            "error: nobody  is not a valid unique path to a Node in the scene.\nfailed");
-  EXPECT_EQ(run("getRotationAngleAxis", {"node"}, {{"inSpaceOf", {"take"}}}),
-            "error: take is not a valid unique path to a Node in the scene.\nfailed");
-  EXPECT_EQ(run("setRotationAngleAxis", {"take", Vec3()}),
-            "error: take is not a valid path to a node in the scene.\nfailed");
-}
+class TransformCommands : public SceneFixture {};
 
 TEST_F(TransformCommands, OffsetsOfConstraintsAndClusters) {
   auto* bone = make<SolvingBone>("bone");

@@ -12,7 +12,8 @@
 // ">" or "|" stands after "| ". The working folder is the folder of the tests.
 // In the end every line is undone and redone, and the scene compared with what it was.
 //
-//   transcripts [--update] --plugin LIBRARY FILE...      --update rewrites the files instead
+//   transcripts [--update] [--dev] --plugin LIBRARY FILE...
+// --update rewrites the files instead; --dev has the commands for developers
 
 #include <cstdio>
 #include <filesystem>
@@ -153,6 +154,8 @@ int main(int argc, char** argv) {
     const std::string arg = argv[i];
     if (arg == "--update") {
       update = true;
+    } else if (arg == "--dev") {
+      Database::setDevOnlyMode(true);
     } else if (arg == "--plugin" && i + 1 < argc) {
       plugin = std::filesystem::absolute(argv[++i]);
     } else {
@@ -160,7 +163,7 @@ int main(int argc, char** argv) {
     }
   }
   if (paths.empty()) {
-    std::cout << "usage: transcripts [--update] --plugin LIBRARY FILE...\n";
+    std::cout << "usage: transcripts [--update] [--dev] --plugin LIBRARY FILE...\n";
     return 2;
   }
   try {
