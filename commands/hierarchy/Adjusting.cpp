@@ -1,9 +1,12 @@
 #include "commands/hierarchy/Adjusting.h"
 
 #include "host/scene/Database.h"
+#include "host/services/OperationStack.h"
 #include "host/time/HTimeManager.h"
 
-void adjustNode(Node& node, Node* target, bool ranges) {
+namespace {
+
+void keepMotion(Node& node, Node* target, bool ranges) {
   if (!ranges) {
     node.parentAdjust(target, HTimeRange::forever());
     return;
@@ -16,7 +19,19 @@ void adjustNode(Node& node, Node* target, bool ranges) {
   }
 }
 
-void warnOfNoData(Module const& module) {
-  Command::logWarning("Object %s does not contain animation data. Skipping -adjust option",
-                      module.getName().GetStr());
+}  // namespace
+
+Node* nodeToAdjust(Module* module) {
+  auto* node = objectAs<Node>(module);
+  if (!node)
+    Command::logWarning("Object %s does not contain animation data. Skipping -adjust option",
+                        module->getName().GetStr());
+  return node;
+}
+
+bool adjustNode(Adjusting const& adjusting, Node& node, Node* target) {
+  keepMotion(node, target, adjusting.ranges);
+  if (!adjusting.showProgress) return true;
+  g_theOperationStack.stepTask();
+  return !g_theOperationStack.isCancelled();
 }

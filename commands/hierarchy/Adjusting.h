@@ -20,7 +20,8 @@ struct Adjusting {
   }
 };
 
-// Keeps the motion of a node in the world for a new parent (null: the world).
-void adjustNode(Node& node, Node* target, bool ranges);
-// Says that a module that is no node has nothing to adjust.
-void warnOfNoData(Module const& module);
+// The module as a node; says that one that is none has nothing to adjust, and answers null.
+Node* nodeToAdjust(Module* module);
+// Keeps the motion of a node in the world for a new parent (null: the world), and steps the progress. False
+// when the user cancelled.
+bool adjustNode(Adjusting const& adjusting, Node& node, Node* target);

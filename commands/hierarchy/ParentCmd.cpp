@@ -55,11 +55,8 @@ bool mayHang(Module const* module, Module const* parent) {
 
 // False when the user cancelled.
 bool adjust(Adjusting const& adjusting, Module* module, Node* target) {
-  auto* node = objectAs<Node>(module);
-  if (!node) {
-    warnOfNoData(*module);
-    return true;
-  }
+  Node* node = nodeToAdjust(module);
+  if (!node) return true;
   if (adjusting.showProgress) {
     HString caption;
     caption.Format("Parent adjusting %s to %s", node->getName().GetStr(),
@@ -67,12 +64,7 @@ bool adjust(Adjusting const& adjusting, Module* module, Node* target) {
     g_theOperationStack.setTaskCaption(caption);
     if (g_theOperationStack.isCancelled()) return false;
   }
-  adjustNode(*node, target, adjusting.ranges);
-  if (adjusting.showProgress) {
-    g_theOperationStack.stepTask();
-    if (g_theOperationStack.isCancelled()) return false;
-  }
-  return true;
+  return adjustNode(adjusting, *node, target);
 }
 
 bool ParentCmd::execute(Given const& given, Args const&, Variable&) {

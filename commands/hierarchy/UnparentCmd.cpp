@@ -21,20 +21,14 @@ class UnparentCmd final : public ScriptCommand<UnparentCmd> {
 
 // False when the user cancelled.
 bool adjust(Adjusting const& adjusting, Module* module) {
-  auto* node = objectAs<Node>(module);
-  if (!node) {
-    warnOfNoData(*module);
-    return true;
-  }
+  Node* node = nodeToAdjust(module);
+  if (!node) return true;
   if (adjusting.showProgress) {
     HString caption;
     caption.Format("Unparent adjusting %s", node->getName().GetStr());
     g_theOperationStack.setTaskCaption(caption);
   }
-  adjustNode(*node, nullptr, adjusting.ranges);
-  if (!adjusting.showProgress) return true;
-  g_theOperationStack.stepTask();
-  return !g_theOperationStack.isCancelled();
+  return adjustNode(adjusting, *node, nullptr);
 }
 
 bool UnparentCmd::execute(Given const& given, Args const&, Variable&) {

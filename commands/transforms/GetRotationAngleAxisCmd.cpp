@@ -26,11 +26,8 @@ class GetRotationAngleAxisCmd final : public ScriptCommand<GetRotationAngleAxisC
 };
 
 bool GetRotationAngleAxisCmd::execute(Given const& given, Args const& args, Variable& result) {
-  constexpr QueryTexts texts = {
-      "%s is not a valid unique path to a Node in the scene.",
-      "%s  is not a valid unique path to a Node in the scene."};  // kept: two spaces
   TransformQuery query;
-  if (!readQuery(given, args, kOptions, texts, query)) return false;
+  if (!readQuery(given, args, kOptions, kRotationTexts, query)) return false;
   Vec3 vector;
   rotationFor(query).getAsVector(vector);
   return answer(result, vector);

@@ -26,11 +26,8 @@ class GetRotationCmd final : public ScriptCommand<GetRotationCmd> {
 };
 
 bool GetRotationCmd::execute(Given const& given, Args const& args, Variable& result) {
-  constexpr QueryTexts texts = {
-      "%s is not a valid unique path to a Node in the scene.",
-      "%s  is not a valid unique path to a Node in the scene."};  // kept: two spaces
   TransformQuery query;
-  return readQuery(given, args, kOptions, texts, query) &&
+  return readQuery(given, args, kOptions, kRotationTexts, query) &&
          answer(result, eulerDegrees(rotationFor(query), query.node->getRotationOrder()));
 }
 

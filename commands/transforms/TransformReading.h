@@ -26,6 +26,11 @@ struct QueryTexts {
   char const* badNode;
 };
 
+// Those of the readers of rotations.
+inline constexpr QueryTexts kRotationTexts = {
+    "%s is not a valid unique path to a Node in the scene.",
+    "%s  is not a valid unique path to a Node in the scene."};  // kept: two spaces
+
 // Every "-inSpaceOf" must name a node, and the last decides; "-ws" goes before it, and the pre-transform
 // before the default value. False, with a message, when a node is not found.
 [[nodiscard]] bool readQuery(Given const& given, Args const& args, QueryOptions const& which,

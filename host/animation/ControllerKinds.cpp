@@ -5,7 +5,7 @@
 #include <cmath>
 
 #include "host/animation/Clips.h"
-#include "host/animation/Controller.h"
+#include "host/animation/RawValues.h"
 #include "host/scene/Database.h"
 
 H_DEFINE_CLASS(FloatController);
@@ -19,20 +19,6 @@ namespace {
 using Values = Controller::Values;
 
 Values scalar(double value) { return {value}; }
-
-Values vector(Vec3 const& value) { return {value.x, value.y, value.z}; }
-
-Values rotation(TalixRotation const& value) {
-  Values values;
-  value.getQuaternion(values.data());
-  return values;
-}
-
-TalixRotation rotation(Values const& values) {
-  TalixRotation result;
-  result.setQuaternion(values.data());
-  return result;
-}
 
 double first(Controller const& channel, int64 time) {
   Values values;
@@ -100,7 +86,7 @@ double Vec3Controller::getKeyComponentValue(int key, unsigned mask) const {
 }
 
 void Vec3Controller::setKeyValue(int key, Vec3 const& value, unsigned mask) {
-  writeKey(key, vector(value), mask);
+  writeKey(key, rawValues(value), mask);
 }
 
 void Vec3Controller::setKeyComponentValue(int key, double value, unsigned mask) {
@@ -108,7 +94,7 @@ void Vec3Controller::setKeyComponentValue(int key, double value, unsigned mask) 
 }
 
 void Vec3Controller::setKey(int64 time, Vec3 const& value, unsigned mask) {
-  writeKeyAt(time, vector(value), mask);
+  writeKeyAt(time, rawValues(value), mask);
 }
 
 void Vec3Controller::setComponentKey(int64 time, double value, unsigned mask) {
@@ -117,36 +103,36 @@ void Vec3Controller::setComponentKey(int64 time, double value, unsigned mask) {
 
 bool Vec3Controller::setConstValue(Vec3 value, bool, bool) {
   if (!std::isfinite(value.x) || !std::isfinite(value.y) || !std::isfinite(value.z)) return false;
-  setDefaultValues(vector(value));
+  setDefaultValues(rawValues(value));
   return true;
 }
 
 TalixRotation RotController::getValue(int64 time) const {
   Values values;
   evaluate(time, values);
-  return rotation(values);
+  return rotationOf(values);
 }
 
 TalixRotation RotController::getKeyValue(int key) const {
   Values values;
   readKey(key, values);
-  return rotation(values);
+  return rotationOf(values);
 }
 
 void RotController::setKeyValue(int key, TalixRotation const& value, unsigned mask) {
-  writeKey(key, rotation(value), mask);
+  writeKey(key, rawValues(value), mask);
 }
 
 void RotController::setKey(int64 time, TalixRotation const& value, unsigned mask) {
-  writeKeyAt(time, rotation(value), mask);
+  writeKeyAt(time, rawValues(value), mask);
 }
 
-TalixRotation RotController::getConstValue() const { return rotation(m_default); }
+TalixRotation RotController::getConstValue() const { return rotationOf(m_default); }
 
-void RotController::setConstValue(TalixRotation const& value, bool) { setDefaultValues(rotation(value)); }
+void RotController::setConstValue(TalixRotation const& value, bool) { setDefaultValues(rawValues(value)); }
 
 void RotController::compose(Values& values, Values const& layer) const {
-  values = rotation(rotation(values) * rotation(layer));
+  values = rawValues(rotationOf(values) * rotationOf(layer));
 }
 
 // Of L0 * ... * La * ... * Ln = wanted, the factor La.
@@ -157,10 +143,10 @@ Values RotController::solveLayer(int64 time, Values const& wanted) const {
   for (int layer = 0; layer < clip->getNumLayers(); ++layer) {
     Values values;
     evaluateLayer(clip, layer, time, values);
-    if (layer < g_db->getActiveLayer()) below *= rotation(values);
-    if (layer > g_db->getActiveLayer()) above *= rotation(values);
+    if (layer < g_db->getActiveLayer()) below *= rotationOf(values);
+    if (layer > g_db->getActiveLayer()) above *= rotationOf(values);
   }
-  return rotation(below.inverse() * rotation(wanted) * above.inverse());
+  return rawValues(below.inverse() * rotationOf(wanted) * above.inverse());
 }
 
 // The weighted mean of quaternions on the first one's side, made a unit again.
@@ -172,5 +158,5 @@ void RotController::blend(Values const* values, double const* weights, int count
     const double weight = dot < 0 ? -weights[i] : weights[i];
     for (size_t k = 0; k < 4; ++k) sum[k] += weight * values[i][k];
   }
-  out = rotation(rotation(sum));
+  out = rawValues(rotationOf(sum));
 }

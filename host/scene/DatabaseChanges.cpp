@@ -42,7 +42,6 @@ void Database::join(Module* module) {
 
 void Database::leave(Module* module) {
   m_selection.remove(module);
-  if (m_priority == module) m_priority = nullptr;
   module->forgetByAll();
   if (auto* clip = objectAs<NLEClip>(module)) {
     if (m_activeClip == clip) setActiveClip(nullptr);

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 
+#include "host/animation/RawValues.h"
 #include "host/scene/Database.h"
 #include "host/time/HTimeManager.h"
 
@@ -29,14 +30,6 @@ Vec3 quotients(Vec3 const& a, Vec3 const& b) {
 bool isFinite(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
 
 int64 now() { return HTimeManager::getInstance()->getTime(); }
-
-Controller::Values raw(Vec3 const& v) { return {v.x, v.y, v.z}; }
-
-Controller::Values raw(TalixRotation const& rotation) {
-  Controller::Values values;
-  rotation.getQuaternion(values.data());
-  return values;
-}
 
 }  // namespace
 
@@ -236,7 +229,7 @@ void Node::writeAt(Controller* channel, int64 time, Controller::Values const& va
 }
 
 void Node::setLocalPos(int64 time, Vec3 const& position) {
-  if (isFinite(position)) writeAt(m_translation, time, raw(position));
+  if (isFinite(position)) writeAt(m_translation, time, rawValues(position));
 }
 
 void Node::setWSPos(int64 time, Vec3 const& position) {
@@ -244,7 +237,7 @@ void Node::setWSPos(int64 time, Vec3 const& position) {
 }
 
 void Node::setLocalRot(int64 time, TalixRotation const& rotation) {
-  writeAt(m_rotation, time, raw(rotation));
+  writeAt(m_rotation, time, rawValues(rotation));
 }
 
 void Node::setWSRot(int64 time, TalixRotation const& rotation) {
@@ -252,7 +245,7 @@ void Node::setWSRot(int64 time, TalixRotation const& rotation) {
 }
 
 void Node::setLocalScale(int64 time, Vec3 const& scale) {
-  if (isFinite(scale)) writeAt(m_scale, time, raw(scale));
+  if (isFinite(scale)) writeAt(m_scale, time, rawValues(scale));
 }
 
 void Node::setWSScale(int64 time, Vec3 const& scale) {

@@ -4,6 +4,8 @@
 #include <cmath>
 #include <optional>
 
+#include "host/animation/KeyTimes.h"
+#include "host/animation/RawValues.h"
 #include "host/scene/Database.h"
 #include "host/scene/Marker.h"
 #include "host/time/HTimeManager.h"
@@ -11,7 +13,7 @@
 namespace {
 
 using Values = Controller::Values;
-using Times = std::vector<int64>;  // ascending
+using Times = KeyTimes;
 
 // How far the motion between keys may stray: millimetres, radians, parts of the scale. Lengths beyond 10 km
 // stray by what is left of their digits.
@@ -22,21 +24,6 @@ constexpr double kSame = 1e-10;
 // Between two keys all channels are smooth, so that of very many frames some tell about all.
 constexpr int64 kProbes = 64;
 
-void merge(Times& times, Times const& more) {
-  if (std::includes(times.begin(), times.end(), more.begin(), more.end())) return;
-  Times all;
-  all.reserve(times.size() + more.size());
-  std::set_union(times.begin(), times.end(), more.begin(), more.end(), std::back_inserter(all));
-  times = std::move(all);
-}
-
-Times timesOf(KeyTrack const& track) {
-  Times times;
-  times.reserve(static_cast<size_t>(track.count()));
-  track.forEach(0, track.count(), [&](KeyTrack::Key const& key) { times.push_back(key.time); });
-  return times;
-}
-
 // Where a track's curve is pinned: at its whole keys (one of some components pins only these), and just
 // outside of all.
 Times limitsOf(KeyTrack const& track) {
@@ -44,15 +31,9 @@ Times limitsOf(KeyTrack const& track) {
   track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
     if (key.components == KeyTrack::kAll) times.push_back(key.time);
   });
-  merge(times, {track.timeAt(0) - 1});
-  merge(times, {track.timeAt(track.count() - 1) + 1});
+  mergeTimes(times, {track.timeAt(0) - 1});
+  mergeTimes(times, {track.timeAt(track.count() - 1) + 1});
   return times;
-}
-
-// The key times of a channel in all layers of a clip.
-void mergeKeyTimes(Times& times, Controller const& channel, NLEClip const& clip) {
-  for (int layer = 0; layer < clip.getNumLayers(); ++layer)
-    if (KeyTrack const* track = channel.findTrack(&clip, layer)) merge(times, timesOf(*track));
 }
 
 template <class Keep>
@@ -100,31 +81,21 @@ std::vector<HTimeRange> spansAround(KeyTrack const& track, Times const& added) {
   return spans;
 }
 
-Values raw(Vec3 const& v) { return {v.x, v.y, v.z}; }
-
-Values raw(TalixRotation const& rotation) {
-  Values values;
-  rotation.getQuaternion(values.data());
-  return values;
-}
-
 bool isFinite(Values const& values) {
   return std::all_of(values.begin(), values.end(), [](double value) { return std::isfinite(value); });
 }
 
 bool isFinite(Placement const& place) {
-  return isFinite(raw(place.position)) && isFinite(raw(place.rotation)) && isFinite(raw(place.scale));
+  return isFinite(rawValues(place.position)) && isFinite(rawValues(place.rotation)) &&
+         isFinite(rawValues(place.scale));
 }
 
 // Radians between two rotations, the distance of two vectors.
 double distance(Controller const& channel, Values const& a, Values const& b) {
   if (channel.getPropertyType() == DataSource::Vec3Property)
     return (Vec3(a.data()) - Vec3(b.data())).length();
-  TalixRotation from, to;
-  from.setQuaternion(a.data());
-  to.setQuaternion(b.data());
   Vec3 turn;
-  (from.inverse() * to).getAsVector(turn);
+  (rotationOf(a).inverse() * rotationOf(b)).getAsVector(turn);
   return turn.length();
 }
 
@@ -137,9 +108,9 @@ bool same(Controller const& channel, Values const& a, Values const& b) {
 enum class Kind { Translation, Rotation, Scale };
 
 Values part(Placement const& place, Kind kind) {
-  return kind == Kind::Translation ? raw(place.position)
-         : kind == Kind::Rotation  ? raw(place.rotation)
-                                   : raw(place.scale);
+  return kind == Kind::Translation ? rawValues(place.position)
+         : kind == Kind::Rotation  ? rawValues(place.rotation)
+                                   : rawValues(place.scale);
 }
 
 // The stretches of time in which a marker has data in a clip: at its keys, and between two keys of which
@@ -248,7 +219,7 @@ void Adjustment::collectTimes() {
   for (const int64 end : {m_range.getStart(), m_range.getEnd()})
     if (hasEnd(end)) ends.push_back(end);
   ends.erase(std::unique(ends.begin(), ends.end()), ends.end());
-  merge(m_times, ends);
+  mergeTimes(m_times, ends);
   keepOnly(m_times, [this](int64 time) { return m_range.contains(time) && hasData(HTimeRange(time, time)); });
 }
 
@@ -321,7 +292,7 @@ Times Adjustment::keysNeeded(Controller const& channel, std::vector<Values> cons
   Times own;
   mergeKeyTimes(own, channel, *m_clip);
   for (const int64 end : {m_range.getStart(), m_range.getEnd()})
-    if (hasEnd(end)) merge(own, {end});
+    if (hasEnd(end)) mergeTimes(own, {end});
   keepOnly(own, [this](int64 time) { return std::binary_search(m_times.begin(), m_times.end(), time); });
   // Keys that are added later change a cubic curve beyond their neighbours.
   const bool local = channel.getInterpolation() != Interpolation::Cubic;
@@ -397,7 +368,7 @@ void Adjustment::refine(Controller const& channel, Kind kind, KeyTrack& track) c
     return values;
   };
   Times times = limitsOf(track);
-  merge(times, m_times);
+  mergeTimes(times, m_times);
   for (std::vector<HTimeRange> spans = spansBetween(times); !spans.empty();) {
     Times added;
     for (HTimeRange const& span : spans) {

@@ -5,12 +5,13 @@
 #include <cmath>
 #include <unordered_map>
 
+#include "host/animation/KeyTimes.h"
 #include "host/scene/Database.h"
 #include "host/time/HTimeManager.h"
 
 namespace {
 
-using Times = std::vector<int64>;  // ascending
+using Times = KeyTimes;
 
 // Keys at most so far apart were measured; no capture system is slower.
 constexpr int64 kSlowestSampling = kTicksPerSecond / 20;
@@ -23,30 +24,15 @@ std::array<Controller*, 3> transformChannels(Node const& node) {
 
 bool turns(TalixRotation const& rotation) { return !(rotation == TalixRotation()); }
 
-void addKeyTimes(Controller const& channel, NLEClip const* clip, Times& times) {
-  for (int layer = 0; layer < clip->getNumLayers(); ++layer) {
-    if (KeyTrack const* track = channel.findTrack(clip, layer))
-      track->forEach(0, track->count(), [&](KeyTrack::Key const& key) { times.push_back(key.time); });
-  }
-}
-
-void sortTimes(Times& times) {
-  std::sort(times.begin(), times.end());
-  times.erase(std::unique(times.begin(), times.end()), times.end());
-}
-
 Times keyTimes(Controller const& channel, NLEClip const* clip) {
   Times times;
-  addKeyTimes(channel, clip, times);
-  sortTimes(times);
+  mergeKeyTimes(times, channel, *clip);
   return times;
 }
 
-Times merged(Times const& a, Times const& b) {
-  Times all;
-  all.reserve(a.size() + b.size());
-  std::set_union(a.begin(), a.end(), b.begin(), b.end(), std::back_inserter(all));
-  return all;
+Times merged(Times times, Times const& more) {
+  mergeTimes(times, more);
+  return times;
 }
 
 // --- the frames that the markers are in ---
@@ -203,16 +189,15 @@ Times const& Baking::frameTimes(Node const* parent) {
   Times& times = entry->second;
   if (!isNew) return times;
   for (Node const* node = parent; node; node = node->getNodeParent())
-    for (Controller const* channel : transformChannels(*node)) addKeyTimes(*channel, m_clip, times);
-  sortTimes(times);
+    for (Controller const* channel : transformChannels(*node)) mergeKeyTimes(times, *channel, *m_clip);
   if (times.empty()) return times;
   const int64 period = HTimeManager::getInstance()->getTicksPerFrame();
   const int64 first = times.front() / period, last = times.back() / period;
-  const size_t keys = times.size();
   if (last - first > kMostFrames) return times;
+  Times frames;
   for (int64 time = first * period; time <= last * period; time += period)
-    if (time > times[0] && time < times[keys - 1]) times.push_back(time);
-  sortTimes(times);
+    if (time > times.front() && time < times.back()) frames.push_back(time);
+  mergeTimes(times, frames);
   return times;
 }
 
