@@ -11,7 +11,7 @@ namespace {
 namespace json = boost::json;
 
 // Whole numbers without an exponent.
-json::value number(double value) {
+json::value jsonNumber(double value) {
   constexpr double kExact = 9007199254740992.0;
   if (value == std::floor(value) && std::abs(value) < kExact) return static_cast<int64>(value);
   return value;
@@ -40,7 +40,7 @@ json::object joint(const TakeJoint& joint) {
   return {{"name", printable(joint.name)},
           {"parent", joint.parent},
           {"endSite", joint.endSite},
-          {"offset", {number(joint.offset.x), number(joint.offset.y), number(joint.offset.z)}},
+          {"offset", {jsonNumber(joint.offset.x), jsonNumber(joint.offset.y), jsonNumber(joint.offset.z)}},
           {"rotationOrder", kOrders[joint.rotationOrder]},
           {"channels", listOf(joint.channels, shortChannel)}};
 }
@@ -52,12 +52,12 @@ json::object takeAsJson(const Take& take, const std::string& file) {
   info["file"] = printable(file);
   info["format"] = take.format;
   info["variant"] = printable(take.variant);
-  info["rate"] = number(take.rate);
+  info["rate"] = jsonNumber(take.rate);
   info["frames"] = take.frameCount;
   info["firstFrame"] = take.firstFrame;
-  info["seconds"] = number(static_cast<double>(take.frameCount) / take.rate);
+  info["seconds"] = jsonNumber(static_cast<double>(take.frameCount) / take.rate);
   info["unit"] = printable(take.fileUnit);
-  info["unitInMillimetres"] = number(take.unitInMillimetres);
+  info["unitInMillimetres"] = jsonNumber(take.unitInMillimetres);
   info["unitAssumed"] = take.unitAssumed;
   info["upAxis"] = std::string(1, "xyz"[static_cast<int>(take.up)]);
   info["upAxisAssumed"] = take.upAssumed;
@@ -66,17 +66,17 @@ json::object takeAsJson(const Take& take, const std::string& file) {
     return {
         {"name", printable(output.name)}, {"kind", printable(output.kind)}, {"unit", printable(output.unit)}};
   });
-  info["analogRate"] = number(take.analogRate);
+  info["analogRate"] = jsonNumber(take.analogRate);
   info["analog"] = listOf(take.analog, [](const TakeAnalogChannel& channel) -> json::object {
     return {{"name", printable(channel.name)},
             {"unit", printable(channel.unit)},
             {"description", printable(channel.description)},
-            {"scale", number(channel.scale)},
-            {"offset", number(channel.offset)}};
+            {"scale", jsonNumber(channel.scale)},
+            {"offset", jsonNumber(channel.offset)}};
   });
   info["joints"] = listOf(take.joints, joint);
   info["events"] = listOf(take.events, [](const TakeEvent& event) -> json::object {
-    return {{"seconds", number(event.seconds)},
+    return {{"seconds", jsonNumber(event.seconds)},
             {"label", printable(event.label)},
             {"context", printable(event.context)},
             {"subject", printable(event.subject)},

@@ -2,17 +2,10 @@
 #include <benchmark/benchmark.h>
 #include <string>
 
-#include "host/scene/Database.h"
+#include "bench/host/BenchScene.h"
 #include "host/scene/SubjectManager.h"
 
 namespace {
-
-constexpr int64 kFrame = kTicksPerSecond / 120;
-
-template <class T>
-T* create(char const* name, Module* parent = nullptr) {
-  return static_cast<T*>(g_db->createModule(&T::staticClass(), name, parent));
-}
 
 // Markers of a character, each with a key at every frame.
 Character* markers(int64 count, int frames) {

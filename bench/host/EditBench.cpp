@@ -15,7 +15,7 @@
 namespace {
 
 constexpr int kMarkers = 100;
-constexpr int64 kFrames = 20'000;
+constexpr int64 kTakeFrames = 20'000;
 constexpr int64 kKeys = 100'000;
 constexpr HTimeRange kNoRange;
 
@@ -115,13 +115,13 @@ TIMED_BENCHMARKS(setKeyAtRandom);
 // A tenth of the keys of every marker, in 20 ranges.
 void cutKeyRanges(benchmark::State& state, Timed timed) {
   Scene scene(kMarkers);
-  const KeyTrack walk = curveOf(Curve::Walk, kFrames);
+  const KeyTrack walk = curveOf(Curve::Walk, kTakeFrames);
   for (auto _ : state) {
     state.PauseTiming();
     scene.fill(walk);
     editTimed(state, timed, [&] {
       for (int m = 0; m < kMarkers; ++m)
-        for (int64 first = 0; first < kFrames; first += 1000) {
+        for (int64 first = 0; first < kTakeFrames; first += 1000) {
           const HTimeRange range(first * period(), (first + 99) * period());
           scene.channel(m)->beginDataEdit(range);
           scene.channel(m)->deleteKeys(range, KeyTrack::kAll, false);
@@ -130,13 +130,13 @@ void cutKeyRanges(benchmark::State& state, Timed timed) {
     });
     state.ResumeTiming();
   }
-  state.SetItemsProcessed(state.iterations() * kMarkers * kFrames / 10);
+  state.SetItemsProcessed(state.iterations() * kMarkers * kTakeFrames / 10);
 }
 TIMED_BENCHMARKS(cutKeyRanges);
 
 void reduceTake(benchmark::State& state, Curve curve, Interpolation interpolation) {
   Scene scene(kMarkers);
-  const KeyTrack original = curveOf(curve, kFrames);
+  const KeyTrack original = curveOf(curve, kTakeFrames);
   for (int m = 0; m < kMarkers; ++m) scene.channel(m)->setInterpType(static_cast<int>(interpolation));
   const HTimeRange all[] = {HTimeRange::forever()};
   int64 removed = 0;
@@ -151,8 +151,8 @@ void reduceTake(benchmark::State& state, Curve curve, Interpolation interpolatio
     for (int m = 0; m < kMarkers; ++m)
       removed += scene.channel(m)->reduceKeys(all, {.length = 0.5, .angle = 0, .ofRange = 0});
   }
-  state.SetItemsProcessed(state.iterations() * kMarkers * kFrames);
-  state.counters["removed"] = static_cast<double>(removed) / (kMarkers * kFrames);
+  state.SetItemsProcessed(state.iterations() * kMarkers * kTakeFrames);
+  state.counters["removed"] = static_cast<double>(removed) / (kMarkers * kTakeFrames);
 }
 BENCHMARK_CAPTURE(reduceTake, walk, Curve::Walk, Interpolation::Linear)->Unit(benchmark::kMillisecond);
 BENCHMARK_CAPTURE(reduceTake, walkCubic, Curve::Walk, Interpolation::Cubic)->Unit(benchmark::kMillisecond);

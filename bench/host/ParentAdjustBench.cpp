@@ -2,12 +2,10 @@
 #include <benchmark/benchmark.h>
 #include <vector>
 
-#include "host/scene/Bones.h"
-#include "host/scene/Database.h"
+#include "bench/host/BenchScene.h"
 
 namespace {
 
-constexpr int64 kFrame = kTicksPerSecond / 120;
 constexpr int kBones = 60;
 
 // A spine of ten bones with five limbs of ten, keyed at every `period` frames.

@@ -21,7 +21,7 @@ class GetBooleanPropertyCmd final : public ScriptCommand<GetBooleanPropertyCmd> 
 };
 
 // Kept: a channel of another kind is an error, yet the command succeeds without a value.
-bool readChannel(Module const& module, HString const& name, DataSource::PropertyType kind, bool byDefault,
+bool readBoolean(Module const& module, HString const& name, DataSource::PropertyType kind, bool byDefault,
                  Variable& result) {
   switch (kind) {
     case DataSource::BoolProperty: {
@@ -61,7 +61,7 @@ bool GetBooleanPropertyCmd::execute(Given const& given, Args const& args, Variab
   const HString name = args[1].getStringValue(-1);
   const DataSource::PropertyType kind = Controller::mapToPropertyType(name);
   if (kind != DataSource::NoProperty)
-    return readChannel(*module, name, kind, isByDefault<GetBooleanPropertyCmd>(given), result);
+    return readBoolean(*module, name, kind, isByDefault<GetBooleanPropertyCmd>(given), result);
   Attribute const* attribute = attributeNamed(*module, name);
   if (!attribute) return false;
   if (BoolAttribute const* boolean = objectAs<BoolAttribute>(attribute))

@@ -19,7 +19,7 @@ class GetIntPropertyCmd final : public ScriptCommand<GetIntPropertyCmd> {
   bool execute(Given const& given, Args const& args, Variable& result) override;
 };
 
-bool readChannel(Module const& module, HString const& name, DataSource::PropertyType kind, bool byDefault,
+bool readInteger(Module const& module, HString const& name, DataSource::PropertyType kind, bool byDefault,
                  Variable& result) {
   if (kind == DataSource::FloatProperty) {
     FloatController const* channel = channelNamed<FloatController>(module, name);
@@ -58,7 +58,7 @@ bool GetIntPropertyCmd::execute(Given const& given, Args const& args, Variable& 
   const HString name = args[1].getStringValue(-1);
   const DataSource::PropertyType kind = Controller::mapToPropertyType(name);
   if (kind != DataSource::NoProperty)
-    return readChannel(*module, name, kind, isByDefault<GetIntPropertyCmd>(given), result);
+    return readInteger(*module, name, kind, isByDefault<GetIntPropertyCmd>(given), result);
   Attribute const* attribute = attributeNamed(*module, name);
   return attribute && readAttribute(*attribute, result);
 }

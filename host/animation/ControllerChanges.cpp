@@ -11,36 +11,36 @@ namespace {
 // the smaller record.
 constexpr size_t kKeysBeforeSnapshot = 64;
 
-// A key that may be missing.
-struct Slot {
-  KeyTrack::Key key;  // with its time
-  bool present = false;
-
-  Slot(KeyTrack const& track, int64 time) {
-    key.time = time;
-    const int64 index = track.find(time);
-    present = index >= 0;
-    if (present) key = track.at(index);
-  }
-
-  bool operator==(Slot const& o) const {
-    return present == o.present &&
-           (!present || (key.values == o.key.values && key.components == o.key.components &&
-                         key.selected == o.key.selected));
-  }
-  // Makes the track so at this time.
-  void putInto(KeyTrack& track) const {
-    track.eraseRange(key.time, key.time);
-    if (!present) return;
-    track.set(key.time, key.values, key.components);
-    if (key.selected) track.setSelected(track.find(key.time), key.selected);
-  }
-};
-
 }  // namespace
 
 // The keys of a track: single ones as long as they are few, else a snapshot of all.
 struct Controller::KeyChange : UndoChange {
+  // A key that may be missing.
+  struct Slot {
+    KeyTrack::Key key;  // with its time
+    bool present = false;
+
+    Slot(KeyTrack const& track, int64 time) {
+      key.time = time;
+      const int64 index = track.find(time);
+      present = index >= 0;
+      if (present) key = track.at(index);
+    }
+
+    bool operator==(Slot const& o) const {
+      return present == o.present &&
+             (!present || (key.values == o.key.values && key.components == o.key.components &&
+                           key.selected == o.key.selected));
+    }
+    // Makes the track so at this time.
+    void putInto(KeyTrack& track) const {
+      track.eraseRange(key.time, key.time);
+      if (!present) return;
+      track.set(key.time, key.values, key.components);
+      if (key.selected) track.setSelected(track.find(key.time), key.selected);
+    }
+  };
+
   KeyChange(Controller& concerned, ClipTrack const& track)
       : UndoChange(concerned.m_module), channel(concerned), clip(track.clip), layer(track.layer) {}
 

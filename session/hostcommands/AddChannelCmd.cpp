@@ -7,18 +7,18 @@ namespace talix {
 
 namespace {
 
-struct Kind {
+struct ChannelKind {
   char const* name;
   DataSource::PropertyType type;
 };
-constexpr Kind kKinds[] = {{"vector", DataSource::Vec3Property},
-                           {"rotation", DataSource::RotProperty},
-                           {"float", DataSource::FloatProperty},
-                           {"int", DataSource::IntProperty},
-                           {"bool", DataSource::BoolProperty}};
+constexpr ChannelKind kChannelKinds[] = {{"vector", DataSource::Vec3Property},
+                                         {"rotation", DataSource::RotProperty},
+                                         {"float", DataSource::FloatProperty},
+                                         {"int", DataSource::IntProperty},
+                                         {"bool", DataSource::BoolProperty}};
 
 char const* kindName(DataSource::PropertyType type) {
-  for (Kind const& kind : kKinds)
+  for (ChannelKind const& kind : kChannelKinds)
     if (kind.type == type) return kind.name;
   return "";
 }
@@ -37,8 +37,8 @@ class AddChannelCmd final : public ScriptCommand<AddChannelCmd> {
     Module* module = moduleAt(args[0].getStringValue(-1));
     if (!module) return false;
     const HString name = args[1].getStringValue(-1), kindText = args[2].getStringValue(-1);
-    Kind const* kind = nullptr;
-    for (Kind const& known : kKinds)
+    ChannelKind const* kind = nullptr;
+    for (ChannelKind const& known : kChannelKinds)
       if (kindText == known.name) kind = &known;
     if (!kind) {
       logError("%s is not a kind of channel: vector, rotation, float, int or bool.", kindText.GetStr());
@@ -51,7 +51,7 @@ class AddChannelCmd final : public ScriptCommand<AddChannelCmd> {
   }
 
  private:
-  static bool mayAdd(Module const& module, HString const& name, Kind const& kind) {
+  static bool mayAdd(Module const& module, HString const& name, ChannelKind const& kind) {
     if (!Module::isValidPropertyName(name)) {
       logError("\"%s\" cannot be the name of a channel: it must not be empty nor hold a dot or a backslash.",
                name.GetStr());

@@ -15,7 +15,7 @@ namespace {
 // Single values: arrays are taken apart.
 using Values = std::vector<Variable>;
 
-constexpr AttributeKind kKinds[] = {
+constexpr AttributeKind kAttributeKinds[] = {
     {"int", Attribute::Integer, "an integer"},
     {"enum", Attribute::Enumeration, "strings, its labels"},
     {"float", Attribute::Float, "a number"},
@@ -196,15 +196,15 @@ bool isReference(Attribute const& attribute) {
 }  // namespace
 
 AttributeKind const* findAttributeKind(HString const& name) {
-  const auto* kind = std::find_if(std::begin(kKinds), std::end(kKinds),
+  const auto* kind = std::find_if(std::begin(kAttributeKinds), std::end(kAttributeKinds),
                                   [&](AttributeKind const& known) { return name == known.name; });
-  return kind == std::end(kKinds) ? nullptr : kind;
+  return kind == std::end(kAttributeKinds) ? nullptr : kind;
 }
 
 std::string attributeKindNames() {
   std::string names;
-  for (AttributeKind const& kind : kKinds) {
-    if (!names.empty()) names += &kind == std::end(kKinds) - 1 ? " or " : ", ";
+  for (AttributeKind const& kind : kAttributeKinds) {
+    if (!names.empty()) names += &kind == std::end(kAttributeKinds) - 1 ? " or " : ", ";
     names += kind.name;
   }
   return names;

@@ -16,7 +16,7 @@ using Shape = KeyTrack::Shape;
 using Values = KeyTrack::Values;
 
 constexpr int64 kKeys = 20'000;
-constexpr int64 kPeriod = 5'880'000;
+constexpr int64 kFramePeriod = 5'880'000;
 
 double bytesPerKey(KeyTrack const& track) {
   return static_cast<double>(track.memoryUse()) / static_cast<double>(track.count());
@@ -36,7 +36,7 @@ Values valuesOf(std::vector<double> const& flat, int64 i) {
 
 KeyTrack denseTrack(std::vector<double> const& flat) {
   KeyTrack track(Shape::Vector);
-  track.append(0, kPeriod, flat.data(), static_cast<int64>(flat.size()) / 3);
+  track.append(0, kFramePeriod, flat.data(), static_cast<int64>(flat.size()) / 3);
   return track;
 }
 
@@ -44,10 +44,10 @@ TEST(KeyTrack, DenseKeysAreCompactHoweverTheyCome) {
   const std::vector<double> flat = randomDoubles(kKeys * 3);
   const KeyTrack bulk = denseTrack(flat);
   KeyTrack forward(Shape::Vector), backward(Shape::Vector), pieces(Shape::Vector);
-  for (int64 i = 0; i < kKeys; ++i) forward.set(i * kPeriod, valuesOf(flat, i));
-  for (int64 i = kKeys - 1; i >= 0; --i) backward.set(i * kPeriod, valuesOf(flat, i));
+  for (int64 i = 0; i < kKeys; ++i) forward.set(i * kFramePeriod, valuesOf(flat, i));
+  for (int64 i = kKeys - 1; i >= 0; --i) backward.set(i * kFramePeriod, valuesOf(flat, i));
   for (int64 i = 0, n = 1; i < kKeys; i += n, n = std::min<int64>(n * 2 % 1001, kKeys - i))
-    pieces.append(i * kPeriod, kPeriod, flat.data() + i * 3, n);
+    pieces.append(i * kFramePeriod, kFramePeriod, flat.data() + i * 3, n);
 
   for (const KeyTrack* track : std::initializer_list<const KeyTrack*>{&bulk, &forward, &backward, &pieces}) {
     EXPECT_STREQ(track->checkInvariants(), "");
@@ -77,12 +77,12 @@ TEST(KeyTrack, AnEditThatIsTakenBackLeavesNoTrace) {
   KeyTrack track = before;
   for (int64 i = 5; i < kKeys; i += 97) {
     track.erase(i);
-    track.set(i * kPeriod, valuesOf(flat, i));
+    track.set(i * kFramePeriod, valuesOf(flat, i));
   }
   EXPECT_LE(bytesPerKey(track), 26);
-  EXPECT_EQ(track.select(0, kKeys * kPeriod), kKeys);
+  EXPECT_EQ(track.select(0, kKeys * kFramePeriod), kKeys);
   EXPECT_GE(bytesPerKey(track), 25.5);
-  EXPECT_EQ(track.deselect(0, kKeys * kPeriod), kKeys);
+  EXPECT_EQ(track.deselect(0, kKeys * kFramePeriod), kKeys);
   EXPECT_TRUE(track == before);
   EXPECT_FALSE(track.sharesAll(before));
   EXPECT_LE(bytesPerKey(track), 26);
@@ -95,7 +95,7 @@ TEST(KeyTrack, SnapshotsShareUntilOneChanges) {
   KeyTrack snapshot = track;
   EXPECT_TRUE(snapshot.sharesAll(track));
   EXPECT_EQ(track.erase(kKeys, KeyTrack::kAll), 0);  // changes nothing
-  EXPECT_EQ(track.eraseRange(kKeys * kPeriod, INT64_MAX), 0);
+  EXPECT_EQ(track.eraseRange(kKeys * kFramePeriod, INT64_MAX), 0);
   EXPECT_EQ(track.deselect(0, INT64_MAX), 0);
   EXPECT_TRUE(snapshot.sharesAll(track));
 

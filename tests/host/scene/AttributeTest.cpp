@@ -7,7 +7,7 @@
 
 namespace {
 
-constexpr double kNan = std::numeric_limits<double>::quiet_NaN();
+constexpr double kNotANumber = std::numeric_limits<double>::quiet_NaN();
 
 Attribute::Labels labels(std::vector<HString> texts) {
   return std::make_shared<std::vector<HString> const>(std::move(texts));
@@ -66,17 +66,17 @@ TEST_F(AttributeTest, ValuesReadBackAndBadOnesAreRefused) {
 
   auto* real = add<FloatAttribute>("f", Attribute::Float);
   EXPECT_TRUE(real->setValue(1e300, true, true, true, true));
-  EXPECT_FALSE(real->setValue(kNan, true, true, true, true));
+  EXPECT_FALSE(real->setValue(kNotANumber, true, true, true, true));
   EXPECT_EQ(real->getValue(), 1e300);
   auto* vector = add<VectorAttribute>("v", Attribute::Vector);
   vector->setValue({1, 2, 3}, true, true, true, true);
-  vector->setValue({1, kNan, 3}, true, true, true, true);
+  vector->setValue({1, kNotANumber, 3}, true, true, true, true);
   EXPECT_EQ(vector->getValue(), Vec3(1, 2, 3));
   auto* matrix = add<MatrixAttribute>("m", Attribute::MatrixKind);
   Matrix values(2);
   values[1][0] = 5;
   matrix->setValue(values, true, true, true, true);
-  values[0][1] = kNan;
+  values[0][1] = kNotANumber;
   matrix->setValue(values, true, true, true, true);
   EXPECT_TRUE(matrix->getValue().rows() == 2 && matrix->getValue()[1][0] == 5 &&
               matrix->getValue()[0][1] == 0);
