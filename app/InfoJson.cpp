@@ -62,7 +62,7 @@ json::object takeAsJson(const Take& take, const std::string& file) {
   info["upAxis"] = std::string(1, "xyz"[static_cast<int>(take.up)]);
   info["upAxisAssumed"] = take.upAssumed;
   info["markers"] = listOf(take.points, [&](const TakePoint& point) { return marker(take, point); });
-  info["outputs"] = listOf(take.outputs, [](const TakeOutput& output) -> json::object {
+  info["outputs"] = listOf(take.outputs, [](const ModelOutput& output) -> json::object {
     return {
         {"name", printable(output.name)}, {"kind", printable(output.kind)}, {"unit", printable(output.unit)}};
   });

@@ -212,12 +212,12 @@ class TakeText {
 
   void addOutputs() {
     std::vector<std::string> kinds;
-    for (const TakeOutput& output : m_take.outputs)
+    for (const ModelOutput& output : m_take.outputs)
       if (std::find(kinds.begin(), kinds.end(), output.kind) == kinds.end()) kinds.push_back(output.kind);
     for (const std::string& kind : kinds) {
       std::vector<std::string> names;
       std::string unit;
-      for (const TakeOutput& output : m_take.outputs)
+      for (const ModelOutput& output : m_take.outputs)
         if (output.kind == kind) names.push_back(printable(output.name)), unit = output.unit;
       std::string title = kind.empty() ? "outputs" : printable(kind);
       std::transform(title.begin(), title.end(), title.begin(),

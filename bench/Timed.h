@@ -19,7 +19,7 @@ void runTimed(benchmark::State& state, Timed timed, Edit edit, Undo undo, Redo r
   if (timed == Timed::Redo) run(true, redo);
 }
 
-// Undoing can be so short that the library would repeat the edit before it for minutes.
+// ImportRollback can be so short that the library would repeat the edit before it for minutes.
 #define TIMED_BENCHMARKS(name)                                                               \
   BENCHMARK_CAPTURE(name, edit, Timed::Edit)->Unit(benchmark::kMillisecond);                 \
   BENCHMARK_CAPTURE(name, withJournal, Timed::WithJournal)->Unit(benchmark::kMillisecond);   \

@@ -1,12 +1,14 @@
 # Layers: a target sees the headers of its own folder and of the folders that it is given, and of no other.
 #
 # Headers are included by folder ("host/scene/Module.h"). Each folder is reached through a directory of its
-# own that holds one link, build/include/FOLDER/FOLDER, so a folder that a target was not given is not found
-# by the compiler. Paths that climb ("../") would get around that and are refused at configuration time.
+# own that holds one link, build/include/FOLDER/FOLDER (a folder inside another: build/include/host.keys/host/keys),
+# so a folder that a target was not given is not found by the compiler. Paths that climb ("../") would get around that and are refused at configuration time.
 
 function(talix_layer_root folder out)
-  set(root ${CMAKE_BINARY_DIR}/include/${folder})
-  file(MAKE_DIRECTORY ${root})
+  string(REPLACE "/" "." name ${folder})
+  set(root ${CMAKE_BINARY_DIR}/include/${name})
+  get_filename_component(above ${root}/${folder} DIRECTORY)
+  file(MAKE_DIRECTORY ${above})
   if(NOT EXISTS ${root}/${folder})
     file(CREATE_LINK ${CMAKE_SOURCE_DIR}/${folder} ${root}/${folder} SYMBOLIC)
   endif()

@@ -1,6 +1,6 @@
 #include "commands/ChannelName.h"
 
-#include "host/animation/Controller.h"
+#include "host/scene/Controller.h"
 
 namespace {
 

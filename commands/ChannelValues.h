@@ -1,9 +1,9 @@
 // Values that scripts give after a property's name: their shapes, and how they meet the value that is there.
 #pragma once
 
-#include "host/animation/Controller.h"
 #include "host/command/ScriptCommand.h"
 #include "host/math/TalixRotation.h"
+#include "host/scene/ControllerKinds.h"
 
 inline constexpr double kRadiansPerDegree = 0.017453292519943295;
 

@@ -3,7 +3,7 @@
 
 #include <type_traits>
 
-#include "host/base/Variable.h"
+#include "host/command/Variable.h"
 
 template <class T>
 bool answer(Variable& result, T const& value) {

@@ -8,7 +8,7 @@
 #include <string>
 #include <vector>
 
-#include "host/animation/KeyTrack.h"
+#include "host/keys/KeyTrack.h"
 #include "host/math/Vec3.h"
 #include "host/time/Ticks.h"
 
@@ -32,7 +32,7 @@ struct TakePoint {
 };
 
 // A channel that is no position: an angle, force, moment, power or scalar computed with the take. Unscaled.
-struct TakeOutput {
+struct ModelOutput {
   std::string name;
   std::string unit;
   std::string kind;  // "ANGLES", "FORCES", "MOMENTS", "POWERS", "SCALARS", ...
@@ -80,7 +80,7 @@ struct Take {
   Axis up = Axis::Z;
   bool upAssumed = false;
   std::vector<TakePoint> points;
-  std::vector<TakeOutput> outputs;
+  std::vector<ModelOutput> outputs;
   std::vector<TakeAnalogChannel> analog;
   double analogRate = 0;          // samples a second, 0: no analog data
   std::vector<TakeJoint> joints;  // parents before children, siblings in file order

@@ -1,6 +1,6 @@
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 #include "io/TakeScene.h"
-#include "io/scene/TakeAttributes.h"
+#include "io/scene/FileMetadata.h"
 #include "io/scene/TakeExportParts.h"
 
 namespace talix {
@@ -22,16 +22,16 @@ FrameGrid animationFrames() {
 }
 
 void recallFile(Take& take, const NLEClip& clip) {
-  take.name = remembered::text(clip, remembered::kFileName);
+  take.name = fileMetadata::text(clip, fileMetadata::kFileName);
   if (take.name.empty()) take.name = clip.getName().GetString();
-  take.format = remembered::text(clip, remembered::kFileFormat);
-  const double unit = remembered::number(clip, remembered::kFileUnitInMillimetres, 0);
+  take.format = fileMetadata::text(clip, fileMetadata::kFileFormat);
+  const double unit = fileMetadata::number(clip, fileMetadata::kFileUnitInMillimetres, 0);
   if (unit > 0) {
     take.unitInMillimetres = unit;
-    take.fileUnit = remembered::text(clip, remembered::kFileUnit);
+    take.fileUnit = fileMetadata::text(clip, fileMetadata::kFileUnit);
   }
-  for (const remembered::Record& record : remembered::records(clip, remembered::kEvents, 5))
-    take.events.push_back({record[1], record[2], record[3], record[4], remembered::textNumber(record[0])});
+  for (const fileMetadata::Record& record : fileMetadata::records(clip, fileMetadata::kEvents, 5))
+    take.events.push_back({record[1], record[2], record[3], record[4], fileMetadata::textNumber(record[0])});
 }
 
 }  // namespace

@@ -1,9 +1,9 @@
 #include <filesystem>
 
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 #include "io/FileError.h"
 #include "io/TakeScene.h"
-#include "io/scene/TakeAttributes.h"
+#include "io/scene/FileMetadata.h"
 #include "io/scene/TakeImportParts.h"
 
 namespace talix {
@@ -13,9 +13,9 @@ namespace {
 constexpr const char* kAxisNames[] = {"x", "y", "z"};
 
 // Taken before anything changes: what a failed import goes back to.
-class Undoing {
+class ImportRollback {
  public:
-  explicit Undoing(Database& scene)
+  explicit ImportRollback(Database& scene)
       : m_scene(scene), m_clip(scene.getActiveClip()), m_layer(scene.getActiveLayer()) {}
 
   void takeBack(Clip* clip, const std::vector<Module*>& created) const {
@@ -57,7 +57,7 @@ HFrameRate frameRate(double rate) {
 void setSceneTime(TakeImport& import, const Take& take) {
   HTimeManager* time = HTimeManager::getInstance();
   if (take.rate > HFrameRate::kMaximum)
-    import.warn("the scene counts at most " + remembered::numberText(HFrameRate::kMaximum) +
+    import.warn("the scene counts at most " + fileMetadata::numberText(HFrameRate::kMaximum) +
                 " frames a second and keeps its rate; keys lie at their times");
   else
     time->setFrameRate(frameRate(take.rate));
@@ -71,8 +71,8 @@ void setSceneTime(TakeImport& import, const Take& take) {
 void noteSceneTime(TakeImport& import, const Take& take) {
   const HFrameRate& rate = HTimeManager::getInstance()->getFrameRate();
   if (rate.getTicksPerFrame() != ticksPerFrameAt(take.rate))
-    import.info("the take has " + remembered::numberText(take.rate) + " frames a second, the scene " +
-                remembered::numberText(rate.getFrameRate()) + "; keys keep their times");
+    import.info("the take has " + fileMetadata::numberText(take.rate) + " frames a second, the scene " +
+                fileMetadata::numberText(rate.getFrameRate()) + "; keys keep their times");
 }
 
 // The scene's up axis, from the user, else as it was, else from the take.
@@ -91,16 +91,16 @@ void noteAxes(TakeImport& import, const Take& take, int formerAxis, int axis, bo
 }
 
 void rememberFile(Clip& clip, const Take& take) {
-  remembered::setText(clip, remembered::kFileName, take.name);
-  remembered::setText(clip, remembered::kFileFormat, take.format);
-  remembered::setText(clip, remembered::kFileUnit, take.fileUnit);
-  remembered::setNumber(clip, remembered::kFileUnitInMillimetres, take.unitInMillimetres);
+  fileMetadata::setText(clip, fileMetadata::kFileName, take.name);
+  fileMetadata::setText(clip, fileMetadata::kFileFormat, take.format);
+  fileMetadata::setText(clip, fileMetadata::kFileUnit, take.fileUnit);
+  fileMetadata::setNumber(clip, fileMetadata::kFileUnitInMillimetres, take.unitInMillimetres);
   if (take.events.empty()) return;
-  std::vector<remembered::Record> events;
+  std::vector<fileMetadata::Record> events;
   for (const TakeEvent& event : take.events)
-    events.push_back({remembered::numberText(event.seconds), event.label, event.context, event.subject,
+    events.push_back({fileMetadata::numberText(event.seconds), event.label, event.context, event.subject,
                       event.description});
-  remembered::setRecords(clip, remembered::kEvents, events);
+  fileMetadata::setRecords(clip, fileMetadata::kEvents, events);
 }
 
 }  // namespace
@@ -109,7 +109,7 @@ void importTake(Take take, const std::string& path, int up, Database& scene, std
   checkTake(take, path, scene);
   const bool firstTake = scene.getNumClips() == 0;
   const int formerAxis = scene.getUpAxis(), axis = sceneUpAxis(take, up, scene);
-  const Undoing undoing(scene);
+  const ImportRollback undoing(scene);
   // With its suffix, so that the clip and the character that stands for the file do not share a path.
   const std::string fileName = std::filesystem::path(path).filename().string();
   const std::string clipName = moduleName(fileName);
@@ -118,7 +118,7 @@ void importTake(Take take, const std::string& path, int up, Database& scene, std
   scene.setActiveClip(clip);
 
   std::vector<TakeNote> said;
-  TakeImport import(scene, *clip, AxisTurn(static_cast<int>(take.up), axis), fileName, said);
+  TakeImport import(scene, *clip, UpAxisConversion(static_cast<int>(take.up), axis), fileName, said);
   for (const TakeNote& note : take.notes)
     note.level == TakeNote::Level::Warning ? import.warn(note.text) : import.info(note.text);
   try {

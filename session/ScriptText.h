@@ -8,7 +8,7 @@
 #include <string>
 #include <string_view>
 
-#include "host/base/Variable.h"
+#include "host/command/Variable.h"
 
 namespace talix {
 

@@ -10,7 +10,7 @@
 #include <string_view>
 #include <vector>
 
-#include "host/services/Log.h"
+#include "host/base/Log.h"
 #include "session/CommandRegistry.h"
 #include "session/PluginLoader.h"
 #include "session/ScriptLine.h"

@@ -6,11 +6,11 @@
 #include <sstream>
 #include <string>
 
-#include "host/animation/PropertyTable.h"
 #include "host/scene/CalibrationMgr.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/PropertyTable.h"
 #include "host/scene/SubjectManager.h"
-#include "host/time/HTimeManager.h"
 
 namespace talix_tests {
 

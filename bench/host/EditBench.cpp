@@ -7,10 +7,10 @@
 
 #include "bench/Shuffled.h"
 #include "bench/Timed.h"
-#include "host/animation/KeyReduction.h"
+#include "host/keys/KeyReduction.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Marker.h"
-#include "host/time/HTimeManager.h"
 
 namespace {
 

@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "bench/Shuffled.h"
-#include "host/animation/KeyTrack.h"
+#include "host/keys/KeyTrack.h"
 
 namespace {
 

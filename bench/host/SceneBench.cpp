@@ -8,7 +8,7 @@
 #include "bench/host/BenchScene.h"
 #include "host/scene/Character.h"
 #include "host/scene/Devices.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 

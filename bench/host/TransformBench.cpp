@@ -2,7 +2,7 @@
 #include <benchmark/benchmark.h>
 
 #include "bench/host/BenchScene.h"
-#include "host/scene/DistanceUtils.h"
+#include "host/scene/motion/DistanceUtils.h"
 
 namespace {
 

@@ -2,7 +2,7 @@
 #include <benchmark/benchmark.h>
 
 #include "bench/host/BenchScene.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 #include "session/Session.h"
 
 namespace {

@@ -5,8 +5,8 @@
 #include "bench/Shuffled.h"
 #include "bench/Timed.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Marker.h"
-#include "host/time/HTimeManager.h"
 #include "session/Session.h"
 
 namespace {

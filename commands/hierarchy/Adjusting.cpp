@@ -1,8 +1,8 @@
 #include "commands/hierarchy/Adjusting.h"
 
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/services/OperationStack.h"
-#include "host/time/HTimeManager.h"
 
 namespace {
 

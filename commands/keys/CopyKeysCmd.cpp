@@ -2,8 +2,8 @@
 #include "commands/keys/KeyClipboard.h"
 #include "commands/keys/KeyTargets.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Node.h"
-#include "host/time/HTimeManager.h"
 
 namespace {
 

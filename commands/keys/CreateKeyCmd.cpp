@@ -1,7 +1,7 @@
-#include "host/animation/PropertyTable.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/PropertyTable.h"
 
 namespace {
 

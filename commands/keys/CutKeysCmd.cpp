@@ -1,7 +1,7 @@
 #include "commands/Targets.h"
 #include "commands/keys/KeyTargets.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 

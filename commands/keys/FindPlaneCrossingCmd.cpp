@@ -3,8 +3,8 @@
 #include "commands/Arguments.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Node.h"
-#include "host/time/HTimeManager.h"
 
 namespace {
 

@@ -1,7 +1,7 @@
 #include "commands/keys/KeyTargets.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Node.h"
-#include "host/time/HTimeManager.h"
 
 namespace {
 

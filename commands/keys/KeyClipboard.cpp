@@ -1,7 +1,7 @@
 #include "commands/keys/KeyClipboard.h"
 
-#include "host/animation/PropertyTable.h"
 #include "host/scene/Database.h"
+#include "host/scene/PropertyTable.h"
 
 bool nameOneChannel() {
   const auto channelId = [](int i) { return g_db->getActiveProperty(i) & ~PropertyTable::kWhole; };

@@ -1,8 +1,8 @@
 // What copying and pasting keys share: the one channel that the active properties name.
 #pragma once
 
-#include "host/animation/ClipboardManager.h"
-#include "host/animation/Controller.h"
+#include "host/scene/ClipboardManager.h"
+#include "host/scene/Controller.h"
 
 // Whether all active properties, of which there is at least one, name the same channel, whatever components
 // they mark.

@@ -5,7 +5,7 @@
 #include "commands/ChannelName.h"
 #include "commands/Targets.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 

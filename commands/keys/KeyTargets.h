@@ -2,9 +2,9 @@
 #pragma once
 
 #include "commands/Results.h"
-#include "host/animation/Controller.h"
-#include "host/animation/PropertyTable.h"
 #include "host/command/ScriptCommand.h"
+#include "host/scene/Controller.h"
+#include "host/scene/PropertyTable.h"
 
 // --- one channel by name: "-onMod", else the primary selection, and a channel name ---
 

@@ -2,9 +2,9 @@
 #include <vector>
 
 #include "commands/keys/KeyTargets.h"
-#include "host/animation/KeyReduction.h"
+#include "host/keys/KeyReduction.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 

@@ -4,7 +4,7 @@
 #include "commands/ChannelValues.h"
 #include "commands/Events.h"
 #include "commands/keys/KeyTargets.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 

@@ -2,9 +2,9 @@
 #include <optional>
 
 #include "commands/ChannelValues.h"
-#include "host/animation/Clips.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/CalibrationMgr.h"
+#include "host/scene/Clips.h"
 #include "host/scene/Database.h"
 #include "host/scene/Devices.h"
 

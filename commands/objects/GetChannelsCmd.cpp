@@ -1,7 +1,7 @@
 #include "commands/Results.h"
-#include "host/animation/PropertyTable.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
+#include "host/scene/PropertyTable.h"
 
 namespace {
 

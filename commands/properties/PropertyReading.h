@@ -4,7 +4,7 @@
 
 #include "commands/Targets.h"
 #include "host/command/ScriptCommand.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 // The getters that send the user elsewhere for kinds of attribute that they do not read.
 enum class Getter { Int, Boolean, String, BooleanArray, IntArray, StringArray };

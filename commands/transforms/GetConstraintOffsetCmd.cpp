@@ -2,7 +2,7 @@
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Constraints.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 

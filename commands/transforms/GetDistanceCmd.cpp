@@ -2,8 +2,8 @@
 #include "commands/Targets.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
-#include "host/scene/DistanceUtils.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/motion/DistanceUtils.h"
 
 namespace {
 

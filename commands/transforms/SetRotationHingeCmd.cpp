@@ -1,6 +1,6 @@
 #include "commands/transforms/JointBone.h"
 #include "commands/transforms/TransformWriting.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 

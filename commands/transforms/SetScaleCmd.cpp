@@ -21,7 +21,7 @@ class SetScaleCmd final : public ScriptCommand<SetScaleCmd> {
 // The local scale that gives a scale in the world below the parent as it is at a time.
 Vec3 localScale(Node const& node, Vec3 const& inWorld, int64 time) {
   Node const* parent = node.getNodeParent();
-  return parent ? parent->getWorldPlacement(time).seen(Placement{{}, {}, inWorld}).scale : inWorld;
+  return parent ? Transform{{}, {}, inWorld}.relativeTo(parent->getWorldTransform(time)).scale : inWorld;
 }
 
 bool SetScaleCmd::execute(Given const& given, Args const& args, Variable&) {

@@ -2,7 +2,7 @@
 
 #include "commands/Targets.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 bool readQuery(Given const& given, Args const& args, QueryOptions const& which, QueryTexts const& texts,
                TransformQuery& query) {

@@ -4,7 +4,7 @@
 
 #include "commands/Targets.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 bool readWrite(Given const& given, Args const& args, WriteOptions const& which, char const* command,
                TransformWrite& write) {

@@ -2,8 +2,8 @@
 
 #include <cstdarg>
 
+#include "host/base/Log.h"
 #include "host/base/Text.h"
-#include "host/services/Log.h"
 
 H_DEFINE_ABSTRACT_CLASS(Command);
 

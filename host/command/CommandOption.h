@@ -3,7 +3,7 @@
 
 #include "host/base/HString.h"
 #include "host/base/TArray.h"
-#include "host/base/Variable.h"
+#include "host/command/Variable.h"
 
 class CommandOption {
  public:

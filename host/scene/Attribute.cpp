@@ -4,8 +4,8 @@
 #include <cmath>
 
 #include "host/scene/Database.h"
-#include "host/services/UndoJournal.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/UndoJournal.h"
 
 H_DEFINE_ABSTRACT_CLASS(Attribute);
 H_DEFINE_CLASS(IntAttribute);

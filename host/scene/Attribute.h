@@ -9,10 +9,10 @@
 #include <variant>
 #include <vector>
 
+#include "host/base/ControlID.h"
 #include "host/base/HObject.h"
 #include "host/base/HString.h"
 #include "host/base/TSimpleArray.h"
-#include "host/control/ControlID.h"
 #include "host/math/Matrix.h"
 #include "host/math/TalixRotation.h"
 #include "host/math/Vec3.h"

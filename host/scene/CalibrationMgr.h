@@ -3,7 +3,7 @@
 
 #include <unordered_set>
 
-#include "host/control/ControlID.h"
+#include "host/base/ControlID.h"
 
 class Module;
 

@@ -2,13 +2,13 @@
 
 #include <cstdarg>
 
-#include "host/animation/ClipboardManager.h"
-#include "host/animation/PropertyTable.h"
 #include "host/base/Text.h"
 #include "host/scene/CalibrationMgr.h"
+#include "host/scene/ClipboardManager.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/PropertyTable.h"
 #include "host/scene/SceneIndex.h"
 #include "host/scene/SubjectManager.h"
-#include "host/time/HTimeManager.h"
 
 namespace {
 

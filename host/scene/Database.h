@@ -5,9 +5,9 @@
 #include <memory>
 #include <vector>
 
-#include "host/animation/Clips.h"
+#include "host/base/Log.h"
+#include "host/scene/Clips.h"
 #include "host/scene/Selection.h"
-#include "host/services/Log.h"
 
 class CalibrationMgr;
 class ClipboardManager;
@@ -120,7 +120,7 @@ class Database {
 
   UndoJournal& getUndoJournal() { return m_journal; }
   // Puts lists in order again after undo and redo, and forgets what was cached.
-  void settle();
+  void restoreOrder();
 
   CalibrationMgr* getCalibrationMgr() const { return m_calibration.get(); }
   ClipboardManager* getClipboardManager() const { return m_clipboard.get(); }

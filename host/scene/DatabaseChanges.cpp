@@ -3,9 +3,9 @@
 
 #include "host/scene/CalibrationMgr.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/SceneIndex.h"
 #include "host/scene/SubjectManager.h"
-#include "host/time/HTimeManager.h"
 
 // --- membership ---
 
@@ -139,7 +139,7 @@ void Database::setUpAxis(int axis) {
 
 // --- after undo and redo ---
 
-void Database::settle() {
+void Database::restoreOrder() {
   if (m_unsorted) {
     const auto earlier = [](Module const* a, Module const* b) { return a->m_order < b->m_order; };
     m_modules.sort(earlier);
@@ -153,6 +153,6 @@ void Database::settle() {
                           m_unsortedParents.end());
   for (Module* parent : m_unsortedParents) parent->sortChildren();
   m_unsortedParents.clear();
-  m_selection.settle();
+  m_selection.restoreOrder();
   Node::forgetWorldCache();
 }

@@ -4,7 +4,7 @@
 
 #include "host/scene/Character.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 H_DEFINE_CLASS(Marker);
 

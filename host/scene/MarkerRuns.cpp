@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <vector>
 
-#include "host/animation/Clips.h"
+#include "host/scene/Clips.h"
 #include "host/scene/Database.h"
 
 namespace {

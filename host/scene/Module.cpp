@@ -3,9 +3,9 @@
 #include <algorithm>
 
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/ModuleChildren.h"
 #include "host/scene/SceneIndex.h"
-#include "host/time/HTimeManager.h"
 
 H_DEFINE_ABSTRACT_CLASS(Module);
 

@@ -9,13 +9,13 @@
 #include <unordered_map>
 #include <vector>
 
-#include "host/animation/Controller.h"
 #include "host/base/TArray.h"
 #include "host/base/TSimpleArray.h"
 #include "host/scene/Attribute.h"
+#include "host/scene/ControllerKinds.h"
 #include "host/scene/ModuleReferrer.h"
 #include "host/scene/OrderedList.h"
-#include "host/services/UndoJournal.h"
+#include "host/scene/UndoJournal.h"
 
 class Character;
 class Marker;
@@ -140,6 +140,7 @@ class Module : public HObject {
 
  private:
   friend class Attribute;
+  friend class ConnectingLines;
   friend class Controller;
   friend class Database;
   friend class NameAttribute;

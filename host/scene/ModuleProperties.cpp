@@ -1,8 +1,8 @@
 // Channels of a module by name, and numbers of channels and attributes by name.
 
-#include "host/animation/PropertyTable.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Node.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/PropertyTable.h"
 
 namespace {
 

@@ -3,46 +3,29 @@
 #include <algorithm>
 #include <cmath>
 
-#include "host/animation/RawValues.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/RawValues.h"
 
 H_DEFINE_CLASS(Node);
 
-// --- placements and their cache ---
+// --- world transforms and their cache ---
 
 namespace {
 
-// World placements are cached for one time, that of the last question: the current time when a scene is
-// looked at, each frame in turn when something walks through time. A node's placement holds while its epoch
+// World transforms are cached for one time, that of the last question: the current time when a scene is
+// looked at, each frame in turn when something walks through time. A node's holds while its epoch
 // is the cache's. A node that holds has ancestors that hold.
 struct WorldCache {
   int64 time = 0;
   uint64 epoch = 1;
 } s_cache;
 
-double quotient(double a, double b) { return b == 0 ? 0 : a / b; }
-
-Vec3 quotients(Vec3 const& a, Vec3 const& b) {
-  return {quotient(a.x, b.x), quotient(a.y, b.y), quotient(a.z, b.z)};
-}
-
 bool isFinite(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
 
 int64 now() { return HTimeManager::getInstance()->getTime(); }
 
 }  // namespace
-
-Placement Placement::operator*(Placement const& inner) const {
-  return {position + rotation.rotate(scaled(inner.position, scale)), rotation * inner.rotation,
-          scaled(scale, inner.scale)};
-}
-
-Placement Placement::seen(Placement const& other) const {
-  const TalixRotation back = rotation.inverse();
-  return {quotients(back.rotate(other.position - position), scale), back * other.rotation,
-          quotients(other.scale, scale)};
-}
 
 void Node::forgetWorldCache() { ++s_cache.epoch; }
 
@@ -61,26 +44,26 @@ void Node::markMoved(Module* module) {
   }
 }
 
-Placement Node::getWorldPlacement(int64 time) const {
+Transform Node::getWorldTransform(int64 time) const {
   if (time != s_cache.time) {
     s_cache.time = time;
     ++s_cache.epoch;
   }
   if (m_worldEpoch == s_cache.epoch) return m_world;
   Node const* parent = getNodeParent();
-  if (!parent || parent->m_worldEpoch == s_cache.epoch) return placeBelow(parent, time);
+  if (!parent || parent->m_worldEpoch == s_cache.epoch) return cacheBelow(parent, time);
   std::vector<Node const*> chain{this};
   for (; parent && parent->m_worldEpoch != s_cache.epoch; parent = parent->getNodeParent())
     chain.push_back(parent);
   for (auto node = chain.rbegin(); node != chain.rend(); ++node) {
-    (*node)->placeBelow(parent, time);
+    (*node)->cacheBelow(parent, time);
     parent = *node;
   }
   return m_world;
 }
 
-Placement const& Node::placeBelow(Node const* parent, int64 time) const {
-  const Placement own = inParent(time);
+Transform const& Node::cacheBelow(Node const* parent, int64 time) const {
+  const Transform own = inParent(time);
   m_world = parent ? parent->m_world * own : own;
   m_worldEpoch = s_cache.epoch;
   return m_world;
@@ -88,9 +71,7 @@ Placement const& Node::placeBelow(Node const* parent, int64 time) const {
 
 // --- life ---
 
-Node::~Node() {
-  for (MarkerConnection const& line : m_lines) release(line.getTarget());
-}
+Node::~Node() = default;
 
 void Node::setUp() {
   Module::setUp();
@@ -121,39 +102,39 @@ Vec3 Node::getLocalPos(int64 time) const { return m_translation->getValue(time);
 TalixRotation Node::getLocalRot(int64 time) const { return m_rotation->getValue(time); }
 Vec3 Node::getLocalScale(int64 time) const { return m_scale->getValue(time); }
 
-Placement Node::inParent(int64 time) const {
+Transform Node::inParent(int64 time) const {
   return {m_preTranslation + m_preRotation.rotate(getLocalPos(time)), m_preRotation * getLocalRot(time),
           getLocalScale(time)};
 }
 
-Placement Node::parentWorld(int64 time) const {
+Transform Node::parentWorld(int64 time) const {
   Node const* parent = getNodeParent();
-  return parent ? parent->getWorldPlacement(time) : Placement();
+  return parent ? parent->getWorldTransform(time) : Transform();
 }
 
-Vec3 Node::getWSPos(int64 time) const { return getWorldPlacement(time).position; }
-TalixRotation Node::getWSRot(int64 time) const { return getWorldPlacement(time).rotation; }
-Vec3 Node::getWSScale(int64 time) const { return getWorldPlacement(time).scale; }
+Vec3 Node::getWSPos(int64 time) const { return getWorldTransform(time).position; }
+TalixRotation Node::getWSRot(int64 time) const { return getWorldTransform(time).rotation; }
+Vec3 Node::getWSScale(int64 time) const { return getWorldTransform(time).scale; }
 
 namespace {
 
 // What `space` (null: the world) sees of a world placement.
-Placement seenFrom(Node const* space, int64 time, Placement const& world) {
-  return space ? space->getWorldPlacement(time).seen(world) : world;
+Transform relativeTo(Node const* space, int64 time, Transform const& world) {
+  return space ? world.relativeTo(space->getWorldTransform(time)) : world;
 }
 
 }  // namespace
 
 Vec3 Node::getPosInSpaceOfNode(int64 time, Node* space) const {
-  return seenFrom(space, time, getWorldPlacement(time)).position;
+  return relativeTo(space, time, getWorldTransform(time)).position;
 }
 
 TalixRotation Node::getRotInSpaceOfNode(int64 time, Node* space) const {
-  return seenFrom(space, time, getWorldPlacement(time)).rotation;
+  return relativeTo(space, time, getWorldTransform(time)).rotation;
 }
 
 Vec3 Node::getScaleInSpaceOfNode(int64 time, Node* space) const {
-  return seenFrom(space, time, getWorldPlacement(time)).scale;
+  return relativeTo(space, time, getWorldTransform(time)).scale;
 }
 
 Vec3 Node::getConstLocalPos() const { return m_translation->getConstValue(); }
@@ -164,22 +145,22 @@ TalixRotation Node::getConstLocalRot(bool withoutPre) const {
 
 Vec3 Node::getConstLocalScale() const { return m_scale->getConstValue(); }
 
-Placement Node::constInParent() const {
+Transform Node::constInParent() const {
   return {m_preTranslation + m_preRotation.rotate(getConstLocalPos()), getConstLocalRot(false),
           getConstLocalScale()};
 }
 
-Placement Node::constWorld() const {
+Transform Node::constWorld() const {
   std::vector<Node const*> chain;
   for (Node const* node = this; node; node = node->getNodeParent()) chain.push_back(node);
-  Placement world;
+  Transform world;
   for (auto node = chain.rbegin(); node != chain.rend(); ++node) world = world * (*node)->constInParent();
   return world;
 }
 
-Placement Node::constParentWorld() const {
+Transform Node::constParentWorld() const {
   Node const* parent = getNodeParent();
-  return parent ? parent->constWorld() : Placement();
+  return parent ? parent->constWorld() : Transform();
 }
 
 Vec3 Node::getConstWSPos() const { return constWorld().position; }
@@ -187,15 +168,15 @@ TalixRotation Node::getConstWSRot() const { return constWorld().rotation; }
 Vec3 Node::getConstWSScale() const { return constWorld().scale; }
 
 Vec3 Node::getConstPosInSpaceOfNode(Node const* space) const {
-  return space ? space->constWorld().seen(constWorld()).position : getConstWSPos();
+  return space ? constWorld().relativeTo(space->constWorld()).position : getConstWSPos();
 }
 
 TalixRotation Node::getConstRotInSpaceOfNode(Node const* space) const {
-  return space ? space->constWorld().seen(constWorld()).rotation : getConstWSRot();
+  return space ? constWorld().relativeTo(space->constWorld()).rotation : getConstWSRot();
 }
 
 Vec3 Node::getConstScaleInSpaceOfNode(Node const* space) const {
-  return space ? space->constWorld().seen(constWorld()).scale : getConstWSScale();
+  return space ? constWorld().relativeTo(space->constWorld()).scale : getConstWSScale();
 }
 
 Vec3 Node::getPreTranslationWS() const { return getPreTranslationInSpaceOfNode(nullptr); }
@@ -203,11 +184,11 @@ Vec3 Node::getPreTranslationWS() const { return getPreTranslationInSpaceOfNode(n
 TalixRotation Node::getPreRotationWS() const { return getPreRotationInSpaceOfNode(nullptr); }
 
 Vec3 Node::getPreTranslationInSpaceOfNode(Node* space) const {
-  return seenFrom(space, now(), parentWorld(now()) * Placement{m_preTranslation, {}, {1, 1, 1}}).position;
+  return relativeTo(space, now(), parentWorld(now()) * Transform{m_preTranslation, {}, {1, 1, 1}}).position;
 }
 
 TalixRotation Node::getPreRotationInSpaceOfNode(Node* space) const {
-  return seenFrom(space, now(), parentWorld(now()) * Placement{{}, m_preRotation, {1, 1, 1}}).rotation;
+  return relativeTo(space, now(), parentWorld(now()) * Transform{{}, m_preRotation, {1, 1, 1}}).rotation;
 }
 
 // --- writing ---
@@ -233,7 +214,7 @@ void Node::setLocalPos(int64 time, Vec3 const& position) {
 }
 
 void Node::setWSPos(int64 time, Vec3 const& position) {
-  setLocalPos(time, translationFor(parentWorld(time).seen(position)));
+  setLocalPos(time, translationFor(positionRelativeTo(parentWorld(time), position)));
 }
 
 void Node::setLocalRot(int64 time, TalixRotation const& rotation) {
@@ -255,7 +236,7 @@ void Node::setWSScale(int64 time, Vec3 const& scale) {
 void Node::setConstLocalPos(Vec3 const& position) { m_translation->setConstValue(position, true, false); }
 
 void Node::setConstWSPos(Vec3 const& position) {
-  setConstLocalPos(translationFor(constParentWorld().seen(position)));
+  setConstLocalPos(translationFor(positionRelativeTo(constParentWorld(), position)));
 }
 
 void Node::setConstLocalRot(TalixRotation const& rotation, bool withoutPre) {
@@ -318,67 +299,5 @@ void Node::setPreRotationWS(TalixRotation const& rotation) {
 }
 
 void Node::setPreTranslationWS(Vec3 const& translation) {
-  setPreTranslation(parentWorld(now()).seen(translation));
+  setPreTranslation(positionRelativeTo(parentWorld(now()), translation));
 }
-
-// --- connecting lines ---
-
-Vec3 MarkerConnection::getDefaultColor() { return {128, 128, 128}; }
-
-namespace {
-
-template <class Lines>
-auto findLine(Lines& lines, Node const* target) {
-  return std::find_if(lines.begin(), lines.end(), [&](auto& line) { return line.getTarget() == target; });
-}
-
-}  // namespace
-
-MarkerConnection* Node::getConnectionTo(Node const* target) {
-  return isConnectedTo(target) ? &*findLine(m_lines, target) : nullptr;
-}
-
-struct Node::LinesChange : UndoChange {
-  explicit LinesChange(Node& concerned) : UndoChange(&concerned), node(concerned), lines(concerned.m_lines) {}
-  void swap() override {
-    for (MarkerConnection const& line : lines) node.refer(line.getTarget());
-    for (MarkerConnection const& line : node.m_lines) node.release(line.getTarget());
-    node.m_lines.swap(lines);
-  }
-  int64 memoryUse() const override {
-    return static_cast<int64>(sizeof *this +
-                              std::max(lines.size(), node.m_lines.size()) * sizeof(MarkerConnection));
-  }
-
-  Node& node;
-  std::vector<MarkerConnection> lines;
-};
-
-void Node::storeLine(Node* target, MarkerConnection const* line) {
-  if (isRecorded() && UndoJournal::isDue(m_linesMark))
-    g_db->getUndoJournal().add(std::make_unique<LinesChange>(*this));
-  const bool known = isConnectedTo(target);
-  if (line && known) {
-    *findLine(m_lines, target) = *line;
-  } else if (line) {
-    m_lines.push_back(*line);
-    refer(target);
-  } else if (known) {
-    m_lines.erase(findLine(m_lines, target));
-    release(target);
-  }
-}
-
-void Node::addConnectingLine(MarkerConnection const& line) {
-  if (line.getTarget()) storeLine(line.getTarget(), &line);
-}
-
-void Node::removeConnectingLine(MarkerConnection const& line) { removeConnectingLine(line.getTarget()); }
-
-void Node::removeConnectingLine(Node* target) { storeLine(target, nullptr); }
-
-void Node::resetAllLines() {
-  while (!m_lines.empty()) storeLine(m_lines.front().getTarget(), nullptr);
-}
-
-void Node::forget(Module* module) { removeConnectingLine(static_cast<Node*>(module)); }

@@ -6,26 +6,11 @@
 // millimetres, times ticks. "Const" operations use default values throughout.
 #pragma once
 
-#include <vector>
-
-#include "host/scene/MarkerConnection.h"
+#include "host/math/Transform.h"
+#include "host/scene/ConnectingLines.h"
 #include "host/scene/Module.h"
 
-// Where a node's frame lies in another one.
-struct Placement {
-  Vec3 position;
-  TalixRotation rotation;
-  Vec3 scale{1, 1, 1};
-
-  // A frame given in this one, in the frame that this one is given in. Frames do not shear, so with uneven
-  // scales it matters where a product begins: at the root.
-  Placement operator*(Placement const& inner) const;
-  // A frame given beside this one, as seen from this one. Along an axis of scale 0 everything is at 0.
-  Placement seen(Placement const& other) const;
-  Vec3 seen(Vec3 const& point) const { return seen(Placement{point, {}, {1, 1, 1}}).position; }
-};
-
-class Node : public Module, private ModuleReferrer {
+class Node : public Module {
   H_DECLARE_CLASS(Node, Module)
 
  public:
@@ -34,7 +19,7 @@ class Node : public Module, private ModuleReferrer {
   Vec3Controller* getTranslationChannel() const { return m_translation; }
   RotController* getRotationChannel() const { return m_rotation; }
   Vec3Controller* getScaleChannel() const { return m_scale; }
-  // Forgets every cached world placement: what is active has changed.
+  // Forgets every cached world transform: what is active has changed.
   static void forgetWorldCache();
   // Marks the nodes at and below a module as moved, stopping where that is known already.
   static void markMoved(Module* module);
@@ -57,7 +42,7 @@ class Node : public Module, private ModuleReferrer {
   Vec3 getPosInSpaceOfNode(int64 time, Node* space) const;
   TalixRotation getRotInSpaceOfNode(int64 time, Node* space) const;
   Vec3 getScaleInSpaceOfNode(int64 time, Node* space) const;
-  Placement getWorldPlacement(int64 time) const;
+  Transform getWorldTransform(int64 time) const;
 
   Vec3 getConstLocalPos() const;
   // withoutPre: the channel's own default; else the pre-rotation before it.
@@ -113,16 +98,20 @@ class Node : public Module, private ModuleReferrer {
   void setPreTranslationWS(Vec3 const& translation);
 
   // --- connecting lines ---
-  bool isConnectedTo(Node const* target) const { return refersTo(target); }
-  int getNumConnectingLines() const { return static_cast<int>(m_lines.size()); }
-  MarkerConnection const& getConnectingLine(int i) const { return m_lines[static_cast<size_t>(i)]; }
+  bool isConnectedTo(Node const* target) const { return m_lines.leadTo(target); }
+  int getNumConnectingLines() const { return m_lines.getCount(); }
+  MarkerConnection const& getConnectingLine(int i) const { return m_lines.at(i); }
   // For reading: a line with another colour is added in place of the former one.
-  MarkerConnection* getConnectionTo(Node const* target);
+  MarkerConnection* getConnectionTo(Node const* target) { return m_lines.find(target); }
   // Replaces a line to the same target.
-  void addConnectingLine(MarkerConnection const& line);
-  void removeConnectingLine(MarkerConnection const& line);
-  void removeConnectingLine(Node* target);
-  void resetAllLines();
+  void addConnectingLine(MarkerConnection const& line) {
+    if (line.getTarget()) m_lines.store(line.getTarget(), &line);
+  }
+  void removeConnectingLine(MarkerConnection const& line) { removeConnectingLine(line.getTarget()); }
+  void removeConnectingLine(Node* target) { m_lines.store(target, nullptr); }
+  void resetAllLines() {
+    while (m_lines.getCount() > 0) m_lines.store(m_lines.at(0).getTarget(), nullptr);
+  }
 
  protected:
   Node() = default;
@@ -133,21 +122,17 @@ class Node : public Module, private ModuleReferrer {
   friend class Database;
   friend class Selection;
 
-  void forget(Module* module) override;
   void storePreTransform(Vec3 const& translation, TalixRotation const& rotation);  // mutator
   struct PreTransformChange;
-  struct LinesChange;
-  // Mutator: the line to a target, null for none.
-  void storeLine(Node* target, MarkerConnection const* line);
-  // Caches this node's world frame; the parent's (null: none) holds already.
-  Placement const& placeBelow(Node const* parent, int64 time) const;
-  // The frame of this node in its parent node's frame.
-  Placement inParent(int64 time) const;
-  Placement constInParent() const;
-  Placement constWorld() const;
-  // The world frame of the parent node; the world itself without one.
-  Placement parentWorld(int64 time) const;
-  Placement constParentWorld() const;
+  // Caches this node's world transform; the parent's (null: none) holds already.
+  Transform const& cacheBelow(Node const* parent, int64 time) const;
+  // In the space of the parent node.
+  Transform inParent(int64 time) const;
+  Transform constInParent() const;
+  Transform constWorld() const;
+  // Of the parent node; the world itself without one.
+  Transform parentWorld(int64 time) const;
+  Transform constParentWorld() const;
   Vec3 translationFor(Vec3 const& inParent) const;
   void writeAt(Controller* channel, int64 time, Controller::Values const& values);
 
@@ -157,11 +142,11 @@ class Node : public Module, private ModuleReferrer {
   EnumAttribute* m_rotationOrder = nullptr;
   Vec3 m_preTranslation;
   TalixRotation m_preRotation;
-  std::vector<MarkerConnection> m_lines;
+  ConnectingLines m_lines{*this};
 
-  uint64 m_preTransformMark = 0, m_linesMark = 0;  // of undo steps
+  uint64 m_preTransformMark = 0;  // of undo steps
 
-  mutable Placement m_world;        // at the cache's time
+  mutable Transform m_world;        // at the cache's time
   mutable uint64 m_worldEpoch = 0;  // of the cache; m_world holds when they are equal
   uint32 m_nodeSlot = kNoSlot;
   uint32 m_selectedNodeSlot = kNoSlot;

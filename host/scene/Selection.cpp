@@ -110,7 +110,7 @@ void Selection::setPrimary(Module* module) {
   m_primary = module;
 }
 
-void Selection::settle() {
+void Selection::restoreOrder() {
   if (!m_unsorted) return;
   const auto earlier = [](Module const* a, Module const* b) {
     return a->m_selectionOrder < b->m_selectionOrder;

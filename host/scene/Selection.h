@@ -14,7 +14,7 @@ class Selection {
   void clear();
   void setPrimary(Module* module);  // null: none
   // Puts the lists in order again after undo and redo.
-  void settle();
+  void restoreOrder();
 
   Module* getPrimary() const { return m_primary; }
   int getCount() const { return m_modules.getCount(); }

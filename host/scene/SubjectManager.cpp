@@ -1,8 +1,8 @@
 #include "host/scene/SubjectManager.h"
 
 #include "host/scene/Database.h"
-#include "host/scene/RootMotion.h"
 #include "host/scene/SceneIndex.h"
+#include "host/scene/motion/RootMotion.h"
 
 Character* SubjectManager::getSubject(HString const& name) const {
   for (int i = 0; i < m_subjects.getCount(); ++i)

@@ -4,8 +4,8 @@
 #include <filesystem>
 #include <string>
 
+#include "host/base/Log.h"
 #include "host/services/HInterface.h"
-#include "host/services/Log.h"
 
 namespace {
 

@@ -9,7 +9,7 @@
 #include "io/TakeFormats.h"
 #include "io/TextScanner.h"
 #include "io/bvh/BvhChannels.h"
-#include "io/bvh/EulerUnroller.h"
+#include "io/bvh/EulerFilter.h"
 
 namespace talix {
 
@@ -102,7 +102,7 @@ class JointWriter {
   bool m_written[3] = {};  // rotation channels, by axis
   bool m_moves = false;
   double m_lostTurn = 0;
-  EulerUnroller m_unroller;
+  EulerFilter m_unroller;
   KeyTrack::Cursor m_placeCursor, m_turnCursor;
 };
 

@@ -13,7 +13,7 @@ namespace talix {
 // alone.
 struct C3DPointTarget {
   TakePoint* point = nullptr;
-  TakeOutput* output = nullptr;
+  ModelOutput* output = nullptr;
   double factor = 1;        // from the file's coordinates
   double residualStep = 1;  // mm for each 1 of the file's residual
 };

@@ -26,7 +26,7 @@ class DataWriter {
       m_positions.emplace_back(point.positions, plan.frames);
       m_residuals.emplace_back(point.residuals, plan.frames);
     }
-    for (const TakeOutput& output : take.outputs) m_outputs.emplace_back(output.values, plan.frames);
+    for (const ModelOutput& output : take.outputs) m_outputs.emplace_back(output.values, plan.frames);
     if (!plan.withAnalog) return;
     for (const TakeAnalogChannel& channel : take.analog) m_analog.emplace_back(channel.samples, plan.samples);
   }

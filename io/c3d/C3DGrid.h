@@ -1,7 +1,7 @@
 // Keys of a track at evenly spaced times: the only ones that a C3D file has room for.
 #pragma once
 
-#include "host/animation/KeyTrack.h"
+#include "host/keys/KeyTrack.h"
 
 namespace talix {
 

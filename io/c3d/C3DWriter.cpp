@@ -119,7 +119,7 @@ class Writer {
                       [](unsigned char mask) { return mask > 0x7f; }))
         warn("C3D holds seven cameras: the eighth of " + labelOf(i) + " is not written");
     }
-    for (const TakeOutput& output : m_take.outputs)
+    for (const ModelOutput& output : m_take.outputs)
       tellLeftOver(output.values, m_plan.frames, "keys of " + output.name);
     if (!m_plan.withAnalog) return;
     for (const TakeAnalogChannel& channel : m_take.analog)
@@ -155,7 +155,7 @@ class Writer {
       labels.push_back(labelOf(i));
       descriptions.push_back(m_take.points[i].description);
     }
-    for (const TakeOutput& output : m_take.outputs) {
+    for (const ModelOutput& output : m_take.outputs) {
       labels.push_back(output.name);
       descriptions.emplace_back();
     }
@@ -181,7 +181,7 @@ class Writer {
   void addOutputs(C3DGroupWriter& group) {
     std::map<std::string, std::vector<std::string>> labels;
     std::map<std::string, std::string> units;
-    for (const TakeOutput& output : m_take.outputs) {
+    for (const ModelOutput& output : m_take.outputs) {
       const std::string kind = output.kind.empty() ? "SCALARS" : output.kind;
       labels[kind].push_back(output.name);
       const auto [unit, first] = units.emplace(kind, output.unit);

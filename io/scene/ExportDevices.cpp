@@ -1,8 +1,8 @@
 #include <unordered_map>
 
 #include "host/scene/Devices.h"
-#include "host/time/HTimeManager.h"
-#include "io/scene/TakeAttributes.h"
+#include "host/scene/HTimeManager.h"
+#include "io/scene/FileMetadata.h"
 #include "io/scene/TakeExportParts.h"
 
 namespace talix {
@@ -10,12 +10,12 @@ namespace talix {
 namespace {
 
 // What the clip remembers of its channels, by their name in the scene.
-using Remembered = std::unordered_map<std::string, remembered::Record>;
+using Remembered = std::unordered_map<std::string, fileMetadata::Record>;
 
 Remembered rememberedOf(const NLEClip* clip, const char* attribute, size_t fields) {
   Remembered byChannel;
   if (!clip) return byChannel;
-  for (remembered::Record& record : remembered::records(*clip, attribute, fields)) {
+  for (fileMetadata::Record& record : fileMetadata::records(*clip, attribute, fields)) {
     std::string channel = record[0];
     byChannel.emplace(std::move(channel), std::move(record));
   }
@@ -27,8 +27,8 @@ class DeviceExport {
   explicit DeviceExport(TakeExport& out)
       : m_out(out),
         m_sampler(out.sampler),
-        m_analog(rememberedOf(m_sampler.clip(), remembered::kAnalogChannels, 6)),
-        m_outputs(rememberedOf(m_sampler.clip(), remembered::kOutputs, 4)) {}
+        m_analog(rememberedOf(m_sampler.clip(), fileMetadata::kAnalogChannels, 6)),
+        m_outputs(rememberedOf(m_sampler.clip(), fileMetadata::kOutputs, 4)) {}
 
   void add(const AnalogDevice& device) {
     for (int i = 0; i < device.getNumChannels(); ++i) {
@@ -47,13 +47,13 @@ class DeviceExport {
   void finish() {
     if (m_out.take.analog.empty()) return;
     m_out.take.analogRate =
-        m_sampler.clip() ? remembered::number(*m_sampler.clip(), remembered::kAnalogRate, m_out.take.rate)
+        m_sampler.clip() ? fileMetadata::number(*m_sampler.clip(), fileMetadata::kAnalogRate, m_out.take.rate)
                          : m_out.take.rate;
   }
 
  private:
   void addOutput(const Controller& channel) {
-    TakeOutput output;
+    ModelOutput output;
     output.name = channel.getName().GetString();
     output.kind = "SCALARS";
     if (const auto known = m_outputs.find(output.name); known != m_outputs.end()) {
@@ -72,11 +72,11 @@ class DeviceExport {
     TakeAnalogChannel analog;
     analog.name = channel.getName().GetString();
     if (const auto known = m_analog.find(analog.name); known != m_analog.end()) {
-      const remembered::Record& record = known->second;
+      const fileMetadata::Record& record = known->second;
       analog.unit = record[2];
       analog.description = record[3];
-      analog.scale = remembered::textNumber(record[4]);
-      analog.offset = remembered::textNumber(record[5]);
+      analog.scale = fileMetadata::textNumber(record[4]);
+      analog.offset = fileMetadata::textNumber(record[5]);
       analog.name = record[1];
     }
     analog.samples = samples(channel);

@@ -3,9 +3,9 @@
 
 #include "host/scene/Bones.h"
 #include "io/bvh/BvhChannels.h"
-#include "io/scene/AxisTurn.h"
-#include "io/scene/TakeAttributes.h"
+#include "io/scene/FileMetadata.h"
 #include "io/scene/TakeExportParts.h"
+#include "io/scene/UpAxisConversion.h"
 
 namespace talix {
 
@@ -123,7 +123,7 @@ class JointExport {
     FrameRun positions(KeyTrack::Shape::Vector, grid), rotations(KeyTrack::Shape::Rotation, grid);
     for (int64 i = 0; i < grid.count; ++i) {
       const int64 time = grid.start() + i * grid.period;
-      const Placement world = node.getWorldPlacement(time);
+      const Transform world = node.getWorldTransform(time);
       double quaternion[4];
       world.rotation.getQuaternion(quaternion);
       positions.add(i, &world.position.x);
@@ -136,7 +136,7 @@ class JointExport {
 
   // The file's channels, as long as they are what the joint needs.
   std::vector<std::string> channels(const TakeJoint& result, const Node& node) const {
-    std::istringstream words(remembered::text(node, remembered::kFileChannels));
+    std::istringstream words(fileMetadata::text(node, fileMetadata::kFileChannels));
     std::vector<std::string> names;
     std::vector<BvhChannel> known;
     for (std::string word; words >> word; names.push_back(word)) {

@@ -3,9 +3,9 @@
 
 #include "host/scene/Character.h"
 #include "host/scene/Marker.h"
-#include "io/scene/AxisTurn.h"
-#include "io/scene/TakeAttributes.h"
+#include "io/scene/FileMetadata.h"
 #include "io/scene/TakeExportParts.h"
+#include "io/scene/UpAxisConversion.h"
 
 namespace talix {
 
@@ -36,7 +36,7 @@ std::string subjectOf(const Marker& marker) {
   const Character* character = marker.getCharacterParent();
   if (!character) return {};
   const std::string name = character->getName().GetString();
-  return remembered::text(*character, remembered::kFileName) == name ? std::string() : name;
+  return fileMetadata::text(*character, fileMetadata::kFileName) == name ? std::string() : name;
 }
 
 class PointExport {
@@ -50,7 +50,7 @@ class PointExport {
     point.label = marker.getName().GetString();
     if (marker.isUnlabeled() && standsForNoName(point.label)) point.label.clear();
     point.subject = subjectOf(marker);
-    point.description = remembered::text(marker, remembered::kDescription);
+    point.description = fileMetadata::text(marker, fileMetadata::kDescription);
     m_out.keysLeftOut += m_sampler.keysOffGrid(translation);
 
     const std::vector<bool> frames = m_sampler.framesWithData(translation, &marker);

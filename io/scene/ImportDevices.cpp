@@ -1,10 +1,10 @@
 #include <algorithm>
 #include <unordered_set>
 
-#include "host/animation/PropertyTable.h"
 #include "host/scene/Devices.h"
+#include "host/scene/PropertyTable.h"
 #include "io/FileError.h"
-#include "io/scene/TakeAttributes.h"
+#include "io/scene/FileMetadata.h"
 #include "io/scene/TakeImportParts.h"
 
 namespace talix {
@@ -62,23 +62,23 @@ class DeviceImport {
 void importOutputs(TakeImport& import, Take& take, const std::string& path) {
   auto* device = import.place<AnalogDevice>(isDevice, "Outputs", nullptr);
   DeviceImport channels(import, *device, DataSource::Vec3Property, path);
-  std::vector<remembered::Record> records;
-  for (TakeOutput& output : take.outputs)
+  std::vector<fileMetadata::Record> records;
+  for (ModelOutput& output : take.outputs)
     records.push_back({channels.add(output.name, "output", std::move(output.values)), output.name,
                        output.unit, output.kind});
-  remembered::setRecords(import.clip(), remembered::kOutputs, records);
+  fileMetadata::setRecords(import.clip(), fileMetadata::kOutputs, records);
 }
 
 void importAnalog(TakeImport& import, Take& take, const std::string& path) {
   auto* device = import.place<AnalogDevice>(isDevice, "Analog", nullptr);
   DeviceImport channels(import, *device, DataSource::FloatProperty, path);
-  std::vector<remembered::Record> records;
+  std::vector<fileMetadata::Record> records;
   for (TakeAnalogChannel& analog : take.analog)
     records.push_back({channels.add(analog.name, "channel", std::move(analog.samples)), analog.name,
-                       analog.unit, analog.description, remembered::numberText(analog.scale),
-                       remembered::numberText(analog.offset)});
-  remembered::setRecords(import.clip(), remembered::kAnalogChannels, records);
-  remembered::setNumber(import.clip(), remembered::kAnalogRate, take.analogRate);
+                       analog.unit, analog.description, fileMetadata::numberText(analog.scale),
+                       fileMetadata::numberText(analog.offset)});
+  fileMetadata::setRecords(import.clip(), fileMetadata::kAnalogChannels, records);
+  fileMetadata::setNumber(import.clip(), fileMetadata::kAnalogRate, take.analogRate);
 }
 
 }  // namespace

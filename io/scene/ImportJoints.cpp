@@ -1,4 +1,4 @@
-#include "io/scene/TakeAttributes.h"
+#include "io/scene/FileMetadata.h"
 #include "io/scene/TakeImportParts.h"
 
 namespace talix {
@@ -75,7 +75,8 @@ class JointImport {
     if (joint.endSite) return;
     node.setRotationOrder(static_cast<TalixRotation::RotOrder>(joint.rotationOrder));
     setDofs(static_cast<BaseBone&>(node), joint.channels);
-    if (!joint.channels.empty()) remembered::setText(node, remembered::kFileChannels, joined(joint.channels));
+    if (!joint.channels.empty())
+      fileMetadata::setText(node, fileMetadata::kFileChannels, joined(joint.channels));
   }
 
   void compareOffset(const Node& node, const Vec3& offset) {

@@ -1,6 +1,6 @@
 #include <algorithm>
 
-#include "io/scene/TakeAttributes.h"
+#include "io/scene/FileMetadata.h"
 #include "io/scene/TakeImportParts.h"
 
 namespace talix {
@@ -42,7 +42,8 @@ class PointImport {
     marker->getTranslationChannel()->setTrack(clip, 0, std::move(point.positions));
     if (!point.residuals.empty()) marker->getResidualChannel()->setTrack(clip, 0, std::move(point.residuals));
     addCameras(*marker, point);
-    if (!point.description.empty()) remembered::setText(*marker, remembered::kDescription, point.description);
+    if (!point.description.empty())
+      fileMetadata::setText(*marker, fileMetadata::kDescription, point.description);
   }
 
   void addNotes() {

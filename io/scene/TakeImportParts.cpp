@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "io/scene/TakeAttributes.h"
+#include "io/scene/FileMetadata.h"
 
 namespace talix {
 
@@ -22,7 +22,7 @@ std::string counted(int64 count, const std::string& noun) {
   return std::to_string(count) + " " + noun + (count == 1 ? "" : "s");
 }
 
-TakeImport::TakeImport(Database& scene, Clip& clip, const AxisTurn& turn, std::string fileName,
+TakeImport::TakeImport(Database& scene, Clip& clip, const UpAxisConversion& turn, std::string fileName,
                        std::vector<TakeNote>& notes)
     : m_scene(scene), m_clip(clip), m_turn(turn), m_fileName(std::move(fileName)), m_notes(notes) {}
 
@@ -80,7 +80,7 @@ Character* TakeImport::fileCharacter(const std::string& takeName) {
   bool isNew = false;
   const std::string name = moduleName(takeName);
   Character* found = character(name, &isNew);
-  if (isNew) remembered::setText(*found, remembered::kFileName, name);
+  if (isNew) fileMetadata::setText(*found, fileMetadata::kFileName, name);
   return found;
 }
 

@@ -9,7 +9,7 @@
 
 #include "host/scene/Database.h"
 #include "io/Take.h"
-#include "io/scene/AxisTurn.h"
+#include "io/scene/UpAxisConversion.h"
 
 namespace talix {
 
@@ -17,11 +17,11 @@ namespace talix {
 // some.
 class TakeImport {
  public:
-  TakeImport(Database& scene, Clip& clip, const AxisTurn& turn, std::string fileName,
+  TakeImport(Database& scene, Clip& clip, const UpAxisConversion& turn, std::string fileName,
              std::vector<TakeNote>& notes);
 
   Clip& clip() const { return m_clip; }
-  const AxisTurn& turn() const { return m_turn; }
+  const UpAxisConversion& turn() const { return m_turn; }
   void info(const std::string& text) { note(TakeNote::Level::Info, text); }
   void warn(const std::string& text) { note(TakeNote::Level::Warning, text); }
 
@@ -55,7 +55,7 @@ class TakeImport {
 
   Database& m_scene;
   Clip& m_clip;
-  AxisTurn m_turn;
+  UpAxisConversion m_turn;
   std::string m_fileName;
   std::vector<TakeNote>& m_notes;
   std::unordered_map<Module*, Waiting> m_waiting;

@@ -1,6 +1,6 @@
 #include <iterator>
 
-#include "host/animation/PropertyTable.h"
+#include "host/scene/PropertyTable.h"
 #include "session/hostcommands/Arguments.h"
 
 namespace talix {

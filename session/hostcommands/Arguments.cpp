@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <cmath>
 
-#include "host/animation/PropertyTable.h"
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/PropertyTable.h"
 
 namespace talix {
 

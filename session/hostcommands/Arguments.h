@@ -4,8 +4,8 @@
 
 #include <optional>
 
-#include "host/animation/Controller.h"
 #include "host/command/ScriptCommand.h"
+#include "host/scene/Controller.h"
 #include "host/scene/Module.h"
 
 namespace talix {

@@ -4,8 +4,8 @@
 #include <cmath>
 #include <iterator>
 
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Node.h"
-#include "host/time/HTimeManager.h"
 #include "session/hostcommands/Arguments.h"
 
 namespace talix {

@@ -1,5 +1,5 @@
 #include "host/command/ScriptCommand.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace talix {
 

@@ -1,5 +1,5 @@
-#include "host/animation/PropertyTable.h"
 #include "host/scene/Database.h"
+#include "host/scene/PropertyTable.h"
 #include "session/hostcommands/Arguments.h"
 
 namespace talix {

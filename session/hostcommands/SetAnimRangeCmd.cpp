@@ -1,4 +1,4 @@
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 #include "session/hostcommands/Arguments.h"
 
 namespace talix {

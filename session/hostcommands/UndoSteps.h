@@ -2,7 +2,7 @@
 #pragma once
 
 #include "host/command/ScriptCommand.h"
-#include "host/services/UndoJournal.h"
+#include "host/scene/UndoJournal.h"
 
 namespace talix {
 

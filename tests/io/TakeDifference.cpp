@@ -82,7 +82,7 @@ void compareDevices(Comparison& is, const Take& a, const Take& b) {
   is.same("analog rate", a.analogRate, b.analogRate);
   if (!is.sameCount("outputs", a.outputs, b.outputs) || !is.sameCount("channels", a.analog, b.analog)) return;
   for (size_t i = 0; i < a.outputs.size(); ++i) {
-    const TakeOutput &from = a.outputs[i], &to = b.outputs[i];
+    const ModelOutput &from = a.outputs[i], &to = b.outputs[i];
     is.same("output " + from.name + " is " + to.name, from.name + from.unit + from.kind,
             to.name + to.unit + to.kind);
     is.same("output " + from.name, from.values, to.values);

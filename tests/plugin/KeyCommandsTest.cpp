@@ -2,8 +2,8 @@
 #include <random>
 #include <set>
 
-#include "host/animation/PropertyTable.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/PropertyTable.h"
 #include "tests/plugin/SceneFixture.h"
 
 namespace {

@@ -5,9 +5,9 @@
 #include <string>
 #include <vector>
 
+#include "host/base/Log.h"
 #include "host/command/Command.h"
 #include "host/command/CommandPluginBase.h"
-#include "host/services/Log.h"
 
 // The library's exported names, looked up at first use; it stays loaded.
 struct PluginLibrary {

@@ -4,7 +4,7 @@
 #include <typeinfo>
 #include <utility>
 
-#include "host/animation/PropertyTable.h"
+#include "host/scene/PropertyTable.h"
 #include "host/services/HEvent.h"
 #include "tests/plugin/SceneFixture.h"
 

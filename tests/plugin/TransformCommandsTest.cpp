@@ -2,8 +2,8 @@
 #include <limits>
 
 #include "host/scene/Constraints.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Marker.h"
-#include "host/time/HTimeManager.h"
 #include "tests/plugin/SceneFixture.h"
 
 namespace {

@@ -3,7 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 #include "session/Session.h"
 
 namespace {
@@ -11,7 +11,7 @@ namespace {
 struct Strayed {
   double position = 0, relative = 0, angle = 0;  // mm, parts, degrees
 
-  void add(Placement const& was, Placement const& is) {
+  void add(Transform const& was, Transform const& is) {
     const double far = (was.position - is.position).length();
     Vec3 turn;
     (was.rotation.inverse() * is.rotation).getAsVector(turn);
@@ -56,17 +56,17 @@ TEST_P(SkeletonTest, KeepsItsMotion) {
     run(text.substr(0, cut));
     std::vector<Node const*> nodes;
     for (int i = 0; i < g_db->getNumSelectedNodes(); ++i) nodes.push_back(g_db->getSelectedNode(i));
-    std::vector<Placement> before;
+    std::vector<Transform> before;
     for (auto const* times : {&keys, &frames})
       for (const int64 at : *times)
-        for (Node const* node : nodes) before.push_back(node->getWorldPlacement(at));
+        for (Node const* node : nodes) before.push_back(node->getWorldTransform(at));
     run(text.substr(cut + 1));
     Strayed atKeys, between;
     auto was = before.begin();
     for (auto const* times : {&keys, &frames})
       for (const int64 at : *times)
         for (Node const* node : nodes)
-          (times == &keys ? atKeys : between).add(*was++, node->getWorldPlacement(at));
+          (times == &keys ? atKeys : between).add(*was++, node->getWorldTransform(at));
     EXPECT_LT(atKeys.relative, 1e-9) << lines;
     EXPECT_LE(between.position, 0.0100001) << lines;
     EXPECT_LE(between.angle, 0.0100001) << lines;

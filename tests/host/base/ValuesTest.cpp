@@ -3,10 +3,10 @@
 #include <gtest/gtest.h>
 #include <limits>
 
+#include "host/base/ControlID.h"
 #include "host/base/HStringArray.h"
 #include "host/base/TSimpleArray.h"
-#include "host/base/Variable.h"
-#include "host/control/ControlID.h"
+#include "host/command/Variable.h"
 #include "host/scene/Bones.h"
 #include "host/scene/Devices.h"
 

@@ -8,8 +8,8 @@
 
 #include "host/scene/Character.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/Marker.h"
-#include "host/time/HTimeManager.h"
 
 class SceneTest : public testing::Test {
  protected:

@@ -42,7 +42,7 @@ class SubjectTest : public SceneTest {
     NLEClip* clip;
     Marker* marker;
     int64 time;
-    Placement world;
+    Transform world;
   };
   // Where the markers are at times (in frames), in every clip and by default.
   static std::vector<Sample> sampled(std::vector<Marker*> const& markers, std::vector<double> const& frames) {
@@ -53,7 +53,7 @@ class SubjectTest : public SceneTest {
       for (Marker* marker : markers)
         for (const double frame : frames) {
           const auto time = static_cast<int64>(frame * kFrame);
-          samples.push_back({clip, marker, time, marker->getWorldPlacement(time)});
+          samples.push_back({clip, marker, time, marker->getWorldTransform(time)});
         }
       if (!clip) break;
     }
@@ -63,7 +63,7 @@ class SubjectTest : public SceneTest {
   static void expectAsBefore(std::vector<Sample> const& samples) {
     for (Sample const& sample : samples) {
       g_db->setActiveClip(sample.clip);
-      const Placement now = sample.marker->getWorldPlacement(sample.time);
+      const Transform now = sample.marker->getWorldTransform(sample.time);
       const auto where = sample.marker->getName().GetString() + " at " +
                          std::to_string(static_cast<double>(sample.time) / kFrame) + " in " +
                          (sample.clip ? sample.clip->getName().GetString() : "none");

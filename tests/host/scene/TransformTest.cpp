@@ -246,9 +246,9 @@ TEST_F(TransformTest, OneFrameSeenFromAnother) {
   for (int i = 0; i < 100; ++i) {
     Node *node = oneOf(m_nodes), *space = oneOf(m_nodes);
     const int64 time = randomTime();
-    const Placement seen{node->getPosInSpaceOfNode(time, space), node->getRotInSpaceOfNode(time, space),
+    const Transform seen{node->getPosInSpaceOfNode(time, space), node->getRotInSpaceOfNode(time, space),
                          node->getScaleInSpaceOfNode(time, space)};
-    const Placement back = space->getWorldPlacement(time) * seen;
+    const Transform back = space->getWorldTransform(time) * seen;
     EXPECT_LT((back.position - node->getWSPos(time)).length(), 1e-7);
     EXPECT_LT((back.rotation.rotate({1, 2, 3}) - node->getWSRot(time).rotate({1, 2, 3})).length(), 1e-9);
     EXPECT_LT((back.scale - node->getWSScale(time)).length(), 1e-9);

@@ -4,8 +4,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "host/base/Log.h"
 #include "host/services/HInterface.h"
-#include "host/services/Log.h"
 
 namespace {
 

@@ -4,10 +4,10 @@
 #include <gtest/gtest.h>
 #include <thread>
 
+#include "host/base/Log.h"
 #include "host/command/Command.h"
 #include "host/services/HEvent.h"
 #include "host/services/HInterface.h"
-#include "host/services/Log.h"
 #include "host/services/OperationStack.h"
 
 namespace {

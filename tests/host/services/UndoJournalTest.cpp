@@ -2,7 +2,7 @@
 #include "host/scene/Bones.h"
 #include "host/scene/Constraints.h"
 #include "host/scene/Setups.h"
-#include "host/services/UndoJournal.h"
+#include "host/scene/UndoJournal.h"
 #include "tests/SceneText.h"
 #include "tests/host/scene/SceneFixture.h"
 

@@ -4,7 +4,7 @@
 #include <limits>
 #include <random>
 
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 

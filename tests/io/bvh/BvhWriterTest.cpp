@@ -6,7 +6,7 @@
 #include "host/math/TalixRotation.h"
 #include "io/TakeFormats.h"
 #include "io/bvh/BvhChannels.h"
-#include "io/bvh/EulerUnroller.h"
+#include "io/bvh/EulerFilter.h"
 #include "tests/io/TakeTesting.h"
 
 namespace talix {
@@ -170,11 +170,11 @@ TEST(BvhWriter, SaysWhatItCannotHold) {
 
 // A joint that turns on for several turns, passes the poles and stops in gimbal lock: angles follow without a
 // jump and make the same rotation.
-TEST(EulerUnroller, FollowsWithoutJumps) {
+TEST(EulerFilter, FollowsWithoutJumps) {
   for (int order = 0; order < 6; ++order) {
     const auto rotationOrder = static_cast<TalixRotation::RotOrder>(order);
     const int middle = kOrderAxes[order][1];
-    EulerUnroller unroller(order, true);
+    EulerFilter unroller(order, true);
     Vec3 before;
     for (int frame = 0; frame <= 720; ++frame) {
       Vec3 angles(frame * 0.03, frame * 0.02, frame * -0.01);
@@ -197,7 +197,7 @@ TEST(EulerUnroller, FollowsWithoutJumps) {
     }
   }
   // Standing in gimbal lock, the first angle keeps still and the last one turns.
-  EulerUnroller unroller(TalixRotation::XYZ, true);
+  EulerFilter unroller(TalixRotation::XYZ, true);
   TalixRotation rotation;
   for (int frame = 0; frame < 100; ++frame) {
     double q[4];

@@ -156,7 +156,7 @@ TEST(C3DReader, ReadsOutputsAndEventsOfTheGait) {
   const Take take = readC3D(dataFile("gait_results_events_01.c3d"));
   const auto ofKind = [&](const char* kind) {
     return std::count_if(take.outputs.begin(), take.outputs.end(),
-                         [&](const TakeOutput& output) { return output.kind == kind; });
+                         [&](const ModelOutput& output) { return output.kind == kind; });
   };
   EXPECT_EQ(ofKind("ANGLES"), 10);
   EXPECT_EQ(ofKind("POWERS"), 6);

@@ -1,6 +1,6 @@
 // Real takes, thinned and saved: what is saved has the frames of the original and its values within the
 // tolerance.
-#include "host/animation/KeyReduction.h"
+#include "host/keys/KeyReduction.h"
 #include "tests/io/scene/SceneTesting.h"
 
 namespace talix {

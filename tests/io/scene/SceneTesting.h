@@ -4,7 +4,7 @@
 #include <gtest/gtest.h>
 
 #include "host/scene/Database.h"
-#include "host/time/HTimeManager.h"
+#include "host/scene/HTimeManager.h"
 #include "io/TakeFormats.h"
 #include "io/TakeScene.h"
 

@@ -1,10 +1,10 @@
 #include <gmock/gmock.h>
 
-#include "host/animation/PropertyTable.h"
 #include "host/scene/Bones.h"
 #include "host/scene/Character.h"
 #include "host/scene/Devices.h"
-#include "io/scene/AxisTurn.h"
+#include "host/scene/PropertyTable.h"
+#include "io/scene/UpAxisConversion.h"
 #include "tests/io/TakeTesting.h"
 #include "tests/io/scene/SceneTesting.h"
 
@@ -148,11 +148,11 @@ TEST_F(TakeImportTest, OtherUpAxesAreTurnedToTheScenes) {
   EXPECT_EQ(firstPosition(keysOf("\\two\\M")), Vec3(1, 2, 3));
 }
 
-TEST(AxisTurn, AllTurnsAreProperAndAgreeWithTheirRotation) {
+TEST(UpAxisConversion, AllTurnsAreProperAndAgreeWithTheirRotation) {
   const Vec3 units[] = {{1, 0, 0}, {0, 1, 0}, {0, 0, 1}};
   for (int from = 0; from < 3; ++from)
     for (int to = 0; to < 3; ++to) {
-      const AxisTurn turn(from, to);
+      const UpAxisConversion turn(from, to);
       EXPECT_EQ(turn(units[from]), units[to]);
       EXPECT_EQ(turn(units[0]).cross(turn(units[1])), turn(units[2]));
       const Vec3 v(1, 2, 3);
@@ -194,7 +194,7 @@ TEST_F(TakeImportTest, TurnedSkeletonsMoveAsTheirFileTurned) {
   const Vec3 inFile = end->getWSPos(time);
   g_db->newScene();
   open(skeletonTake("walk"), 2);
-  const Vec3 turned = AxisTurn(1, 2)(inFile);
+  const Vec3 turned = UpAxisConversion(1, 2)(inFile);
   EXPECT_THAT(at<Node>("\\walk\\Hips\\Leg\\Leg_end")->getWSPos(time), Near(turned.x, turned.y, turned.z));
   // The keys are the file's.
   EXPECT_EQ(at<SolvingBone>("\\walk\\Hips")->getLocalPos(0), Vec3(5, 50, 0));
@@ -216,7 +216,7 @@ TEST_F(TakeImportTest, ChannelsOfDevicesGetNamesThatCanStand) {
     channel.unit = "N";
     channel.samples.set(ticksPerFrameAt(100), {1});
   }
-  TakeOutput& output = take.outputs.emplace_back();
+  ModelOutput& output = take.outputs.emplace_back();
   output.name = "Force_Fx";
   output.values.set(ticksPerFrameAt(100), {1, 2, 3});
   open(take);

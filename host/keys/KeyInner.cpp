@@ -1,0 +1,139 @@
+#include "host/keys/KeyInner.h"
+
+#include <algorithm>
+
+void KeyNodeRef::destroy(KeyNode* node) {
+  if (node->isLeaf()) {
+    delete static_cast<KeyLeaf*>(node);
+  } else {
+    delete static_cast<KeyInner*>(node);
+  }
+}
+
+KeyNode* KeyNodeRef::clone(KeyNode const& node) {
+  if (node.isLeaf()) return new KeyLeaf(asLeaf(node));
+  return new KeyInner(asInner(node));
+}
+
+int KeyInner::childAtTime(int64 time) const {
+  const auto begin = m_firstTimes.begin();
+  const auto found = std::upper_bound(begin + 1, begin + m_size, time);
+  return static_cast<int>(found - begin) - 1;
+}
+
+int KeyInner::childAtIndex(int64& index) const {
+  int i = 0;
+  for (; i + 1 < m_size && index >= m_keys[at(i)]; ++i) index -= m_keys[at(i)];
+  return i;
+}
+
+int64 KeyInner::keysBefore(int i) const {
+  int64 sum = 0;
+  for (int k = 0; k < i; ++k) sum += m_keys[at(k)];
+  return sum;
+}
+
+void KeyInner::childChanged(int i, KeyCounts const& before) {
+  KeyNodeRef const& changed = m_children[at(i)];
+  counts -= before;
+  if (changed) counts += changed->counts;
+  m_keys[at(i)] = changed ? changed->counts.keys : 0;
+  if (changed) m_firstTimes[at(i)] = firstTimeOf(*changed.get());
+}
+
+void KeyInner::place(int i, KeyNodeRef child) {
+  counts += child->counts;
+  m_firstTimes[at(i)] = firstTimeOf(*child.get());
+  m_keys[at(i)] = child->counts.keys;
+  m_children[at(i)] = std::move(child);
+}
+
+KeyNodeRef KeyInner::insert(int i, KeyNodeRef child) {
+  if (full()) {
+    // Keys that arrive in order, from either end, leave full nodes behind; others halve them.
+    const int from = i == m_size ? i : i == 1 ? 1 : m_size / 2;
+    auto* right = new KeyInner(level(), m_fanout);
+    KeyNodeRef sibling(right);
+    moveTail(from, *right);
+    if (i >= from) {
+      right->insert(i - from, std::move(child));
+    } else {
+      insert(i, std::move(child));
+    }
+    return sibling;
+  }
+  for (int k = m_size; k > i; --k) {
+    m_firstTimes[at(k)] = m_firstTimes[at(k - 1)];
+    m_keys[at(k)] = m_keys[at(k - 1)];
+    m_children[at(k)] = std::move(m_children[at(k - 1)]);
+  }
+  ++m_size;
+  place(i, std::move(child));
+  return {};
+}
+
+void KeyInner::moveTail(int from, KeyInner& to) {
+  for (int k = from; k < m_size; ++k) {
+    counts -= m_children[at(k)]->counts;
+    to.place(to.m_size++, std::move(m_children[at(k)]));
+  }
+  m_size = std::min(m_size, from);
+}
+
+void KeyInner::mend(int first, int last) {
+  int kept = first;
+  for (int k = first; k < m_size; ++k) {
+    if (!m_children[at(k)]) continue;
+    if (k != kept) {
+      m_firstTimes[at(kept)] = m_firstTimes[at(k)];
+      m_keys[at(kept)] = m_keys[at(k)];
+      m_children[at(kept)] = std::move(m_children[at(k)]);
+    }
+    ++kept;
+  }
+  last -= m_size - kept;
+  m_size = kept;
+
+  for (int i = std::max(first - 1, 0); i + 1 < m_size && i <= last;) {
+    if (joins(i)) {
+      join(i);
+      --last;
+    } else {
+      ++i;
+    }
+  }
+}
+
+// Small ones join a neighbour as long as the result keeps some room, so that the next insertion does not
+// split it.
+bool KeyInner::joins(int i) const {
+  const auto room = [](int64 a, int64 b, int64 limit) {
+    return std::min(a, b) < std::max<int64>(limit / 4, 2) && a + b <= limit * 3 / 4;
+  };
+  if (level() == 1) return room(keys(i), keys(i + 1), asLeaf(child(i)).limit());
+  return room(asInner(child(i)).size(), asInner(child(i + 1)).size(), m_fanout);
+}
+
+void KeyInner::join(int i) {
+  KeyNodeRef& left = m_children[at(i)];
+  KeyNodeRef const right = std::move(m_children[at(i + 1)]);
+  left.own();
+  if (left->isLeaf()) {
+    asLeaf(*left.get()).append(asLeaf(*right.get()), 0, asLeaf(*right.get()).size());
+  } else {
+    auto& to = asInner(*left.get());
+    auto const& from = asInner(*right.get());
+    for (int k = 0; k < from.m_size; ++k) to.place(to.m_size++, from.m_children[at(k)]);
+  }
+  m_keys[at(i)] = left->counts.keys;
+  remove(i + 1);
+}
+
+void KeyInner::remove(int i) {
+  for (int k = i; k + 1 < m_size; ++k) {
+    m_firstTimes[at(k)] = m_firstTimes[at(k + 1)];
+    m_keys[at(k)] = m_keys[at(k + 1)];
+    m_children[at(k)] = std::move(m_children[at(k + 1)]);
+  }
+  m_children[at(--m_size)].reset();
+}

@@ -1,0 +1,60 @@
+// An inner node of a key track's tree: up to `fanout` children of one level, with their first times and
+// numbers of keys beside each other, so that a search touches only the children on its path.
+#pragma once
+
+#include <array>
+
+#include "host/keys/KeyLeaf.h"
+#include "host/keys/KeyNode.h"
+
+class KeyInner final : public KeyNode {
+ public:
+  static constexpr int kMaxFanout = 32;
+
+  KeyInner(int level, int fanout) : KeyNode(level), m_fanout(fanout) {}
+  KeyInner(KeyInner const&) = default;
+
+  int size() const { return m_size; }
+  bool full() const { return m_size >= m_fanout; }
+  KeyNode const& child(int i) const { return *m_children[at(i)].get(); }
+  KeyNodeRef& childRef(int i) { return m_children[at(i)]; }
+  int64 firstTime(int i = 0) const { return m_firstTimes[at(i)]; }
+  int64 keys(int i) const { return m_keys[at(i)]; }
+
+  // The child whose span the time falls into: the last one that starts at or before it, else the first.
+  int childAtTime(int64 time) const;
+  // The child with the key of this index, which becomes its index in the child. An index behind the last key
+  // falls into the last child.
+  int childAtIndex(int64& index) const;
+  int64 keysBefore(int i) const;
+
+  // To be called after child i has changed; `before` are the counts that it had.
+  void childChanged(int i, KeyCounts const& before);
+  // Adds a child at position i. A full node splits: the answer is the new node to its right.
+  KeyNodeRef insert(int i, KeyNodeRef child);
+  // Removes the empty references among the children first to last, then joins small neighbours around there.
+  void mend(int first, int last);
+
+ private:
+  static size_t at(int i) { return static_cast<size_t>(i); }
+  void place(int i, KeyNodeRef child);
+  void moveTail(int from, KeyInner& to);
+  bool joins(int i) const;
+  void join(int i);
+  void remove(int i);
+
+  int m_fanout;
+  int m_size = 0;
+  std::array<int64, kMaxFanout> m_firstTimes{};
+  std::array<int64, kMaxFanout> m_keys{};
+  std::array<KeyNodeRef, kMaxFanout> m_children;
+};
+
+inline KeyLeaf const& asLeaf(KeyNode const& node) { return static_cast<KeyLeaf const&>(node); }
+inline KeyInner const& asInner(KeyNode const& node) { return static_cast<KeyInner const&>(node); }
+inline KeyLeaf& asLeaf(KeyNode& node) { return static_cast<KeyLeaf&>(node); }
+inline KeyInner& asInner(KeyNode& node) { return static_cast<KeyInner&>(node); }
+
+inline int64 firstTimeOf(KeyNode const& node) {
+  return node.isLeaf() ? asLeaf(node).firstTime() : asInner(node).firstTime();
+}

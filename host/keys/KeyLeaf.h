@@ -1,0 +1,126 @@
+// A leaf of a key track: up to a few hundred keys. Each of its three parts has a compact form and a general
+// one:
+//  - times: a start and a period while they are evenly spaced, else one by one;
+//  - flags: none while every key is whole and none selected, else a byte for each key;
+//  - values: one key's while all are equal bit by bit, floats while that loses nothing, else doubles.
+// A leaf with even times and no flags is dense. An edit that breaks a form turns that part of that leaf
+// alone. Components that a key does not hold have the value 0. Slots count from 0; arguments must be in
+// range.
+#pragma once
+
+#include "host/keys/KeyColumn.h"
+#include "host/keys/KeyNode.h"
+
+class KeyLeaf final : public KeyNode {
+ public:
+  static constexpr unsigned kWhole = 7;
+
+  // `width` doubles in a key; `limit` keys at most.
+  KeyLeaf(int width, int limit) : KeyNode(0), m_width(width), m_limit(limit) {}
+  KeyLeaf(KeyLeaf const&) = default;
+
+  int size() const { return m_size; }
+  int limit() const { return m_limit; }
+  bool full() const { return m_size >= m_limit; }
+  bool evenTimes() const { return m_times.empty(); }
+  bool plain() const { return m_flags.empty(); }  // every key whole, none selected
+  bool dense() const { return evenTimes() && plain(); }
+
+  int64 time(int slot) const { return evenTimes() ? m_start + m_period * slot : m_times[slot]; }
+  int64 firstTime() const { return time(0); }
+  int64 lastTime() const { return time(m_size - 1); }
+  int lowerBound(int64 time) const;      // the first key at or after the time, size() when there is none
+  int lastAtOrBefore(int64 time) const;  // the time must not lie before the first key
+  int lastAtOrBefore(int64 time, int guess) const {  // fast when the answer is the guess or just behind it
+    for (int end = guess + 2; guess < end; ++guess) {
+      if (this->time(guess) > time) break;
+      if (guess + 1 == m_size || this->time(guess + 1) > time) return guess;
+    }
+    return lastAtOrBefore(time);
+  }
+
+  unsigned components(int slot) const { return plain() ? kWhole : m_flags[slot] & kWhole; }
+  unsigned selected(int slot) const { return plain() ? 0 : m_flags[slot] >> kSelectionShift; }
+  double value(int slot, int component) const {
+    if (m_form == Form::Double) return m_doubles[slot * m_width + component];
+    if (m_form == Form::Float) return static_cast<double>(m_floats[slot * m_width + component]);
+    return m_doubles[component];
+  }
+  void values(int slot, double* out) const {
+    if (m_form == Form::Float) {
+      for (int c = 0; c < m_width; ++c) out[c] = static_cast<double>(m_floats[slot * m_width + c]);
+    } else {
+      const double* from = m_doubles.data() + (m_form == Form::One ? 0 : slot * m_width);
+      for (int c = 0; c < m_width; ++c) out[c] = from[c];
+    }
+  }
+
+  // The first slot at or after (last at or before) `slot` that holds, or is selected on, a component of the
+  // mask; -1 when there is none.
+  int nextHolding(int slot, unsigned mask) const { return scan<1>(slot, mask); }
+  int previousHolding(int slot, unsigned mask) const { return scan<-1>(slot, mask); }
+  int nextSelected(int slot, unsigned mask) const {
+    return plain() ? -1 : scan<1>(slot, mask << kSelectionShift);
+  }
+  int previousSelected(int slot, unsigned mask) const {
+    return plain() ? -1 : scan<-1>(slot, mask << kSelectionShift);
+  }
+  // The same for keys that are selected on no component of the mask.
+  int nextUnselected(int slot, unsigned mask) const { return scan<1, false>(slot, mask << kSelectionShift); }
+  int previousUnselected(int slot, unsigned mask) const {
+    return scan<-1, false>(slot, mask << kSelectionShift);
+  }
+
+  void insert(int slot, int64 time, const double* values, unsigned components, unsigned selection = 0);
+  // n whole keys behind the last one. The leaf must have room for them.
+  void append(int64 start, int64 period, const double* values, int n);
+  void append(KeyLeaf const& from, int first, int last);
+  void write(int slot, const double* values, unsigned mask);
+  void erase(int first, int last);
+  void setFlags(int slot, unsigned components, unsigned selection);
+  // To be called when a series of setFlags is done.
+  void dropIdleFlags();
+  // Replaces the values of the whole keys in [first, last) by change(values). One call may serve for all keys
+  // that have equal values.
+  void transform(int first, int last, void (*change)(void*, double*), void* context);
+
+  int64 memoryUse() const;
+  // The text of the first broken invariant, null when all hold.
+  const char* checkInvariants() const;
+
+ private:
+  enum class Form : unsigned char { One, Float, Double };
+  static constexpr int kSelectionShift = 4;
+
+  // The first slot that has any of the flags, or none of them.
+  template <int Step, bool Any = true>
+  int scan(int slot, unsigned flags) const {
+    if (plain()) return slot >= 0 && slot < m_size && (flags || !Any) ? slot : -1;
+    for (; slot >= 0 && slot < m_size; slot += Step)
+      if (((m_flags[slot] & flags) != 0) == Any) return slot;
+    return -1;
+  }
+
+  void insertTimes(int slot, int64 start, int64 period, int n);
+  void insertValues(int slot, const double* values, int n);
+  void insertFlags(int slot, unsigned flags, int n);
+  void eraseTimes(int first, int last);
+  bool continuesEvenly(int slot, int64 start, int64 period, int n);
+  void spellOutTimes();
+  void evenOutTimes();
+  void spellOutFlags();
+  void spellOutValues(bool asFloats);
+  void widen();
+  void putValues(int slot, const double* values);
+
+  int m_width;
+  int m_limit;
+  int m_size = 0;
+  Form m_form = Form::One;
+  int64 m_start = 0;  // of even times
+  int64 m_period = 0;
+  KeyColumn<int64> m_times;
+  KeyColumn<double> m_doubles;  // with Form::One a single key's
+  KeyColumn<float> m_floats;
+  KeyColumn<unsigned char> m_flags;  // components, and selection above them
+};

@@ -1,0 +1,24 @@
+#include "host/scene/ClipboardManager.h"
+
+void ClipboardManager::startClipboardCopy(ClipboardDataType, ControllerDataType type,
+                                          TalixRotation::RotOrder order) {
+  m_incoming.clear();
+  m_incomingType = type;
+  m_incomingOrder = order;
+}
+
+void ClipboardManager::finishClipboardCopy(bool keep) {
+  if (keep) {
+    m_keys.swap(m_incoming);
+    m_type = m_incomingType;
+    m_order = m_incomingOrder;
+    m_filled = true;
+  }
+  m_incoming.clear();
+}
+
+HTimeRange ClipboardManager::getControllerDataRange() const {
+  HTimeRange range;
+  for (tagKey const& key : m_keys) range.include(key.time);
+  return range;
+}

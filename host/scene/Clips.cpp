@@ -1,0 +1,73 @@
+#include "host/scene/Clips.h"
+
+#include "host/scene/Database.h"
+
+H_DEFINE_ABSTRACT_CLASS(NLEClip);
+H_DEFINE_CLASS(Clip);
+H_DEFINE_CLASS(BlendClip);
+
+void NLEClip::setUp() {
+  Module::setUp();
+  m_weight = static_cast<FloatController*>(addChannel("Weight", DataSource::FloatProperty));
+  m_weight->setConstValue(1, false);
+}
+
+bool NLEClip::isActive() const { return g_db->getActiveClip() == this; }
+
+NLEClip* NLEClip::getNext() const { return g_db->getClipAfter(this); }
+
+// A blend's values hang on the weights of its sources.
+void NLEClip::dataChanged(Controller const*) { Node::forgetWorldCache(); }
+
+struct NLEClip::LocksChange : UndoChange {
+  explicit LocksChange(NLEClip& concerned)
+      : UndoChange(&concerned), clip(concerned), locks(concerned.m_layerLocks) {}
+  void swap() override { clip.m_layerLocks.swap(locks); }
+  bool isVoid() const override { return locks == clip.m_layerLocks; }
+  int64 memoryUse() const override { return static_cast<int64>(sizeof *this + locks.capacity() / 8); }
+
+  NLEClip& clip;
+  std::vector<bool> locks;
+};
+
+void NLEClip::storeLayerLocks(std::vector<bool> locks) {
+  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<LocksChange>(*this));
+  m_layerLocks = std::move(locks);
+}
+
+int NLEClip::addLayer() {
+  std::vector<bool> locks = m_layerLocks;
+  locks.push_back(false);
+  storeLayerLocks(std::move(locks));
+  return getNumLayers() - 1;
+}
+
+bool NLEClip::isLayerLocked(int layer) const {
+  return layer >= 0 && layer < getNumLayers() && m_layerLocks[static_cast<size_t>(layer)];
+}
+
+void NLEClip::setLayerLocked(int layer, bool locked) {
+  if (layer < 0 || layer >= getNumLayers()) return;
+  std::vector<bool> locks = m_layerLocks;
+  locks[static_cast<size_t>(layer)] = locked;
+  storeLayerLocks(std::move(locks));
+}
+
+void Clip::setUp() {
+  NLEClip::setUp();
+  m_smpteOffset = addBuiltIn<TimeAttribute>("SmpteOffset");
+}
+
+Clip* Clip::createInstance() {
+  auto* clip = new Clip;
+  clip->setUp();
+  return clip;
+}
+
+void Clip::setSmpteOffset(int64 ticks) { m_smpteOffset->setValue(ticks, true, true, true, true); }
+
+void BlendClip::setUp() {
+  NLEClip::setUp();
+  m_sources = addBuiltIn<MultiModAttribute>("Sources");
+  setReaction(m_sources, [](Module&, Attribute&) { Node::forgetWorldCache(); });
+}

@@ -1,0 +1,363 @@
+#include "host/scene/Controller.h"
+
+#include <algorithm>
+#include <cassert>
+#include <climits>
+#include <cmath>
+
+#include "host/scene/Clips.h"
+#include "host/scene/Database.h"
+#include "host/scene/MarkerRuns.h"
+
+H_DEFINE_ABSTRACT_CLASS(DataSource);
+H_DEFINE_ABSTRACT_CLASS(Controller);
+
+std::unique_ptr<Controller> Controller::create(PropertyType type) {
+  switch (type) {
+    case Vec3Property:
+      return std::make_unique<Vec3Controller>();
+    case RotProperty:
+      return std::make_unique<RotController>();
+    case FloatProperty:
+      return std::make_unique<FloatController>();
+    case IntProperty:
+      return std::make_unique<IntController>();
+    case BoolProperty:
+      return std::make_unique<BoolController>();
+    case NoProperty:
+      break;
+  }
+  return nullptr;
+}
+
+KeyTrack::Shape Controller::shapeOf(PropertyType type) {
+  return type == Vec3Property  ? KeyTrack::Shape::Vector
+         : type == RotProperty ? KeyTrack::Shape::Rotation
+                               : KeyTrack::Shape::Scalar;
+}
+
+// --- editing ---
+
+bool Controller::isEditable() const {
+  NLEClip const* clip = g_db->getActiveClip();
+  return clip && clip->holdsKeys() && !m_locked && !clip->isLocked() &&
+         !clip->isLayerLocked(g_db->getActiveLayer()) && !(m_module && m_module->isLocked());
+}
+
+void Controller::setLocked(bool locked) {
+  recordSettings();
+  m_locked = locked;
+}
+
+void Controller::beginDefaultEdit() { ++m_editDepth; }
+
+void Controller::beginDataEdit(HTimeRange const&) { ++m_editDepth; }
+
+void Controller::endDataEdit() {
+  assert(m_editDepth > 0 && "an edit ends that did not begin");
+  if (--m_editDepth == 0) changed();
+}
+
+void Controller::changed() {
+  if (m_module) m_module->dataChanged(this);
+}
+
+bool Controller::areFinite(Values const& values, unsigned mask) const {
+  const bool split = getPropertyType() == Vec3Property;
+  for (int i = 0; i < static_cast<int>(shapeOf(getPropertyType())); ++i)
+    if ((!split || mask >> i & 1) && !std::isfinite(values[static_cast<size_t>(i)])) return false;
+  return true;
+}
+
+void Controller::setDefaultValues(Values const& values) {
+  if (!areFinite(values, KeyTrack::kAll)) return;
+  recordSettings();
+  m_default = values;
+  changed();
+}
+
+void Controller::writeKeyAt(int64 time, Values const& values, unsigned mask) {
+  if (!areFinite(values, mask)) return;
+  KeyTrack* track = editTrack(time, time);
+  if (!track) return;
+  // A new key of a one-valued or rotation channel is whole whatever the mask.
+  track->set(time, values, track->shape() == KeyTrack::Shape::Vector ? mask : KeyTrack::kAll);
+  changed();
+}
+
+void Controller::writeKey(int key, Values const& values, unsigned mask) {
+  if (KeyTrack const* track = findActiveTrack()) writeKeyAt(track->timeAt(key), values, mask);
+}
+
+void Controller::readKey(int key, Values& values) const {
+  KeyTrack const* track = findActiveTrack();
+  values = track ? track->at(key).values : m_default;
+}
+
+int Controller::selectKeys(HTimeRange const& range, unsigned mask) {
+  if (!findActiveTrack()) return 0;
+  return static_cast<int>(
+      editTrack(range.getStart(), range.getEnd())->select(range.getStart(), range.getEnd(), mask));
+}
+
+int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
+  if (!findActiveTrack()) return 0;
+  return static_cast<int>(
+      editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
+}
+
+int Controller::deleteKey(int64 time, unsigned mask) {
+  return deleteKeys(HTimeRange(time, time), mask, false);
+}
+
+int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers) {
+  int64 deleted = 0;
+  NLEClip* clip = g_db->getActiveClip();
+  const int64 first = range.getStart(), last = range.getEnd();
+  const CutRuns cut(*this, first, last);
+  for (ClipTrack const& track : m_tracks)
+    if (track.clip == clip &&
+        (track.layer == g_db->getActiveLayer() || (allLayers && !clip->isLayerLocked(track.layer))))
+      deleted += editTrack(clip, track.layer, first, last)->eraseRange(first, last, mask);
+  if (deleted) changed();
+  return static_cast<int>(deleted);
+}
+
+int Controller::deleteSelectedKeys(unsigned mask) {
+  KeyTrack const* track = findActiveTrack();
+  if (!track || track->countSelected() == 0) return 0;
+  const int64 first = track->timeAt(track->selectedIndex(0));
+  const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
+  const CutRuns cut(*this, first, last);
+  const int64 deleted = editTrack(first, last)->eraseSelected(mask);
+  if (deleted) changed();
+  return static_cast<int>(deleted);
+}
+
+bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo) {
+  if (source->getPropertyType() != getPropertyType() || !isEditable()) return false;
+  if (source == this) return true;
+  setDefaultValues(source->m_default);
+  setInterpType(static_cast<int>(source->m_interpolation));
+  NLEClip* clip = g_db->getActiveClip();
+  for (int layer = 0; keys && layer < clip->getNumLayers(); ++layer) {
+    KeyTrack const* theirs = source->findTrack(clip, layer);
+    if (!theirs && !findTrack(clip, layer)) continue;
+    KeyTrack copy = theirs ? *theirs : KeyTrack(shapeOf(getPropertyType()));
+    if (!selectionToo) copy.deselect(-kForever, kForever);
+    setTrack(clip, layer, std::move(copy));
+  }
+  return true;
+}
+
+// --- keys of the active layer ---
+
+namespace {
+
+int asInt(int64 count) { return static_cast<int>(std::min<int64>(count, INT_MAX)); }
+
+}  // namespace
+
+Controller::ClipTrack const* Controller::find(NLEClip const* clip, int layer) const {
+  for (ClipTrack const& track : m_tracks)
+    if (track.clip == clip && track.layer == layer) return &track;
+  return nullptr;
+}
+
+KeyTrack const* Controller::findTrack(NLEClip const* clip, int layer) const {
+  ClipTrack const* track = find(clip, layer);
+  return track ? &track->track : nullptr;
+}
+
+KeyTrack const* Controller::findActiveTrack() const {
+  NLEClip const* clip = g_db->getActiveClip();
+  return clip ? findTrack(clip, g_db->getActiveLayer()) : nullptr;
+}
+
+int Controller::getNumKeys() const {
+  KeyTrack const* track = findActiveTrack();
+  return track ? asInt(track->count()) : 0;
+}
+
+int Controller::getNumKeys(unsigned mask) const {
+  KeyTrack const* track = findActiveTrack();
+  return track ? asInt(track->countHolding(mask)) : 0;
+}
+
+int Controller::getNumSelectedKeys() const {
+  KeyTrack const* track = findActiveTrack();
+  return track ? asInt(track->countSelected()) : 0;
+}
+
+int Controller::getNumSelectedKeys(unsigned mask) const {
+  KeyTrack const* track = findActiveTrack();
+  return track ? asInt(track->countSelected(mask)) : 0;
+}
+
+int Controller::getSelectedKeyIndex(int i) const {
+  KeyTrack const* track = findActiveTrack();
+  return track && i < track->countSelected() ? asInt(track->selectedIndex(i)) : -1;
+}
+
+unsigned Controller::getSelectedKeyFlags(int i) const {
+  const int key = getSelectedKeyIndex(i);
+  return key < 0 ? 0 : findActiveTrack()->at(key).selected;
+}
+
+int64 Controller::getKeyTime(int key) const {
+  KeyTrack const* track = findActiveTrack();
+  return track ? track->timeAt(key) : 0;
+}
+
+bool Controller::keyHasComponents(int key, unsigned mask) const {
+  KeyTrack const* track = findActiveTrack();
+  return track && (track->at(key).components & mask) == mask;
+}
+
+bool Controller::hasKeyAt(int64 time) const {
+  KeyTrack const* track = findActiveTrack();
+  return track && track->find(time) >= 0;
+}
+
+bool Controller::hasKeyAt(int64 time, unsigned mask) const {
+  KeyTrack const* track = findActiveTrack();
+  const int64 key = track ? track->find(time) : -1;
+  return key >= 0 && (track->at(key).components & mask) == mask;
+}
+
+bool Controller::isKeySelectedAt(int64 time, unsigned mask) const {
+  KeyTrack const* track = findActiveTrack();
+  const int64 key = track ? track->find(time) : -1;
+  return key >= 0 && (track->at(key).selected & mask) != 0;
+}
+
+HTimeRange Controller::getKeyRange() const {
+  KeyTrack const* track = findActiveTrack();
+  return track && !track->empty() ? HTimeRange(track->timeAt(0), track->timeAt(track->count() - 1))
+                                  : HTimeRange();
+}
+
+// --- evaluation ---
+
+void Controller::evaluate(int64 time, Values& values) const {
+  NLEClip const* clip = g_db->getActiveClip();
+  values = m_default;
+  if (!clip || m_tracks.empty()) return;
+  if (clip->holdsKeys()) return evaluateInClip(clip, time, values);
+
+  // A blend: the mean of its sources, weighted by their weights now.
+  MultiModAttribute const* sources = static_cast<BlendClip const*>(clip)->getSources();
+  std::vector<Values> parts;
+  std::vector<double> weights;
+  double sum = 0;
+  for (int i = 0; i < sources->getNumModules(); ++i) {
+    auto const* source = objectAs<NLEClip>(sources->getModuleValue(i));
+    if (!source || !source->holdsKeys()) continue;
+    Values weight;
+    source->getWeightChannel()->evaluateInClip(source, time, weight = source->getWeightChannel()->m_default);
+    if (!(weight[0] > 0)) continue;
+    evaluateInClip(source, time, parts.emplace_back(m_default));
+    weights.push_back(weight[0]);
+    sum += weight[0];
+  }
+  if (parts.empty()) return;
+  for (double& weight : weights) weight /= sum;
+  blend(parts.data(), weights.data(), static_cast<int>(parts.size()), values);
+}
+
+bool Controller::evaluateLayer(NLEClip const* clip, int layer, int64 time, Values& values) const {
+  ClipTrack const* track = find(clip, layer);
+  const Values otherwise = layer == 0 ? m_default : neutral();
+  if (!track || track->track.empty()) {
+    values = otherwise;
+    return layer == 0;
+  }
+  track->track.evaluate(time, m_interpolation, otherwise, values, &track->cursor);
+  return true;
+}
+
+void Controller::evaluateInClip(NLEClip const* clip, int64 time, Values& values) const {
+  evaluateLayer(clip, 0, time, values);
+  const int layers = clip->getNumLayers();
+  Values added;
+  for (int layer = 1; layer < layers; ++layer)
+    if (evaluateLayer(clip, layer, time, added)) compose(values, added);
+}
+
+void Controller::evaluateLayer(int64 time, Values& values) const {
+  NLEClip const* clip = g_db->getActiveClip();
+  clip ? static_cast<void>(evaluateLayer(clip, g_db->getActiveLayer(), time, values))
+       : static_cast<void>(values = m_default);
+}
+
+Controller::Values Controller::solveLayer(int64 time, Values const& wanted) const {
+  // A clip of one layer takes the value as it is, without the rounding of a sum.
+  NLEClip const* clip = g_db->getActiveClip();
+  const bool single = !clip || clip->getNumLayers() == 1;
+  Values all, own;
+  evaluate(time, all);
+  evaluateLayer(time, own);
+  for (size_t i = 0; i < own.size(); ++i) own[i] = single ? wanted[i] : own[i] + wanted[i] - all[i];
+  return own;
+}
+
+void Controller::compose(Values& values, Values const& layer) const {
+  for (size_t i = 0; i < values.size(); ++i) values[i] += layer[i];
+}
+
+void Controller::blend(Values const* values, double const* weights, int count, Values& out) const {
+  out = Values{};
+  for (int i = 0; i < count; ++i)
+    for (size_t k = 0; k < out.size(); ++k) out[k] += weights[i] * values[i][k];
+}
+
+// --- interpolation ---
+
+int Controller::getNumInterpTypes() const { return m_numInterpTypes; }
+
+char const* Controller::getInterpTypeName(int i) const {
+  static constexpr char const* names[] = {"Constant", "Linear", "Cubic"};
+  return names[i];
+}
+
+void Controller::setInterpType(int i) {
+  if (i < 0 || i >= m_numInterpTypes) return;
+  recordSettings();
+  m_interpolation = static_cast<Interpolation>(i);
+  changed();
+}
+
+// --- clips and layers ---
+
+void Controller::setTrack(NLEClip* clip, int layer, KeyTrack track) {
+  assert(track.shape() == shapeOf(getPropertyType()));
+  replaceTrack(clip, layer) = std::move(track);
+  changed();
+}
+
+bool Controller::hasKeysInClip(NLEClip const* clip) const {
+  return std::any_of(m_tracks.begin(), m_tracks.end(),
+                     [&](ClipTrack const& track) { return track.clip == clip && !track.track.empty(); });
+}
+
+HTimeRange Controller::getKeyRangeInClip(NLEClip const* clip) const {
+  HTimeRange range;
+  for (ClipTrack const& track : m_tracks) {
+    if (track.clip != clip || track.track.empty()) continue;
+    range.include(HTimeRange(track.track.timeAt(0), track.track.timeAt(track.track.count() - 1)));
+  }
+  return range;
+}
+
+void Controller::forgetClip(NLEClip const* clip) {
+  std::vector<ClipTrack> others;
+  std::copy_if(m_tracks.begin(), m_tracks.end(), std::back_inserter(others),
+               [&](ClipTrack const& track) { return track.clip != clip; });
+  if (others.size() < m_tracks.size()) storeTracks(std::move(others));
+}
+
+void Controller::restore(State const& state) {
+  storeTracks(state.tracks);
+  setDefaultValues(state.byDefault);
+  setInterpType(static_cast<int>(state.interpolation));
+}

@@ -1,0 +1,190 @@
+// The mutators of a channel: its keys, its settings.
+#include <algorithm>
+
+#include "host/scene/Clips.h"
+#include "host/scene/Controller.h"
+#include "host/scene/Database.h"
+
+namespace {
+
+// Beyond about so many keys a snapshot of the track, which costs no more than its leaves that are changed, is
+// the smaller record.
+constexpr size_t kKeysBeforeSnapshot = 64;
+
+}  // namespace
+
+// The keys of a track: single ones as long as they are few, else a snapshot of all.
+struct Controller::KeyChange : UndoChange {
+  // A key that may be missing.
+  struct Slot {
+    KeyTrack::Key key;  // with its time
+    bool present = false;
+
+    Slot(KeyTrack const& track, int64 time) {
+      key.time = time;
+      const int64 index = track.find(time);
+      present = index >= 0;
+      if (present) key = track.at(index);
+    }
+
+    bool operator==(Slot const& o) const {
+      return present == o.present &&
+             (!present || (key.values == o.key.values && key.components == o.key.components &&
+                           key.selected == o.key.selected));
+    }
+    // Makes the track so at this time.
+    void putInto(KeyTrack& track) const {
+      track.eraseRange(key.time, key.time);
+      if (!present) return;
+      track.set(key.time, key.values, key.components);
+      if (key.selected) track.setSelected(track.find(key.time), key.selected);
+    }
+  };
+
+  KeyChange(Controller& concerned, ClipTrack const& track)
+      : UndoChange(concerned.m_module), channel(concerned), clip(track.clip), layer(track.layer) {}
+
+  // Keys from first to last are about to change; a single time also when it has no key yet.
+  void note(KeyTrack const& track, int64 first, int64 last) {
+    if (snapshot) return;
+    if (first == last) return noteKey(track, first);
+    const int64 from = track.lowerBound(first);
+    const int64 to = last >= kForever ? track.count() : track.lowerBound(last + 1);
+    if (to - from > static_cast<int64>(kKeysBeforeSnapshot)) return takeSnapshot(track);
+    for (int64 i = from; i < to && !snapshot; ++i) noteKey(track, track.timeAt(i));
+  }
+  void noteKey(KeyTrack const& track, int64 time) {
+    for (Slot const& slot : keys)
+      if (slot.key.time == time) return;
+    if (keys.size() == kKeysBeforeSnapshot) return takeSnapshot(track);
+    keys.emplace_back(track, time);
+  }
+  void takeSnapshot(KeyTrack const& track) {
+    snapshot = std::make_unique<KeyTrack>(track);
+    for (Slot const& slot : keys) slot.putInto(*snapshot);
+    std::vector<Slot>().swap(keys);
+  }
+
+  KeyTrack& track() const { return channel.clipTrack(clip, layer).track; }
+
+  void swap() override {
+    if (snapshot) return std::swap(*snapshot, track());
+    for (Slot& slot : keys) {
+      const Slot now(track(), slot.key.time);
+      slot.putInto(track());
+      slot = now;
+    }
+  }
+  bool isVoid() const override {
+    if (snapshot) return snapshot->sharesAll(track()) || *snapshot == track();
+    return std::all_of(keys.begin(), keys.end(),
+                       [&](Slot const& slot) { return slot == Slot(track(), slot.key.time); });
+  }
+  int64 memoryUse() const override {
+    return static_cast<int64>(sizeof *this + keys.capacity() * sizeof(Slot)) +
+           (snapshot ? std::max(snapshot->memoryAlone(), track().memoryAlone()) : 0);
+  }
+
+  Controller& channel;
+  NLEClip* clip;
+  int layer;
+  std::vector<Slot> keys;
+  std::unique_ptr<KeyTrack> snapshot;  // in place of keys
+};
+
+Controller::ClipTrack& Controller::clipTrack(NLEClip* clip, int layer) {
+  for (ClipTrack& track : m_tracks)
+    if (track.clip == clip && track.layer == layer) return track;
+  return m_tracks.emplace_back(ClipTrack{clip, layer, KeyTrack(shapeOf(getPropertyType()))});
+}
+
+Controller::KeyChange* Controller::changeOf(ClipTrack& track) {
+  if (!m_module || !m_module->isRecorded()) return nullptr;
+  if (UndoJournal::isDue(track.undoMark)) {
+    auto change = std::make_unique<KeyChange>(*this, track);
+    track.change = change.get();
+    g_db->getUndoJournal().add(std::move(change));
+  }
+  return track.change;
+}
+
+KeyTrack* Controller::editTrack(NLEClip* clip, int layer, int64 first, int64 last) {
+  ClipTrack& track = clipTrack(clip, layer);
+  if (KeyChange* change = UndoJournal::isRecording() ? changeOf(track) : nullptr)
+    change->note(track.track, first, last);
+  return &track.track;
+}
+
+KeyTrack& Controller::replaceTrack(NLEClip* clip, int layer) {
+  ClipTrack& track = clipTrack(clip, layer);
+  KeyChange* change = UndoJournal::isRecording() ? changeOf(track) : nullptr;
+  if (change && !change->snapshot) change->takeSnapshot(track.track);
+  return track.track;
+}
+
+KeyTrack* Controller::editTrack(int64 first, int64 last) {
+  NLEClip* clip = g_db->getActiveClip();
+  return clip && clip->holdsKeys() ? editTrack(clip, g_db->getActiveLayer(), first, last) : nullptr;
+}
+
+// --- all tracks at once ---
+
+struct Controller::TracksChange : UndoChange {
+  explicit TracksChange(Controller& concerned)
+      : UndoChange(concerned.m_module), channel(concerned), tracks(concerned.m_tracks) {}
+  void swap() override { channel.m_tracks.swap(tracks); }
+  int64 memoryUse() const override {
+    int64 alone = 0;
+    for (ClipTrack const& track : tracks) alone += track.track.memoryAlone();
+    return static_cast<int64>(sizeof *this + tracks.capacity() * sizeof(ClipTrack)) +
+           std::max(alone, channel.memoryAlone());
+  }
+
+  Controller& channel;
+  std::vector<ClipTrack> tracks;
+};
+
+void Controller::storeTracks(std::vector<ClipTrack> tracks) {
+  if (m_module && m_module->isRecorded()) g_db->getUndoJournal().add(std::make_unique<TracksChange>(*this));
+  m_tracks = std::move(tracks);
+  // What was recorded of single tracks stands before this change: later edits are recorded anew.
+  for (ClipTrack& track : m_tracks) track.undoMark = 0;
+  changed();
+}
+
+int64 Controller::memoryAlone() const {
+  int64 bytes = static_cast<int64>(m_tracks.capacity() * sizeof(ClipTrack));
+  for (ClipTrack const& track : m_tracks) bytes += track.track.memoryAlone();
+  return bytes;
+}
+
+// --- settings ---
+
+struct Controller::SettingsChange : UndoChange {
+  explicit SettingsChange(Controller& concerned)
+      : UndoChange(concerned.m_module),
+        channel(concerned),
+        byDefault(concerned.m_default),
+        interpolation(concerned.m_interpolation),
+        locked(concerned.m_locked) {}
+  void swap() override {
+    std::swap(byDefault, channel.m_default);
+    std::swap(interpolation, channel.m_interpolation);
+    std::swap(locked, channel.m_locked);
+  }
+  bool isVoid() const override {
+    return byDefault == channel.m_default && interpolation == channel.m_interpolation &&
+           locked == channel.m_locked;
+  }
+  int64 memoryUse() const override { return sizeof *this; }
+
+  Controller& channel;
+  Values byDefault;
+  Interpolation interpolation;
+  bool locked;
+};
+
+void Controller::recordSettings() {
+  if (m_module && m_module->isRecorded() && UndoJournal::isDue(m_settingsMark))
+    g_db->getUndoJournal().add(std::make_unique<SettingsChange>(*this));
+}

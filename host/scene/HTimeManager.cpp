@@ -1,0 +1,90 @@
+#include "host/scene/HTimeManager.h"
+
+#include <algorithm>
+#include <charconv>
+#include <cmath>
+
+#include "host/scene/Database.h"
+
+HTimeManager::HTimeManager() { reset(); }
+
+HTimeManager* HTimeManager::getInstance() {
+  static HTimeManager manager;
+  return &manager;
+}
+
+void HTimeManager::reset() {
+  m_rate = HFrameRate();
+  m_time = 0;
+  m_animRange = m_playRange = HTimeRange(0, getTime(100));
+  m_selected.clear();
+}
+
+void HTimeManager::setFrameRate(HFrameRate const& rate) {
+  g_db->recordSettings();
+  m_rate = rate;
+}
+
+void HTimeManager::setTime(int64 time, bool) { m_time = std::clamp(time, -kForever, kForever); }
+
+int64 HTimeManager::getTime(int frame) const {
+  const int64 ticks = getTicksPerFrame();
+  if (std::abs(int64{frame}) > kForever / ticks) return frame < 0 ? -kForever : kForever;
+  return frame * ticks;
+}
+
+int HTimeManager::getFrame(int64 time) const {
+  return static_cast<int>(std::clamp<int64>(time / getTicksPerFrame(), INT32_MIN, INT32_MAX));
+}
+
+double HTimeManager::getFrameDouble(int64 time) const {
+  // Whole frames apart, so that times far from 0 keep their fraction.
+  const int64 ticks = getTicksPerFrame();
+  return static_cast<double>(time / ticks) + static_cast<double>(time % ticks) / static_cast<double>(ticks);
+}
+
+int64 HTimeManager::getTimeFromFrameDouble(double frame) const {
+  if (std::isnan(frame)) return 0;
+  const int64 ticks = getTicksPerFrame();
+  const double whole = std::trunc(frame);
+  if (std::abs(whole) >= static_cast<double>(kForever / ticks)) return frame < 0 ? -kForever : kForever;
+  return static_cast<int64>(whole) * ticks + std::llround((frame - whole) * static_cast<double>(ticks));
+}
+
+int64 HTimeManager::frameTime(int64 time, ERoundDirection direction, int64 origin) const {
+  const int64 ticks = getTicksPerFrame();
+  int64 past = (time - origin) % ticks;  // the last boundary
+  if (past < 0) past += ticks;
+  const bool up = past > 0 && (direction == RoundUp || (direction == RoundNearest && past >= ticks - past));
+  return std::clamp(time + (up ? ticks - past : -past), -kForever, kForever);
+}
+
+void HTimeManager::frameRange(HTimeRange& range, bool outward, int64 origin) {
+  if (range.isEmpty()) return;
+  range.setEnds(frameTime(range.getStart(), outward ? RoundDown : RoundUp, origin),
+                frameTime(range.getEnd(), outward ? RoundUp : RoundDown, origin));
+}
+
+double HTimeManager::stringToFrameDouble(HString const& text, bool relative) const {
+  std::string const& s = text.GetString();
+  double frames = 0;
+  const auto [end, error] = std::from_chars(s.data(), s.data() + s.size(), frames);
+  if (error == std::errc() && end == s.data() + s.size() && std::isfinite(frames)) return frames;
+  const HFrameRate rate = relative ? m_rate.withoutDrop() : m_rate;
+  int64 frame = 0;
+  return rate.frameFromTimecode(text, frame) ? static_cast<double>(frame) : 0;
+}
+
+void HTimeManager::setPlayRange(HTimeRange range, bool keepTime) {
+  m_playRange = range;
+  if (!keepTime && !range.isEmpty()) setTime(std::clamp(m_time, range.getStart(), range.getEnd()), true);
+}
+
+void HTimeManager::addSelectedTimeRange(HTimeRange range) {
+  if (range.isEmpty()) return;
+  const auto before = [](HTimeRange const& a, HTimeRange const& b) { return a.getEnd() < b.getStart(); };
+  // All ranges that meet the new one grow into it.
+  const auto [first, last] = std::equal_range(m_selected.begin(), m_selected.end(), range, before);
+  for (auto met = first; met != last; ++met) range.include(*met);
+  m_selected.insert(m_selected.erase(first, last), range);
+}

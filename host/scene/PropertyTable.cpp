@@ -1,0 +1,141 @@
+#include "host/scene/PropertyTable.h"
+
+#include <string_view>
+
+#include "host/scene/Database.h"
+
+PropertyTable& PropertyTable::getInstance() {
+  static PropertyTable table;
+  return table;
+}
+
+void PropertyTable::reset() {
+  m_entries.clear();
+  m_ids.clear();
+  m_idsByLowerName.clear();
+  add("Translation", DataSource::Vec3Property);
+  add("Rotation", DataSource::RotProperty);
+  add("Scale", DataSource::Vec3Property);
+  add("Occluded", DataSource::BoolProperty);
+  add("Residual", DataSource::FloatProperty);
+  add("Weight", DataSource::FloatProperty);
+  add("FocalLength", DataSource::FloatProperty);
+  add("Threshold", DataSource::IntProperty);
+  add("Length", DataSource::FloatProperty);
+  add("FillType", DataSource::IntProperty);
+}
+
+unsigned PropertyTable::findId(HString const& name) const {
+  const auto found = m_ids.find(name.GetString());
+  return found == m_ids.end() ? 0 : found->second;
+}
+
+HString PropertyTable::getName(unsigned id) const {
+  id &= kIdMask;
+  return id == 0 || id > m_entries.size() ? HString() : m_entries[id - 1].name;
+}
+
+DataSource::PropertyType PropertyTable::getType(unsigned id) const {
+  id &= kIdMask;
+  return id == 0 || id > m_entries.size() ? DataSource::NoProperty : m_entries[id - 1].type;
+}
+
+// The last name added: later ones have gone before it.
+struct PropertyTable::Addition : UndoChange {
+  Addition(HString const& text, DataSource::PropertyType kind)
+      : UndoChange(nullptr), name(text), type(kind) {}
+  void swap() override {
+    PropertyTable& table = getInstance();
+    table.findId(name) ? table.removeLast() : static_cast<void>(table.store(name, type));
+  }
+  int64 memoryUse() const override { return static_cast<int64>(sizeof *this + name.GetString().size()); }
+
+  HString name;
+  DataSource::PropertyType type;
+};
+
+unsigned PropertyTable::add(HString const& name, DataSource::PropertyType type) {
+  if (const unsigned known = findId(name)) return getType(known) == type ? known : 0;
+  if (!Module::isValidPropertyName(name) || m_entries.size() == kIdMask) return 0;
+  const unsigned id = store(name, type);
+  if (UndoJournal::isRecording()) g_db->getUndoJournal().add(std::make_unique<Addition>(name, type));
+  return id;
+}
+
+unsigned PropertyTable::store(HString const& name, DataSource::PropertyType type) {
+  m_entries.push_back({name, type});
+  const auto id = static_cast<unsigned>(m_entries.size());
+  m_ids.emplace(name.GetString(), id);
+  HString lower = name;
+  lower.MakeLower();
+  m_idsByLowerName[lower.GetString()].push_back(id);
+  return id;
+}
+
+void PropertyTable::removeLast() {
+  HString lower = m_entries.back().name;
+  m_ids.erase(lower.GetString());
+  lower.MakeLower();
+  const auto known = m_idsByLowerName.find(lower.GetString());
+  known->second.pop_back();
+  if (known->second.empty()) m_idsByLowerName.erase(known);
+  m_entries.pop_back();
+}
+
+HString PropertyTable::restoreCase(HString const& name) const {
+  if (findId(name)) return name;
+  HString lower = name;
+  lower.MakeLower();
+  const auto found = m_idsByLowerName.find(lower.GetString());
+  return found == m_idsByLowerName.end() || found->second.size() != 1 ? HString()
+                                                                      : getName(found->second.front());
+}
+
+// --- the names as commands ask for them ---
+
+DataSource::PropertyType Controller::mapToPropertyType(HString const& name) {
+  return mapToPropertyType(mapPropertyName(name));
+}
+
+DataSource::PropertyType Controller::mapToPropertyType(unsigned id) {
+  return PropertyTable::getInstance().getType(id);
+}
+
+HString Controller::mapPropertyId(unsigned id) { return PropertyTable::getInstance().getName(id); }
+
+unsigned Controller::mapPropertyName(HString const& name) {
+  return PropertyTable::getInstance().findId(name);
+}
+
+void Controller::fixChannelStr(HString& text) {
+  static constexpr std::string_view kBlanks = " \t\r\n";
+  std::string const& given = text.GetString();
+  const size_t first = given.find_first_not_of(kBlanks);
+  if (first == std::string::npos) {
+    text = "";
+    return;
+  }
+  std::string trimmed = given.substr(first, given.find_last_not_of(kBlanks) - first + 1);
+
+  if (trimmed.size() == 2) {
+    const char channel = static_cast<char>(trimmed[0] | 0x20),
+               component = static_cast<char>(trimmed[1] | 0x20);
+    char const* name = channel == 't'   ? "Translation"
+                       : channel == 'r' ? "Rotation"
+                       : channel == 's' ? "Scale"
+                                        : nullptr;
+    // A channel that really has such a name is meant itself.
+    if (name && component >= 'x' && component <= 'z' && !mapPropertyName(HString(trimmed))) {
+      text = std::string(name) + "." + component;
+      return;
+    }
+  }
+  PropertyTable const& table = PropertyTable::getInstance();
+  HString known = table.restoreCase(HString(trimmed));
+  const size_t dot = trimmed.rfind('.');
+  if (known.IsEmpty() && dot != std::string::npos) {
+    known = table.restoreCase(HString(trimmed.substr(0, dot)));
+    if (!known.IsEmpty()) known += HString(trimmed.substr(dot));
+  }
+  text = known.IsEmpty() ? HString(std::move(trimmed)) : known;
+}

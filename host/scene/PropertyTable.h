@@ -1,0 +1,54 @@
+// Channel names, their ids and kinds. A channel name has one kind everywhere.
+//
+// An id is a small number (low 16 bits, from 1) to which the component bits of an active property may be
+// added.
+#pragma once
+
+#include <optional>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "host/base/HString.h"
+#include "host/scene/DataSource.h"
+
+class PropertyTable {
+ public:
+  static constexpr unsigned kIdMask = 0xffff;
+  static constexpr unsigned kX = 0x10000000, kY = 0x20000000, kZ = 0x40000000;
+  static constexpr unsigned kWhole = kX | kY | kZ;
+
+  static PropertyTable& getInstance();
+
+  // Back to the built-in channels: "Translation", "Rotation", "Scale", "Occluded", "Residual", "Weight",
+  // "FocalLength", "Threshold", "Length", "FillType".
+  void reset();
+
+  // 0 when there is no such channel name.
+  unsigned findId(HString const& name) const;
+  HString getName(unsigned id) const;  // empty when unknown
+  DataSource::PropertyType getType(unsigned id) const;
+
+  // The id of a channel name, which is added when it is new. 0 when the name is known with another kind, is
+  // empty, holds a dot or a backslash, or the table is full (65,535 names).
+  unsigned add(HString const& name, DataSource::PropertyType type);
+
+  // The known name that is equal but for case; empty when there is none, or none in exact case and several
+  // others.
+  HString restoreCase(HString const& name) const;
+
+ private:
+  PropertyTable() { reset(); }
+
+  struct Addition;
+  unsigned store(HString const& name, DataSource::PropertyType type);  // mutator: adds at the end
+  void removeLast();
+
+  struct Entry {
+    HString name;
+    DataSource::PropertyType type;
+  };
+  std::vector<Entry> m_entries;  // id - 1
+  std::unordered_map<std::string, unsigned> m_ids;
+  std::unordered_map<std::string, std::vector<unsigned>> m_idsByLowerName;
+};

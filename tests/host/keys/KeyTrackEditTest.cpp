@@ -1,0 +1,222 @@
+// Random edits of key tracks against the plain model, in trees of every depth.
+#include <gtest/gtest.h>
+#include <random>
+#include <sstream>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "tests/host/keys/KeyTrackModel.h"
+
+namespace {
+
+using Key = KeyTrack::Key;
+using Shape = KeyTrack::Shape;
+using Values = KeyTrack::Values;
+
+// Says what differs first, "" when nothing does.
+std::string difference(KeyTrack const& track, KeyTrackModel const& model) {
+  std::ostringstream text;
+  if (*track.checkInvariants()) return track.checkInvariants();
+  if (track.count() != model.size()) {
+    text << "count " << track.count() << ", expected " << model.size();
+    return text.str();
+  }
+  int64 i = 0;
+  track.forEach(0, track.count(), [&](Key const& key) {
+    Key const& expected = model.at(i++);
+    if (key.time != expected.time || key.values != expected.values || key.components != expected.components ||
+        key.selected != expected.selected)
+      text << "key " << i - 1 << " at " << key.time << " differs; ";
+  });
+  return text.str();
+}
+
+struct Setup {
+  Shape shape;
+  KeyTrack::Limits limits;
+  int steps;
+  int64 span;  // times are 0 to span
+  unsigned seed;
+};
+
+void PrintTo(Setup const& setup, std::ostream* out) {
+  *out << "width " << static_cast<int>(setup.shape) << ", " << setup.limits.leafKeys
+       << " keys in a leaf, fanout " << setup.limits.fanout << ", seed " << setup.seed;
+}
+
+class KeyTrackEdits : public testing::TestWithParam<Setup> {
+ protected:
+  KeyTrackEdits()
+      : track(GetParam().shape, GetParam().limits), model(GetParam().shape), random(GetParam().seed) {}
+
+  int64 upTo(int64 n) { return std::uniform_int_distribution<int64>(0, n)(random); }
+  bool oneIn(int n) { return upTo(n - 1) == 0; }
+  int64 time() { return upTo(GetParam().span); }
+  unsigned mask() { return oneIn(2) ? 7u : static_cast<unsigned>(upTo(7)); }
+
+  // Mixes values that repeat, that floats hold, and that only doubles hold.
+  Values values() {
+    Values v{};
+    const int64 kind = upTo(3);
+    for (size_t c = 0; c < static_cast<size_t>(GetParam().shape); ++c)
+      v[c] = kind < 2    ? 2.5
+             : kind == 2 ? static_cast<double>(upTo(1000)) / 8
+                         : static_cast<double>(upTo(1000)) / 7;
+    return v;
+  }
+
+  void setOne(int64 at) {
+    const Values v = values();
+    const unsigned m = mask();
+    track.set(at, v, m);
+    model.set(at, v, m);
+  }
+
+  void appendRun() {
+    const int64 n = upTo(GetParam().limits.leafKeys * 3), period = 1 + upTo(3);
+    const int64 start = (model.keys.empty() ? 0 : model.keys.back().time) + 1 + upTo(4);
+    std::vector<double> flat;
+    for (int64 i = 0; i < n; ++i) {
+      const Values v = values();
+      flat.insert(flat.end(), v.begin(), v.begin() + track.width());
+      model.set(start + i * period, v, 7);
+    }
+    track.append(start, period, flat.data(), n);
+  }
+
+  void eraseOne() {
+    if (model.keys.empty()) return;
+    const int64 i = oneIn(3) ? 0 : oneIn(3) ? model.size() - 1 : upTo(model.size() - 1), t = model.at(i).time;
+    const unsigned m = mask();
+    ASSERT_EQ(track.erase(i, m), model.eraseRange(t, t, m));
+  }
+
+  void changeRange() {
+    const int64 first = time(), last = first + (oneIn(12) ? GetParam().span : upTo(GetParam().span / 24));
+    const unsigned m = mask();
+    switch (upTo(8)) {
+      case 0:
+        ASSERT_EQ(track.eraseRange(first, last, m), model.eraseRange(first, last, m));
+        break;
+      case 1:
+        track.deselect(last, INT64_MAX, 7);  // else it would soon erase everything
+        model.deselect(last, INT64_MAX, 7);
+        track.deselect(0, first, 7);
+        model.deselect(0, first, 7);
+        ASSERT_EQ(track.eraseSelected(m), model.eraseSelected(m));
+        break;
+      case 2:
+      case 3:
+      case 4:
+        ASSERT_EQ(track.select(first, last, m), model.select(first, last, m));
+        break;
+      case 5:
+      case 6:
+      case 7:
+        ASSERT_EQ(track.deselect(first, last, m), model.deselect(first, last, m));
+        break;
+      default:
+        track.transform([](double* v) { v[0] = -v[0]; });
+        for (Key& key : model.keys)
+          if (key.components == 7) key.values[0] = -key.values[0];
+    }
+  }
+
+  void setSelected() {
+    if (model.keys.empty()) return;
+    const int64 i = upTo(model.size() - 1);
+    const unsigned flags = mask();
+    track.setSelected(i, flags);
+    model.at(i).selected = static_cast<unsigned char>(model.normal(flags) & model.at(i).components);
+  }
+
+  void step() {
+    const int64 what = upTo(99);
+    const bool large = model.size() > GetParam().span / 2;
+    if (what < 40) {
+      setOne(time());
+    } else if (what < 45 && !large) {
+      const int64 start = time();  // a row of neighbours, as recording over a stretch writes them
+      for (int64 i = upTo(20); i >= 0; --i) setOne(start + i);
+    } else if (what < 47 && !large) {
+      appendRun();
+    } else if (what < 70) {
+      for (int64 i = large ? 20 : 0; i >= 0; --i) eraseOne();
+    } else if (what < 85) {
+      setSelected();
+    } else {
+      changeRange();
+    }
+  }
+
+  void compareQueries() {
+    ASSERT_EQ(track.countSelected(), model.countSelected(7));
+    for (unsigned m = 0; m < 8; ++m) {
+      ASSERT_EQ(track.countHolding(m), model.countHolding(m)) << m;
+      ASSERT_EQ(track.countSelected(m), model.countSelected(m)) << m;
+      const int64 i = upTo(model.size() + 3) - 2;
+      ASSERT_EQ(track.nextHolding(i, m), model.walk(i, 1, &Key::components, m)) << i << " " << m;
+      ASSERT_EQ(track.nextSelected(i, m), model.walk(i, 1, &Key::selected, m)) << i << " " << m;
+      ASSERT_EQ(track.previousHolding(i, m), model.walk(i, -1, &Key::components, m)) << i << " " << m;
+      ASSERT_EQ(track.previousSelected(i, m), model.walk(i, -1, &Key::selected, m)) << i << " " << m;
+      ASSERT_EQ(track.nextUnselected(i, m), model.walk(i, 1, &Key::selected, m, false)) << i << " " << m;
+      ASSERT_EQ(track.previousUnselected(i, m), model.walk(i, -1, &Key::selected, m, false)) << i << " " << m;
+    }
+    for (int n = 0; n < 4; ++n) {
+      const int64 t = time() - 2;
+      ASSERT_EQ(track.find(t), model.find(t));
+      ASSERT_EQ(track.lowerBound(t), model.lowerBound(t));
+    }
+    int64 index = -1;
+    for (int64 n = 0; n < track.countSelected(); ++n) {
+      index = model.walk(index, 1, &Key::selected, 7);
+      if (oneIn(8)) {
+        ASSERT_EQ(track.selectedIndex(n), index);
+      }
+    }
+    if (model.keys.empty()) return;
+    const int64 i = upTo(model.size() - 1);
+    int64 k = i;
+    track.forEach(i, std::min(i + 20, model.size()),
+                  [&](Key const& key) { ASSERT_EQ(key.time, model.at(k++).time); });
+    ASSERT_EQ(track.timeAt(i), model.at(i).time);
+    ASSERT_EQ(track.at(i).values, model.at(i).values);
+  }
+
+  KeyTrack track;
+  KeyTrackModel model;
+  std::mt19937 random;
+};
+
+TEST_P(KeyTrackEdits, MatchThePlainModel) {
+  std::vector<std::pair<KeyTrack, KeyTrackModel>> snapshots;
+  for (int i = 0; i < GetParam().steps; ++i) {
+    step();
+    if (HasFatalFailure()) FAIL() << "at step " << i;
+    if (i % 4 == 0) {
+      ASSERT_EQ(difference(track, model), "") << "at step " << i;
+    }
+    if (i % 8 == 0) compareQueries();
+    if (HasFatalFailure()) FAIL() << "at step " << i;
+    if (oneIn(GetParam().steps / 12)) snapshots.emplace_back(track, model);
+    if (oneIn(GetParam().steps / 3)) {  // go on from a snapshot, as undo does
+      track = snapshots.empty() ? KeyTrack(GetParam().shape, GetParam().limits) : snapshots.front().first;
+      model = snapshots.empty() ? KeyTrackModel(GetParam().shape) : snapshots.front().second;
+    }
+  }
+  ASSERT_FALSE(snapshots.empty());
+  for (auto const& [snapshot, then] : snapshots) EXPECT_EQ(difference(snapshot, then), "");
+}
+
+INSTANTIATE_TEST_SUITE_P(Random, KeyTrackEdits,
+                         testing::Values(Setup{Shape::Scalar, {4, 4}, 6000, 700, 1},
+                                         Setup{Shape::Vector, {4, 4}, 9000, 700, 2},
+                                         Setup{Shape::Rotation, {4, 4}, 4000, 700, 3},
+                                         Setup{Shape::Vector, {5, 6}, 6000, 2000, 4},
+                                         Setup{Shape::Vector, {16, 4}, 6000, 3000, 5},
+                                         Setup{Shape::Scalar, {16, 5}, 4000, 3000, 6},
+                                         Setup{Shape::Vector, {256, 32}, 3000, 12000, 7},
+                                         Setup{Shape::Rotation, {256, 32}, 2000, 12000, 8}));
+
+}  // namespace

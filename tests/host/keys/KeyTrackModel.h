@@ -1,0 +1,102 @@
+// A key track as plainly as it can be written: a sorted vector, every question answered by looking at all
+// keys.
+#pragma once
+
+#include <algorithm>
+#include <vector>
+
+#include "host/keys/KeyTrack.h"
+
+class KeyTrackModel {
+ public:
+  using Key = KeyTrack::Key;
+  using Shape = KeyTrack::Shape;
+
+  explicit KeyTrackModel(Shape shape) : m_shape(shape) {}
+
+  std::vector<Key> keys;
+
+  unsigned normal(unsigned mask) const { return m_shape == Shape::Vector ? mask & 7 : mask ? 7 : 0; }
+  int64 size() const { return static_cast<int64>(keys.size()); }
+  Key& at(int64 i) { return keys[static_cast<size_t>(i)]; }
+  Key const& at(int64 i) const { return keys[static_cast<size_t>(i)]; }
+
+  int64 lowerBound(int64 time) const {
+    return std::count_if(keys.begin(), keys.end(), [time](Key const& k) { return k.time < time; });
+  }
+  int64 find(int64 time) const {
+    const int64 i = lowerBound(time);
+    return i < size() && at(i).time == time ? i : -1;
+  }
+  int64 countHolding(unsigned mask) const {
+    mask = normal(mask);
+    return std::count_if(keys.begin(), keys.end(),
+                         [mask](Key const& k) { return (k.components & mask) == mask; });
+  }
+  int64 countSelected(unsigned mask) const {
+    mask = normal(mask);
+    return std::count_if(keys.begin(), keys.end(), [mask](Key const& k) { return (k.selected & mask) != 0; });
+  }
+  // The first key behind `index`, in steps of `step`, whose flags meet the mask.
+  int64 walk(int64 index, int step, unsigned char Key::*flags, unsigned mask, bool any = true) const {
+    mask = normal(mask);
+    for (index = std::clamp<int64>(index, -1, size()) + step; index >= 0 && index < size(); index += step)
+      if (((at(index).*flags & mask) != 0) == any) return index;
+    return -1;
+  }
+
+  void set(int64 time, KeyTrack::Values const& values, unsigned mask) {
+    mask = normal(mask);
+    if (!mask) return;
+    int64 i = find(time);
+    if (i < 0) {
+      i = lowerBound(time);
+      keys.insert(keys.begin() + i, Key{time, {}, 0, 0});
+    }
+    Key& key = at(i);
+    key.components |= static_cast<unsigned char>(mask);
+    for (size_t c = 0; c < static_cast<size_t>(m_shape); ++c)
+      if (m_shape != Shape::Vector || mask >> c & 1) key.values[c] = values[c];
+  }
+
+  // Calls change(key) for the keys in the time range, then drops those that hold nothing any more.
+  template <class Change>
+  int64 edit(int64 first, int64 last, Change change) {
+    int64 changed = 0;
+    for (Key& key : keys)
+      if (key.time >= first && key.time <= last) changed += change(key);
+    std::erase_if(keys, [](Key const& k) { return k.components == 0; });
+    return changed;
+  }
+
+  int64 eraseRange(int64 first, int64 last, unsigned mask) {
+    return edit(first, last, [mask = normal(mask)](Key& k) { return lose(k, mask & k.components); });
+  }
+  int64 eraseSelected(unsigned mask) {
+    return edit(INT64_MIN, INT64_MAX, [mask = normal(mask)](Key& k) { return lose(k, mask & k.selected); });
+  }
+  int64 select(int64 first, int64 last, unsigned mask) {
+    return edit(first, last, [mask = normal(mask)](Key& k) {
+      k.selected |= static_cast<unsigned char>(mask & k.components);
+      return (mask & k.components) != 0;
+    });
+  }
+  int64 deselect(int64 first, int64 last, unsigned mask) {
+    return edit(first, last, [mask = normal(mask)](Key& k) {
+      const bool had = (k.selected & mask) != 0;
+      k.selected &= static_cast<unsigned char>(~mask);
+      return had;
+    });
+  }
+
+ private:
+  static bool lose(Key& key, unsigned lost) {
+    for (size_t c = 0; c < 3; ++c)
+      if (lost >> c & 1) key.values[c] = 0;
+    key.components &= static_cast<unsigned char>(~lost);
+    key.selected &= static_cast<unsigned char>(~lost);
+    return lost != 0;
+  }
+
+  Shape m_shape;
+};
