@@ -71,7 +71,9 @@ bool SetBoneLengthCmd::execute(Given const& given, Args const& args, Variable&) 
                                                  options.has(info.option("adjustChildren")));
   for (NewPlace const& place : places)
     if (!areFinite(place.preTranslation, info.name)) return false;
-  for (NewPlace const& place : places) place.node->setPreTranslation(place.preTranslation);
+  for (auto const& [node, preTranslation] : places)
+    if (isFree(obstacleToPreTransform(*node), "Pre-translation", *node))
+      node->setPreTranslation(preTranslation);
   return true;
 }
 

@@ -24,16 +24,17 @@ class SetPositionCmd final : public ScriptCommand<SetPositionCmd> {
 bool writePosition(TransformWrite const& write) {
   Node& node = *write.node;
   if (write.preTransform) {
+    if (!isFree(obstacleToPreTransform(node), "Pre-translation", node)) return false;
     write.world ? node.setPreTranslationWS(write.vector)
                 : static_cast<void>(node.setPreTranslation(write.vector));
     return true;
   }
   Controller* channel = node.getTranslationChannel();
+  if (!isWritable(*channel, write.byDefault)) return false;
   if (write.byDefault) {
     channel->beginDefaultEdit();
     write.world ? node.setConstWSPos(write.vector) : node.setConstLocalPos(write.vector);
   } else {
-    if (!isWritable(channel)) return false;
     channel->beginDataEdit(write.edited());
     write.world ? node.setWSPos(write.time, write.vector) : node.setLocalPos(write.time, write.vector);
   }

@@ -25,7 +25,7 @@ bool SetRotationHardyCmd::execute(Given const&, Args const& args, Variable&) {
   TalixRotation rotation;
   rotation.setAsHardySpicerRotation(major, minor, bone->getMajorAxisIndex(), bone->getMinorAxisIndex(),
                                     bone->getPreRotation());
-  if (isWritable(bone->getRotationChannel()))
+  if (isWritable(*bone->getRotationChannel(), false))
     bone->setLocalRot(HTimeManager::getInstance()->getTime(), rotation);
   return true;
 }

@@ -24,7 +24,7 @@ bool SetRotationHingeCmd::execute(Given const&, Args const& args, Variable&) {
   if (!bone || !areFinite({angle, 0, 0}, info.name)) return false;
   TalixRotation rotation;
   rotation.setAsHingeRotation(angle, bone->getMajorAxisIndex());
-  if (isWritable(bone->getRotationChannel()))
+  if (isWritable(*bone->getRotationChannel(), false))
     bone->setLocalRot(HTimeManager::getInstance()->getTime(), rotation);
   return true;
 }

@@ -28,12 +28,13 @@ bool SetScaleCmd::execute(Given const& given, Args const& args, Variable&) {
   TransformWrite write;
   if (!readWrite(given, args, kOptions, info.name, write)) return false;
   Node& node = *write.node;
+  if (!isWritable(*node.getScaleChannel(), write.byDefault)) return true;
   if (write.byDefault) {
     // Kept: the write of the default value stands in the bracket, the one at a time does not.
     node.beginDataEdit(write.edited());
     node.setConstLocalScale(write.world ? localScale(node, write.vector, write.time) : write.vector);
     node.endDataEdit();
-  } else if (isWritable(node.getScaleChannel())) {
+  } else {
     write.world ? node.setWSScale(write.time, write.vector) : node.setLocalScale(write.time, write.vector);
   }
   return true;

@@ -3,7 +3,6 @@
 #include <cmath>
 
 #include "commands/Targets.h"
-#include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 
 bool readWrite(Given const& given, Args const& args, WriteOptions const& which, char const* command,
@@ -27,19 +26,23 @@ bool areFinite(Vec3 const& values, char const* command) {
   return false;
 }
 
-bool isWritable(Controller const* channel) {
-  if (!g_db->getActiveClip() || channel->isEditable()) return true;
-  Command::logWarning("%s is not editable on %s: nothing was written. This may be due to the active clip.",
-                      channel->getName().GetStr(), channel->getModule()->getName().GetStr());
+bool isFree(Obstacle obstacle, char const* what, Module const& module) {
+  if (obstacle == Obstacle::none) return true;
+  Command::logWarning("%s is not editable on %s: %s.", what, module.getName().GetStr(), reasonOf(obstacle));
   return false;
+}
+
+bool isWritable(Controller const& channel, bool byDefault) {
+  return isFree(byDefault ? obstacleToDefault(channel) : obstacleToValue(channel), channel.getName().GetStr(),
+                *channel.getModule());
 }
 
 bool writeRotation(TransformWrite const& write, TalixRotation const& rotation) {
   Node& node = *write.node;
-  if (!write.byDefault && !isWritable(node.getRotationChannel())) return true;
   // Kept: the pre-rotation is written besides, not instead.
-  if (write.preTransform)
+  if (write.preTransform && isFree(obstacleToPreTransform(node), "Pre-rotation", node))
     write.world ? node.setPreRotationWS(rotation) : static_cast<void>(node.setPreRotation(rotation, false));
+  if (!isWritable(*node.getRotationChannel(), write.byDefault)) return true;
   if (write.byDefault) {
     write.world ? node.setConstWSRot(rotation) : node.setConstLocalRot(rotation, true);
     return true;

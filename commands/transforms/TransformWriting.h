@@ -2,6 +2,7 @@
 #pragma once
 
 #include "host/command/ScriptCommand.h"
+#include "host/scene/Editability.h"
 #include "host/scene/Node.h"
 
 struct TransformWrite {
@@ -29,9 +30,11 @@ struct WriteOptions {
 // Whether numbers are finite; else logs that the command needs such.
 [[nodiscard]] bool areFinite(Vec3 const& values, char const* command);
 
-// Whether a value at a time can be written on a channel: as a key, or with no active clip as the default
-// value. Else warns.
-[[nodiscard]] bool isWritable(Controller const* channel);
+// Whether nothing stands in the way of writing; else warns of it: what is not editable on which module.
+[[nodiscard]] bool isFree(Obstacle obstacle, char const* what, Module const& module);
+
+// Whether the value of a channel can be written; else warns.
+[[nodiscard]] bool isWritable(Controller const& channel, bool byDefault);
 
 // Sets the rotation of the node as asked for. Always answers true.
 bool writeRotation(TransformWrite const& write, TalixRotation const& rotation);

@@ -7,6 +7,7 @@
 
 #include "host/scene/Clips.h"
 #include "host/scene/Database.h"
+#include "host/scene/Editability.h"
 #include "host/scene/MarkerRuns.h"
 
 H_DEFINE_ABSTRACT_CLASS(DataSource);
@@ -38,11 +39,7 @@ KeyTrack::Shape Controller::shapeOf(PropertyType type) {
 
 // --- editing ---
 
-bool Controller::isEditable() const {
-  NLEClip const* clip = g_db->getActiveClip();
-  return clip && clip->holdsKeys() && !m_locked && !clip->isLocked() &&
-         !clip->isLayerLocked(g_db->getActiveLayer()) && !(m_module && m_module->isLocked());
-}
+bool Controller::isEditable() const { return obstacleToKeys(*this) == Obstacle::none; }
 
 void Controller::setLocked(bool locked) {
   recordSettings();
@@ -116,8 +113,8 @@ int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayer
   const int64 first = range.getStart(), last = range.getEnd();
   const CutRuns cut(*this, first, last);
   for (ClipTrack const& track : m_tracks)
-    if (track.clip == clip &&
-        (track.layer == g_db->getActiveLayer() || (allLayers && !clip->isLayerLocked(track.layer))))
+    if (track.clip == clip && (track.layer == g_db->getActiveLayer() ||
+                               (allLayers && obstacleToKeys(*this, clip, track.layer) == Obstacle::none)))
       deleted += editTrack(clip, track.layer, first, last)->eraseRange(first, last, mask);
   if (deleted) changed();
   return static_cast<int>(deleted);
@@ -135,14 +132,25 @@ int Controller::deleteSelectedKeys(unsigned mask) {
 }
 
 bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo) {
-  if (source->getPropertyType() != getPropertyType() || !isEditable()) return false;
+  if (source->getPropertyType() != getPropertyType()) return false;
+  NLEClip* clip = g_db->getActiveClip();
+  const int layers = clip ? clip->getNumLayers() : 0;
+  const auto isFree = [&](int layer) { return obstacleToKeys(*this, clip, layer) == Obstacle::none; };
+  int layer = 0;
+  while (layer < layers && !isFree(layer)) ++layer;
+  if (layer == layers) return false;
   if (source == this) return true;
   setDefaultValues(source->m_default);
   setInterpType(static_cast<int>(source->m_interpolation));
-  NLEClip* clip = g_db->getActiveClip();
-  for (int layer = 0; keys && layer < clip->getNumLayers(); ++layer) {
+  for (layer = 0; keys && layer < layers; ++layer) {
     KeyTrack const* theirs = source->findTrack(clip, layer);
     if (!theirs && !findTrack(clip, layer)) continue;
+    if (!isFree(layer)) {
+      g_db->logWarning("%s is not editable on %s in layer %d of %s: %s.", getName().GetStr(),
+                       m_module->getName().GetStr(), layer, clip->getName().GetStr(),
+                       reasonOf(Obstacle::layerLocked));
+      continue;
+    }
     KeyTrack copy = theirs ? *theirs : KeyTrack(shapeOf(getPropertyType()));
     if (!selectionToo) copy.deselect(-kForever, kForever);
     setTrack(clip, layer, std::move(copy));

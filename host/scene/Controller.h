@@ -124,7 +124,7 @@ class Controller : public DataSource {
   void forgetClip(NLEClip const* clip);
 
   // Copies default value, interpolation and the keys of the active clip from a channel of the same kind.
-  // False when the kinds differ or this channel is not editable.
+  // Locked layers stay as they are, with a warning. False when the kinds differ or no layer is editable.
   virtual bool copyFrom(Controller const* source, bool keys, bool selectionToo);
 
   // The shape that keys of a kind of channel have.

@@ -197,6 +197,13 @@ void Database::logError(char const* format, ...) {
   va_end(args);
 }
 
+void Database::logWarning(char const* format, ...) {
+  va_list args;
+  va_start(args, format);
+  writeLog(LogLevel::Warning, formatted(format, args));
+  va_end(args);
+}
+
 void Database::logInfo(char const* format, ...) {
   va_list args;
   va_start(args, format);

@@ -127,6 +127,7 @@ class Database {
   SubjectManager* getSubjectManager() const { return m_subjects.get(); }
 
   void logError(char const* format, ...) TALIX_PRINTF(2, 3);
+  void logWarning(char const* format, ...) TALIX_PRINTF(2, 3);
   void logInfo(char const* format, ...) TALIX_PRINTF(2, 3);
 
  private:

@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "host/scene/Database.h"
+#include "host/scene/Editability.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/RawValues.h"
 
@@ -198,15 +199,15 @@ Vec3 Node::translationFor(Vec3 const& inParent) const {
 }
 
 void Node::writeAt(Controller* channel, int64 time, Controller::Values const& values) {
-  if (!g_db->getActiveClip()) {
-    channel->beginDefaultEdit();
-    channel->setDefaultValues(values);
-    channel->endDataEdit();
-  } else if (channel->isEditable()) {
+  if (obstacleToValue(*channel) != Obstacle::none) return;
+  if (g_db->getActiveClip()) {
     channel->beginDataEdit(HTimeRange(time, time));
     channel->writeKeyAt(time, channel->solveLayer(time, values), KeyTrack::kAll);
-    channel->endDataEdit();
+  } else {
+    channel->beginDefaultEdit();
+    channel->setDefaultValues(values);
   }
+  channel->endDataEdit();
 }
 
 void Node::setLocalPos(int64 time, Vec3 const& position) {

@@ -66,7 +66,8 @@ class Node : public Module {
   // --- writing
   // ------------------------------------------------------------------------------------------------- Setters
   // at a time write a key in the active clip, so that the sum of its layers is right; with no active clip
-  // they write the default value. World setters find the local value below the present parent.
+  // they write the default value; what is locked stays. World setters find the local value below the present
+  // parent. Setters of default values and pre-transforms write where it is locked, too (Editability.h).
   virtual void setLocalPos(int64 time, Vec3 const& position);
   virtual void setWSPos(int64 time, Vec3 const& position);
   virtual void setLocalRot(int64 time, TalixRotation const& rotation);

