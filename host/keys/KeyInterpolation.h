@@ -1,4 +1,4 @@
-// The value between two keys: what evaluation and reduction share.
+// The value between two keys: what evaluation, sampling and reduction share.
 #pragma once
 
 #include <ImathQuat.h>
@@ -10,12 +10,13 @@ namespace interpolation {
 // The slope at the key between two intervals, of the parabola through its three keys, times the length of one
 // interval: weights for the differences over that interval and over the other one.
 struct Tangent {
-  double own = 1, other = 0;  // one-sided
+  double own, other;
 
-  Tangent() = default;
-  Tangent(double ownLength, double otherLength)
-      : own(otherLength / (ownLength + otherLength)),
-        other(ownLength * ownLength / (otherLength * (ownLength + otherLength))) {}
+  static Tangent oneSided() { return {1, 0}; }
+  static Tangent between(double ownLength, double otherLength) {
+    const double both = ownLength + otherLength;
+    return {otherLength / both, ownLength * ownLength / (otherLength * both)};
+  }
 
   template <class T>
   T operator()(T const& ownDifference, T const& otherDifference) const {
@@ -23,10 +24,21 @@ struct Tangent {
   }
 };
 
-inline double hermite(double u, double p0, double m0, double p1, double m1) {
-  const double d = p1 - p0;
-  return p0 + u * (m0 + u * ((3 * d - 2 * m0 - m1) + u * (m0 + m1 - 2 * d)));
-}
+// The cubic between two values with the slopes m0 and m1, u from 0 to 1.
+class CubicSpan {
+ public:
+  CubicSpan() = default;
+  CubicSpan(double p0, double m0, double p1, double m1) : m_value(p0), m_slope(m0) {
+    const double d = p1 - p0;
+    m_square = 3 * d - 2 * m0 - m1;
+    m_cube = m0 + m1 - 2 * d;
+  }
+  double start() const { return m_value; }
+  double at(double u) const { return m_value + u * (m_slope + u * (m_square + u * m_cube)); }
+
+ private:
+  double m_value, m_slope, m_square, m_cube;
+};
 
 using Quat = Imath::Quatd;
 using V3 = Imath::V3d;
@@ -37,18 +49,44 @@ inline Quat turned(Quat const& q, V3 const& by) { return q * Quat(0, by).exp(); 
 
 inline Quat nearest(Quat const& q, Quat const& to) { return (q ^ to) < 0 ? -q : q; }
 
-inline Quat squad(double u, Tangent const& leaving, Tangent const& arriving, Quat const& before,
-                  Quat const& a, Quat const& b, Quat const& after) {
-  const V3 forth = logBetween(a, b), back = -logBetween(b, a);
-  const V3 start = leaving(forth, -logBetween(a, nearest(before, a)));
-  const V3 end = arriving(back, logBetween(b, nearest(after, b)));
-  const Quat nearA = turned(a, (start - forth) * 0.5), nearB = turned(b, (back - end) * 0.5);
-  return Imath::slerp(Imath::slerp(a, b, u), Imath::slerp(nearA, nearB, u), 2 * u * (1 - u));
-}
+// The arc between two unit quaternions: Imath::slerp, with what is the same for every u calculated once.
+class Arc {
+ public:
+  Arc() = default;
+  Arc(Quat const& a, Quat const& b)
+      : m_a(a), m_b(b), m_angle(Imath::angle4D(a, b)), m_sinc(Imath::sinx_over_x(m_angle)) {}
+  Quat at(double u) const {
+    const double s = 1 - u;
+    return (Imath::sinx_over_x(s * m_angle) / m_sinc * s * m_a +
+            Imath::sinx_over_x(u * m_angle) / m_sinc * u * m_b)
+        .normalized();
+  }
+
+ private:
+  Quat m_a, m_b;
+  double m_angle = 0, m_sinc = 1;
+};
+
+class SquadSpan {
+ public:
+  SquadSpan() = default;
+  SquadSpan(Tangent const& leaving, Tangent const& arriving, Quat const& before, Quat const& a, Quat const& b,
+            Quat const& after)
+      : m_arc(a, b) {
+    const V3 forth = logBetween(a, b), back = -logBetween(b, a);
+    const V3 start = leaving(forth, -logBetween(a, nearest(before, a)));
+    const V3 end = arriving(back, logBetween(b, nearest(after, b)));
+    m_near = Arc(turned(a, (start - forth) * 0.5), turned(b, (back - end) * 0.5));
+  }
+  Quat at(double u) const { return Arc(m_arc.at(u), m_near.at(u)).at(2 * u * (1 - u)); }
+
+ private:
+  Arc m_arc, m_near;
+};
 
 }  // namespace interpolation
 
-// The value at a time between the keys a and b, which lie before and behind it, for Linear and Cubic. Cubic
+// The value at a time between the keys a and b, which lie before and after it, for Linear and Cubic. Cubic
 // also looks at the neighbours, which may be none. Point has time(), value(component) and a test for none.
 // Components that are not wanted(component) stay as they are; rotations are whole.
 template <class Point, class Wanted>
@@ -57,10 +95,10 @@ void interpolateKeys(KeyTrack::Shape shape, Interpolation kind, int64 time, Poin
   using namespace interpolation;
   const auto length = static_cast<double>(b.time() - a.time());
   const double u = static_cast<double>(time - a.time()) / length;
-  Tangent leaving, arriving;
+  Tangent leaving = Tangent::oneSided(), arriving = leaving;
   if (kind == Interpolation::Cubic) {
-    if (before) leaving = {length, static_cast<double>(a.time() - before.time())};
-    if (after) arriving = {length, static_cast<double>(after.time() - b.time())};
+    if (before) leaving = Tangent::between(length, static_cast<double>(a.time() - before.time()));
+    if (after) arriving = Tangent::between(length, static_cast<double>(after.time() - b.time()));
     if (!before) before = a;
     if (!after) after = b;
   }
@@ -71,8 +109,8 @@ void interpolateKeys(KeyTrack::Shape shape, Interpolation kind, int64 time, Poin
     };
     const Quat qa = quatAt(a), qb = nearest(quatAt(b), qa);
     const Quat q = kind == Interpolation::Linear
-                       ? Imath::slerp(qa, qb, u)
-                       : squad(u, leaving, arriving, quatAt(before), qa, qb, quatAt(after));
+                       ? Arc(qa, qb).at(u)
+                       : SquadSpan(leaving, arriving, quatAt(before), qa, qb, quatAt(after)).at(u);
     values = {q.v.x, q.v.y, q.v.z, q.r};
     return;
   }
@@ -83,7 +121,7 @@ void interpolateKeys(KeyTrack::Shape shape, Interpolation kind, int64 time, Poin
     if (kind == Interpolation::Linear) {
       out = pa + d * u;
     } else {
-      out = hermite(u, pa, leaving(d, pa - before.value(c)), pb, arriving(d, after.value(c) - pb));
+      out = CubicSpan(pa, leaving(d, pa - before.value(c)), pb, arriving(d, after.value(c) - pb)).at(u);
     }
   }
 }

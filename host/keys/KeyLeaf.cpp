@@ -30,6 +30,17 @@ int countBefore(const int64* times, int n, int64 time) {
   return static_cast<int>(from - times) + (n == 1 && *from < time);
 }
 
+// Values of every `step`-th key, of keys `width` wide, into a strided array.
+template <class T>
+void spread(const T* from, int width, int step, int n, int first, int end, double* out, ptrdiff_t stride) {
+  if (step == 1 && first == 0 && end == width && stride == width) {
+    std::copy_n(from, n * width, out);
+    return;
+  }
+  for (int c = first; c < end; ++c, ++out)
+    for (int i = 0; i < n; ++i) out[i * stride] = static_cast<double>(from[i * step * width + c]);
+}
+
 }  // namespace
 
 int KeyLeaf::lowerBound(int64 time) const {
@@ -43,6 +54,24 @@ int KeyLeaf::lastAtOrBefore(int64 time) const {
   if (time >= lastTime()) return m_size - 1;
   if (evenTimes()) return static_cast<int>((time - m_start) / m_period);
   return countBefore(m_times.data(), m_size, time + 1) - 1;
+}
+
+void KeyLeaf::readTimes(int slot, int n, int64* out) const {
+  if (evenTimes()) {
+    for (int i = 0; i < n; ++i) out[i] = m_start + m_period * (slot + i);
+  } else {
+    std::copy_n(m_times.data() + slot, n, out);
+  }
+}
+
+void KeyLeaf::readValues(int slot, int step, int n, int first, int end, double* out, ptrdiff_t stride) const {
+  if (m_form == Form::Float) {
+    spread(m_floats.data() + slot * m_width, m_width, step, n, first, end, out, stride);
+  } else if (m_form == Form::Double) {
+    spread(m_doubles.data() + slot * m_width, m_width, step, n, first, end, out, stride);
+  } else {
+    for (int i = 0; i < n; ++i) std::copy(m_doubles.data() + first, m_doubles.data() + end, out + i * stride);
+  }
 }
 
 void KeyLeaf::insert(int slot, int64 time, const double* values, unsigned components, unsigned selection) {

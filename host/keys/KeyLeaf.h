@@ -31,7 +31,7 @@ class KeyLeaf final : public KeyNode {
   int64 lastTime() const { return time(m_size - 1); }
   int lowerBound(int64 time) const;      // the first key at or after the time, size() when there is none
   int lastAtOrBefore(int64 time) const;  // the time must not lie before the first key
-  int lastAtOrBefore(int64 time, int guess) const {  // fast when the answer is the guess or just behind it
+  int lastAtOrBefore(int64 time, int guess) const {  // fast when it is the guess or the next slot
     for (int end = guess + 2; guess < end; ++guess) {
       if (this->time(guess) > time) break;
       if (guess + 1 == m_size || this->time(guess + 1) > time) return guess;
@@ -55,6 +55,20 @@ class KeyLeaf final : public KeyNode {
     }
   }
 
+  // Whether every key holds a component of the mask.
+  bool allHold(unsigned mask) const {
+    return plain() || counts.whole == m_size || (mask == 1 && counts.held[0] == m_size) ||
+           (mask == 2 && counts.held[1] == m_size) || (mask == 4 && counts.held[2] == m_size);
+  }
+  int64 period() const { return evenTimes() ? m_period : 0; }  // undefined with a single key
+  bool repeats() const { return m_form == Form::One; }         // all values are equal bit by bit
+
+  // Decodes the times of n slots.
+  void readTimes(int slot, int n, int64* out) const;
+  // Decodes the components first to before end of n slots, which are `step` apart: those of the i-th go to
+  // out[i * stride] and after.
+  void readValues(int slot, int step, int n, int first, int end, double* out, ptrdiff_t stride) const;
+
   // The first slot at or after (last at or before) `slot` that holds, or is selected on, a component of the
   // mask; -1 when there is none.
   int nextHolding(int slot, unsigned mask) const { return scan<1>(slot, mask); }
@@ -72,7 +86,7 @@ class KeyLeaf final : public KeyNode {
   }
 
   void insert(int slot, int64 time, const double* values, unsigned components, unsigned selection = 0);
-  // n whole keys behind the last one. The leaf must have room for them.
+  // n whole keys after the last one. The leaf must have room for them.
   void append(int64 start, int64 period, const double* values, int n);
   void append(KeyLeaf const& from, int first, int last);
   void write(int slot, const double* values, unsigned mask);

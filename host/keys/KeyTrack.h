@@ -16,11 +16,13 @@
 #pragma once
 
 #include <array>
+#include <cstddef>
 
 #include "host/base/Types.h"
 #include "host/keys/KeyNode.h"
 
 class KeyLeaf;
+class SampleTimes;
 
 enum class Interpolation : unsigned char {
   Constant,  // the last key at or before the time
@@ -121,6 +123,12 @@ class KeyTrack {
   double evaluateComponent(int64 time, Interpolation, int component, double byDefault,
                            Cursor* = nullptr) const;
 
+  // Evaluates at many times, leaf by leaf: component c of sample i goes to out[i * stride + c], for the
+  // components of the mask; others are not touched. Equals evaluate() within 1e-12 of the values. Keeps
+  // nothing in the track, so that several threads may sample one that does not change.
+  void sample(SampleTimes const&, Interpolation, Values const& defaults, unsigned mask, double* out,
+              ptrdiff_t stride) const;
+
   // Calls visit(Key const&) for the keys first to last index (excluding last), in order.
   template <class Visit>
   void forEach(int64 firstIndex, int64 lastIndex, Visit visit) const {
@@ -163,6 +171,7 @@ class KeyTrack {
  private:
   struct Place;     // a key: its leaf, slot and index
   struct LeafEdit;  // what a range edit does to the leaves that it touches
+  class Sampler;    // sample() on one curve: all components, or one that is keyed alone
 
   unsigned normal(unsigned mask) const { return m_shape == Shape::Vector ? mask & kAll : mask ? kAll : 0; }
   void changed();

@@ -2,9 +2,11 @@
 #include <cmath>
 #include <gtest/gtest.h>
 #include <random>
+#include <tuple>
 #include <vector>
 
 #include "host/keys/KeyTrack.h"
+#include "host/keys/SampleTimes.h"
 
 namespace {
 
@@ -66,6 +68,10 @@ TEST(KeyTrackEval, TheWholeTimeLine) {
   EXPECT_EQ(track.timeAt(2), kEnd);
   EXPECT_EQ(scalarAt(track, INT64_MAX, kLinear), 1);
   EXPECT_EQ(scalarAt(track, INT64_MIN, kLinear), -1);
+  double ends[3];
+  track.sample(SampleTimes(INT64_MIN, int64{1} << 62, 3), kLinear, {}, KeyTrack::kAll, ends, 1);
+  EXPECT_NEAR(ends[1], -1, 1e-15);
+  EXPECT_EQ(ends[2], 5);
 }
 
 TEST(KeyTrackEval, CubicOverUnevenTimes) {
@@ -197,33 +203,98 @@ TEST(KeyTrackEval, EachComponentComesFromTheKeysThatHoldIt) {
   EXPECT_EQ(out, (Values{1, 8, 6}));
 }
 
-TEST(KeyTrackEval, ACursorChangesNothing) {
-  std::mt19937 random(5);
-  const auto upTo = [&](int64 n) { return static_cast<int64>(random() % static_cast<uint64>(n + 1)); };
-  for (const Shape shape : {Shape::Scalar, Shape::Vector, Shape::Rotation}) {
-    KeyTrack track(shape, {8, 4}), other = track;
-    KeyTrack::Cursor cursor;
-    int64 time = 0;
-    for (int step = 0; step < 20'000; ++step) {
-      const int64 what = upTo(99);
-      const Values values = shape == Shape::Rotation ? aboutZ(static_cast<double>(upTo(6000)) / 1000)
-                                                     : Values{static_cast<double>(upTo(9)), 1.0 / 3, 2};
-      if (what < 8) track.set(upTo(4000), values, 1 + static_cast<unsigned>(upTo(6)));
-      if (what == 8 && !track.empty()) track.erase(upTo(track.count() - 1));
-      if (what == 9) track.select(upTo(4000), upTo(4000));
-      if (what == 10) std::swap(track, other);
-      if (what == 11) other = track;
-      if (what == 12 && upTo(20) == 0) track.eraseRange(upTo(4000), upTo(4000));
-      if (what == 13 && upTo(20) == 0) track = KeyTrack(shape, {8, 4});
+class EvaluationModes : public testing::TestWithParam<std::tuple<Shape, KeyTrack::Limits>> {
+ protected:
+  int64 upTo(int64 n) { return static_cast<int64>(m_random() % static_cast<uint64>(n + 1)); }
 
-      time = what > 95 ? upTo(4200) - 100 : time + upTo(3);
-      const Interpolation kind = kAllKinds[upTo(2)];
-      Values with{}, without{};
-      track.evaluate(time, kind, {1, 2, 3, 4}, with, &cursor);
-      track.evaluate(time, kind, {1, 2, 3, 4}, without);
-      ASSERT_EQ(with, without) << "step " << step << " at " << time;
+  // Values that repeat, that floats hold, and that only doubles hold.
+  Values randomValues() {
+    const auto x = static_cast<double>(upTo(6000)) / (upTo(1) ? 1024 : 1000);
+    if (m_track.shape() == Shape::Rotation) return upTo(2) ? aboutZ(x) : aboutZ(1);
+    return upTo(2) ? Values{x, 1.0 / 3, 2 * x} : Values{1, 2, 3};
+  }
+
+  void appendRun() {
+    const int64 last = m_track.empty() ? 0 : m_track.timeAt(m_track.count() - 1), period = 1 + upTo(5);
+    const Values repeated = randomValues();
+    std::vector<double> flat;
+    const bool repeats = upTo(1), step = upTo(1);
+    int64 n = upTo(400);
+    for (int64 i = 0; i < n; ++i) {
+      const Values v = repeats && (!step || i < n / 2) ? repeated : randomValues();
+      flat.insert(flat.end(), v.begin(), v.begin() + m_track.width());
+    }
+    if (last < 4000) m_track.append(last + 1 + upTo(9), period, flat.data(), n);
+  }
+
+  void edit() {
+    const int64 what = upTo(99);
+    if (what < 8) m_track.set(upTo(4000), randomValues(), 1 + static_cast<unsigned>(upTo(6)));
+    if (what == 8 && !m_track.empty())
+      m_track.erase(upTo(m_track.count() - 1), 1 + static_cast<unsigned>(upTo(6)));
+    if (what == 9) m_track.select(upTo(4000), upTo(4000));
+    if (what == 10) std::swap(m_track, m_other);
+    if (what == 11) m_other = m_track;
+    if (what == 12 && upTo(9) == 0) m_track.eraseRange(upTo(4000), upTo(4000));
+    if (what == 13 && upTo(9) == 0) m_track = KeyTrack(m_track.shape(), std::get<1>(GetParam()));
+    if (what == 14) appendRun();
+  }
+
+  void compareSamples(SampleTimes const& times, Interpolation kind) {
+    const Values defaults = {1, 2, 3, 4};
+    const unsigned mask = upTo(2) ? 7 : static_cast<unsigned>(upTo(7));
+    const ptrdiff_t stride = m_track.width() + upTo(2);
+    constexpr double kUntouched = 99;
+    std::vector<double> sampled(static_cast<size_t>(times.count() * stride), kUntouched);
+    m_track.sample(times, kind, defaults, mask, sampled.data(), stride);
+    for (int64 i = 0; i < times.count(); ++i) {
+      Values single{};
+      m_track.evaluate(times[i], kind, defaults, single);
+      for (int c = 0; c < stride; ++c) {
+        const bool wanted =
+            c < m_track.width() && (m_track.shape() == Shape::Vector ? mask >> c & 1 : mask != 0);
+        ASSERT_NEAR(sampled[static_cast<size_t>(i * stride + c)],
+                    wanted ? single[static_cast<size_t>(c)] : kUntouched, 1e-12)
+            << "component " << c << " at " << times[i] << ", " << static_cast<int>(kind);
+      }
     }
   }
+
+  void compareSamples(Interpolation kind) {
+    const int64 start = upTo(4500) - 200;
+    compareSamples(SampleTimes(start, 1 + (upTo(1) ? upTo(11) : upTo(900)), upTo(300)), kind);
+    if (!m_track.empty()) {  // at the keys, as far as a run has this period
+      compareSamples(SampleTimes(m_track.timeAt(upTo(m_track.count() - 1)), 1 + upTo(5), upTo(300)), kind);
+    }
+    std::vector<int64> times;
+    const int64 most = upTo(1) ? 3 : 300;
+    for (int64 n = upTo(100), time = start; n > 0; --n) times.push_back(time += upTo(most));
+    compareSamples(SampleTimes(times), kind);
+  }
+
+  KeyTrack m_track{std::get<0>(GetParam()), std::get<1>(GetParam())}, m_other = m_track;
+  std::mt19937 m_random{5};
+};
+
+TEST_P(EvaluationModes, AgreeWhateverWasEdited) {
+  KeyTrack::Cursor cursor;
+  int64 time = 0;
+  for (int step = 0; step < 12'000; ++step) {
+    edit();
+    const Interpolation kind = kAllKinds[upTo(2)];
+    time = upTo(99) > 95 ? upTo(4200) - 100 : time + upTo(3);
+    Values with{}, without{};
+    m_track.evaluate(time, kind, {1, 2, 3, 4}, with, &cursor);
+    m_track.evaluate(time, kind, {1, 2, 3, 4}, without);
+    ASSERT_EQ(with, without) << "step " << step << " at " << time;
+    if (step % 8 == 0) compareSamples(kind);
+    if (HasFatalFailure()) FAIL() << "step " << step;
+  }
 }
+
+INSTANTIATE_TEST_SUITE_P(Tracks, EvaluationModes,
+                         testing::Combine(testing::Values(Shape::Scalar, Shape::Vector, Shape::Rotation),
+                                          testing::Values(KeyTrack::Limits{8, 4},
+                                                          KeyTrack::Limits{256, 32})));
 
 }  // namespace
