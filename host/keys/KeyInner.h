@@ -58,3 +58,8 @@ inline KeyInner& asInner(KeyNode& node) { return static_cast<KeyInner&>(node); }
 inline int64 firstTimeOf(KeyNode const& node) {
   return node.isLeaf() ? asLeaf(node).firstTime() : asInner(node).firstTime();
 }
+inline int64 lastTimeOf(KeyNode const& node) {
+  if (node.isLeaf()) return asLeaf(node).lastTime();
+  auto const& inner = asInner(node);
+  return lastTimeOf(inner.child(inner.size() - 1));
+}

@@ -74,10 +74,10 @@ void KeyLeaf::readValues(int slot, int step, int n, int first, int end, double* 
   }
 }
 
-void KeyLeaf::insert(int slot, int64 time, const double* values, unsigned components, unsigned selection) {
+void KeyLeaf::insert(int slot, int64 time, const double* values, KeyFlags const& flags) {
   insertTimes(slot, time, 0, 1);
   insertValues(slot, values, 1);
-  insertFlags(slot, components | selection << kSelectionShift, 1);
+  insertFlags(slot, flags, 1);
   ++m_size;
   evenOutTimes();
 }
@@ -85,7 +85,7 @@ void KeyLeaf::insert(int slot, int64 time, const double* values, unsigned compon
 void KeyLeaf::append(int64 start, int64 period, const double* values, int n) {
   insertTimes(m_size, start, period, n);
   insertValues(m_size, values, n);
-  insertFlags(m_size, kWhole, n);
+  insertFlags(m_size, {}, n);
   m_size += n;
 }
 
@@ -93,7 +93,7 @@ void KeyLeaf::append(KeyLeaf const& from, int first, int last) {
   std::array<double, 4> one{};
   for (int slot = first; slot < last; ++slot) {
     from.values(slot, one.data());
-    insert(m_size, from.time(slot), one.data(), from.components(slot), from.selected(slot));
+    insert(m_size, from.time(slot), one.data(), from.flags(slot));
   }
 }
 
@@ -103,30 +103,38 @@ void KeyLeaf::write(int slot, const double* values, unsigned mask) {
   for (int c = 0; c < m_width; ++c)
     if (m_width != 3 || mask >> c & 1) fresh[static_cast<size_t>(c)] = values[c];
   putValues(slot, fresh.data());
-  setFlags(slot, components(slot) | mask, selected(slot));
+  setFlags(slot, {components(slot) | mask, bridges(slot), selected(slot)});
 }
 
 void KeyLeaf::erase(int first, int last) {
   eraseTimes(first, last);
   if (m_form == Form::Double) m_doubles.erase(first * m_width, last * m_width);
   if (m_form == Form::Float) m_floats.erase(first * m_width, last * m_width);
-  for (int slot = first; slot < last; ++slot) counts.count(components(slot), selected(slot), -1);
+  for (int slot = first; slot < last; ++slot) counts.count(flags(slot), -1);
   if (!plain()) m_flags.erase(first, last);
+  if (!m_selection.empty()) m_selection.erase(first, last);
   m_size -= last - first;
   dropIdleFlags();
   evenOutTimes();
 }
 
-void KeyLeaf::setFlags(int slot, unsigned components, unsigned selection) {
-  if (components == this->components(slot) && selection == selected(slot)) return;
-  spellOutFlags();
-  counts.count(this->components(slot), selected(slot), -1);
-  counts.count(components, selection, 1);
-  m_flags[slot] = static_cast<unsigned char>(components | selection << kSelectionShift);
+void KeyLeaf::setFlags(int slot, KeyFlags const& fresh) {
+  const KeyFlags old = flags(slot);
+  if (fresh == old) return;
+  counts.count(old, -1);
+  counts.count(fresh, 1);
+  const auto write = [&](Column& column, unsigned absent, unsigned bits) {
+    if (column.empty() && bits == absent) return;
+    if (column.empty()) insertBits(column, absent, absent, 0, 0);
+    column[slot] = static_cast<unsigned char>(bits);
+  };
+  write(m_flags, kWhole, fresh.components | fresh.bridges << kBridgeShift);
+  write(m_selection, 0, fresh.selected);
 }
 
 void KeyLeaf::dropIdleFlags() {
-  if (!plain() && counts.whole == m_size && counts.selected == 0) m_flags.clear();
+  if (!plain() && counts.whole == m_size && !counts.bridgesAny(kWhole)) m_flags.clear();
+  if (!m_selection.empty() && counts.selected == 0) m_selection.clear();
 }
 
 void KeyLeaf::transform(int first, int last, void (*change)(void*, double*), void* context) {
@@ -207,12 +215,20 @@ void KeyLeaf::insertValues(int slot, const double* values, int n) {
   }
 }
 
-void KeyLeaf::insertFlags(int slot, unsigned flags, int n) {
-  if (flags != kWhole) spellOutFlags();
-  if (flags != kWhole || !plain())
-    std::memset(m_flags.open(slot, n, m_limit), static_cast<int>(flags), static_cast<size_t>(n));
-  const unsigned components = flags & kWhole;
-  for (int i = 0; i < n; ++i) counts.count(components, flags >> kSelectionShift, 1);
+void KeyLeaf::insertFlags(int slot, KeyFlags const& flags, int n) {
+  const unsigned bits = flags.components | flags.bridges << kBridgeShift;
+  if (bits != kWhole || !plain()) insertBits(m_flags, kWhole, bits, slot, n);
+  if (flags.selected || !m_selection.empty()) insertBits(m_selection, 0, flags.selected, slot, n);
+  for (int i = 0; i < n; ++i) counts.count(flags, 1);
+}
+
+// An absent column is written out first: each slot had the bits `absent`.
+void KeyLeaf::insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n) {
+  const auto fill = [&](int at, int count, unsigned with) {
+    std::memset(column.open(at, count, m_limit), static_cast<int>(with), static_cast<size_t>(count));
+  };
+  if (column.empty() && m_size > 0) fill(0, m_size, absent);
+  if (n > 0) fill(slot, n, bits);
 }
 
 void KeyLeaf::putValues(int slot, const double* values) {
@@ -247,11 +263,6 @@ void KeyLeaf::evenOutTimes() {
   m_times.clear();
 }
 
-void KeyLeaf::spellOutFlags() {
-  if (plain() && m_size > 0)
-    std::memset(m_flags.open(0, m_size, m_limit), kWhole, static_cast<size_t>(m_size));
-}
-
 void KeyLeaf::spellOutValues(bool asFloats) {
   std::array<double, 4> one{};
   values(0, one.data());
@@ -276,7 +287,7 @@ void KeyLeaf::widen() {
 
 int64 KeyLeaf::memoryUse() const {
   return static_cast<int64>(sizeof *this) + m_times.bytes() + m_doubles.bytes() + m_floats.bytes() +
-         m_flags.bytes();
+         m_flags.bytes() + m_selection.bytes();
 }
 
 const char* KeyLeaf::checkInvariants() const {
@@ -289,15 +300,18 @@ const char* KeyLeaf::checkInvariants() const {
   if ((m_form == Form::Float ? m_floats.size() : m_doubles.size()) != stored) return "values are missing";
   if (!evenTimes() && m_times.size() != m_size) return "times are missing";
   if (!plain() && m_flags.size() != m_size) return "flags are missing";
+  if (!m_selection.empty() && m_selection.size() != m_size) return "selection is missing";
 
   KeyCounts expected;
   for (int slot = 0; slot < m_size; ++slot) {
     if (components(slot) == 0) return "a key holds no component";
     if (m_width != 3 && components(slot) != kWhole) return "a key that is keyed whole lacks components";
+    if (m_width != 3 && bridges(slot) && bridges(slot) != kWhole) return "a key bridges in part";
+    if (bridges(slot) & ~components(slot)) return "a component is bridged that the key does not hold";
     if (selected(slot) & ~components(slot)) return "a component is selected that the key does not hold";
     for (int c = 0; m_width == 3 && c < 3; ++c)
       if (!(components(slot) >> c & 1) && value(slot, c) != 0) return "an absent component has a value";
-    expected.count(components(slot), selected(slot), 1);
+    expected.count(flags(slot), 1);
   }
   if (!(expected == counts)) return "the counts of a leaf are wrong";
   return nullptr;

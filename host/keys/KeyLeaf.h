@@ -1,11 +1,12 @@
-// A leaf of a key track: up to a few hundred keys. Each of its three parts has a compact form and a general
+// A leaf of a key track: up to a few hundred keys. Each of its four parts has a compact form and a general
 // one:
 //  - times: a start and a period while they are evenly spaced, else one by one;
-//  - flags: none while every key is whole and none selected, else a byte for each key;
+//  - components and bridges: none while every key is whole and bridges nothing, else a byte for each key;
+//  - selection: none while no key is selected, else a byte for each key;
 //  - values: one key's while all are equal bit by bit, floats while that loses nothing, else doubles.
-// A leaf with even times and no flags is dense. An edit that breaks a form turns that part of that leaf
-// alone. Components that a key does not hold have the value 0. Slots count from 0; arguments must be in
-// range.
+// A leaf with even times and no flags or selection is dense. An edit that breaks a form turns that part of
+// that leaf alone. Components that a key does not hold have the value 0. Slots count from 0; arguments must
+// be in range.
 #pragma once
 
 #include "host/keys/KeyColumn.h"
@@ -23,8 +24,8 @@ class KeyLeaf final : public KeyNode {
   int limit() const { return m_limit; }
   bool full() const { return m_size >= m_limit; }
   bool evenTimes() const { return m_times.empty(); }
-  bool plain() const { return m_flags.empty(); }  // every key whole, none selected
-  bool dense() const { return evenTimes() && plain(); }
+  bool plain() const { return m_flags.empty(); }  // every key is whole and bridges nothing
+  bool dense() const { return evenTimes() && plain() && m_selection.empty(); }
 
   int64 time(int slot) const { return evenTimes() ? m_start + m_period * slot : m_times[slot]; }
   int64 firstTime() const { return time(0); }
@@ -40,7 +41,9 @@ class KeyLeaf final : public KeyNode {
   }
 
   unsigned components(int slot) const { return plain() ? kWhole : m_flags[slot] & kWhole; }
-  unsigned selected(int slot) const { return plain() ? 0 : m_flags[slot] >> kSelectionShift; }
+  unsigned bridges(int slot) const { return plain() ? 0 : m_flags[slot] >> kBridgeShift; }
+  unsigned selected(int slot) const { return m_selection.empty() ? 0 : m_selection[slot]; }
+  KeyFlags flags(int slot) const { return {components(slot), bridges(slot), selected(slot)}; }
   double value(int slot, int component) const {
     if (m_form == Form::Double) return m_doubles[slot * m_width + component];
     if (m_form == Form::Float) return static_cast<double>(m_floats[slot * m_width + component]);
@@ -71,27 +74,23 @@ class KeyLeaf final : public KeyNode {
 
   // The first slot at or after (last at or before) `slot` that holds, or is selected on, a component of the
   // mask; -1 when there is none.
-  int nextHolding(int slot, unsigned mask) const { return scan<1>(slot, mask); }
-  int previousHolding(int slot, unsigned mask) const { return scan<-1>(slot, mask); }
-  int nextSelected(int slot, unsigned mask) const {
-    return plain() ? -1 : scan<1>(slot, mask << kSelectionShift);
-  }
-  int previousSelected(int slot, unsigned mask) const {
-    return plain() ? -1 : scan<-1>(slot, mask << kSelectionShift);
-  }
+  int nextHolding(int slot, unsigned mask) const { return scan<1>(m_flags, kWhole, slot, mask); }
+  int previousHolding(int slot, unsigned mask) const { return scan<-1>(m_flags, kWhole, slot, mask); }
+  int nextSelected(int slot, unsigned mask) const { return scan<1>(m_selection, 0, slot, mask); }
+  int previousSelected(int slot, unsigned mask) const { return scan<-1>(m_selection, 0, slot, mask); }
   // The same for keys that are selected on no component of the mask.
-  int nextUnselected(int slot, unsigned mask) const { return scan<1, false>(slot, mask << kSelectionShift); }
+  int nextUnselected(int slot, unsigned mask) const { return scan<1, false>(m_selection, 0, slot, mask); }
   int previousUnselected(int slot, unsigned mask) const {
-    return scan<-1, false>(slot, mask << kSelectionShift);
+    return scan<-1, false>(m_selection, 0, slot, mask);
   }
 
-  void insert(int slot, int64 time, const double* values, unsigned components, unsigned selection = 0);
+  void insert(int slot, int64 time, const double* values, KeyFlags const& flags);
   // n whole keys after the last one. The leaf must have room for them.
   void append(int64 start, int64 period, const double* values, int n);
   void append(KeyLeaf const& from, int first, int last);
   void write(int slot, const double* values, unsigned mask);
   void erase(int first, int last);
-  void setFlags(int slot, unsigned components, unsigned selection);
+  void setFlags(int slot, KeyFlags const& flags);
   // To be called when a series of setFlags is done.
   void dropIdleFlags();
   // Replaces the values of the whole keys in [first, last) by change(values). One call may serve for all keys
@@ -104,25 +103,27 @@ class KeyLeaf final : public KeyNode {
 
  private:
   enum class Form : unsigned char { One, Float, Double };
-  static constexpr int kSelectionShift = 4;
+  using Column = KeyColumn<unsigned char>;
+  static constexpr int kBridgeShift = 3;
 
-  // The first slot that has any of the flags, or none of them.
+  // The first slot whose bits have any of the mask, or none of it. Where the column is absent each slot has
+  // the bits `absent`.
   template <int Step, bool Any = true>
-  int scan(int slot, unsigned flags) const {
-    if (plain()) return slot >= 0 && slot < m_size && (flags || !Any) ? slot : -1;
+  int scan(Column const& bits, unsigned absent, int slot, unsigned mask) const {
+    if (bits.empty()) return slot >= 0 && slot < m_size && ((absent & mask) != 0) == Any ? slot : -1;
     for (; slot >= 0 && slot < m_size; slot += Step)
-      if (((m_flags[slot] & flags) != 0) == Any) return slot;
+      if (((bits[slot] & mask) != 0) == Any) return slot;
     return -1;
   }
 
   void insertTimes(int slot, int64 start, int64 period, int n);
   void insertValues(int slot, const double* values, int n);
-  void insertFlags(int slot, unsigned flags, int n);
+  void insertFlags(int slot, KeyFlags const& flags, int n);
+  void insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n);
   void eraseTimes(int first, int last);
   bool continuesEvenly(int slot, int64 start, int64 period, int n);
   void spellOutTimes();
   void evenOutTimes();
-  void spellOutFlags();
   void spellOutValues(bool asFloats);
   void widen();
   void putValues(int slot, const double* values);
@@ -136,5 +137,6 @@ class KeyLeaf final : public KeyNode {
   KeyColumn<int64> m_times;
   KeyColumn<double> m_doubles;  // with Form::One a single key's
   KeyColumn<float> m_floats;
-  KeyColumn<unsigned char> m_flags;  // components, and selection above them
+  Column m_flags;  // components, and bridges above them
+  Column m_selection;
 };

@@ -7,6 +7,15 @@
 
 #include "host/base/Types.h"
 
+// Bits of a key, by components: 1 x, 2 y, 4 z. Bridges and selection are part of the components.
+struct KeyFlags {
+  unsigned components = 7;
+  unsigned bridges = 0;  // components whose data goes on to the next key that has them
+  unsigned selected = 0;
+
+  bool operator==(KeyFlags const&) const = default;
+};
+
 // What lies below a node, by components: x 0, y 1, z 2.
 struct KeyCounts {
   int64 keys = 0;
@@ -14,31 +23,40 @@ struct KeyCounts {
   int64 selected = 0;        // keys selected on any component
   int64 held[3] = {};        // keys that hold the component
   int64 selectedOn[3] = {};  // keys selected on the component
+  int64 bridging[3] = {};    // keys that bridge the component
 
   // One more (by 1) or one less (by -1) key with these flags.
-  void count(unsigned components, unsigned selection, int by) {
+  void count(KeyFlags const& flags, int by) {
     keys += by;
-    whole += components == 7 ? by : 0;
-    selected += selection ? by : 0;
+    whole += flags.components == 7 ? by : 0;
+    selected += flags.selected ? by : 0;
     for (int c = 0; c < 3; ++c) {
-      held[c] += components >> c & 1 ? by : 0;
-      selectedOn[c] += selection >> c & 1 ? by : 0;
+      held[c] += flags.components >> c & 1 ? by : 0;
+      selectedOn[c] += flags.selected >> c & 1 ? by : 0;
+      bridging[c] += flags.bridges >> c & 1 ? by : 0;
     }
   }
 
   void operator+=(KeyCounts const& o) {
     keys += o.keys, whole += o.whole, selected += o.selected;
-    for (int c = 0; c < 3; ++c) held[c] += o.held[c], selectedOn[c] += o.selectedOn[c];
+    for (int c = 0; c < 3; ++c)
+      held[c] += o.held[c], selectedOn[c] += o.selectedOn[c], bridging[c] += o.bridging[c];
   }
   void operator-=(KeyCounts const& o) {
     keys -= o.keys, whole -= o.whole, selected -= o.selected;
-    for (int c = 0; c < 3; ++c) held[c] -= o.held[c], selectedOn[c] -= o.selectedOn[c];
+    for (int c = 0; c < 3; ++c)
+      held[c] -= o.held[c], selectedOn[c] -= o.selectedOn[c], bridging[c] -= o.bridging[c];
   }
   bool operator==(KeyCounts const&) const = default;
 
-  // Whether some key holds (is selected on) any component of the mask.
+  // Whether some key holds (is selected on, bridges) any component of the mask.
   bool holdsAny(unsigned mask) const { return anyOf(held, mask); }
   bool selectedAny(unsigned mask) const { return anyOf(selectedOn, mask); }
+  bool bridgesAny(unsigned mask) const { return anyOf(bridging, mask); }
+  // Whether every key is whole and bridges every component.
+  bool bridgesAll() const {
+    return whole == keys && bridging[0] == keys && bridging[1] == keys && bridging[2] == keys;
+  }
   // Whether some key may be selected on no component of the mask; surely so with one component or all.
   bool unselectedAny(unsigned mask) const {
     if (mask == 7) return keys > selected;

@@ -92,12 +92,6 @@ int64 bytesAloneOf(KeyNode const& node) {
   return sum;
 }
 
-int64 lastTimeOf(KeyNode const& node) {
-  if (node.isLeaf()) return asLeaf(node).lastTime();
-  auto const& inner = asInner(node);
-  return lastTimeOf(inner.child(inner.size() - 1));
-}
-
 const char* brokenInvariant(KeyNode const& node) {
   if (node.isLeaf()) return asLeaf(node).checkInvariants();
   auto const& inner = asInner(node);
@@ -122,6 +116,7 @@ KeyTrack::Key keyIn(KeyLeaf const& leaf, int slot) {
   key.time = leaf.time(slot);
   key.components = static_cast<unsigned char>(leaf.components(slot));
   key.selected = static_cast<unsigned char>(leaf.selected(slot));
+  key.bridges = static_cast<unsigned char>(leaf.bridges(slot));
   leaf.values(slot, key.values.data());
   return key;
 }
@@ -220,6 +215,18 @@ int64 KeyTrack::lowerBound(int64 time) const {
   return place && place.time() == time ? place.index : place.index + 1;
 }
 
+unsigned KeyTrack::bridgedAt(int64 time, unsigned mask) const {
+  unsigned bridged = 0;
+  if (!bridgesAny(mask)) return bridged;
+  const int64 index = lowerBound(time);
+  if (index == count()) return bridged;
+  for (const unsigned part : KeyParts(m_shape, mask)) {
+    const int64 before = previousHolding(index, part);
+    if (before >= 0) bridged |= placeAt(before).bridges() & part;
+  }
+  return bridged;
+}
+
 int64 KeyTrack::nextHolding(int64 index, unsigned mask) const {
   return m_root ? findNext(*m_root.get(), std::max<int64>(index + 1, 0), {normal(mask), Wanted::holding})
                 : -1;
@@ -269,7 +276,7 @@ bool KeyTrack::operator==(KeyTrack const& o) const {
   for (int64 i = 0; i < count(); ++i) {
     const Key a = mine.next(), b = theirs.next();
     if (a.time != b.time || a.components != b.components || a.selected != b.selected ||
-        std::memcmp(a.values.data(), b.values.data(), sizeof(Values)) != 0)
+        a.bridges != b.bridges || std::memcmp(a.values.data(), b.values.data(), sizeof(Values)) != 0)
       return false;
   }
   return true;
@@ -285,5 +292,9 @@ int64 KeyTrack::memoryAlone() const { return m_root ? bytesAloneOf(*m_root.get()
 
 const char* KeyTrack::checkInvariants() const {
   const char* broken = m_root ? brokenInvariant(*m_root.get()) : nullptr;
+  for (const unsigned part : KeyParts(m_shape, kAll)) {
+    const Place last = placeAt(broken ? -1 : previousHolding(count(), part));
+    if (last && last.bridges() & part) broken = "the last key that holds a component bridges it";
+  }
   return broken ? broken : "";
 }

@@ -3,11 +3,16 @@
 // Invariants (checkInvariants tests these, in this order):
 //  1. Key times strictly ascend.
 //  2. A key holds at least one component; a rotation or one-valued key always holds all.
-//  3. The counts in inner nodes (keys, selected keys by component, keys by component) are those of their
+//  3. A key bridges only components that it holds and that a later key holds, too; a rotation or one-valued
+//  key all or none.
+//  4. The counts in inner nodes (keys; keys, selected keys and bridges by component) are those of their
 //  leaves.
-//  4. No leaf is empty; what a leaf stores in a compact form has it: even times (a start and a period), no
-//  flags
-//     (every key whole, none selected), equal values stored once, values stored as floats without loss.
+//  5. No leaf is empty; what a leaf stores in a compact form has it: even times (a start and a period), no
+//  flags (every key whole, nothing bridged), no selection, equal values stored once, values stored as floats
+//  without loss.
+//
+// Bridges tell where there is data between keys (DataRanges.h): a key that bridges a component goes on to the
+// next key that has it. Values between keys do not depend on them.
 //
 // Copying a track is a snapshot and costs one reference; the copies part at the first change of either.
 // Unless a comment says otherwise an operation is logarithmic in the number of keys, plus one leaf.
@@ -46,6 +51,13 @@ class KeyTrack {
     Values values{};
     unsigned char components = kAll;  // which components are keyed
     unsigned char selected = 0;       // selection flags; all three bits on one-valued and rotation keys
+    unsigned char bridges = 0;        // components whose data goes on to the next key that has them
+  };
+
+  // How a deletion finds the frames at which bridges then end, and the values there.
+  struct BridgeEnds {
+    Interpolation interpolation = Interpolation::Linear;
+    int64 framePeriod = 1;  // ticks; whole frames lie at its multiples
   };
 
   // Remembers where the last evaluation was, so that playing forward costs constant time. Belongs to the
@@ -96,19 +108,41 @@ class KeyTrack {
   int64 nextUnselected(int64 index, unsigned mask) const;
   int64 previousUnselected(int64 index, unsigned mask) const;
 
-  // Writes the components of `mask` at `time`. An existing key keeps its selection and other components.
-  // Appending at the end is amortised constant.
+  // Writes the components of `mask` at `time`. An existing key keeps its selection and other components. On a
+  // bridge the key bridges to both sides. Appending at the end is amortised constant.
   void set(int64 time, Values const& values, unsigned mask = kAll);
   // Appends `n` whole keys at start, start + period, ... (after the last key); `values` holds n * width()
   // doubles.
   void append(int64 start, int64 period, const double* values, int64 n);
 
-  // Erasing on a mask removes these components; a key left without any goes. They answer the number of keys
-  // that lost something. Ranges include both ends; the cost of a range is that of the leaves it touches.
+  // Erasing on a mask removes these components; a key left without any goes, and a bridge that loses one of
+  // its two keys goes whole. They return the number of keys that lost something. Ranges include both ends;
+  // the cost of a range is that of the leaves it touches.
   int64 erase(int64 index, unsigned mask = kAll);  // an index outside the track erases nothing
   int64 eraseRange(int64 first, int64 last, unsigned mask = kAll);
-  int64 eraseSelected(unsigned mask = kAll);  // of each key the components of the mask that are selected
   void clear();
+
+  // The same for edits by a user, which take away no other data than what was chosen: a bridge that loses a
+  // key, or frames, ends at the last frame before what is gone, or begins at the first one after it, where a
+  // key with the curve's value is put. These keys are not counted. A range is all its frames, with or without
+  // keys; of selected keys the components of the mask that are selected go, and the bridges between
+  // neighbours that go.
+  int64 deleteRange(int64 first, int64 last, unsigned mask, BridgeEnds const& ends);
+  int64 deleteSelected(unsigned mask, BridgeEnds const& ends);
+
+  // Bridges. Whether any key bridges a component of the mask; constant time.
+  bool bridgesAny(unsigned mask = kAll) const { return m_root && m_root->counts.bridgesAny(normal(mask)); }
+  // The components of the mask that have data at the time because a bridge passes over it or reaches it.
+  unsigned bridgedAt(int64 time, unsigned mask = kAll) const;
+  // Lets the keys from first to last (times, included) bridge the components of the mask that they hold to
+  // their next keys; the last key that holds a component never does. unbridge ends their bridges.
+  void bridge(int64 first, int64 last, unsigned mask = kAll);
+  void unbridge(int64 first, int64 last, unsigned mask = kAll);
+
+  // Makes the track hold exactly this key at its time, or none, whatever the neighbours' bridges say: for
+  // undo, which restores every key that an edit changed.
+  void restore(Key const& key);
+  void restoreNone(int64 time);
 
   // Selection. Only components that a key holds can be selected. Selecting answers the number of
   // keys in the range that hold a component of the mask; deselecting the number of keys that lost a flag.
@@ -169,6 +203,7 @@ class KeyTrack {
   const char* checkInvariants() const;
 
  private:
+  friend class DataRanges;
   struct Place;     // a key: its leaf, slot and index
   struct LeafEdit;  // what a range edit does to the leaves that it touches
   class Sampler;    // sample() on one curve: all components, or one that is keyed alone
@@ -184,12 +219,17 @@ class KeyTrack {
   void evaluateAt(int64 time, Interpolation, unsigned mask, Place const& base, Values const& defaults,
                   Values& values, Cursor const*) const;
 
-  KeyNodeRef setBelow(KeyNodeRef& node, int64 time, Values const& values, unsigned mask);
-  KeyNodeRef setInLeaf(KeyNodeRef& node, int64 time, Values const& values, unsigned mask);
+  void put(Key const& key);
+  KeyNodeRef setBelow(KeyNodeRef& node, Key const& key);
+  KeyNodeRef setInLeaf(KeyNodeRef& node, Key const& key);
   KeyNodeRef appendBelow(KeyNodeRef& node, int64 start, int64 period, const double* values, int n);
   void growRoot(KeyNodeRef sibling);
   int64 edit(int64 firstIndex, int64 lastIndex, LeafEdit&);
+  int64 editTimes(int64 first, int64 last, LeafEdit&);
   void editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit&);
+  void endBridge(int64 index, unsigned part);  // -1: no key
+  // What deleteRange does with the keys that are put at the ends of bridges, with values of `curve`.
+  void capBridges(int64 first, int64 last, unsigned mask, BridgeEnds const& ends, KeyTrack const& curve);
 
   KeyNodeRef m_root;     // null: no keys
   uint64 m_version = 0;  // differs after every change, from that of any other track too

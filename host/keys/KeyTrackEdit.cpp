@@ -5,9 +5,10 @@
 #include <cassert>
 
 #include "host/keys/KeyTrackPlace.h"
+#include "host/time/Ticks.h"
 
 struct KeyTrack::LeafEdit {
-  enum class Kind : unsigned char { Erase, EraseSelected, Select, Deselect, Transform };
+  enum class Kind : unsigned char { Erase, EraseSelected, Select, Deselect, Bridge, Unbridge, Transform };
 
   Kind kind;
   unsigned mask;
@@ -23,10 +24,13 @@ struct KeyTrack::LeafEdit {
     switch (kind) {
       case Kind::Erase:
       case Kind::Select:
+      case Kind::Bridge:
         return !node.counts.holdsAny(mask);
       case Kind::EraseSelected:
       case Kind::Deselect:
         return !node.counts.selectedAny(mask);
+      case Kind::Unbridge:
+        return !node.counts.bridgesAny(mask);
       case Kind::Transform:
         return false;
     }
@@ -42,17 +46,21 @@ struct KeyTrack::LeafEdit {
     } else if (erases()) {
       eraseComponents(leaf, first, last);
     } else {
-      changeSelection(leaf, first, last);
+      changeFlags(leaf, first, last);
     }
   }
 
  private:
-  void changeSelection(KeyLeaf& leaf, int first, int last) {
+  void changeFlags(KeyLeaf& leaf, int first, int last) {
+    const bool adds = kind == Kind::Select || kind == Kind::Bridge;
+    const bool bridges = kind == Kind::Bridge || kind == Kind::Unbridge;
     for (int slot = first; slot < last; ++slot) {
-      const unsigned held = leaf.components(slot), selected = leaf.selected(slot);
-      const unsigned touched = mask & (kind == Kind::Select ? held : selected);
+      KeyFlags flags = leaf.flags(slot);
+      unsigned& bits = bridges ? flags.bridges : flags.selected;
+      const unsigned touched = mask & (adds ? flags.components : bits);
       affected += touched != 0;
-      leaf.setFlags(slot, held, kind == Kind::Select ? selected | touched : selected & ~touched);
+      bits = adds ? bits | touched : bits & ~touched;
+      leaf.setFlags(slot, flags);
     }
     leaf.dropIdleFlags();
   }
@@ -61,7 +69,7 @@ struct KeyTrack::LeafEdit {
   void eraseComponents(KeyLeaf& leaf, int first, int last) {
     int runEnd = last;
     for (int slot = last - 1; slot >= first; --slot) {
-      const unsigned held = leaf.components(slot), selected = leaf.selected(slot);
+      const auto [held, bridged, selected] = leaf.flags(slot);
       const unsigned lost = mask & (kind == Kind::Erase ? held : selected);
       affected += lost != 0;
       if (lost == held) continue;
@@ -71,7 +79,7 @@ struct KeyTrack::LeafEdit {
       if (lost != 0) {
         constexpr Values kAbsent{};
         leaf.write(slot, kAbsent.data(), lost);
-        leaf.setFlags(slot, held & ~lost, selected & ~lost);
+        leaf.setFlags(slot, {held & ~lost, bridged & ~lost, selected & ~lost});
       }
     }
     if (first < runEnd) leaf.erase(first, runEnd);
@@ -95,41 +103,53 @@ void KeyTrack::growRoot(KeyNodeRef sibling) {
 void KeyTrack::set(int64 time, Values const& values, unsigned mask) {
   mask = normal(mask);
   if (mask == 0) return;
-  changed();
-  if (!m_root) m_root = KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
-  if (KeyNodeRef sibling = setBelow(m_root, time, values, mask)) growRoot(std::move(sibling));
+  Key key{.time = time, .values = values};
+  key.components = static_cast<unsigned char>(mask);
+  key.bridges = static_cast<unsigned char>(bridgedAt(time, mask));
+  put(key);
 }
 
-// Answers the new node to the right when the node had to split.
-KeyNodeRef KeyTrack::setBelow(KeyNodeRef& node, int64 time, Values const& values, unsigned mask) {
-  if (node->isLeaf()) return setInLeaf(node, time, values, mask);
+// Adds the key's components to what the track holds at its time; components that it holds already keep their
+// bridges.
+void KeyTrack::put(Key const& key) {
+  changed();
+  if (!m_root) m_root = KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
+  if (KeyNodeRef sibling = setBelow(m_root, key)) growRoot(std::move(sibling));
+}
+
+// Returns the new node to the right when the node had to split.
+KeyNodeRef KeyTrack::setBelow(KeyNodeRef& node, Key const& key) {
+  if (node->isLeaf()) return setInLeaf(node, key);
   node.own();
   auto& inner = asInner(*node.get());
-  const int i = inner.childAtTime(time);
+  const int i = inner.childAtTime(key.time);
   KeyNodeRef& child = inner.childRef(i);
   const KeyCounts before = child->counts;
-  KeyNodeRef sibling = setBelow(child, time, values, mask);
+  KeyNodeRef sibling = setBelow(child, key);
   inner.childChanged(i, before);
   return sibling ? inner.insert(i + 1, std::move(sibling)) : KeyNodeRef();
 }
 
-KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, int64 time, Values const& values, unsigned mask) {
+KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key) {
   const auto insertInto = [&](KeyLeaf& leaf, int slot) {
     Values held{};
     for (size_t c = 0; c < held.size(); ++c)
-      if (m_shape != Shape::Vector || mask >> c & 1) held[c] = values[c];
-    leaf.insert(slot, time, held.data(), mask);
+      if (m_shape != Shape::Vector || key.components >> c & 1) held[c] = key.values[c];
+    leaf.insert(slot, key.time, held.data(), {key.components, key.bridges, key.selected});
   };
 
   const auto& old = asLeaf(*node.get());
   const int size = old.size();
-  const int slot = size == 0 ? 0 : old.lowerBound(time);
-  const bool present = slot < size && old.time(slot) == time;
+  const int slot = size == 0 ? 0 : old.lowerBound(key.time);
+  const bool present = slot < size && old.time(slot) == key.time;
   if (present || !old.full()) {
     node.own();
     auto& leaf = asLeaf(*node.get());
     if (present) {
-      leaf.write(slot, values.data(), mask);
+      const KeyFlags held = leaf.flags(slot);
+      leaf.write(slot, key.values.data(), key.components);
+      leaf.setFlags(slot, {held.components | key.components, held.bridges | (key.bridges & ~held.components),
+                           held.selected | key.selected});
       leaf.dropIdleFlags();
     } else {
       insertInto(leaf, slot);
@@ -249,20 +269,122 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
   if (inner.size() == 0) node.reset();
 }
 
+int64 KeyTrack::editTimes(int64 first, int64 last, LeafEdit& what) {
+  return first > last ? 0 : edit(lowerBound(first), placeAtOrBefore(last).index + 1, what);
+}
+
 int64 KeyTrack::erase(int64 index, unsigned mask) {
+  if (index < 0 || index >= count()) return 0;
+  if (bridgesAny(mask)) {
+    const int64 time = timeAt(index);
+    return eraseRange(time, time, mask);
+  }
   LeafEdit what{LeafEdit::Kind::Erase, normal(mask)};
   return edit(index, index + 1, what);
 }
 
 int64 KeyTrack::eraseRange(int64 first, int64 last, unsigned mask) {
   if (first > last) return 0;
+  // Bridges into the range lose their end.
+  const int64 from = bridgesAny(mask) ? lowerBound(first) : count();
+  for (const unsigned part : KeyParts(m_shape, mask)) {
+    const Place gone = placeAt(nextHolding(from - 1, part));
+    if (!gone || gone.time() > last) continue;
+    endBridge(previousHolding(from, part), part);
+  }
   LeafEdit what{LeafEdit::Kind::Erase, normal(mask)};
-  return edit(lowerBound(first), placeAtOrBefore(last).index + 1, what);
+  return editTimes(first, last, what);
 }
 
-int64 KeyTrack::eraseSelected(unsigned mask) {
-  LeafEdit what{LeafEdit::Kind::EraseSelected, normal(mask)};
-  return edit(0, count(), what);
+void KeyTrack::endBridge(int64 index, unsigned part) {
+  const Place place = placeAt(index);
+  if (!place || !(place.bridges() & part)) return;
+  LeafEdit end{LeafEdit::Kind::Unbridge, part};
+  edit(index, index + 1, end);
+}
+
+// The keys at the ends are put before what lies between them is erased: so the bridges that stay go through
+// them.
+void KeyTrack::capBridges(int64 first, int64 last, unsigned mask, BridgeEnds const& ends,
+                          KeyTrack const& curve) {
+  first = std::max(first, -kForever), last = std::min(last, kForever);
+  const int64 firstFrame = frameAtOrAfter(first, ends.framePeriod);
+  const int64 lastFrame = frameAtOrBefore(last, ends.framePeriod);
+  const int64 before = (firstFrame - 1) * ends.framePeriod, after = (lastFrame + 1) * ends.framePeriod;
+  const int64 from = lowerBound(first), to = placeAtOrBefore(last).index + 1;
+  unsigned endsBefore = 0, beginsAfter = 0, cut = 0;
+  for (const unsigned part : KeyParts(m_shape, mask)) {
+    const Place earlier = placeAt(previousHolding(from, part)), next = placeAt(nextHolding(from - 1, part));
+    const bool holdsKeys = next && next.time() <= last;
+    if (!holdsKeys && firstFrame > lastFrame) continue;
+    if (earlier && earlier.bridges() & part) {
+      cut |= part;
+      if (earlier.time() < before) endsBefore |= part;
+    }
+    const Place inner = placeAt(previousHolding(to, part)), later = placeAt(nextHolding(to - 1, part));
+    if (inner && later && inner.bridges() & part && later.time() > after) beginsAfter |= part;
+  }
+  const auto cap = [&](int64 time, unsigned components) {
+    if (!components) return;
+    Values values{};
+    curve.evaluate(time, ends.interpolation, {}, values);
+    set(time, values, components);
+  };
+  cap(before, endsBefore);
+  cap(after, beginsAfter);
+  for (const unsigned part : KeyParts(m_shape, cut)) {
+    endBridge(previousHolding(lowerBound(first), part), part);
+  }
+}
+
+int64 KeyTrack::deleteRange(int64 first, int64 last, unsigned mask, BridgeEnds const& ends) {
+  if (first > last) return 0;
+  if (bridgesAny(mask)) capBridges(first, last, normal(mask), ends, KeyTrack(*this));
+  return eraseRange(first, last, mask);
+}
+
+int64 KeyTrack::deleteSelected(unsigned mask, BridgeEnds const& ends) {
+  mask = normal(mask);
+  if (!bridgesAny(mask)) {
+    LeafEdit what{LeafEdit::Kind::EraseSelected, mask};
+    return edit(0, count(), what);
+  }
+  const int64 affected = countSelected(mask);
+  const KeyTrack before = *this;
+  for (const unsigned part : KeyParts(m_shape, mask)) {
+    for (int64 first = before.nextSelected(-1, part), last; first >= 0;
+         first = before.nextSelected(last, part)) {
+      last = first;
+      for (int64 next;
+           (next = before.nextHolding(last, part)) >= 0 && before.placeAt(next).selected() & part;)
+        last = next;
+      const int64 start = before.timeAt(first), end = before.timeAt(last);
+      if (bridgesAny(part)) capBridges(start, end, part, ends, before);
+      eraseRange(start, end, part);
+    }
+  }
+  return affected;
+}
+
+void KeyTrack::bridge(int64 first, int64 last, unsigned mask) {
+  LeafEdit what{LeafEdit::Kind::Bridge, normal(mask)};
+  editTimes(first, last, what);
+  for (const unsigned part : KeyParts(m_shape, mask)) endBridge(previousHolding(count(), part), part);
+}
+
+void KeyTrack::unbridge(int64 first, int64 last, unsigned mask) {
+  LeafEdit what{LeafEdit::Kind::Unbridge, normal(mask)};
+  editTimes(first, last, what);
+}
+
+void KeyTrack::restore(Key const& key) {
+  restoreNone(key.time);
+  put(key);
+}
+
+void KeyTrack::restoreNone(int64 time) {
+  LeafEdit what{LeafEdit::Kind::Erase, kAll};
+  editTimes(time, time, what);
 }
 
 void KeyTrack::clear() {
@@ -271,15 +393,13 @@ void KeyTrack::clear() {
 }
 
 int64 KeyTrack::select(int64 first, int64 last, unsigned mask) {
-  if (first > last) return 0;
   LeafEdit what{LeafEdit::Kind::Select, normal(mask)};
-  return edit(lowerBound(first), placeAtOrBefore(last).index + 1, what);
+  return editTimes(first, last, what);
 }
 
 int64 KeyTrack::deselect(int64 first, int64 last, unsigned mask) {
-  if (first > last) return 0;
   LeafEdit what{LeafEdit::Kind::Deselect, normal(mask)};
-  return edit(lowerBound(first), placeAtOrBefore(last).index + 1, what);
+  return editTimes(first, last, what);
 }
 
 void KeyTrack::setSelected(int64 index, unsigned flags) {

@@ -1,6 +1,8 @@
 // A key of a track by where it lies. Valid until the track changes.
 #pragma once
 
+#include <array>
+
 #include "host/keys/KeyInner.h"
 #include "host/keys/KeyTrack.h"
 
@@ -12,4 +14,25 @@ struct KeyTrack::Place {
   explicit operator bool() const { return leaf != nullptr; }
   int64 time() const { return leaf->time(slot); }
   double value(int component) const { return leaf->value(slot, component); }
+  unsigned bridges() const { return leaf->bridges(slot); }
+  unsigned selected() const { return leaf->selected(slot); }
+};
+
+// The parts of a key that a mask means, each as a mask: the components of vectors, else the whole.
+class KeyParts {
+ public:
+  KeyParts(KeyTrack::Shape shape, unsigned mask) {
+    if (shape != KeyTrack::Shape::Vector) {
+      if (mask) m_parts[m_size++] = KeyTrack::kAll;
+      return;
+    }
+    for (const unsigned component : {1u, 2u, 4u})
+      if (mask & component) m_parts[m_size++] = component;
+  }
+  const unsigned* begin() const { return m_parts.data(); }
+  const unsigned* end() const { return m_parts.data() + m_size; }
+
+ private:
+  std::array<unsigned, 3> m_parts{};
+  size_t m_size = 0;
 };

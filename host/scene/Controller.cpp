@@ -8,6 +8,7 @@
 #include "host/scene/Clips.h"
 #include "host/scene/Database.h"
 #include "host/scene/Editability.h"
+#include "host/scene/HTimeManager.h"
 #include "host/scene/MarkerRuns.h"
 
 H_DEFINE_ABSTRACT_CLASS(DataSource);
@@ -103,8 +104,12 @@ int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
       editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
 }
 
+KeyTrack::BridgeEnds Controller::bridgeEnds() const {
+  return {m_interpolation, HTimeManager::getInstance()->getTicksPerFrame()};
+}
+
 int Controller::deleteKey(int64 time, unsigned mask) {
-  return deleteKeys(HTimeRange(time, time), mask, false);
+  return hasKeyAt(time) ? deleteKeys(HTimeRange(time, time), mask, false) : 0;
 }
 
 int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers) {
@@ -115,7 +120,7 @@ int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayer
   for (ClipTrack const& track : m_tracks)
     if (track.clip == clip && (track.layer == g_db->getActiveLayer() ||
                                (allLayers && obstacleToKeys(*this, clip, track.layer) == Obstacle::none)))
-      deleted += editTrack(clip, track.layer, first, last)->eraseRange(first, last, mask);
+      deleted += trackToDelete(clip, track.layer, first, last)->deleteRange(first, last, mask, bridgeEnds());
   if (deleted) changed();
   return static_cast<int>(deleted);
 }
@@ -126,7 +131,10 @@ int Controller::deleteSelectedKeys(unsigned mask) {
   const int64 first = track->timeAt(track->selectedIndex(0));
   const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
   const CutRuns cut(*this, first, last);
-  const int64 deleted = editTrack(first, last)->eraseSelected(mask);
+  NLEClip* clip = g_db->getActiveClip();
+  const int layer = g_db->getActiveLayer();
+  KeyTrack* edited = track->bridgesAny() ? &replaceTrack(clip, layer) : editTrack(first, last);
+  const int64 deleted = edited->deleteSelected(mask, bridgeEnds());
   if (deleted) changed();
   return static_cast<int>(deleted);
 }

@@ -165,6 +165,9 @@ class Controller : public DataSource {
   // `first` to `last`; only at a single time it may add one. Null on the base clip.
   KeyTrack* editTrack(int64 first, int64 last);
   KeyTrack* editTrack(NLEClip* clip, int layer, int64 first, int64 last);
+  // The same for a deletion, which also changes the ends of bridges.
+  KeyTrack* trackToDelete(NLEClip* clip, int layer, int64 first, int64 last);
+  KeyTrack::BridgeEnds bridgeEnds() const;
   // The same for all keys, with keys at other times.
   KeyTrack& replaceTrack(NLEClip* clip, int layer);
   ClipTrack& clipTrack(NLEClip* clip, int layer);

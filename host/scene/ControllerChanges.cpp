@@ -30,15 +30,10 @@ struct Controller::KeyChange : UndoChange {
     bool operator==(Slot const& o) const {
       return present == o.present &&
              (!present || (key.values == o.key.values && key.components == o.key.components &&
-                           key.selected == o.key.selected));
+                           key.selected == o.key.selected && key.bridges == o.key.bridges));
     }
     // Makes the track so at this time.
-    void putInto(KeyTrack& track) const {
-      track.eraseRange(key.time, key.time);
-      if (!present) return;
-      track.set(key.time, key.values, key.components);
-      if (key.selected) track.setSelected(track.find(key.time), key.selected);
-    }
+    void putInto(KeyTrack& track) const { present ? track.restore(key) : track.restoreNone(key.time); }
   };
 
   KeyChange(Controller& concerned, ClipTrack const& track)
@@ -113,6 +108,20 @@ KeyTrack* Controller::editTrack(NLEClip* clip, int layer, int64 first, int64 las
   if (KeyChange* change = UndoJournal::isRecording() ? changeOf(track) : nullptr)
     change->note(track.track, first, last);
   return &track.track;
+}
+
+KeyTrack* Controller::trackToDelete(NLEClip* clip, int layer, int64 first, int64 last) {
+  KeyTrack* track = editTrack(clip, layer, first, last);
+  if (!track->bridgesAny()) return track;
+  // Bridges into the range end at a key before it or at the frame before it, and begin likewise after it.
+  const int64 period = bridgeEnds().framePeriod;
+  for (const int64 frame : {frameAtOrAfter(first, period) - 1, frameAtOrBefore(last, period) + 1})
+    editTrack(clip, layer, frame * period, frame * period);
+  for (const unsigned component : {1u, 2u, 4u}) {
+    const int64 before = track->previousHolding(track->lowerBound(first), component);
+    if (before >= 0) editTrack(clip, layer, track->timeAt(before), track->timeAt(before));
+  }
+  return track;
 }
 
 KeyTrack& Controller::replaceTrack(NLEClip* clip, int layer) {

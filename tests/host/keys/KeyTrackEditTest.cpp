@@ -6,6 +6,7 @@
 #include <utility>
 #include <vector>
 
+#include "host/keys/DataRanges.h"
 #include "tests/host/keys/KeyTrackModel.h"
 
 namespace {
@@ -13,6 +14,9 @@ namespace {
 using Key = KeyTrack::Key;
 using Shape = KeyTrack::Shape;
 using Values = KeyTrack::Values;
+
+constexpr int64 kFrame = 3;
+constexpr KeyTrack::BridgeEnds kBridgeEnds{Interpolation::Linear, kFrame};
 
 // Says what differs first, "" when nothing does.
 std::string difference(KeyTrack const& track, KeyTrackModel const& model) {
@@ -26,7 +30,7 @@ std::string difference(KeyTrack const& track, KeyTrackModel const& model) {
   track.forEach(0, track.count(), [&](Key const& key) {
     Key const& expected = model.at(i++);
     if (key.time != expected.time || key.values != expected.values || key.components != expected.components ||
-        key.selected != expected.selected)
+        key.selected != expected.selected || key.bridges != expected.bridges)
       text << "key " << i - 1 << " at " << key.time << " differs; ";
   });
   return text.str();
@@ -95,7 +99,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
   void changeRange() {
     const int64 first = time(), last = first + (oneIn(12) ? GetParam().span : upTo(GetParam().span / 24));
     const unsigned m = mask();
-    switch (upTo(8)) {
+    switch (upTo(11)) {
       case 0:
         ASSERT_EQ(track.eraseRange(first, last, m), model.eraseRange(first, last, m));
         break;
@@ -104,8 +108,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
         model.deselect(last, INT64_MAX, 7);
         track.deselect(0, first, 7);
         model.deselect(0, first, 7);
-        ASSERT_EQ(track.eraseSelected(m), model.eraseSelected(m));
-        break;
+        return deleteSelected(m);
       case 2:
       case 3:
       case 4:
@@ -116,11 +119,86 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
       case 7:
         ASSERT_EQ(track.deselect(first, last, m), model.deselect(first, last, m));
         break;
+      case 8:
+        return deleteRange(first, first + upTo(7), m);
+      case 9:
+      case 10: {
+        const bool on = !oneIn(4);
+        on ? track.bridge(first, last, m) : track.unbridge(first, last, m);
+        model.bridge(first, last, m, on);
+        break;
+      }
       default:
         track.transform([](double* v) { v[0] = -v[0]; });
         for (Key& key : model.keys)
           if (key.components == 7) key.values[0] = -key.values[0];
     }
+  }
+
+  // Edits of data: the frames of `gone` lose it and no others, and keys that come lie on the curve as it was.
+  template <class Gone>
+  void compareData(Gone gone) {
+    ASSERT_STREQ(track.checkInvariants(), "");
+    const KeyTrackModel before = model;
+    const KeyTrack curve = std::exchange(m_before, KeyTrack(GetParam().shape));
+    model.keys.clear();
+    track.forEach(0, track.count(), [&](Key const& key) { model.keys.push_back(key); });
+    const int64 end = before.keys.empty() ? -1 : before.keys.back().time;
+    const std::vector<unsigned> had = before.dataAt(0, end, kFrame), has = model.dataAt(0, end, kFrame);
+    for (size_t i = 0; i < had.size(); ++i)
+      if (had[i] != has[i] || oneIn(8)) {
+        const int64 t = static_cast<int64>(i) * kFrame;
+        ASSERT_EQ(has[i], had[i] & ~gone(before, t)) << "at " << t;
+      }
+    for (Key const& key : model.keys) {
+      const int64 old = before.find(key.time);
+      const unsigned added = key.components & ~(old < 0 ? 0u : before.at(old).components);
+      ASSERT_TRUE(added == 0 || key.time % kFrame == 0);
+      Values expected{};
+      curve.evaluate(key.time, kBridgeEnds.interpolation, {}, expected);
+      for (size_t c = 0; c < static_cast<size_t>(GetParam().shape); ++c)
+        if (GetParam().shape != Shape::Vector || key.components >> c & 1) {
+          ASSERT_NEAR(key.values[c], expected[c], 1e-9);
+        }
+    }
+  }
+
+  void deleteRange(int64 first, int64 last, unsigned mask) {
+    KeyTrackModel erased = model;
+    m_before = track;
+    ASSERT_EQ(track.deleteRange(first, last, mask, kBridgeEnds), erased.eraseRange(first, last, mask));
+    compareData([&](KeyTrackModel const& before, int64 t) {
+      return t >= first && t <= last ? before.normal(mask) : 0;
+    });
+  }
+
+  void deleteSelected(unsigned mask) {
+    KeyTrackModel erased = model;
+    m_before = track;
+    ASSERT_EQ(track.deleteSelected(mask, kBridgeEnds), erased.eraseSelected(mask));
+    compareData([&](KeyTrackModel const& before, int64 t) {
+      unsigned lost = 0;
+      for (unsigned c = 1; c < 8; c *= 2) {
+        const int64 next = before.nextHolder(before.lowerBound(t) - 1, c);
+        const int64 last = before.walk(before.lowerBound(t + 1), -1, &Key::components, c);
+        const auto chosen = [&](int64 i) {
+          return i >= 0 && (before.at(i).selected & c & before.normal(mask)) != 0;
+        };
+        if (chosen(next) && chosen(last)) lost |= c;
+      }
+      return lost;
+    });
+  }
+
+  void restoreOne() {
+    if (model.keys.empty()) return;
+    Key& key = model.at(upTo(model.size() - 1));
+    track.restoreNone(key.time);
+    const Values fresh = values();
+    for (size_t c = 0; c < static_cast<size_t>(GetParam().shape); ++c)
+      if (GetParam().shape != Shape::Vector || key.components >> c & 1) key.values[c] = fresh[c];
+    key.selected = key.components;
+    track.restore(key);
   }
 
   void setSelected() {
@@ -143,11 +221,55 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
       appendRun();
     } else if (what < 70) {
       for (int64 i = large ? 20 : 0; i >= 0; --i) eraseOne();
+    } else if (what < 72) {
+      restoreOne();
     } else if (what < 85) {
       setSelected();
     } else {
       changeRange();
     }
+  }
+
+  void compareRanges() {
+    const unsigned mask = 1 + static_cast<unsigned>(upTo(6));
+    const bool all = oneIn(2);
+    const DataRanges ranges(track, kFrame, mask, all ? DataRanges::Where::All : DataRanges::Where::Any);
+    const int64 first = time() - 7, last = first + upTo(GetParam().span / 2);
+    const unsigned wanted = model.normal(mask);
+    // With room for the runs that reach beyond the range.
+    const int64 from = -10 * kFrame, to = GetParam().span * 3 + 100;
+    const std::vector<unsigned> data = model.dataAt(from, to, kFrame);
+    const auto hasData = [&](int64 frameTime) {
+      if (frameTime < from || frameTime > to) return false;
+      const unsigned here = data[static_cast<size_t>((frameTime - from) / kFrame)] & wanted;
+      return all ? here == wanted : here != 0;
+    };
+    std::vector<int64> seen, missing, expectedSeen, expectedMissing;
+    const auto collectInto = [](std::vector<int64>& into) {
+      return [&into](int64 start, int64 end) {
+        ASSERT_TRUE(into.empty() || start > into.back() + kFrame) << "runs that touch";
+        for (; start <= end; start += kFrame) into.push_back(start);
+      };
+    };
+    ranges.visitRanges(first, last, collectInto(seen));
+    ranges.visitGaps(first, last, collectInto(missing));
+    for (int64 t = frameAtOrAfter(first, kFrame) * kFrame; t <= last; t += kFrame)
+      (hasData(t) ? expectedSeen : expectedMissing).push_back(t);
+    ASSERT_EQ(seen, expectedSeen) << "components " << wanted;
+    ASSERT_EQ(missing, expectedMissing);
+    const unsigned any = model.dataAt(first, first, 1).front() & wanted;
+    ASSERT_EQ(ranges.hasDataAt(first), all ? any == wanted : any != 0);
+    const HTimeRange gap = ranges.nextGap(first, last), range = ranges.nextRange(first, last);
+    ASSERT_EQ(gap.isEmpty(), missing.empty());
+    ASSERT_EQ(range.isEmpty(), seen.empty());
+    ASSERT_TRUE(gap.isEmpty() || (gap.getStart() == missing.front() && !hasData(gap.getEnd())));
+    if (range.isEmpty()) return;
+    ASSERT_EQ(range.getStart(), seen.front());
+    ASSERT_TRUE(range.getEnd() == seen.back() || !hasData(range.getEnd() + kFrame));
+    HTimeRange around(seen.back(), seen.back());
+    while (hasData(around.getStart() - kFrame)) around.setEnds(around.getStart() - kFrame, around.getEnd());
+    while (hasData(around.getEnd() + kFrame)) around.setEnds(around.getStart(), around.getEnd() + kFrame);
+    ASSERT_EQ(ranges.rangeAround(seen.back()), around);
   }
 
   void compareQueries() {
@@ -187,6 +309,9 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
   KeyTrack track;
   KeyTrackModel model;
   std::mt19937 random;
+
+ private:
+  KeyTrack m_before{Shape::Scalar};
 };
 
 TEST_P(KeyTrackEdits, MatchThePlainModel) {
@@ -198,6 +323,7 @@ TEST_P(KeyTrackEdits, MatchThePlainModel) {
       ASSERT_EQ(difference(track, model), "") << "at step " << i;
     }
     if (i % 8 == 0) compareQueries();
+    if (i % 16 == 0) compareRanges();
     if (HasFatalFailure()) FAIL() << "at step " << i;
     if (oneIn(GetParam().steps / 12)) snapshots.emplace_back(track, model);
     if (oneIn(GetParam().steps / 3)) {  // go on from a snapshot, as undo does

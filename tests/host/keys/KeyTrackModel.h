@@ -54,19 +54,62 @@ class KeyTrackModel {
       keys.insert(keys.begin() + i, Key{time, {}, 0, 0});
     }
     Key& key = at(i);
+    key.bridges |= static_cast<unsigned char>(bridgedAt(time) & mask & ~key.components);
     key.components |= static_cast<unsigned char>(mask);
     for (size_t c = 0; c < static_cast<size_t>(m_shape); ++c)
       if (m_shape != Shape::Vector || mask >> c & 1) key.values[c] = values[c];
   }
 
-  // Calls change(key) for the keys in the time range, then drops those that hold nothing any more.
+  // Components with data at a time because a bridge passes over it or reaches it.
+  unsigned bridgedAt(int64 time) const {
+    unsigned bridged = 0;
+    for (Key const& key : keys)
+      if (key.time < time) bridged = (bridged & ~key.components) | key.bridges;
+    return bridged;
+  }
+  // The components that have data at first, first + period, ..., last.
+  std::vector<unsigned> dataAt(int64 first, int64 last, int64 period) const {
+    std::vector<unsigned> data;
+    unsigned bridged = 0;
+    auto key = keys.begin();
+    for (int64 time = first; time <= last; time += period) {
+      for (; key != keys.end() && key->time < time; ++key)
+        bridged = (bridged & ~key->components) | key->bridges;
+      data.push_back(bridged | (key != keys.end() && key->time == time ? key->components : 0u));
+    }
+    return data;
+  }
+  int64 nextHolder(int64 index, unsigned component) const {
+    return walk(index, 1, &Key::components, component);
+  }
+
+  // Calls change(key) for the keys in the time range, then drops those that hold nothing any more, and
+  // bridges to what was lost.
   template <class Change>
   int64 edit(int64 first, int64 last, Change change) {
     int64 changed = 0;
+    const std::vector<Key> before = keys;
     for (Key& key : keys)
       if (key.time >= first && key.time <= last) changed += change(key);
+    for (unsigned c = 1; c < 8; c *= 2) {
+      Key* holder = nullptr;
+      for (size_t i = 0; i < keys.size(); ++i) {
+        if (!(before[i].components & c)) continue;
+        if (holder && !(keys[i].components & c)) holder->bridges &= static_cast<unsigned char>(~c);
+        holder = &keys[i];
+      }
+      if (holder) holder->bridges &= static_cast<unsigned char>(~c);
+    }
     std::erase_if(keys, [](Key const& k) { return k.components == 0; });
     return changed;
+  }
+
+  void bridge(int64 first, int64 last, unsigned mask, bool on) {
+    edit(first, last, [mask = normal(mask), on](Key& k) {
+      const auto bits = static_cast<unsigned char>(mask & k.components);
+      k.bridges = static_cast<unsigned char>(on ? k.bridges | bits : k.bridges & ~bits);
+      return true;
+    });
   }
 
   int64 eraseRange(int64 first, int64 last, unsigned mask) {
@@ -95,6 +138,7 @@ class KeyTrackModel {
       if (lost >> c & 1) key.values[c] = 0;
     key.components &= static_cast<unsigned char>(~lost);
     key.selected &= static_cast<unsigned char>(~lost);
+    key.bridges &= static_cast<unsigned char>(~lost);
     return lost != 0;
   }
 
