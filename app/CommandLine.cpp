@@ -109,7 +109,10 @@ int main(int argc, char** argv) {
   bool json = false;
   CLI::App* commandsApp = app.add_subcommand("commands", "List the script commands, or tell all about one");
   commandsApp->add_option("NAME", name, "Command to tell about");
-  commandsApp->add_flag("--json", json, "Print them as a JSON array");
+  CLI::Option* asJson = commandsApp->add_flag("--json", json, "Print them as a JSON array");
+  bool markdown = false;
+  commandsApp->add_flag("--markdown", markdown, "Print all about all of them, as docs/commands.md has it")
+      ->excludes(asJson);
   addPluginOptions(*commandsApp, plugin);
 
   std::vector<std::string> infoFiles;
@@ -126,6 +129,7 @@ int main(int argc, char** argv) {
     return status == 0 ? 0 : kBadCommandLine;
   }
   if (infoApp->parsed()) return talix::runInfo(infoFiles, infoJson);
+  if (markdown) return talix::showRegistryPage(plugin);
   if (commandsApp->parsed()) return talix::showCommands(plugin, name, json);
   run.putInOrder(*runApp);
   return talix::runScripts(run.request);

@@ -8,6 +8,7 @@
 #include <cstring>
 #include <filesystem>
 #include <iostream>
+#include <set>
 #include <unistd.h>
 
 #include "app/Progress.h"
@@ -18,6 +19,7 @@
 #include "session/CommandHelp.h"
 #include "session/JsonForms.h"
 #include "session/JsonText.h"
+#include "session/RegistryPage.h"
 #include "session/ScriptRunner.h"
 #include "session/ScriptText.h"
 
@@ -142,6 +144,23 @@ int runScripts(RunRequest const& request) {
         status = static_cast<int>(Status::FileFailed);
   }
   return finished(status, runner.finish());
+}
+
+int showRegistryPage(PluginChoice plugin) {
+  // The commands that are there with developer mode only are known by what is missing without it.
+  std::set<std::string> forUsers;
+  int status = 0;
+  plugin.developer = false;
+  if (const std::unique_ptr<Session> session = makeSession(plugin, status))
+    for (auto const& entry : session->commands().entries())
+      forUsers.insert(entry.command->getName().GetString());
+  plugin.developer = true;
+  const std::unique_ptr<Session> session = status == 0 ? makeSession(plugin, status) : nullptr;
+  if (!session) return status;
+  const std::string page =
+      registryPage(session->commands(), [&](std::string const& name) { return !forUsers.contains(name); });
+  const bool written = std::puts(page.c_str()) >= 0 && std::fflush(stdout) == 0;
+  return finished(status, written);
 }
 
 int showCommands(PluginChoice const& plugin, std::string const& name, bool json) {

@@ -27,5 +27,7 @@ int runScripts(RunRequest const& request);
 
 // All commands, or the one of that name.
 int showCommands(PluginChoice const& plugin, std::string const& name, bool json);
+// All commands, those for developers too, as the page that is checked in (session/RegistryPage.h).
+int showRegistryPage(PluginChoice plugin);
 
 }  // namespace talix

@@ -23,13 +23,6 @@ std::string padded(std::string text, size_t width) {
   return text;
 }
 
-// "-color integer integer integer"
-std::string optionSyntax(CommandOption const& option) {
-  std::string text = "-" + option.getName().GetString();
-  for (int i = 0; i < option.getArgCount(); ++i) text += " " + typeName(option.getType());
-  return text;
-}
-
 std::vector<CommandOption const*> shownOptions(Command const& command) {
   std::vector<CommandOption const*> shown;
   for (int i = 0; i < command.getNumOptions(); ++i)
@@ -54,6 +47,12 @@ std::string optionLines(std::vector<CommandOption const*> const& options) {
 }
 
 }  // namespace
+
+std::string optionSyntax(CommandOption const& option) {
+  std::string text = "-" + option.getName().GetString();
+  for (int i = 0; i < option.getArgCount(); ++i) text += " " + typeName(option.getType());
+  return text;
+}
 
 bool excludeEachOther(CommandOption const& a, CommandOption const& b) {
   const auto excludes = [](CommandOption const& option, CommandOption const& other) {

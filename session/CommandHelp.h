@@ -7,6 +7,8 @@
 
 namespace talix {
 
+// "-color integer integer integer"
+std::string optionSyntax(CommandOption const& option);
 // Whether each of two options says in its mask that it excludes the other: one side alone is not enough.
 bool excludeEachOther(CommandOption const& a, CommandOption const& b);
 

@@ -1,37 +1,12 @@
 #include "tests/io/TakeTesting.h"
 
-#include <fstream>
 #include <gtest/gtest.h>
-#include <sstream>
-#include <unistd.h>
 
 #include "io/FileError.h"
 
 namespace talix {
 
 std::string dataFile(const std::string& name) { return std::string(TALIX_TEST_DATA "/") + name; }
-
-std::string readText(const std::string& path) {
-  std::ifstream in(path, std::ios::binary);
-  std::ostringstream text;
-  text << in.rdbuf();
-  return text.str();
-}
-
-TempFolder::TempFolder() {
-  std::string name = (std::filesystem::temp_directory_path() / "takes.XXXXXX").string();
-  if (!::mkdtemp(name.data())) throw std::runtime_error("no temporary folder");
-  m_path = name;
-}
-
-TempFolder::~TempFolder() { std::filesystem::remove_all(m_path); }
-
-std::string TempFolder::file(const std::string& name, const std::string& content) const {
-  // Removed first: some file systems flush a file that is cut and written again, which takes milliseconds.
-  std::filesystem::remove(path(name));
-  std::ofstream(path(name), std::ios::binary) << content;
-  return path(name);
-}
 
 std::string errorOf(const std::function<void()>& work) {
   try {

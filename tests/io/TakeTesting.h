@@ -1,30 +1,19 @@
 // What the tests of take files share.
 #pragma once
 
-#include <filesystem>
 #include <functional>
 #include <random>
 #include <string>
 
 #include "io/Take.h"
+#include "tests/TempFolder.h"
 
 namespace talix {
 
+using talix_tests::readText;
+using talix_tests::TempFolder;
+
 std::string dataFile(const std::string& name);
-std::string readText(const std::string& path);
-
-// A folder of its own that goes at the end of the test.
-class TempFolder {
- public:
-  TempFolder();
-  ~TempFolder();
-  std::string path(const std::string& name) const { return (m_path / name).string(); }
-  // Writes a file and answers its path.
-  std::string file(const std::string& name, const std::string& content) const;
-
- private:
-  std::filesystem::path m_path;
-};
 
 // The text of the FileError that `work` throws; empty when it throws none.
 std::string errorOf(const std::function<void()>& work);

@@ -5,6 +5,7 @@
 
 #include "session/PluginLoader.h"
 #include "session/Session.h"
+#include "tests/TempFolder.h"
 
 namespace talix {
 namespace {
@@ -21,8 +22,8 @@ std::string problemOf(std::string const& path) {
 }
 
 TEST(PluginLibraryTest, SaysWhyALibraryCannotBeUsed) {
-  const std::string text = testing::TempDir() + "plugin_test.so";
-  std::ofstream(text) << "no library at all\n";
+  const talix_tests::TempFolder folder;
+  const std::string text = folder.file("plugin_test.so", "no library at all\n");
   const auto because = [](std::string const& path, std::string const& reason) {
     return path + ": " + reason;
   };
@@ -42,7 +43,6 @@ TEST(PluginLibraryTest, SaysWhyALibraryCannotBeUsed) {
                     "the plug-in could not be made: E1224: Out of memory in TSimpleArray::addSpace"));
   EXPECT_EQ(problemOf(sample("SampleClashes")),
             "Two commands are named echo: one of Sample Commands, one of Sample Commands");
-  std::filesystem::remove(text);
 }
 
 TEST(PluginLibraryTest, CommandsOfThePluginComeFirstAndNullOnesAreLeftOut) {
@@ -65,8 +65,8 @@ TEST(PluginLibraryTest, LoadsAgainAfterUnloading) {
 
 TEST(PluginLibraryTest, FindsThePluginBesideTheProgramOrInstalled) {
   namespace fs = std::filesystem;
-  const fs::path root = fs::path(testing::TempDir()) / "find_plugin";
-  fs::remove_all(root);
+  const talix_tests::TempFolder folder;
+  const fs::path root = folder.path("");
   fs::create_directories(root / "bin");
   EXPECT_THROW(findPlugin((root / "bin").string()), PluginError);
   fs::create_directories(root / "lib/talix");
@@ -74,7 +74,6 @@ TEST(PluginLibraryTest, FindsThePluginBesideTheProgramOrInstalled) {
   EXPECT_EQ(findPlugin((root / "bin").string()), (root / "lib/talix/TalixDataCommands.so").string());
   std::ofstream(root / "bin/TalixDataCommands.so") << "";
   EXPECT_EQ(findPlugin((root / "bin").string()), (root / "bin/TalixDataCommands.so").string());
-  fs::remove_all(root);
 }
 
 }  // namespace

@@ -1,9 +1,9 @@
 // The built program, as its users run it: output, exit statuses, what a failed line stops.
 
 #include <boost/json.hpp>
+#include <csignal>
 #include <cstdio>
 #include <filesystem>
-#include <fstream>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <pty.h>
@@ -12,6 +12,8 @@
 #include <termios.h>
 #include <unistd.h>
 
+#include "tests/TempFolder.h"
+
 namespace {
 
 namespace fs = std::filesystem;
@@ -19,19 +21,17 @@ using testing::HasSubstr;
 
 class ProgramTest : public testing::Test {
  protected:
+  // Ctrl-C ends programs, and nobody's settings are used, however the tests were started.
   ProgramTest() {
-    const auto* test = testing::UnitTest::GetInstance()->current_test_info();
-    m_folder = fs::path(testing::TempDir()) / (std::string("talix_") + test->name());
-    fs::remove_all(m_folder);
-    fs::create_directories(m_folder);
+    std::signal(SIGINT, SIG_DFL);
+    setenv("TALIX_PROFILE", "", 1);
   }
-  ~ProgramTest() override { fs::remove_all(m_folder); }
 
   // Runs a shell line in the test's folder; "talix" is the program, "$sample" the option for the sample
   // plug-in.
   int run(std::string const& line) {
     const std::string bin = TALIX_BIN;
-    const std::string command = "cd '" + m_folder.string() + "' && talix() { '" + bin +
+    const std::string command = "cd '" + m_folder.path("") + "' && talix() { '" + bin +
                                 "/talix' \"$@\"; } && sample='--plugin " + bin + "/sample/Sample.so' && { " +
                                 line + "\n} >out 2>err";
     const int status = std::system(command.c_str());
@@ -73,21 +73,14 @@ class ProgramTest : public testing::Test {
     waitpid(child, &status, 0);
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
   }
-  std::string text(std::string const& file) const {
-    std::ostringstream all;
-    all << std::ifstream(m_folder / file).rdbuf();
-    return all.str();
-  }
-  void write(std::string const& file, std::string const& content) const {
-    std::ofstream(m_folder / file) << content;
-  }
+  std::string text(std::string const& file) const { return talix_tests::readText(m_folder.path(file)); }
 
-  fs::path m_folder;
+  const talix_tests::TempFolder m_folder;
   std::string m_out, m_err;
 };
 
 TEST_F(ProgramTest, RunsLinesAndScriptsInTheOrderGiven) {
-  write("two.talix", "\xef\xbb\xbf# two\r\necho 2\r\n\r\necho 3");
+  m_folder.file("two.talix", "\xef\xbb\xbf# two\r\necho 2\r\n\r\necho 3");
   EXPECT_EQ(run("echo 'echo 5' | talix run $sample -c 'echo 1' two.talix -c 'echo 4' - -c 'echo 6'"), 0);
   EXPECT_EQ(m_out, "1\n2\n3\n4\n5\n6\n");
   EXPECT_EQ(m_err, "");
@@ -96,7 +89,7 @@ TEST_F(ProgramTest, RunsLinesAndScriptsInTheOrderGiven) {
 }
 
 TEST_F(ProgramTest, AFailedLineStopsTheRunUnlessToldOtherwise) {
-  write("fails.talix", "echo 1\nfail\necho 2\n");
+  m_folder.file("fails.talix", "echo 1\nfail\necho 2\n");
   EXPECT_EQ(run("talix run $sample fails.talix -c 'echo 3'"), 1);
   EXPECT_EQ(m_out, "1\n");
   EXPECT_EQ(m_err, "info: about to fail\nwarning: 100% sure\nerror: failed\n");
@@ -108,12 +101,12 @@ TEST_F(ProgramTest, AFailedLineStopsTheRunUnlessToldOtherwise) {
 TEST_F(ProgramTest, NothingIsSavedAfterAFailedLine) {
   const std::string scene = "--open '" TALIX_TEST_DATA "/pose_t_01.bvh' --save out.bvh ";
   EXPECT_EQ(run("talix run $sample " + scene + "-c nothing"), 1);
-  EXPECT_FALSE(fs::exists(m_folder / "out.bvh"));
+  EXPECT_FALSE(fs::exists(m_folder.path("out.bvh")));
   EXPECT_EQ(run("talix run $sample " + scene + "--keep-going -c nothing"), 1);
-  EXPECT_TRUE(fs::exists(m_folder / "out.bvh"));
-  fs::remove(m_folder / "out.bvh");
+  EXPECT_TRUE(fs::exists(m_folder.path("out.bvh")));
+  fs::remove(m_folder.path("out.bvh"));
   EXPECT_EQ(run("talix run $sample --json " + scene + "-c getTime"), 0) << m_err;
-  EXPECT_TRUE(fs::exists(m_folder / "out.bvh"));
+  EXPECT_TRUE(fs::exists(m_folder.path("out.bvh")));
   EXPECT_EQ(std::count(m_out.begin(), m_out.end(), '\n'), 1) << m_out;
 }
 
@@ -150,7 +143,7 @@ TEST_F(ProgramTest, WrongCommandLinesAreStatusTwo) {
 }
 
 TEST_F(ProgramTest, JsonHasOneObjectForEachLineThatIsRun) {
-  write("some.talix", "# first\necho <1 2.5 3>\n\nfail\nnothing <\n");
+  m_folder.file("some.talix", "# first\necho <1 2.5 3>\n\nfail\nnothing <\n");
   EXPECT_EQ(run("talix run $sample --json --keep-going some.talix -c 'echo \"a\xff\"' -c 'types 1 a' -c "
                 "'selection'"),
             1);
@@ -197,7 +190,7 @@ TEST_F(ProgramTest, CommandsAreDescribed) {
 }
 
 TEST_F(ProgramTest, LostOutputIsAFailureWithoutACrash) {
-  write("many.talix", [] {
+  m_folder.file("many.talix", [] {
     std::string lines;
     for (int i = 0; i < 100000; ++i) lines += "echo " + std::to_string(i) + "\n";
     return lines;

@@ -1,39 +1,28 @@
 // Settings and their file.
-#include <filesystem>
-#include <fstream>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include "host/base/Log.h"
 #include "host/services/HInterface.h"
+#include "tests/TempFolder.h"
 
 namespace {
 
 class ProfileTest : public testing::Test, private LogSink {
  protected:
-  ProfileTest() : m_folder(std::filesystem::path(testing::TempDir()) / "talix-profile") {
-    std::filesystem::remove_all(m_folder);
-    std::filesystem::create_directory(m_folder);
-    m_former = setLogSink(this);
-  }
-  ~ProfileTest() override {
-    setLogSink(m_former);
-    std::filesystem::remove_all(m_folder);
-  }
+  ProfileTest() : m_former(setLogSink(this)) {}
+  ~ProfileTest() override { setLogSink(m_former); }
 
-  std::string file(std::string const& name) const { return (m_folder / name).string(); }
-  std::string contentOf(std::string const& name) const {
-    std::ifstream in(file(name));
-    return {std::istreambuf_iterator<char>(in), {}};
-  }
-  void put(std::string const& name, std::string const& content) { std::ofstream(file(name)) << content; }
+  std::string file(std::string const& name) const { return m_folder.path(name); }
+  std::string contentOf(std::string const& name) const { return talix_tests::readText(file(name)); }
+  void put(std::string const& name, std::string const& content) { m_folder.file(name, content); }
 
   std::string m_log;
 
  private:
   void write(LogLevel, std::string_view text) override { m_log += std::string(text) + "\n"; }
 
-  std::filesystem::path m_folder;
+  const talix_tests::TempFolder m_folder;
   LogSink* m_former;
 };
 

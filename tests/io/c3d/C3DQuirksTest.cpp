@@ -213,6 +213,49 @@ TEST_F(C3DQuirks, FindsTheDataWhereOnePlaceIsWrong) {
   EXPECT_TRUE(hasNote(take.notes, kWarning, "data start differ"));
 }
 
+TEST_F(C3DQuirks, TakesTheFirstFrameOfACountThatAgreesElseTheHeaders) {
+  file.frames = 200;
+  file.headerLast = 100;
+  file.set("POINT", integers("FRAMES", {200}));
+  file.set("TRIAL", integers("ACTUAL_START_FIELD", {31, 0}));
+  file.set("TRIAL", integers("ACTUAL_END_FIELD", {94, 0}));
+  EXPECT_EQ(read().firstFrame, 1);
+  file.set("TRIAL", integers("ACTUAL_END_FIELD", {230, 0}));
+  EXPECT_EQ(read().firstFrame, 31);
+}
+
+TEST_F(C3DQuirks, LooksForNoDataInsideTheParameters) {
+  file.frames = file.headerLast = 32;  // a whole block
+  file.set("POINT", integers("DATA_START", {2}));
+  const size_t fromParametersOn = file.bytes().size() - kC3DBlock;
+  file.set("POINT", integers("FRAMES", {static_cast<double>(fromParametersOn / 16)}));
+  const Take take = read();
+  EXPECT_EQ(take.frameCount, 32);
+  EXPECT_EQ(take.points[1].positions.at(0).values[0], 2);
+}
+
+TEST_F(C3DQuirks, AnyScaleBelowZeroMeansFloats) {
+  file.scale = -0.0005;
+  file.set("POINT", reals("SCALE", {file.scale}));
+  for (int frame = 0; frame < 4; ++frame)
+    for (const double value : {1.5, -2.5, 1000.0, 3.0, 4.25, 5.0, 6.0, -1.0}) appendC3DReal(file.data, value);
+  const Take take = read();
+  EXPECT_EQ(take.variant, "Intel, float");
+  ASSERT_EQ(take.points[0].positions.count(), 4);
+  EXPECT_EQ(take.points[0].positions.at(3).values, (KeyTrack::Values{1.5, -2.5, 1000, 0}));
+  EXPECT_NEAR(take.points[0].residuals.at(0).values[0], 3 * 0.0005, 1e-9);
+  EXPECT_TRUE(take.points[1].positions.empty());
+}
+
+// Zeros that fill up the last block are no frames; those before it are points at the origin.
+TEST_F(C3DQuirks, CountsZerosBeforeTheLastBlockOfLongTakes) {
+  file.headerLast = 65'535;
+  file.set("POINT", integers("FRAMES", {-1}));
+  file.frames = 65'600;  // 2050 blocks
+  for (int i = 0; i < file.frames * 8; ++i) appendC3DWord(file.data, i < (file.frames - 100) * 8 ? 7 : 0);
+  EXPECT_EQ(read().frameCount, file.frames - 32);
+}
+
 TEST_F(C3DQuirks, MergesEventsOfHeaderAndGroup) {
   file.set("EVENT", integers("USED", {3}));
   file.set("EVENT", texts("LABELS", 11, {"Foot Strike", "Foot Off", "Late"}));
