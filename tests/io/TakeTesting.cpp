@@ -31,7 +31,11 @@ void expectSurvivesDamage(const std::string& content, const std::string& suffix,
     const std::string path = folder.file("damaged" + suffix, damaged);
     try {
       const Take take = read(path);
-      for (const TakePoint& point : take.points) ASSERT_STREQ(point.positions.checkInvariants(), "");
+      for (const TakePoint& point : take.points) {
+        ASSERT_STREQ(point.positions.checkInvariants(), "");
+        ASSERT_TRUE(point.residuals.empty() || point.residuals.count() == point.positions.count());
+        ASSERT_TRUE(point.cameras.empty() || point.cameras.size() == static_cast<size_t>(take.frameCount));
+      }
       for (const TakeJoint& joint : take.joints) ASSERT_STREQ(joint.rotations.checkInvariants(), "");
     } catch (const FileError& error) {
       ASSERT_EQ(std::string(error.what()).rfind(path, 0), 0u) << error.what();

@@ -1,4 +1,4 @@
-// Key commands on scenes that scripts cannot make: random selections, rotation orders, the ends of time.
+// Key commands on scenes that scripts cannot make: random selections, the ends of time.
 #include <random>
 #include <set>
 
@@ -119,85 +119,6 @@ TEST_F(Stepping, StartsBehindTheCurrentTime) {
       }
     }
   }
-}
-
-// A run that begins at the first key of all waits for the second pass.
-TEST_F(Stepping, LeavesTheOpeningRunToTheSecondPass) {
-  activate({"Translation"});
-  Node* node = nodes[0];
-  node->setSelected(true);
-  auto* channel = node->getTranslationChannel();
-  for (int i : {10, 20, 30, 40}) channel->setKey(at(i), {}, 7);
-  for (int i : {10, 30}) channel->selectKeys(HTimeRange(at(i), at(i)), 7);
-  EXPECT_EQ(step(false), 30);
-  EXPECT_EQ(step(false), 10);
-  EXPECT_EQ(step(false), 30);
-  channel->selectKeys(HTimeRange(at(40), at(40)), 7);
-  manager().setTime(at(50), true);
-  EXPECT_EQ(step(true), 10);
-  EXPECT_EQ(step(true), 40);
-  channel->selectKeys(HTimeRange::forever(), 7);
-  manager().setTime(at(15), true);
-  EXPECT_EQ(step(false), 10);
-  EXPECT_EQ(step(false), 10);
-}
-
-TEST_F(Stepping, PrefersTheModuleSelectedFirst) {
-  activate({"Translation"});
-  for (Node* node : {nodes[1], nodes[0]}) {
-    node->setSelected(true);
-    for (int i : {0, 10}) node->getTranslationChannel()->setKey(at(i), {}, 7);
-    node->getTranslationChannel()->selectKeys(HTimeRange(at(10), at(10)), 7);
-  }
-  EXPECT_EQ(g_db->getPrimarySelectedModule(), nodes[0]);
-  step(false);
-  EXPECT_EQ(g_db->getPrimarySelectedModule(), nodes[1]);
-  step(true);
-  EXPECT_EQ(g_db->getPrimarySelectedModule(), nodes[1]);
-}
-
-class RotationKeys : public KeyCommands {
- protected:
-  RotationKeys() {
-    from->setRotationOrder(TalixRotation::ZYX);
-    to->setRotationOrder(TalixRotation::YZX);
-    activate({"Rotation"});
-    from->getRotationChannel()->setKey(at(3), turn(TalixRotation::ZYX, {10, 40, 70}), 7);
-  }
-
-  static TalixRotation turn(TalixRotation::RotOrder order, Vec3 const& degrees) {
-    TalixRotation rotation;
-    rotation.setAsEuler(order, degrees * (3.14159265358979323846 / 180));
-    return rotation;
-  }
-  static void expectTurn(Node* node, int frame, TalixRotation const& expected) {
-    const TalixRotation rotation = node->getRotationChannel()->getValue(at(frame));
-    Vec3 difference;
-    (rotation.inverse() * expected).getAsVector(difference);
-    EXPECT_LT(difference.length(), 1e-12);
-  }
-  void copyAndPaste() {
-    selectOnly(from);
-    run("copyKeys", {}, {{"all"}});
-    selectOnly(to);
-    EXPECT_EQ(run("pasteKeys", {}, {{"useFrame", {8}}}), "info: Pasted 0 keys from the clipboard\nnothing");
-  }
-
-  Node* from = make("from");
-  Node* to = make("to");
-};
-
-TEST_F(RotationKeys, StayTheSameInAnotherRotationOrder) {
-  copyAndPaste();
-  expectTurn(to, 8, turn(TalixRotation::ZYX, {10, 40, 70}));
-  EXPECT_EQ(run("getKeys", {"Rotation"}), "[8]");
-}
-
-TEST_F(RotationKeys, GiveSingleAngles) {
-  to->getRotationChannel()->setKey(at(0), turn(TalixRotation::ZYX, {1, 2, 3}), 7);
-  g_db->setActiveProperties({Controller::mapPropertyName("Rotation") | PropertyTable::kY});
-  copyAndPaste();
-  expectTurn(to, 8, turn(TalixRotation::ZYX, {1, 40, 3}));
 }
 
 TEST_F(KeyCommands, RefuseTimesBeyondTheTimeLine) {

@@ -6,11 +6,13 @@
 //   > echo -int x
 //   error: Option -int of echo needs 1 integer
 //   failed
+//   # take: data/walk.c3d -up z
 //
 // Lines after "> " are run in order against a fresh scene; the lines below each are what must be printed: log
 // lines, the result, and "failed" when the command failed. A printed line that is empty or begins with "#",
-// ">" or "|" stands after "| ". The working folder is the folder of the tests.
-// In the end every line is undone and redone, and the scene compared with what it was.
+// ">" or "|" stands after "| ". A take is opened without showing what "open" says of it. The working folder
+// is the folder of the tests. In the end every line is undone and redone, and the scene compared with what it
+// was.
 //
 //   transcripts [--update] [--dev] --plugin LIBRARY FILE...
 // --update rewrites the files instead; --dev has the commands for developers
@@ -32,7 +34,7 @@ using talix_tests::firstDifference;
 using talix_tests::SceneText;
 using Lines = std::vector<std::string>;
 
-constexpr std::string_view kPrompt = "> ";
+constexpr std::string_view kPrompt = "> ", kTake = "# take: ";
 
 Lines splitLines(std::string_view text) {
   Lines lines;
@@ -110,6 +112,11 @@ Lines replayed(Lines const& file, std::string const& plugin) {
       lines.push_back(line);
       addResult(session.run(std::string_view(line).substr(kPrompt.size())), lines);
       check.lineDone(line.substr(kPrompt.size()));
+    } else if (line.starts_with(kTake)) {
+      lines.push_back(line);
+      const std::string open = "open " + line.substr(kTake.size());
+      if (talix::LineResult const& result = session.run(open); result.failed()) addResult(result, lines);
+      check.lineDone(open);
     } else if (line.empty() || line.front() == '#') {
       lines.push_back(line);
     }

@@ -81,19 +81,6 @@ Take readWith(const ReadOptions& options, const std::string& text) {
 }
 Take read(const std::string& text) { return readWith({}, text); }
 
-TEST(BvhRotations, ChannelsComposeFromLeftToRight) {
-  const Take take = readBVH(dataFile("two_frames_01.bvh"));
-  // the first row: 8.03 35.01 88.36 -3.41 14.78 -164.35 13.09 40.30 -24.60 ...
-  expectRotation(take.joints[0], 0, turn('Z', -3.41) * turn('X', 14.78) * turn('Y', -164.35));
-  expectRotation(take.joints[1], 0, turn('Z', 13.09) * turn('X', 40.30) * turn('Y', -24.60));
-  EXPECT_EQ(take.joints[0].rotationOrder, TalixRotation::YXZ);
-  const KeyTrack::Values place = take.joints[0].translations.at(0).values;
-  EXPECT_DOUBLE_EQ(place[0], 80.3);
-  EXPECT_DOUBLE_EQ(place[1], 350.1);
-  EXPECT_DOUBLE_EQ(place[2], 883.6);
-  EXPECT_DOUBLE_EQ(take.joints[1].offset.y, 52.1);
-}
-
 TEST(BvhRotations, EveryOrderMatchesItsEulerAngles) {
   for (const std::string order : {"XYZ", "XZY", "YXZ", "YZX", "ZXY", "ZYX"}) {
     // Channels name the axis that turns last first.
