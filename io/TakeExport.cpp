@@ -8,8 +8,8 @@ namespace talix {
 namespace {
 
 // The whole frames of the animation range.
-FrameGrid animationFrames() {
-  const HTimeManager* time = HTimeManager::getInstance();
+FrameGrid animationFrames(const Database& scene) {
+  const HTimeManager* time = scene.getTimeManager();
   const HTimeRange range = time->getAnimRange();
   FrameGrid grid;
   grid.period = time->getTicksPerFrame();
@@ -37,9 +37,9 @@ void recallFile(Take& take, const NLEClip& clip) {
 }  // namespace
 
 Take exportTake(Database& scene, std::vector<TakeNote>& notes) {
-  const FrameGrid grid = animationFrames();
+  const FrameGrid grid = animationFrames(scene);
   Take take;
-  take.rate = HTimeManager::getInstance()->getFrameRate().getFrameRate();
+  take.rate = scene.getTimeManager()->getFrameRate().getFrameRate();
   take.firstFrame = grid.firstFrame;
   take.frameCount = grid.count;
   if (scene.getUpAxis() >= 0) take.up = static_cast<Axis>(scene.getUpAxis());

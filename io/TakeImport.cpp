@@ -55,7 +55,7 @@ HFrameRate frameRate(double rate) {
 }
 
 void setSceneTime(TakeImport& import, const Take& take) {
-  HTimeManager* time = HTimeManager::getInstance();
+  HTimeManager* time = import.clip().getDatabase()->getTimeManager();
   if (take.rate > HFrameRate::kMaximum)
     import.warn("the scene counts at most " + fileMetadata::numberText(HFrameRate::kMaximum) +
                 " frames a second and keeps its rate; keys lie at their times");
@@ -69,7 +69,7 @@ void setSceneTime(TakeImport& import, const Take& take) {
 }
 
 void noteSceneTime(TakeImport& import, const Take& take) {
-  const HFrameRate& rate = HTimeManager::getInstance()->getFrameRate();
+  const HFrameRate& rate = import.clip().getDatabase()->getTimeManager()->getFrameRate();
   if (rate.getTicksPerFrame() != ticksPerFrameAt(take.rate))
     import.info("the take has " + fileMetadata::numberText(take.rate) + " frames a second, the scene " +
                 fileMetadata::numberText(rate.getFrameRate()) + "; keys keep their times");

@@ -2,7 +2,7 @@
 
 #include <new>
 
-#include "host/scene/Database.h"
+#include "host/scene/SceneScope.h"
 #include "host/services/HEvent.h"
 #include "host/services/HInterface.h"
 #include "host/services/OperationStack.h"
@@ -32,7 +32,8 @@ class LogCollector : public LogSink {
 
 }  // namespace
 
-Session::Session(std::string const& plugin) {
+Session::Session(std::string const& plugin, Database& scene) : m_scene(scene) {
+  const SceneScope scope(m_scene);
   if (!plugin.empty()) {
     m_plugin = std::make_unique<PluginLibrary>(plugin);
     for (PluginLibrary::Item const& item : m_plugin->commands()) m_registry.add(item.command, item.source);
@@ -47,16 +48,21 @@ Session::~Session() {
 }
 
 void Session::setAssumeYes(bool yes) {
+  const SceneScope scope(m_scene);
   g_interface->setAsker([yes](HString const&) { return yes; });
 }
 
-void Session::setUndo(bool on) { g_db->getUndoJournal().setEnabled(on); }
+void Session::setUndo(bool on) {
+  const SceneScope scope(m_scene);
+  m_scene.getUndoJournal().setEnabled(on);
+}
 
 LineResult const& Session::run(std::string_view line) {
+  const SceneScope scope(m_scene);
   m_result.log.clear();
   m_result.value = Variable();
   const LogCollector collector(m_result.log);
-  UndoJournal& journal = g_db->getUndoJournal();
+  UndoJournal& journal = m_scene.getUndoJournal();
   journal.beginStep();
   m_result.outcome = guarded(line);
   m_result.command = m_line.name();
@@ -67,7 +73,7 @@ LineResult const& Session::run(std::string_view line) {
   }
   journal.endStep(m_line.name());
   if (m_result.failed()) m_result.value = Variable();
-  g_db->releaseRemoved();
+  m_scene.releaseRemoved();
   g_theOperationStack.reset();
   g_eventManager->deliverQueued();
   return m_result;

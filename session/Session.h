@@ -1,8 +1,8 @@
 // Runs script lines against the scene.
 //
 // A line runs through its command's own argument check; what the command logs meanwhile is collected. Nothing
-// that a command does or throws ends the program. The scene is the engine's (g_db): there is one, however
-// many sessions.
+// that a command does or throws ends the program. A session works on one scene, on whichever thread asks it
+// to.
 #pragma once
 
 #include <memory>
@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "host/base/Log.h"
+#include "host/scene/Database.h"
 #include "session/CommandRegistry.h"
 #include "session/PluginLoader.h"
 #include "session/ScriptLine.h"
@@ -38,12 +39,14 @@ struct LineResult {
 
 class Session {
  public:
-  // `plugin`: the library whose commands come before the host's own; empty for none. Throws PluginError.
-  explicit Session(std::string const& plugin);
+  // `plugin`: the library whose commands come before the host's own; empty for none. `scene` must live
+  // longer; the caller owns it. Throws PluginError.
+  explicit Session(std::string const& plugin, Database& scene = Database::current());
   ~Session();
   Session(Session const&) = delete;
   Session& operator=(Session const&) = delete;
 
+  Database& scene() const { return m_scene; }
   CommandRegistry const& commands() const { return m_registry; }
   PluginLibrary const* plugin() const { return m_plugin.get(); }
 
@@ -53,7 +56,8 @@ class Session {
   // Keeps what lines change, each line a step, for "undo" and "redo"; off at start.
   void setUndo(bool on);
 
-  // Runs one line. The answer lasts until the next one.
+  // Runs one line. The result lasts until the next one. Throws SceneHeldError when another thread works on
+  // the scene; so do the two above.
   LineResult const& run(std::string_view line);
 
  private:
@@ -65,6 +69,7 @@ class Session {
   LineResult::Outcome guarded(std::string_view line);
   void warnOfExclusions() const;
 
+  Database& m_scene;
   std::unique_ptr<PluginLibrary> m_plugin;
   std::vector<std::unique_ptr<Command, Release>> m_hostCommands;
   CommandRegistry m_registry;

@@ -16,11 +16,13 @@ namespace talix_tests {
 
 class SceneText {
  public:
+  explicit SceneText(Database& scene = *g_db) : m_scene(scene) {}
+
   std::string write() {
     m_out.str("");
     m_out << std::setprecision(17);
     writeSettings();
-    for (int i = 0; i < g_db->getNumModules(); ++i) writeModule(*g_db->getModule(i));
+    for (int i = 0; i < m_scene.getNumModules(); ++i) writeModule(*m_scene.getModule(i));
     return m_out.str();
   }
 
@@ -31,28 +33,30 @@ class SceneText {
   }
 
   void writeSettings() {
-    HTimeManager const& time = *HTimeManager::getInstance();
-    m_out << "rate " << time.getTicksPerFrame() << " up " << g_db->getUpAxis() << "\nselected";
-    for (int i = 0; i < g_db->getNumSelectedModules(); ++i) m_out << " " << name(g_db->getSelectedModule(i));
+    HTimeManager const& time = *m_scene.getTimeManager();
+    m_out << "rate " << time.getTicksPerFrame() << " up " << m_scene.getUpAxis() << "\nselected";
+    for (int i = 0; i < m_scene.getNumSelectedModules(); ++i)
+      m_out << " " << name(m_scene.getSelectedModule(i));
     m_out << "\nselected nodes";
-    for (int i = 0; i < g_db->getNumSelectedNodes(); ++i) m_out << " " << name(g_db->getSelectedNode(i));
+    for (int i = 0; i < m_scene.getNumSelectedNodes(); ++i) m_out << " " << name(m_scene.getSelectedNode(i));
     m_out << "\nselected markers";
-    for (int i = 0; i < g_db->getNumSelectedMarkers(); ++i) m_out << " " << name(g_db->getSelectedMarker(i));
-    m_out << "\nprimary " << name(g_db->getPrimarySelectedModule()) << "\nactive "
-          << name(g_db->getActiveClip()) << " " << g_db->getActiveLayer();
-    for (int i = 0; i < g_db->getNumActiveProperties(); ++i) m_out << " " << g_db->getActiveProperty(i);
+    for (int i = 0; i < m_scene.getNumSelectedMarkers(); ++i)
+      m_out << " " << name(m_scene.getSelectedMarker(i));
+    m_out << "\nprimary " << name(m_scene.getPrimarySelectedModule()) << "\nactive "
+          << name(m_scene.getActiveClip()) << " " << m_scene.getActiveLayer();
+    for (int i = 0; i < m_scene.getNumActiveProperties(); ++i) m_out << " " << m_scene.getActiveProperty(i);
     m_out << "\nclips";
-    for (NLEClip* clip = g_db->getHeadClip(); clip; clip = clip->getNext()) {
+    for (NLEClip* clip = m_scene.getHeadClip(); clip; clip = clip->getNext()) {
       m_out << " " << name(clip) << ":";
       for (int layer = 0; layer < clip->getNumLayers(); ++layer) m_out << clip->isLayerLocked(layer);
     }
     m_out << "\nnodes";
-    for (int i = 0; i < g_db->getNumNodes(); ++i) m_out << " " << name(g_db->getNode(i));
+    for (int i = 0; i < m_scene.getNumNodes(); ++i) m_out << " " << name(m_scene.getNode(i));
     m_out << "\nsubjects";
-    for (uint64 i = 0; i < g_db->getSubjectManager()->getNumSubjects(); ++i)
-      m_out << " " << name(g_db->getSubjectManager()->getSubject(i));
+    for (uint64 i = 0; i < m_scene.getSubjectManager()->getNumSubjects(); ++i)
+      m_out << " " << name(m_scene.getSubjectManager()->getSubject(i));
     m_out << "\nchannel names";
-    PropertyTable const& table = PropertyTable::getInstance();
+    PropertyTable const& table = m_scene.getPropertyTable();
     for (unsigned id = 1; table.getType(id) != DataSource::NoProperty; ++id)
       m_out << " " << table.getName(id).GetStr() << ":" << table.getType(id);
     m_out << "\n";
@@ -62,7 +66,8 @@ class SceneText {
     const HString path = module.getFullPathString();
     m_out << path.GetStr() << " " << name(&module) << " " << module.getRuntimeClass()->getName() << " below "
           << name(module.getParent()) << (module.isSelected() ? " selected" : "")
-          << (g_db->getModuleWithPath(path, nullptr, false) ? "" : " not found by its path") << "\n children";
+          << (m_scene.getModuleWithPath(path, nullptr, false) ? "" : " not found by its path")
+          << "\n children";
     for (int i = 0; i < module.getNumChildren(); ++i) m_out << " " << name(module.getChild(i));
     for (int i = 0; i < module.getNumNodeChildren(); ++i) m_out << " " << name(module.getNodeChild(i));
     for (int i = 0; i < module.getNumMarkerChildren(); ++i) m_out << " " << name(module.getMarkerChild(i));
@@ -107,7 +112,7 @@ class SceneText {
           << static_cast<int>(channel.getInterpolation()) << (channel.isLocked() ? " locked" : "");
     for (const double value : channel.getDefaultValues()) m_out << " " << value;
     m_out << "\n";
-    for (NLEClip* clip = g_db->getHeadClip(); clip; clip = clip->getNext())
+    for (NLEClip* clip = m_scene.getHeadClip(); clip; clip = clip->getNext())
       for (int layer = 0; layer < clip->getNumLayers(); ++layer)
         if (KeyTrack const* track = channel.findTrack(clip, layer); track && !track->empty())
           writeKeys(*track, name(clip) + " " + std::to_string(layer));
@@ -135,6 +140,7 @@ class SceneText {
     m_out << "\n";
   }
 
+  Database& m_scene;
   std::ostringstream m_out;
 };
 

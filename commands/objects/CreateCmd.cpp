@@ -144,7 +144,7 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
       if (auto* node = objectAs<Node>(module); node && request.parent) request.place(*node);
       if (auto* camera = objectAs<OpticalCamera>(module); camera && !request.parent) {
         g_db->getCalibrationMgr()->addToSystemGroup(camera);
-        if (!deviceNumbers) deviceNumbers.emplace();
+        if (!deviceNumbers) deviceNumbers.emplace(*g_db);
         camera->setDeviceID(deviceNumbers->take());
       }
       created.add(module);

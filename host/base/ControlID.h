@@ -19,8 +19,12 @@ class ControlID {
   uint64 getNumber() const { return m_number; }
   bool operator==(ControlID const&) const = default;
 
-  // Unique numbers start after this one, so that identifiers read from a file are not given out again.
+  // Unique numbers of this thread's counter start after this one, so that identifiers read from a file are
+  // not given out again.
   static void reserveUpTo(uint64 number);
+  // Where this thread takes its unique numbers from: the last one given out, which the caller (a scene) owns.
+  // Null: the thread's own.
+  static void setCounter(uint64* last);
 
  private:
   uint64 m_number = 0;

@@ -2,9 +2,11 @@
 
 #include <cstdio>
 
+#include "host/base/ThreadLocal.h"
+
 namespace {
 
-LogSink* s_sink = nullptr;
+TALIX_THREAD_LOCAL LogSink* t_sink = nullptr;
 
 }  // namespace
 
@@ -14,12 +16,12 @@ char const* getLogLevelName(LogLevel level) {
 }
 
 LogSink* setLogSink(LogSink* sink) {
-  LogSink* former = s_sink;
-  s_sink = sink;
+  LogSink* former = t_sink;
+  t_sink = sink;
   return former;
 }
 
 void writeLog(LogLevel level, std::string_view text) {
-  if (s_sink) return s_sink->write(level, text);
+  if (t_sink) return t_sink->write(level, text);
   std::fprintf(stderr, "%s: %.*s\n", getLogLevelName(level), static_cast<int>(text.size()), text.data());
 }

@@ -1,4 +1,4 @@
-// Lines for the user, with a level, written to the current sink.
+// Lines for the user, with a level, written to the sink of the thread.
 #pragma once
 
 #include <string_view>
@@ -13,7 +13,7 @@ class LogSink {
   virtual void write(LogLevel level, std::string_view text) = 0;
 };
 
-// Where lines go from now on, null for standard error ("error: TEXT"); answers the former sink. The caller
-// owns it.
+// Where this thread's lines go from now on, null for standard error ("error: TEXT"); returns the former sink.
+// The caller owns it.
 LogSink* setLogSink(LogSink* sink);
 void writeLog(LogLevel level, std::string_view text);

@@ -147,8 +147,8 @@ int64 Attribute::bytesBeside(Value const& value) {
 }
 
 void Attribute::put(Value value, bool set, bool react) {
-  if (m_module && m_module->isRecorded() && UndoJournal::isDue(m_undoMark))
-    g_db->getUndoJournal().add(std::make_unique<Change>(*this));
+  if (m_module && m_module->isRecorded() && m_module->journal().isDue(m_undoMark))
+    m_module->journal().add(std::make_unique<Change>(*this));
   m_value = std::move(value);
   m_set = set;
   if (react && m_reaction && m_module) m_reaction(*m_module, *this);
@@ -258,10 +258,19 @@ void RotationAttribute::setValue(TalixRotation const& value, bool, bool notify, 
   change(value, notify, react, markSet);
 }
 
-double TimeAttribute::getValue() const { return HTimeManager::getInstance()->getFrameDouble(getTime()); }
+namespace {
+
+HTimeManager const* timeOf(Attribute const& attribute) {
+  Module const* module = attribute.getModule();
+  return module ? module->getDatabase()->getTimeManager() : HTimeManager::getInstance();
+}
+
+}  // namespace
+
+double TimeAttribute::getValue() const { return timeOf(*this)->getFrameDouble(getTime()); }
 
 HString TimeAttribute::getStringValue() const {
-  HTimeManager const* time = HTimeManager::getInstance();
+  HTimeManager const* time = timeOf(*this);
   const HFrameRate rate = m_relative ? time->getFrameRate().withoutDrop() : time->getFrameRate();
   return rate.timecodeFromFrame(time->getFrame(getTime()));
 }
@@ -279,6 +288,7 @@ void ColorAttribute::setDefaultMode(bool undoable, bool notify) { unset(undoable
 void EventAttribute::doCallBack() { change(std::monostate(), true, true, true); }
 
 void ModAttribute::setValue(Module* value, bool, bool notify, bool react, bool markSet) {
+  if (value && getModule() && value->getDatabase() != getModule()->getDatabase()) return;
   change(value, notify, react, markSet);
 }
 
@@ -290,5 +300,7 @@ void MatrixAttribute::setValue(Matrix const& value, bool, bool notify, bool reac
 }
 
 void MultiModAttribute::setValue(TSimpleArray<Module*>& value, bool, bool notify, bool react, bool markSet) {
+  for (Module const* module : value)
+    if (module && getModule() && module->getDatabase() != getModule()->getDatabase()) return;
   change(Modules(value.begin(), value.end()), notify, react, markSet);
 }

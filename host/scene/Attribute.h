@@ -95,7 +95,7 @@ class Attribute : public HObject, private ModuleReferrer {
   void releaseFrom(Value const& value);
 
   HString m_name;
-  ControlID m_id{ControlID::CreateUnique};
+  ControlID m_id;
   Module* m_module = nullptr;
   Value m_value, m_default;
   Reaction m_reaction = nullptr;
@@ -245,7 +245,7 @@ class TimeAttribute : public Attribute {
   explicit TimeAttribute(int64 ticks = 0, bool relative = false) : Attribute(ticks), m_relative(relative) {}
   Type getType() const override { return Time; }
   int64 getTime() const { return valueAs<int64>(); }
-  double getValue() const;                        // frames at the scene's rate
+  double getValue() const;                        // frames at its scene's rate
   HString getStringValue() const;                 // timecode of the whole frames
   bool isRelative() const { return m_relative; }  // a length of time rather than a moment
   void setValue(int64 ticks, bool undoable, bool notify, bool react, bool markSet);
@@ -285,7 +285,8 @@ class NoneAttribute : public Attribute {
   Type getType() const override { return NoKind; }
 };
 
-// Another module, or none. A module that leaves the scene is no longer referenced.
+// Another module, or none. A module that leaves the scene is no longer referenced; one of another scene is
+// not taken.
 class ModAttribute : public Attribute {
   H_DECLARE_CLASS(ModAttribute, Attribute)
 
@@ -306,7 +307,7 @@ class MatrixAttribute : public Attribute {
   virtual void setValue(Matrix const& value, bool undoable, bool notify, bool react, bool markSet);
 };
 
-// Modules in order; an entry may be null.
+// Modules in order; an entry may be null. None of another scene is taken.
 class MultiModAttribute : public Attribute {
   H_DECLARE_CLASS(MultiModAttribute, Attribute)
 

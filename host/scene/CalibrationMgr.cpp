@@ -4,8 +4,8 @@
 #include "host/scene/Devices.h"
 #include "host/scene/SceneIndex.h"
 
-FreeDeviceNumbers::FreeDeviceNumbers() {
-  for (Module* camera : g_db->getModulesOfType(&OpticalCamera::s_classOpticalCamera))
+FreeDeviceNumbers::FreeDeviceNumbers(Database const& scene) {
+  for (Module* camera : scene.getModulesOfType(&OpticalCamera::s_classOpticalCamera))
     m_taken.insert(static_cast<uint32>(static_cast<OpticalCamera*>(camera)->getDeviceID()));
 }
 
@@ -14,20 +14,20 @@ uint32 FreeDeviceNumbers::take() {
   return m_next++;
 }
 
-uint32 CalibrationMgr::getNextAvailableDeviceID() const { return FreeDeviceNumbers().take(); }
+uint32 CalibrationMgr::getNextAvailableDeviceID() const { return FreeDeviceNumbers(m_scene).take(); }
 
 Module* CalibrationMgr::findSystemGroup() {
-  Module* group = g_db->getModule(m_systemGroup);
-  if (group || !g_db->moduleOfTypeExists(&SystemGroup::s_classSystemGroup)) return group;
-  group = g_db->getModulesOfType(&SystemGroup::s_classSystemGroup)[0];
+  Module* group = m_scene.getModule(m_systemGroup);
+  if (group || !m_scene.moduleOfTypeExists(&SystemGroup::s_classSystemGroup)) return group;
+  group = m_scene.getModulesOfType(&SystemGroup::s_classSystemGroup)[0];
   m_systemGroup = group->getID();
   return group;
 }
 
 void CalibrationMgr::addToSystemGroup(Module* module) {
   Module* group = findSystemGroup();
-  if (!group) group = g_db->createModule(&SystemGroup::s_classSystemGroup, "System", nullptr);
+  if (!group) group = m_scene.createModule(&SystemGroup::s_classSystemGroup, "System", nullptr);
   if (!group || module->getParent() == group) return;
-  const HString name = g_db->getIndex().freeName(group, module->getName());
+  const HString name = m_scene.getIndex().freeName(group, module->getName());
   if (group->addChild(module)) module->setName(name);
 }

@@ -5,10 +5,13 @@
 
 #include "host/base/ControlID.h"
 
+class Database;
 class Module;
 
 class CalibrationMgr {
  public:
+  explicit CalibrationMgr(Database& scene) : m_scene(scene) {}
+
   // The lowest number from 1 that no camera has. Looks at all modules: FreeDeviceNumbers serves many cameras.
   uint32 getNextAvailableDeviceID() const;
   // Hangs a module under the system group, which is made ("System") when there is none, with a name that its
@@ -18,13 +21,14 @@ class CalibrationMgr {
  private:
   Module* findSystemGroup();
 
+  Database& m_scene;
   ControlID m_systemGroup{ControlID::CreateBlank};  // as last seen
 };
 
-// Hands out the numbers that no camera had when this was made, lowest first, each once.
+// Hands out the numbers that no camera of the scene had when this was made, lowest first, each once.
 class FreeDeviceNumbers {
  public:
-  FreeDeviceNumbers();
+  explicit FreeDeviceNumbers(Database const& scene);
   uint32 take();
 
  private:

@@ -9,5 +9,6 @@ SolvingSetup* Character::getSolvingSetup(bool create) {
   for (int child = 0; child < getNumChildren(); ++child)
     if (auto* setup = objectAs<SolvingSetup>(static_cast<HObject*>(getChild(child)))) return setup;
   if (!create) return nullptr;
-  return static_cast<SolvingSetup*>(g_db->createModule(&SolvingSetup::s_classSolvingSetup, "Solving", this));
+  return static_cast<SolvingSetup*>(
+      getDatabase()->createModule(&SolvingSetup::s_classSolvingSetup, "Solving", this));
 }

@@ -12,12 +12,12 @@ void NLEClip::setUp() {
   m_weight->setConstValue(1, false);
 }
 
-bool NLEClip::isActive() const { return g_db->getActiveClip() == this; }
+bool NLEClip::isActive() const { return getDatabase()->getActiveClip() == this; }
 
-NLEClip* NLEClip::getNext() const { return g_db->getClipAfter(this); }
+NLEClip* NLEClip::getNext() const { return getDatabase()->getClipAfter(this); }
 
 // A blend's values hang on the weights of its sources.
-void NLEClip::dataChanged(Controller const*) { Node::forgetWorldCache(); }
+void NLEClip::dataChanged(Controller const*) { getDatabase()->forgetWorldCache(); }
 
 struct NLEClip::LocksChange : UndoChange {
   explicit LocksChange(NLEClip& concerned)
@@ -31,7 +31,7 @@ struct NLEClip::LocksChange : UndoChange {
 };
 
 void NLEClip::storeLayerLocks(std::vector<bool> locks) {
-  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<LocksChange>(*this));
+  if (isRecorded()) journal().add(std::make_unique<LocksChange>(*this));
   m_layerLocks = std::move(locks);
 }
 
@@ -69,5 +69,5 @@ void Clip::setSmpteOffset(int64 ticks) { m_smpteOffset->setValue(ticks, true, tr
 void BlendClip::setUp() {
   NLEClip::setUp();
   m_sources = addBuiltIn<MultiModAttribute>("Sources");
-  setReaction(m_sources, [](Module&, Attribute&) { Node::forgetWorldCache(); });
+  setReaction(m_sources, [](Module& module, Attribute&) { module.getDatabase()->forgetWorldCache(); });
 }

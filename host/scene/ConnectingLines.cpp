@@ -43,8 +43,8 @@ struct ConnectingLines::Change : UndoChange {
 };
 
 void ConnectingLines::store(Node* target, MarkerConnection const* line) {
-  if (m_source.isRecorded() && UndoJournal::isDue(m_undoMark))
-    g_db->getUndoJournal().add(std::make_unique<Change>(*this));
+  if (m_source.isRecorded() && m_source.journal().isDue(m_undoMark))
+    m_source.journal().add(std::make_unique<Change>(*this));
   const bool known = leadTo(target);
   if (line && known) {
     *findLine(m_lines, target) = *line;

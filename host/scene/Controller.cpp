@@ -114,11 +114,12 @@ int Controller::deleteKey(int64 time, unsigned mask) {
 
 int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers) {
   int64 deleted = 0;
-  NLEClip* clip = g_db->getActiveClip();
+  Database const& scene = *getDatabase();
+  NLEClip* clip = scene.getActiveClip();
   const int64 first = range.getStart(), last = range.getEnd();
   const CutRuns cut(*this, first, last);
   for (ClipTrack const& track : m_tracks)
-    if (track.clip == clip && (track.layer == g_db->getActiveLayer() ||
+    if (track.clip == clip && (track.layer == scene.getActiveLayer() ||
                                (allLayers && obstacleToKeys(*this, clip, track.layer) == Obstacle::none)))
       deleted += trackToDelete(clip, track.layer, first, last)->deleteRange(first, last, mask, bridgeEnds());
   if (deleted) changed();
@@ -131,8 +132,8 @@ int Controller::deleteSelectedKeys(unsigned mask) {
   const int64 first = track->timeAt(track->selectedIndex(0));
   const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
   const CutRuns cut(*this, first, last);
-  NLEClip* clip = g_db->getActiveClip();
-  const int layer = g_db->getActiveLayer();
+  NLEClip* clip = getDatabase()->getActiveClip();
+  const int layer = getDatabase()->getActiveLayer();
   KeyTrack* edited = track->bridgesAny() ? &replaceTrack(clip, layer) : editTrack(first, last);
   const int64 deleted = edited->deleteSelected(mask, bridgeEnds());
   if (deleted) changed();
@@ -141,7 +142,7 @@ int Controller::deleteSelectedKeys(unsigned mask) {
 
 bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo) {
   if (source->getPropertyType() != getPropertyType()) return false;
-  NLEClip* clip = g_db->getActiveClip();
+  NLEClip* clip = getDatabase()->getActiveClip();
   const int layers = clip ? clip->getNumLayers() : 0;
   const auto isFree = [&](int layer) { return obstacleToKeys(*this, clip, layer) == Obstacle::none; };
   int layer = 0;
@@ -154,9 +155,9 @@ bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo
     KeyTrack const* theirs = source->findTrack(clip, layer);
     if (!theirs && !findTrack(clip, layer)) continue;
     if (!isFree(layer)) {
-      g_db->logWarning("%s is not editable on %s in layer %d of %s: %s.", getName().GetStr(),
-                       m_module->getName().GetStr(), layer, clip->getName().GetStr(),
-                       reasonOf(Obstacle::layerLocked));
+      getDatabase()->logWarning("%s is not editable on %s in layer %d of %s: %s.", getName().GetStr(),
+                                m_module->getName().GetStr(), layer, clip->getName().GetStr(),
+                                reasonOf(Obstacle::layerLocked));
       continue;
     }
     KeyTrack copy = theirs ? *theirs : KeyTrack(shapeOf(getPropertyType()));
@@ -186,8 +187,9 @@ KeyTrack const* Controller::findTrack(NLEClip const* clip, int layer) const {
 }
 
 KeyTrack const* Controller::findActiveTrack() const {
-  NLEClip const* clip = g_db->getActiveClip();
-  return clip ? findTrack(clip, g_db->getActiveLayer()) : nullptr;
+  Database const& scene = *getDatabase();
+  NLEClip const* clip = scene.getActiveClip();
+  return clip ? findTrack(clip, scene.getActiveLayer()) : nullptr;
 }
 
 int Controller::getNumKeys() const {
@@ -256,7 +258,9 @@ HTimeRange Controller::getKeyRange() const {
 // --- evaluation ---
 
 void Controller::evaluate(int64 time, Values& values) const {
-  NLEClip const* clip = g_db->getActiveClip();
+  Database const& scene = *getDatabase();
+  scene.checkThread();
+  NLEClip const* clip = scene.getActiveClip();
   values = m_default;
   if (!clip || m_tracks.empty()) return;
   if (clip->holdsKeys()) return evaluateInClip(clip, time, values);
@@ -301,14 +305,16 @@ void Controller::evaluateInClip(NLEClip const* clip, int64 time, Values& values)
 }
 
 void Controller::evaluateLayer(int64 time, Values& values) const {
-  NLEClip const* clip = g_db->getActiveClip();
-  clip ? static_cast<void>(evaluateLayer(clip, g_db->getActiveLayer(), time, values))
+  Database const& scene = *getDatabase();
+  scene.checkThread();
+  NLEClip const* clip = scene.getActiveClip();
+  clip ? static_cast<void>(evaluateLayer(clip, scene.getActiveLayer(), time, values))
        : static_cast<void>(values = m_default);
 }
 
 Controller::Values Controller::solveLayer(int64 time, Values const& wanted) const {
   // A clip of one layer takes the value as it is, without the rounding of a sum.
-  NLEClip const* clip = g_db->getActiveClip();
+  NLEClip const* clip = getDatabase()->getActiveClip();
   const bool single = !clip || clip->getNumLayers() == 1;
   Values all, own;
   evaluate(time, all);

@@ -24,6 +24,7 @@
 #include "host/scene/DataSource.h"
 #include "host/time/HTimeRange.h"
 
+class Database;
 class Module;
 class NLEClip;
 struct ReductionTolerances;
@@ -34,7 +35,7 @@ class Controller : public DataSource {
  public:
   using Values = KeyTrack::Values;
 
-  // --- names ---
+  // --- names, those of the current scene ---
   static PropertyType mapToPropertyType(HString const& name);
   static PropertyType mapToPropertyType(unsigned id);
   static HString mapPropertyId(unsigned id);
@@ -46,10 +47,11 @@ class Controller : public DataSource {
   // A new channel of a kind; its module gives it an owner and a name.
   static std::unique_ptr<Controller> create(PropertyType type);
 
-  HString getName() const { return mapPropertyId(m_propertyId); }
+  HString getName() const;
   unsigned getPropertyId() const { return m_propertyId; }
   virtual PropertyType getPropertyType() const = 0;
   Module* getModule() const { return m_module; }
+  inline Database* getDatabase() const;  // its module's
   ControlID getID() const { return m_id; }
 
   // --- editing
@@ -191,7 +193,7 @@ class Controller : public DataSource {
   void storeTracks(std::vector<ClipTrack> tracks);  // the mutator of all keys at once
 
   Module* m_module = nullptr;
-  ControlID m_id{ControlID::CreateUnique};
+  ControlID m_id;
   unsigned m_propertyId = 0;
   Interpolation m_interpolation;
   unsigned char m_numInterpTypes;  // the first so many of Constant, Linear, Cubic

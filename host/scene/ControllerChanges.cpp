@@ -95,18 +95,18 @@ Controller::ClipTrack& Controller::clipTrack(NLEClip* clip, int layer) {
 
 Controller::KeyChange* Controller::changeOf(ClipTrack& track) {
   if (!m_module || !m_module->isRecorded()) return nullptr;
-  if (UndoJournal::isDue(track.undoMark)) {
+  UndoJournal& journal = m_module->journal();
+  if (journal.isDue(track.undoMark)) {
     auto change = std::make_unique<KeyChange>(*this, track);
     track.change = change.get();
-    g_db->getUndoJournal().add(std::move(change));
+    journal.add(std::move(change));
   }
   return track.change;
 }
 
 KeyTrack* Controller::editTrack(NLEClip* clip, int layer, int64 first, int64 last) {
   ClipTrack& track = clipTrack(clip, layer);
-  if (KeyChange* change = UndoJournal::isRecording() ? changeOf(track) : nullptr)
-    change->note(track.track, first, last);
+  if (KeyChange* change = changeOf(track)) change->note(track.track, first, last);
   return &track.track;
 }
 
@@ -126,14 +126,15 @@ KeyTrack* Controller::trackToDelete(NLEClip* clip, int layer, int64 first, int64
 
 KeyTrack& Controller::replaceTrack(NLEClip* clip, int layer) {
   ClipTrack& track = clipTrack(clip, layer);
-  KeyChange* change = UndoJournal::isRecording() ? changeOf(track) : nullptr;
+  KeyChange* change = changeOf(track);
   if (change && !change->snapshot) change->takeSnapshot(track.track);
   return track.track;
 }
 
 KeyTrack* Controller::editTrack(int64 first, int64 last) {
-  NLEClip* clip = g_db->getActiveClip();
-  return clip && clip->holdsKeys() ? editTrack(clip, g_db->getActiveLayer(), first, last) : nullptr;
+  Database const& scene = *getDatabase();
+  NLEClip* clip = scene.getActiveClip();
+  return clip && clip->holdsKeys() ? editTrack(clip, scene.getActiveLayer(), first, last) : nullptr;
 }
 
 // --- all tracks at once ---
@@ -154,7 +155,7 @@ struct Controller::TracksChange : UndoChange {
 };
 
 void Controller::storeTracks(std::vector<ClipTrack> tracks) {
-  if (m_module && m_module->isRecorded()) g_db->getUndoJournal().add(std::make_unique<TracksChange>(*this));
+  if (m_module && m_module->isRecorded()) m_module->journal().add(std::make_unique<TracksChange>(*this));
   m_tracks = std::move(tracks);
   // What was recorded of single tracks stands before this change: later edits are recorded anew.
   for (ClipTrack& track : m_tracks) track.undoMark = 0;
@@ -194,6 +195,6 @@ struct Controller::SettingsChange : UndoChange {
 };
 
 void Controller::recordSettings() {
-  if (m_module && m_module->isRecorded() && UndoJournal::isDue(m_settingsMark))
-    g_db->getUndoJournal().add(std::make_unique<SettingsChange>(*this));
+  if (m_module && m_module->isRecorded() && m_module->journal().isDue(m_settingsMark))
+    m_module->journal().add(std::make_unique<SettingsChange>(*this));
 }

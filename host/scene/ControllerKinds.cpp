@@ -137,14 +137,16 @@ void RotController::compose(Values& values, Values const& layer) const {
 
 // Of L0 * ... * La * ... * Ln = wanted, the factor La.
 Values RotController::solveLayer(int64 time, Values const& wanted) const {
-  NLEClip const* clip = g_db->getActiveClip();
+  Database const& scene = *getDatabase();
+  scene.checkThread();
+  NLEClip const* clip = scene.getActiveClip();
   if (!clip) return wanted;
   TalixRotation below, above;
   for (int layer = 0; layer < clip->getNumLayers(); ++layer) {
     Values values;
     evaluateLayer(clip, layer, time, values);
-    if (layer < g_db->getActiveLayer()) below *= rotationOf(values);
-    if (layer > g_db->getActiveLayer()) above *= rotationOf(values);
+    if (layer < scene.getActiveLayer()) below *= rotationOf(values);
+    if (layer > scene.getActiveLayer()) above *= rotationOf(values);
   }
   return rawValues(below.inverse() * rotationOf(wanted) * above.inverse());
 }

@@ -57,8 +57,9 @@ int Controller::reduceSelectedKeys(ReductionTolerances const& tolerances) {
 
 int Controller::reduce(std::function<bool(KeyTrack::Key const&)> mayGo,
                        ReductionTolerances const& tolerances) {
-  NLEClip* clip = g_db->getActiveClip();
-  const int layer = g_db->getActiveLayer();
+  Database const& scene = *getDatabase();
+  NLEClip* clip = scene.getActiveClip();
+  const int layer = scene.getActiveLayer();
   KeyTrack const* active = findActiveTrack();
   if (!active || !clip->holdsKeys()) return 0;
 
@@ -66,7 +67,7 @@ int Controller::reduce(std::function<bool(KeyTrack::Key const&)> mayGo,
   Marker* marker = markerSeenBy(*this, clip, layer);
   ReductionRule rule{.interpolation = m_interpolation,
                      .tolerance = toleranceFor(*this, original, tolerances),
-                     .framePeriod = HTimeManager::getInstance()->getTicksPerFrame(),
+                     .framePeriod = scene.getTimeManager()->getTicksPerFrame(),
                      .isWhole = getPropertyType() == IntProperty,
                      .mayGo = std::move(mayGo),
                      .hasGaps = marker || objectAs<AnalogDevice>(m_module)};

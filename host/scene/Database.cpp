@@ -9,24 +9,47 @@
 #include "host/scene/PropertyTable.h"
 #include "host/scene/SceneIndex.h"
 #include "host/scene/SubjectManager.h"
+#include "host/services/SceneServices.h"
+
+TALIX_THREAD_LOCAL Database* g_db = nullptr;
+
+// Held from the start by the thread that loads the engine, which is the one that runs main.
+struct DefaultScene {
+  DefaultScene() : database(&SceneServices::getDefault()) {
+    database.hold();
+    Database::makeCurrent(&database);
+  }
+
+  Database database;
+};
 
 namespace {
 
-Database s_database;
-bool s_devOnlyMode = false;
+DefaultScene s_default;
+std::atomic<bool> s_devOnlyMode = false;
 
 }  // namespace
 
-Database* g_db = &s_database;
+Database::Database() : Database(nullptr) {}
 
-Database::Database()
+Database::Database(SceneServices* services)
     : m_index(std::make_unique<SceneIndex>()),
-      m_calibration(std::make_unique<CalibrationMgr>()),
+      m_ownServices(services ? nullptr : std::make_unique<SceneServices>()),
+      m_services(services ? services : m_ownServices.get()),
+      m_time(std::make_unique<HTimeManager>(this)),
+      m_properties(std::make_unique<PropertyTable>(m_journal)),
+      m_calibration(std::make_unique<CalibrationMgr>(*this)),
       m_clipboard(std::make_unique<ClipboardManager>()),
-      m_subjects(std::make_unique<SubjectManager>()) {}
+      m_subjects(std::make_unique<SubjectManager>(*this)) {}
 
-// Not more: the tables that a new scene resets may be gone already when the program ends.
-Database::~Database() { removeAll(); }
+Database::~Database() {
+  // Whoever ends it, no one works on it any more.
+  m_holder = &g_db;
+  Database* former = g_db == this ? nullptr : g_db;
+  makeCurrent(this);
+  removeAll();
+  makeCurrent(former);
+}
 
 void Database::removeAll() {
   m_journal.clear();
@@ -36,6 +59,7 @@ void Database::removeAll() {
 }
 
 void Database::newScene() {
+  checkThread();
   removeAll();
   m_activeProperties.clear();
   m_autoUpdateProperties = false;
@@ -44,8 +68,8 @@ void Database::newScene() {
   m_created = 0;
   *m_index = SceneIndex();
   *m_clipboard = ClipboardManager();
-  PropertyTable::getInstance().reset();
-  HTimeManager::getInstance()->reset();
+  m_properties->reset();
+  m_time->reset();
 }
 
 // --- modules ---
@@ -58,11 +82,13 @@ bool Database::mayJoin(Module const* module) const {
 
 Module* Database::createModule(HRuntimeClass* type, char const* name, Module* parent) {
   if (!type || !type->isDerivedFrom(&Module::s_classModule) || !type->getCreateFunction()) return nullptr;
+  checkThread();
   const HString wanted = name && *name ? name : type->getName();
-  if (!Module::isValidName(wanted) || (parent && !parent->isInScene())) return nullptr;
+  if (!Module::isValidName(wanted) || (parent && !contains(parent))) return nullptr;
   if (parent && type->isDerivedFrom(&Character::s_classCharacter)) return nullptr;
   std::unique_ptr<Module> module(static_cast<Module*>(type->getCreateFunction()()));
   if (!mayJoin(module.get())) return nullptr;
+  module->m_database = this;
   module->setUp();
   module->m_name = m_index->freeName(parent, wanted);
   Module* entered = module.release();
@@ -72,7 +98,9 @@ Module* Database::createModule(HRuntimeClass* type, char const* name, Module* pa
 }
 
 bool Database::addToScene(Module* module, bool uniqueName, Character const* character, bool select, bool) {
-  if (!module || module->isInScene() || !mayJoin(module) || (character && !character->isInScene()))
+  checkThread();
+  if (!module || module->isInScene() || module->m_database != this || !mayJoin(module) ||
+      (character && !contains(character)))
     return false;
   if (character && module->isKindOf(&Character::s_classCharacter)) return false;
   if (module->m_name.IsEmpty()) module->m_name = module->getRuntimeClass()->getName();
@@ -124,7 +152,8 @@ bool Database::moduleOfTypeExists(HRuntimeClass const* type) const {
 // --- selection ---
 
 bool Database::setPrimarySelectedModule(Module* module) {
-  if (module && !module->isInScene()) return false;
+  checkThread();
+  if (module && !contains(module)) return false;
   m_selection.setPrimary(module);
   return true;
 }
@@ -134,6 +163,7 @@ LabelingBone* Database::getSelectedLabelingBone(int i) const {
 }
 
 void Database::selectAllModules(bool select) {
+  checkThread();
   if (!select) return m_selection.clear();
   for (int i = 0; i < getNumModules(); ++i) m_selection.add(getModule(i));
 }
@@ -141,13 +171,13 @@ void Database::selectAllModules(bool select) {
 // --- clips and layers ---
 
 NLEClip* Database::getClipAfter(NLEClip const* clip) const {
-  if (!m_clips.contains(clip)) return nullptr;
+  if (!contains(clip)) return nullptr;
   const int next = m_clips.indexOf(clip) + 1;
   return next < getNumClips() ? m_clips.at(next) : nullptr;
 }
 
 void Database::setActiveClip(NLEClip* clip) {
-  if (!clip || clip->isInScene()) storeActive(clip, 0);
+  if (!clip || contains(clip)) storeActive(clip, 0);
 }
 
 bool Database::setActiveLayer(int layer) {

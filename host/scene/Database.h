@@ -1,18 +1,30 @@
-// The scene, reached through g_db: modules by path, index, identifier and selection; clips; active
-// properties; scene-wide settings. All changes of membership, hierarchy and selection pass through it.
+// A scene: modules by path, index, identifier and selection; clips; active properties; scene-wide settings.
+// All changes of membership, hierarchy and selection pass through it. It owns all that belongs to it: time,
+// channel names, clipboard, undo, events. Commands reach the current scene of their thread through g_db
+// (SceneScope.h); a module knows its own.
 #pragma once
 
+#include <atomic>
 #include <memory>
 #include <vector>
 
 #include "host/base/Log.h"
+#include "host/base/ThreadLocal.h"
 #include "host/scene/Clips.h"
 #include "host/scene/Selection.h"
 
 class CalibrationMgr;
 class ClipboardManager;
+class HTimeManager;
+class PropertyTable;
 class SceneIndex;
 class SubjectManager;
+struct SceneServices;
+
+class Database;
+
+// The current scene of the thread; null on a thread that has none.
+extern TALIX_THREAD_LOCAL Database* g_db;
 
 class Database {
  public:
@@ -20,6 +32,9 @@ class Database {
   ~Database();
   Database(Database const&) = delete;
   Database& operator=(Database const&) = delete;
+
+  // What g_db points at. Throws std::logic_error when the thread has no scene.
+  static Database& current();
 
   // An empty scene, with a new time manager's settings and the built-in channels only.
   void newScene();
@@ -30,9 +45,9 @@ class Database {
   // the scene. The first clip becomes active. Null for an abstract class or one that is no module class, a
   // name that cannot stand, a 32nd clip, a second module of a single-instance class, a parent that refuses.
   Module* createModule(HRuntimeClass* type, char const* name, Module* parent);
-  // Puts a module made by createInstance into the scene, which owns it from then on. `uniqueName`: it gets a
-  // name that its siblings do not have. `character` (may be null) becomes its parent. select: it becomes
-  // selected. False, and the caller keeps the module, when createModule would refuse.
+  // Puts a module that createInstance made for this scene into it; the scene owns it from then on.
+  // `uniqueName`: it gets a name that its siblings do not have. `character` (may be null) becomes its parent.
+  // select: it becomes selected. False, and the caller keeps the module, when createModule would refuse.
   bool addToScene(Module* module, bool uniqueName, Character const* character, bool select, bool notify);
   // Takes the module and all below it out of the scene, with every reference to them. It lives on until
   // releaseRemoved. False when it is not in the scene. The flags: with its children, from the selection,
@@ -46,6 +61,8 @@ class Database {
   // Destroys what was removed since; whoever runs commands calls it after each line.
   void releaseRemoved();
 
+  // Whether the module stands in this scene.
+  bool contains(Module const* module) const { return module->isInScene() && module->getDatabase() == this; }
   int getNumModules() const { return m_modules.getCount(); }
   Module* getModule(int i) const { return m_modules.at(i); }  // in order of creation
   Module* getModule(ControlID& id) const;
@@ -79,7 +96,7 @@ class Database {
   Module* getPriorityModule() const { return m_priority; }
   // Null: none. A module that is not in the scene is not taken.
   void setPrioritySearchModule(Module* module) {
-    if (!module || module->isInScene()) m_priority = module;
+    if (!module || contains(module)) m_priority = module;
   }
 
   // --- clips and layers ---
@@ -121,7 +138,18 @@ class Database {
   UndoJournal& getUndoJournal() { return m_journal; }
   // Puts lists in order again after undo and redo, and forgets what was cached.
   void restoreOrder();
+  // Forgets every cached world transform: what is active has changed.
+  void forgetWorldCache() { ++m_worldCache.epoch; }
+  // Whoever changes the scene or what it caches asks this first. Throws std::logic_error when this thread
+  // does not hold the scene.
+  void checkThread() const {
+    if (m_holder.load(std::memory_order_relaxed) != &g_db) [[unlikely]]
+      refuseThread();
+  }
 
+  HTimeManager* getTimeManager() const { return m_time.get(); }
+  PropertyTable& getPropertyTable() const { return *m_properties; }
+  SceneServices& getServices() const { return *m_services; }
   CalibrationMgr* getCalibrationMgr() const { return m_calibration.get(); }
   ClipboardManager* getClipboardManager() const { return m_clipboard.get(); }
   SubjectManager* getSubjectManager() const { return m_subjects.get(); }
@@ -131,7 +159,18 @@ class Database {
   void logInfo(char const* format, ...) TALIX_PRINTF(2, 3);
 
  private:
+  friend struct DefaultScene;
+  // services: those of the default scene; null: its own.
+  explicit Database(SceneServices* services);
+
   friend class Module;
+  friend class Node;
+  friend class SceneScope;
+
+  void hold();
+  void release();
+  static void makeCurrent(Database* scene);  // null: none
+  [[noreturn]] void refuseThread() const;
 
   void needsSorting(Module* parent) { m_unsortedParents.push_back(parent); }
   bool mayJoin(Module const* module) const;
@@ -154,9 +193,11 @@ class Database {
   std::vector<std::unique_ptr<Module>> m_removed;
   bool m_unsorted = false;  // lists in order of creation
   std::vector<Module*> m_unsortedParents;
-  UndoJournal m_journal;
-  uint64 m_created = 0;
-  Selection m_selection;
+  UndoJournal m_journal{*this};
+  uint64 m_created = 0;  // counts modules
+  uint64 m_linked = 0;   // and children
+  uint64 m_lastID = 0;
+  Selection m_selection{m_journal};
   Module* m_priority = nullptr;
   NLEClip* m_activeClip = nullptr;
   int m_activeLayer = 0;
@@ -165,9 +206,34 @@ class Database {
   bool m_solversBeforeClips = false;
   int m_upAxis = -1;
   uint64 m_undoMark = 0;
+
+  // World transforms are cached for one time, that of the last question: the current time when a scene is
+  // looked at, each frame in turn when something walks through time. A node's holds while its epoch
+  // is the cache's. A node that holds has ancestors that hold.
+  struct WorldCache {
+    int64 time = 0;
+    uint64 epoch = 1;
+  } m_worldCache;
+
+  std::atomic<void const*> m_holder = nullptr;  // tells the thread that holds the scene
+  int m_holds = 0;                              // scopes of that thread
+
+  std::unique_ptr<SceneServices> m_ownServices;  // null: the default scene, which has the default ones
+  SceneServices* m_services;
+  std::unique_ptr<HTimeManager> m_time;
+  std::unique_ptr<PropertyTable> m_properties;
   std::unique_ptr<CalibrationMgr> m_calibration;
   std::unique_ptr<ClipboardManager> m_clipboard;
   std::unique_ptr<SubjectManager> m_subjects;
 };
 
-extern Database* g_db;
+inline UndoJournal& Module::journal() const { return m_database->m_journal; }
+
+inline bool Module::isRecorded() const {
+  m_database->checkThread();
+  return journal().isRecording() && m_enteredStep != journal().getStep() && (isInScene() || m_undoHolds > 0);
+}
+
+inline Database* Controller::getDatabase() const {
+  return m_module ? m_module->getDatabase() : &Database::current();
+}

@@ -12,16 +12,19 @@
 // A module came into the scene or left it; it keeps its parent, its children and its place among all.
 struct Database::Membership : UndoChange {
   explicit Membership(Module& concerned) : UndoChange(&concerned), module(concerned) {}
-  void swap() override { module.isInScene() ? g_db->unjoin(&module) : g_db->join(&module); }
+  void swap() override {
+    Database& scene = *module.getDatabase();
+    module.isInScene() ? scene.unjoin(&module) : scene.join(&module);
+  }
   int64 memoryUse() const override { return sizeof *this + module.memoryUse(); }
 
   Module& module;
 };
 
 void Database::enter(Module* module) {
-  if (UndoJournal::isRecording()) {
+  if (m_journal.isRecording()) {
     m_journal.add(std::make_unique<Membership>(*module));
-    module->m_enteredStep = UndoJournal::getStep();
+    module->m_enteredStep = m_journal.getStep();
   }
   module->m_order = ++m_created;
   join(module);
@@ -48,7 +51,7 @@ void Database::leave(Module* module) {
     for (Module* other : m_modules.toVector())
       for (int i = 0; i < other->getNumChannels(); ++i) other->getChannel(i)->forgetClip(clip);
   }
-  if (UndoJournal::isRecording()) m_journal.add(std::make_unique<Membership>(*module));
+  if (m_journal.isRecording()) m_journal.add(std::make_unique<Membership>(*module));
   unjoin(module);
 }
 
@@ -66,7 +69,8 @@ void Database::unjoin(Module* module) {
 }
 
 bool Database::removeFromScene(Module* module, bool, bool, bool, bool) {
-  if (!module || !module->isInScene()) return false;
+  checkThread();
+  if (!module || !contains(module)) return false;
   TSimpleArray<Module*> all(64, 4096);
   module->getModAndDecedents(all);
   if (module->getParent()) module->storeParent(nullptr);
@@ -83,31 +87,33 @@ bool Database::removeFromScene(Module* module, bool, bool, bool, bool) {
 
 // The frame rate is among it: what frames mean hangs on it. Small, and changed together as often as not.
 struct Database::SettingsChange : UndoChange {
-  SettingsChange()
+  explicit SettingsChange(Database& concerned)
       : UndoChange(nullptr),
-        clip(g_db->m_activeClip),
-        layer(g_db->m_activeLayer),
-        upAxis(g_db->m_upAxis),
-        properties(g_db->m_activeProperties),
-        rate(HTimeManager::getInstance()->getFrameRate()) {}
+        scene(concerned),
+        clip(scene.m_activeClip),
+        layer(scene.m_activeLayer),
+        upAxis(scene.m_upAxis),
+        properties(scene.m_activeProperties),
+        rate(scene.m_time->getFrameRate()) {}
   void swap() override {
-    std::swap(clip, g_db->m_activeClip);
-    std::swap(layer, g_db->m_activeLayer);
-    std::swap(upAxis, g_db->m_upAxis);
-    std::swap(properties, g_db->m_activeProperties);
-    const HFrameRate now = HTimeManager::getInstance()->getFrameRate();
-    HTimeManager::getInstance()->setFrameRate(rate);
+    std::swap(clip, scene.m_activeClip);
+    std::swap(layer, scene.m_activeLayer);
+    std::swap(upAxis, scene.m_upAxis);
+    std::swap(properties, scene.m_activeProperties);
+    const HFrameRate now = scene.m_time->getFrameRate();
+    scene.m_time->setFrameRate(rate);
     rate = now;
   }
   bool isVoid() const override {
-    return clip == g_db->m_activeClip && layer == g_db->m_activeLayer && upAxis == g_db->m_upAxis &&
-           properties == g_db->m_activeProperties && rate == HTimeManager::getInstance()->getFrameRate();
+    return clip == scene.m_activeClip && layer == scene.m_activeLayer && upAxis == scene.m_upAxis &&
+           properties == scene.m_activeProperties && rate == scene.m_time->getFrameRate();
   }
   int64 memoryUse() const override {
     return static_cast<int64>(sizeof *this +
-                              sizeof(unsigned) * (properties.size() + g_db->m_activeProperties.size()));
+                              sizeof(unsigned) * (properties.size() + scene.m_activeProperties.size()));
   }
 
+  Database& scene;
   NLEClip* clip;
   int layer;
   int upAxis;
@@ -116,7 +122,8 @@ struct Database::SettingsChange : UndoChange {
 };
 
 void Database::recordSettings() {
-  if (UndoJournal::isDue(m_undoMark)) m_journal.add(std::make_unique<SettingsChange>());
+  checkThread();
+  if (m_journal.isDue(m_undoMark)) m_journal.add(std::make_unique<SettingsChange>(*this));
 }
 
 void Database::storeActive(NLEClip* clip, int layer) {
@@ -124,7 +131,7 @@ void Database::storeActive(NLEClip* clip, int layer) {
   const bool switched = clip != m_activeClip;
   m_activeClip = clip;
   m_activeLayer = layer;
-  if (switched) Node::forgetWorldCache();
+  if (switched) forgetWorldCache();
 }
 
 void Database::setActiveProperties(std::vector<unsigned> ids) {
@@ -154,5 +161,5 @@ void Database::restoreOrder() {
   for (Module* parent : m_unsortedParents) parent->sortChildren();
   m_unsortedParents.clear();
   m_selection.restoreOrder();
-  Node::forgetWorldCache();
+  forgetWorldCache();
 }

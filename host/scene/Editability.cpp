@@ -12,7 +12,8 @@ Obstacle obstacleToKeys(Controller const& channel, NLEClip const* clip, int laye
 }
 
 Obstacle obstacleToKeys(Controller const& channel) {
-  return obstacleToKeys(channel, g_db->getActiveClip(), g_db->getActiveLayer());
+  Database const& scene = *channel.getDatabase();
+  return obstacleToKeys(channel, scene.getActiveClip(), scene.getActiveLayer());
 }
 
 Obstacle obstacleToDefault(Controller const& channel) {
@@ -22,7 +23,7 @@ Obstacle obstacleToDefault(Controller const& channel) {
 }
 
 Obstacle obstacleToValue(Controller const& channel) {
-  return g_db->getActiveClip() ? obstacleToKeys(channel) : obstacleToDefault(channel);
+  return channel.getDatabase()->getActiveClip() ? obstacleToKeys(channel) : obstacleToDefault(channel);
 }
 
 Obstacle obstacleToPreTransform(Node const& node) {

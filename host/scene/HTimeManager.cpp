@@ -6,12 +6,9 @@
 
 #include "host/scene/Database.h"
 
-HTimeManager::HTimeManager() { reset(); }
+HTimeManager::HTimeManager(Database* scene) : m_scene(scene) { reset(); }
 
-HTimeManager* HTimeManager::getInstance() {
-  static HTimeManager manager;
-  return &manager;
-}
+HTimeManager* HTimeManager::getInstance() { return Database::current().getTimeManager(); }
 
 void HTimeManager::reset() {
   m_rate = HFrameRate();
@@ -21,11 +18,18 @@ void HTimeManager::reset() {
 }
 
 void HTimeManager::setFrameRate(HFrameRate const& rate) {
-  g_db->recordSettings();
+  if (m_scene) m_scene->recordSettings();
   m_rate = rate;
 }
 
-void HTimeManager::setTime(int64 time, bool) { m_time = std::clamp(time, -kForever, kForever); }
+void HTimeManager::checkThread() const {
+  if (m_scene) m_scene->checkThread();
+}
+
+void HTimeManager::setTime(int64 time, bool) {
+  checkThread();
+  m_time = std::clamp(time, -kForever, kForever);
+}
 
 int64 HTimeManager::getTime(int frame) const {
   const int64 ticks = getTicksPerFrame();
@@ -75,12 +79,24 @@ double HTimeManager::stringToFrameDouble(HString const& text, bool relative) con
   return rate.frameFromTimecode(text, frame) ? static_cast<double>(frame) : 0;
 }
 
+void HTimeManager::setAnimRange(HTimeRange range) {
+  checkThread();
+  m_animRange = range;
+}
+
 void HTimeManager::setPlayRange(HTimeRange range, bool keepTime) {
+  checkThread();
   m_playRange = range;
   if (!keepTime && !range.isEmpty()) setTime(std::clamp(m_time, range.getStart(), range.getEnd()), true);
 }
 
+void HTimeManager::clearSelectedTimeRanges() {
+  checkThread();
+  m_selected.clear();
+}
+
 void HTimeManager::addSelectedTimeRange(HTimeRange range) {
+  checkThread();
   if (range.isEmpty()) return;
   const auto before = [](HTimeRange const& a, HTimeRange const& b) { return a.getEnd() < b.getStart(); };
   // All ranges that meet the new one grow into it.

@@ -1,4 +1,4 @@
-// Scene time: frame rate, current time, play, animation and selected ranges. Times are ticks.
+// Time of a scene: frame rate, current time, play, animation and selected ranges. Times are ticks.
 #pragma once
 
 #include <vector>
@@ -6,13 +6,16 @@
 #include "host/time/HFrameRate.h"
 #include "host/time/HTimeRange.h"
 
+class Database;
+
 class HTimeManager {
  public:
   enum ERoundDirection { RoundDown, RoundNearest, RoundUp };
 
   // A new scene's: 120 frames a second, "Custom", time 0, play and animation ranges 0 to 100 frames.
-  HTimeManager();
-  static HTimeManager* getInstance();
+  // scene: whose time it is, which records a change of the rate; null: nobody's.
+  explicit HTimeManager(Database* scene = nullptr);
+  static HTimeManager* getInstance();  // that of the current scene
   void reset();
 
   HFrameRate const& getFrameRate() const { return m_rate; }
@@ -45,7 +48,7 @@ class HTimeManager {
 
   HTimeRange getAnimRange() const { return m_animRange; }
   HTimeRange getPlayRange() const { return m_playRange; }
-  void setAnimRange(HTimeRange range) { m_animRange = range; }
+  void setAnimRange(HTimeRange range);
   // `keepTime`: the current time stays although it lies outside.
   void setPlayRange(HTimeRange range, bool keepTime);
 
@@ -53,9 +56,12 @@ class HTimeManager {
   int getNumSelectedRanges() const { return static_cast<int>(m_selected.size()); }
   HTimeRange getSelectedTimeRange(int i) const { return m_selected[static_cast<size_t>(i)]; }
   void addSelectedTimeRange(HTimeRange range);
-  void clearSelectedTimeRanges() { m_selected.clear(); }
+  void clearSelectedTimeRanges();
 
  private:
+  void checkThread() const;
+
+  Database* m_scene;
   HFrameRate m_rate;
   int64 m_time = 0;
   HTimeRange m_animRange, m_playRange;

@@ -22,8 +22,8 @@ Marker* Marker::createInstance() {
 
 namespace {
 
-int64 frameBehind(int64 time) {
-  return HTimeManager::getInstance()->frameTime(time + 1, HTimeManager::RoundUp, 0);
+int64 frameBehind(Database const& scene, int64 time) {
+  return scene.getTimeManager()->frameTime(time + 1, HTimeManager::RoundUp, 0);
 }
 
 }  // namespace
@@ -31,12 +31,12 @@ int64 frameBehind(int64 time) {
 bool Marker::isUnlabeled() const { return getCharacterParent() == nullptr; }
 
 void Marker::setFillType(int64 const& time, EFillType const& type, bool) {
-  NLEClip const* clip = g_db->getActiveClip();
+  NLEClip const* clip = getDatabase()->getActiveClip();
   if (!clip || !clip->holdsKeys() || isLocked()) return;
   Controller* channel = addChannel("FillType", DataSource::IntProperty);
   if (!channel || !channel->isEditable()) return;
   // The rest of a reduced run stays one, but where recorded data says that it ends.
-  const int64 next = frameBehind(time);
+  const int64 next = frameBehind(*getDatabase(), time);
   const bool goesOn =
       type != Reduced && type != Recorded && isReducedBehind(time) && !channel->hasKeyAt(next);
   channel->beginDataEdit(HTimeRange(time - 1, next));
@@ -46,9 +46,9 @@ void Marker::setFillType(int64 const& time, EFillType const& type, bool) {
 }
 
 bool Marker::isReducedBehind(int64 time) const {
-  NLEClip const* clip = g_db->getActiveClip();
+  NLEClip const* clip = getDatabase()->getActiveClip();
   Controller const* channel = getChannel("FillType");
-  const int64 frame = frameBehind(time);
+  const int64 frame = frameBehind(*getDatabase(), time);
   int64 latest = -kForever - 1;
   double type = Recorded;
   for (int layer = clip && channel ? clip->getNumLayers() : 0; layer-- > 0;) {
@@ -64,7 +64,7 @@ bool Marker::isReducedBehind(int64 time) const {
 // Each key speaks for its own time only: without one the data was recorded. Fill types of layers do not add
 // up, the highest layer's says.
 Marker::EFillType Marker::getFillType(int64 time) const {
-  NLEClip const* clip = g_db->getActiveClip();
+  NLEClip const* clip = getDatabase()->getActiveClip();
   Controller const* channel = getChannel("FillType");
   for (int layer = clip && channel ? clip->getNumLayers() : 0; layer-- > 0;) {
     KeyTrack const* track = channel->findTrack(clip, layer);

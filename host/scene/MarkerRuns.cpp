@@ -96,7 +96,10 @@ void markReduced(Marker& marker, NLEClip* clip, int layer, KeyTrack const& befor
 }
 
 CutRuns::CutRuns(Controller const& channel, int64 first, int64 last)
-    : m_clip(g_db->getActiveClip()), m_first(first), m_last(last), m_before(KeyTrack::Shape::Vector) {
+    : m_clip(channel.getDatabase()->getActiveClip()),
+      m_first(first),
+      m_last(last),
+      m_before(KeyTrack::Shape::Vector) {
   auto* marker = objectAs<Marker>(channel.getModule());
   if (!m_clip || !marker || marker->getTranslationChannel() != &channel) return;
   Controller const* types = marker->getChannel("FillType");

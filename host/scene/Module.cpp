@@ -5,6 +5,7 @@
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/ModuleChildren.h"
+#include "host/scene/PropertyTable.h"
 #include "host/scene/SceneIndex.h"
 
 H_DEFINE_ABSTRACT_CLASS(Module);
@@ -39,11 +40,12 @@ void Module::forgetByAll() {
   while (m_referrers && !m_referrers->empty()) m_referrers->begin()->first->forget(this);
 }
 
-Module::Module() = default;
+Module::Module() : m_database(&Database::current()) {}
 
 Module::~Module() { forgetByAll(); }
 
 void Module::setUp() {
+  m_id = ControlID(++m_database->m_lastID);
   addBuiltIn<NameAttribute>("Name");
   addBuiltIn<BoolAttribute>("Visible", true);
   addBuiltIn<BoolAttribute>("Locked");
@@ -90,9 +92,9 @@ std::string Module::suffixText(int levels) const {
 HString Module::getFullPathString() const { return HString("\\" + suffixText(INT32_MAX)); }
 
 HString Module::getMinimumPathString(bool withinPriority) const {
-  Module const* priority = withinPriority ? g_db->getPriorityModule() : nullptr;
+  Module const* priority = withinPriority ? m_database->getPriorityModule() : nullptr;
   if (priority && priority != this && !isDescendedFrom(priority)) priority = nullptr;
-  const int levels = g_db->getIndex().levelsToTell(this, priority);
+  const int levels = m_database->getIndex().levelsToTell(this, priority);
   return levels == 0 ? getFullPathString() : HString(suffixText(levels));
 }
 
@@ -125,7 +127,7 @@ int Module::findMarkerChild(HString const& name) const {
     if (found < 0 || index < found) found = index;
     return true;
   };
-  if (m_children) g_db->getIndex().forEachChild(this, name.GetString(), visit);
+  if (m_children) m_database->getIndex().forEachChild(this, name.GetString(), visit);
   return found;
 }
 
@@ -158,7 +160,7 @@ void Module::getModAndDecedents(TSimpleArray<Module*>& out) {
 }
 
 bool Module::addChild(Module* child) {
-  if (!child || child == this || isDescendedFrom(child) || !isInScene() || !child->isInScene() ||
+  if (!child || child == this || isDescendedFrom(child) || !isInScene() || !m_database->contains(child) ||
       child->isKindOf(&Character::s_classCharacter))
     return false;
   if (child->m_parent != this) child->storeParent(this);
@@ -188,6 +190,7 @@ Attribute* Module::getAttribute(ControlID id) const {
 Attribute* Module::addAttribute(std::unique_ptr<Attribute> attribute, Attribute::Reaction reaction) {
   const Attribute::Type type = attribute->getType();
   attribute->m_module = this;
+  attribute->m_id = ControlID(++m_database->m_lastID);
   attribute->m_reaction = reaction;
   attribute->m_canBeUnset = attribute->m_custom || type == Attribute::Color ||
                             type == Attribute::ModuleReference || type == Attribute::MultiModule;
@@ -211,7 +214,7 @@ bool Module::isValidPropertyName(HString const& name) {
 // --- channels ---
 
 Controller* Module::getChannel(char const* name) const {
-  return getProperty(Controller::mapPropertyName(HString(name)));
+  return getProperty(m_database->getPropertyTable().findId(HString(name)));
 }
 
 Controller* Module::getChannel(ControlID id) const {
@@ -240,7 +243,7 @@ void Module::addToClip(NLEClip*) {}
 
 HTimeRange Module::getDataRange() const {
   HTimeRange range;
-  NLEClip const* clip = g_db->getActiveClip();
+  NLEClip const* clip = m_database->getActiveClip();
   for (auto const& channel : m_channels) range.include(channel->getKeyRangeInClip(clip));
   return range;
 }
@@ -287,6 +290,7 @@ void Module::setVisible(bool visible, bool notify) {
 bool Module::isLocked() const { return static_cast<BoolAttribute*>(getAttribute(kLocked))->getValue(); }
 
 void Module::setSelected(bool selected) {
+  m_database->checkThread();
   if (!isInScene()) return;
-  selected ? g_db->getSelection().add(this) : g_db->getSelection().remove(this);
+  selected ? m_database->getSelection().add(this) : m_database->getSelection().remove(this);
 }

@@ -18,6 +18,7 @@
 #include "host/scene/UndoJournal.h"
 
 class Character;
+class Database;
 class Marker;
 class NLEClip;
 class Node;
@@ -29,6 +30,9 @@ class Module : public HObject {
   enum EPathType { NameOnly = 0, ShortestPath = 1, FullPath = 3 };
 
   ~Module() override;
+
+  // The scene that it was made for, in it or not: that which createModule was asked of, or the current one.
+  Database* getDatabase() const { return m_database; }
 
   // --- names and paths ---
   virtual HString getName() const { return m_name; }
@@ -131,12 +135,10 @@ class Module : public HObject {
   void setReaction(Attribute* attribute, Attribute::Reaction reaction) { attribute->m_reaction = reaction; }
   // Something that shows in the module's value at a time has changed.
   virtual void dataChanged(Controller const*) {}
+  inline UndoJournal& journal() const;
   // Whether the undo journal is to hear of changes of this module: not while it is set up, nor in the step
-  // that brings it into the scene.
-  bool isRecorded() const {
-    return UndoJournal::isRecording() && m_enteredStep != UndoJournal::getStep() &&
-           (isInScene() || m_undoHolds > 0);
-  }
+  // that brings it into the scene. Every mutator asks, which checks that the thread holds the scene.
+  inline bool isRecorded() const;
 
  private:
   friend class Attribute;
@@ -168,8 +170,9 @@ class Module : public HObject {
   struct Children;
   Children& children();
 
+  Database* m_database;
   HString m_name;
-  ControlID m_id{ControlID::CreateUnique};
+  ControlID m_id;
   Module* m_parent = nullptr;
   std::unique_ptr<Children> m_children;  // null: none yet
   uint32 m_childSlot = kNoSlot;

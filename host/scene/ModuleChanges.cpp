@@ -23,11 +23,11 @@ struct Module::NameChange : UndoChange {
 };
 
 void Module::storeName(HString const& name) {
-  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<NameChange>(*this));
+  if (isRecorded()) journal().add(std::make_unique<NameChange>(*this));
   const bool indexed = isInScene();
-  if (indexed) g_db->getIndex().remove(this);
+  if (indexed) m_database->getIndex().remove(this);
   m_name = name;
-  if (indexed) g_db->getIndex().add(this);
+  if (indexed) m_database->getIndex().add(this);
 }
 
 // --- parent ---
@@ -50,19 +50,18 @@ struct Module::ParentChange : UndoChange {
 };
 
 void Module::storeParent(Module* parent) {
-  static uint64 s_linked = 0;
-  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<ParentChange>(*this));
-  moveTo(parent, ++s_linked);
+  if (isRecorded()) journal().add(std::make_unique<ParentChange>(*this));
+  moveTo(parent, ++m_database->m_linked);
 }
 
 void Module::moveTo(Module* parent, uint64 order) {
   const bool indexed = isInScene();
-  if (indexed) g_db->getIndex().remove(this);
+  if (indexed) m_database->getIndex().remove(this);
   unlinkFromParent();
   m_parent = parent;
   m_childOrder = order;
   linkToParent();
-  if (indexed) g_db->getIndex().add(this);
+  if (indexed) m_database->getIndex().add(this);
   Node::markMoved(this);
 }
 
@@ -70,7 +69,7 @@ void Module::linkToParent() {
   if (!m_parent || m_childSlot != kNoSlot) return;
   auto const& siblings = m_parent->children().all;
   const int count = siblings.getCount();
-  if (count > 0 && siblings.at(count - 1)->m_childOrder > m_childOrder) g_db->needsSorting(m_parent);
+  if (count > 0 && siblings.at(count - 1)->m_childOrder > m_childOrder) m_database->needsSorting(m_parent);
   m_parent->children().editFor(this, [this](auto& list) { list.append(this); });
 }
 
@@ -108,12 +107,12 @@ struct Module::Addition : UndoChange {
 
 void Module::storeAttribute(std::unique_ptr<Attribute> attribute) {
   m_attributes.push_back(std::move(attribute));
-  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<Addition<Attribute>>(*this, m_attributes));
+  if (isRecorded()) journal().add(std::make_unique<Addition<Attribute>>(*this, m_attributes));
 }
 
 void Module::storeChannel(std::unique_ptr<Controller> channel) {
   m_channels.push_back(std::move(channel));
-  if (isRecorded()) g_db->getUndoJournal().add(std::make_unique<Addition<Controller>>(*this, m_channels));
+  if (isRecorded()) journal().add(std::make_unique<Addition<Controller>>(*this, m_channels));
 }
 
 int64 Module::memoryUse() const {

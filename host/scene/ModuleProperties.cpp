@@ -1,5 +1,6 @@
 // Channels of a module by name, and numbers of channels and attributes by name.
 
+#include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/Node.h"
 #include "host/scene/PropertyTable.h"
@@ -84,12 +85,13 @@ HString attributeValue(Attribute const& attribute, double& value) {
 
 Controller* Module::addChannel(HString const& name, DataSource::PropertyType type) {
   if (getAttribute(name.GetStr())) return nullptr;
-  const unsigned id = PropertyTable::getInstance().add(name, type);
+  const unsigned id = m_database->getPropertyTable().add(name, type);
   if (id == 0) return nullptr;
   if (Controller* existing = getProperty(id)) return existing;
   std::unique_ptr<Controller> channel = Controller::create(type);
   channel->m_module = this;
   channel->m_propertyId = id;
+  channel->m_id = ControlID(++m_database->m_lastID);
   storeChannel(std::move(channel));
   return m_channels.back().get();
 }
@@ -97,15 +99,17 @@ Controller* Module::addChannel(HString const& name, DataSource::PropertyType typ
 HString Module::getPropertyVal(HString const& name, double& value, bool byDefault) const {
   HString channelName = name;
   const int component = splitComponent(channelName);
-  const DataSource::PropertyType type = Controller::mapToPropertyType(channelName);
-  if (type != DataSource::NoProperty) {
-    Controller const* channel = getProperty(channelName);
+  PropertyTable const& table = m_database->getPropertyTable();
+  const unsigned id = table.findId(channelName);
+  if (id != 0) {
+    const DataSource::PropertyType type = table.getType(id);
+    Controller const* channel = getProperty(id);
     HString text;
     if (!channel) {
       text.Format("Cannot find property named %s on module %s", name.GetStr(), getName().GetStr());
       return text;
     }
-    const int64 now = HTimeManager::getInstance()->getTime();
+    const int64 now = m_database->getTimeManager()->getTime();
     const bool several = type == DataSource::Vec3Property || type == DataSource::RotProperty;
     if (several && component < 0) return "Use getVectorProperty for this type of property";
     value =

@@ -14,31 +14,22 @@ H_DEFINE_CLASS(Node);
 
 namespace {
 
-// World transforms are cached for one time, that of the last question: the current time when a scene is
-// looked at, each frame in turn when something walks through time. A node's holds while its epoch
-// is the cache's. A node that holds has ancestors that hold.
-struct WorldCache {
-  int64 time = 0;
-  uint64 epoch = 1;
-} s_cache;
-
 bool isFinite(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
 
-int64 now() { return HTimeManager::getInstance()->getTime(); }
+int64 now(Node const& node) { return node.getDatabase()->getTimeManager()->getTime(); }
 
 }  // namespace
 
-void Node::forgetWorldCache() { ++s_cache.epoch; }
-
 void Node::markMoved(Module* module) {
+  const uint64 epoch = module->getDatabase()->m_worldCache.epoch;
   auto const* top = objectAs<Node>(module);
-  if (top && top->m_worldEpoch != s_cache.epoch) return;
+  if (top && top->m_worldEpoch != epoch) return;
   std::vector<Module*> open{module};
   while (!open.empty()) {
     Module* next = open.back();
     open.pop_back();
     if (auto* node = objectAs<Node>(next)) {
-      if (node->m_worldEpoch != s_cache.epoch) continue;
+      if (node->m_worldEpoch != epoch) continue;
       node->m_worldEpoch = 0;
     }
     for (int i = 0; i < next->getNumChildren(); ++i) open.push_back(next->getChild(i));
@@ -46,15 +37,18 @@ void Node::markMoved(Module* module) {
 }
 
 Transform Node::getWorldTransform(int64 time) const {
-  if (time != s_cache.time) {
-    s_cache.time = time;
-    ++s_cache.epoch;
+  Database& scene = *getDatabase();
+  scene.checkThread();
+  Database::WorldCache& cache = scene.m_worldCache;
+  if (time != cache.time) {
+    cache.time = time;
+    ++cache.epoch;
   }
-  if (m_worldEpoch == s_cache.epoch) return m_world;
+  if (m_worldEpoch == cache.epoch) return m_world;
   Node const* parent = getNodeParent();
-  if (!parent || parent->m_worldEpoch == s_cache.epoch) return cacheBelow(parent, time);
+  if (!parent || parent->m_worldEpoch == cache.epoch) return cacheBelow(parent, time);
   std::vector<Node const*> chain{this};
-  for (; parent && parent->m_worldEpoch != s_cache.epoch; parent = parent->getNodeParent())
+  for (; parent && parent->m_worldEpoch != cache.epoch; parent = parent->getNodeParent())
     chain.push_back(parent);
   for (auto node = chain.rbegin(); node != chain.rend(); ++node) {
     (*node)->cacheBelow(parent, time);
@@ -66,7 +60,7 @@ Transform Node::getWorldTransform(int64 time) const {
 Transform const& Node::cacheBelow(Node const* parent, int64 time) const {
   const Transform own = inParent(time);
   m_world = parent ? parent->m_world * own : own;
-  m_worldEpoch = s_cache.epoch;
+  m_worldEpoch = getDatabase()->m_worldCache.epoch;
   return m_world;
 }
 
@@ -185,11 +179,13 @@ Vec3 Node::getPreTranslationWS() const { return getPreTranslationInSpaceOfNode(n
 TalixRotation Node::getPreRotationWS() const { return getPreRotationInSpaceOfNode(nullptr); }
 
 Vec3 Node::getPreTranslationInSpaceOfNode(Node* space) const {
-  return relativeTo(space, now(), parentWorld(now()) * Transform{m_preTranslation, {}, {1, 1, 1}}).position;
+  return relativeTo(space, now(*this), parentWorld(now(*this)) * Transform{m_preTranslation, {}, {1, 1, 1}})
+      .position;
 }
 
 TalixRotation Node::getPreRotationInSpaceOfNode(Node* space) const {
-  return relativeTo(space, now(), parentWorld(now()) * Transform{{}, m_preRotation, {1, 1, 1}}).rotation;
+  return relativeTo(space, now(*this), parentWorld(now(*this)) * Transform{{}, m_preRotation, {1, 1, 1}})
+      .rotation;
 }
 
 // --- writing ---
@@ -200,7 +196,7 @@ Vec3 Node::translationFor(Vec3 const& inParent) const {
 
 void Node::writeAt(Controller* channel, int64 time, Controller::Values const& values) {
   if (obstacleToValue(*channel) != Obstacle::none) return;
-  if (g_db->getActiveClip()) {
+  if (getDatabase()->getActiveClip()) {
     channel->beginDataEdit(HTimeRange(time, time));
     channel->writeKeyAt(time, channel->solveLayer(time, values), KeyTrack::kAll);
   } else {
@@ -275,8 +271,8 @@ struct Node::PreTransformChange : UndoChange {
 };
 
 void Node::storePreTransform(Vec3 const& translation, TalixRotation const& rotation) {
-  if (isRecorded() && UndoJournal::isDue(m_preTransformMark))
-    g_db->getUndoJournal().add(std::make_unique<PreTransformChange>(*this));
+  if (isRecorded() && journal().isDue(m_preTransformMark))
+    journal().add(std::make_unique<PreTransformChange>(*this));
   m_preTranslation = translation;
   m_preRotation = rotation;
   markMoved(this);
@@ -296,9 +292,9 @@ bool Node::setPreTranslation(Vec3 const& translation) {
 }
 
 void Node::setPreRotationWS(TalixRotation const& rotation) {
-  setPreRotation(parentWorld(now()).rotation.inverse() * rotation, false);
+  setPreRotation(parentWorld(now(*this)).rotation.inverse() * rotation, false);
 }
 
 void Node::setPreTranslationWS(Vec3 const& translation) {
-  setPreTranslation(positionRelativeTo(parentWorld(now()), translation));
+  setPreTranslation(positionRelativeTo(parentWorld(now(*this)), translation));
 }

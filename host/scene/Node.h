@@ -19,8 +19,6 @@ class Node : public Module {
   Vec3Controller* getTranslationChannel() const { return m_translation; }
   RotController* getRotationChannel() const { return m_rotation; }
   Vec3Controller* getScaleChannel() const { return m_scale; }
-  // Forgets every cached world transform: what is active has changed.
-  static void forgetWorldCache();
   // Marks the nodes at and below a module as moved, stopping where that is known already.
   static void markMoved(Module* module);
 
@@ -104,9 +102,10 @@ class Node : public Module {
   MarkerConnection const& getConnectingLine(int i) const { return m_lines.at(i); }
   // For reading: a line with another colour is added in place of the former one.
   MarkerConnection* getConnectionTo(Node const* target) { return m_lines.find(target); }
-  // Replaces a line to the same target.
+  // Replaces a line to the same target. One to a node of another scene is not taken.
   void addConnectingLine(MarkerConnection const& line) {
-    if (line.getTarget()) m_lines.store(line.getTarget(), &line);
+    if (line.getTarget() && line.getTarget()->getDatabase() == getDatabase())
+      m_lines.store(line.getTarget(), &line);
   }
   void removeConnectingLine(MarkerConnection const& line) { removeConnectingLine(line.getTarget()); }
   void removeConnectingLine(Node* target) { m_lines.store(target, nullptr); }

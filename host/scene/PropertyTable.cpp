@@ -4,10 +4,7 @@
 
 #include "host/scene/Database.h"
 
-PropertyTable& PropertyTable::getInstance() {
-  static PropertyTable table;
-  return table;
-}
+PropertyTable& PropertyTable::getInstance() { return Database::current().getPropertyTable(); }
 
 void PropertyTable::reset() {
   m_entries.clear();
@@ -42,14 +39,14 @@ DataSource::PropertyType PropertyTable::getType(unsigned id) const {
 
 // The last name added: later ones have gone before it.
 struct PropertyTable::Addition : UndoChange {
-  Addition(HString const& text, DataSource::PropertyType kind)
-      : UndoChange(nullptr), name(text), type(kind) {}
+  Addition(PropertyTable& concerned, HString const& text, DataSource::PropertyType kind)
+      : UndoChange(nullptr), table(concerned), name(text), type(kind) {}
   void swap() override {
-    PropertyTable& table = getInstance();
     table.findId(name) ? table.removeLast() : static_cast<void>(table.store(name, type));
   }
   int64 memoryUse() const override { return static_cast<int64>(sizeof *this + name.GetString().size()); }
 
+  PropertyTable& table;
   HString name;
   DataSource::PropertyType type;
 };
@@ -58,7 +55,7 @@ unsigned PropertyTable::add(HString const& name, DataSource::PropertyType type) 
   if (const unsigned known = findId(name)) return getType(known) == type ? known : 0;
   if (!Module::isValidPropertyName(name) || m_entries.size() == kIdMask) return 0;
   const unsigned id = store(name, type);
-  if (UndoJournal::isRecording()) g_db->getUndoJournal().add(std::make_unique<Addition>(name, type));
+  if (m_journal.isRecording()) m_journal.add(std::make_unique<Addition>(*this, name, type));
   return id;
 }
 
@@ -100,6 +97,8 @@ DataSource::PropertyType Controller::mapToPropertyType(HString const& name) {
 DataSource::PropertyType Controller::mapToPropertyType(unsigned id) {
   return PropertyTable::getInstance().getType(id);
 }
+
+HString Controller::getName() const { return getDatabase()->getPropertyTable().getName(m_propertyId); }
 
 HString Controller::mapPropertyId(unsigned id) { return PropertyTable::getInstance().getName(id); }
 

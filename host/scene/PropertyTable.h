@@ -1,4 +1,4 @@
-// Channel names, their ids and kinds. A channel name has one kind everywhere.
+// The channel names of a scene, their ids and kinds. A channel name has one kind everywhere in it.
 //
 // An id is a small number (low 16 bits, from 1) to which the component bits of an active property may be
 // added.
@@ -12,13 +12,20 @@
 #include "host/base/HString.h"
 #include "host/scene/DataSource.h"
 
+class UndoJournal;
+
 class PropertyTable {
  public:
   static constexpr unsigned kIdMask = 0xffff;
   static constexpr unsigned kX = 0x10000000, kY = 0x20000000, kZ = 0x40000000;
   static constexpr unsigned kWhole = kX | kY | kZ;
 
-  static PropertyTable& getInstance();
+  // journal: that of the scene, to which additions are told.
+  explicit PropertyTable(UndoJournal& journal) : m_journal(journal) { reset(); }
+  PropertyTable(PropertyTable const&) = delete;
+  PropertyTable& operator=(PropertyTable const&) = delete;
+
+  static PropertyTable& getInstance();  // that of the current scene
 
   // Back to the built-in channels: "Translation", "Rotation", "Scale", "Occluded", "Residual", "Weight",
   // "FocalLength", "Threshold", "Length", "FillType".
@@ -38,8 +45,6 @@ class PropertyTable {
   HString restoreCase(HString const& name) const;
 
  private:
-  PropertyTable() { reset(); }
-
   struct Addition;
   unsigned store(HString const& name, DataSource::PropertyType type);  // mutator: adds at the end
   void removeLast();
@@ -48,6 +53,7 @@ class PropertyTable {
     HString name;
     DataSource::PropertyType type;
   };
+  UndoJournal& m_journal;
   std::vector<Entry> m_entries;  // id - 1
   std::unordered_map<std::string, unsigned> m_ids;
   std::unordered_map<std::string, std::vector<unsigned>> m_idsByLowerName;

@@ -1,7 +1,5 @@
 #include "host/scene/Selection.h"
 
-#include "host/scene/Database.h"
-
 // What was selected and deselected in a step, one after the other.
 struct Selection::Change : UndoChange {
   explicit Change(Selection& concerned)
@@ -49,11 +47,11 @@ struct Selection::Change : UndoChange {
 };
 
 void Selection::record(Module* module) {
-  if (!UndoJournal::isRecording()) return;
-  if (UndoJournal::isDue(m_undoMark)) {
+  if (!m_journal.isRecording()) return;
+  if (m_journal.isDue(m_undoMark)) {
     auto change = std::make_unique<Change>(*this);
     m_change = change.get();
-    g_db->getUndoJournal().add(std::move(change));
+    m_journal.add(std::move(change));
   }
   if (module) m_change->entries.push_back({module, module->m_selectionOrder});
 }
@@ -94,7 +92,7 @@ void Selection::remove(Module* module) {
 
 void Selection::clear() {
   record(nullptr);
-  if (UndoJournal::isRecording())
+  if (m_journal.isRecording())
     for (Module* module : m_modules.toVector()) record(module);
   m_modules.clear();
   m_nodes.clear();

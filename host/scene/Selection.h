@@ -8,6 +8,9 @@
 
 class Selection {
  public:
+  // journal: that of the scene, to which changes are told.
+  explicit Selection(UndoJournal& journal) : m_journal(journal) {}
+
   // Mutators. The last selected module is primary unless another is set.
   void add(Module* module);
   void remove(Module* module);
@@ -34,6 +37,7 @@ class Selection {
   void insert(Module* module);
   void take(Module* module);
 
+  UndoJournal& m_journal;
   OrderedList<Module, &Module::m_selectionSlot> m_modules;
   OrderedList<Node, &Node::m_selectedNodeSlot> m_nodes;
   OrderedList<Marker, &Marker::m_selectedMarkerSlot> m_markers;

@@ -11,15 +11,15 @@ Character* SubjectManager::getSubject(HString const& name) const {
 }
 
 uint64 SubjectManager::getNumSelectedSubjects() const {
-  return static_cast<uint64>(g_db->getSelection().getNumCharacters());
+  return static_cast<uint64>(m_scene.getSelection().getNumCharacters());
 }
 
 Character* SubjectManager::getSelectedSubject(uint64 i) const {
-  return g_db->getSelection().getCharacter(static_cast<int>(i));
+  return m_scene.getSelection().getCharacter(static_cast<int>(i));
 }
 
 bool SubjectManager::removeSubject(Character* subject, bool removeLabels, bool undoable, bool notify) {
-  if (!subject || !subject->isInScene()) return false;
+  if (!subject || !m_scene.contains(subject)) return false;
   TSimpleArray<Module*> all(64, 4096);
   subject->getModAndDecedents(all);
   std::vector<Marker*> markers;
@@ -32,11 +32,11 @@ bool SubjectManager::removeSubject(Character* subject, bool removeLabels, bool u
     marker->getParent()->removeChild(marker, false);
     // A namespace that the marker has already, or a name that can be none, is not put in front.
     if (removeLabels)
-      marker->setName(g_db->getIndex().freeName(nullptr, "unlabeled"));
+      marker->setName(m_scene.getIndex().freeName(nullptr, "unlabeled"));
     else
       marker->addNamespace(name);
   }
-  return g_db->removeFromScene(subject, true, true, undoable, notify);
+  return m_scene.removeFromScene(subject, true, true, undoable, notify);
 }
 
 void SubjectManager::removeAllSubjects(bool removeLabels, bool undoable, bool notify) {

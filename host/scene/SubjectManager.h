@@ -1,10 +1,12 @@
-// The characters of the scene and those selected.
+// The characters of a scene and those selected.
 #pragma once
 
 #include "host/scene/Character.h"
 
 class SubjectManager {
  public:
+  explicit SubjectManager(Database& scene) : m_scene(scene) {}
+
   uint64 getNumSubjects() const { return static_cast<uint64>(m_subjects.getCount()); }
   Character* getSubject(uint64 i) const { return m_subjects.at(static_cast<int>(i)); }
   Character* getSubject(HString const& name) const;  // the first created of that name
@@ -21,5 +23,6 @@ class SubjectManager {
 
  private:
   friend class Database;
+  Database& m_scene;
   OrderedList<Character, &Character::m_subjectSlot> m_subjects;
 };

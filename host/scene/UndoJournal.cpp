@@ -5,8 +5,6 @@
 
 #include "host/scene/Database.h"
 
-uint64 UndoJournal::s_step = 0;
-
 UndoChange::UndoChange(Module* owner) : m_owner(owner) {
   if (m_owner) ++m_owner->m_undoHolds;
 }
@@ -21,14 +19,14 @@ void UndoJournal::setEnabled(bool enabled) {
 }
 
 void UndoJournal::beginStep() {
-  if (m_depth++ == 0 && m_enabled) s_step = ++m_lastStep;
+  if (m_depth++ == 0 && m_enabled) m_step = ++m_lastStep;
 }
 
 void UndoJournal::add(std::unique_ptr<UndoChange> change) { m_open.push_back(std::move(change)); }
 
 void UndoJournal::endStep(HString const& name) {
   if (--m_depth > 0) return;
-  s_step = 0;
+  m_step = 0;
   if (m_open.empty()) return;
   Step step;
   step.changes.swap(m_open);
@@ -69,7 +67,7 @@ void UndoJournal::swapAll(Changes& changes, bool backward) {
   } else {
     for (auto const& change : changes) change->swap();
   }
-  g_db->restoreOrder();
+  m_scene.restoreOrder();
 }
 
 bool UndoJournal::undo(HString& name) { return move(m_done, m_undone, true, name); }
@@ -78,18 +76,18 @@ bool UndoJournal::redo(HString& name) { return move(m_undone, m_done, false, nam
 
 bool UndoJournal::move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name) {
   if (from.empty() || !m_open.empty()) return false;
-  const uint64 step = s_step;
-  s_step = 0;
+  const uint64 step = m_step;
+  m_step = 0;
   to.push_back(std::move(from.back()));
   from.pop_back();
   swapAll(to.back().changes, backward);
-  s_step = step;
+  m_step = step;
   name = to.back().name;
   return true;
 }
 
 void UndoJournal::clear() {
-  s_step = 0;
+  m_step = 0;
   m_undone.clear();
   m_open.clear();
   m_done.clear();

@@ -19,6 +19,7 @@
 
 #include "host/base/HString.h"
 
+class Database;
 class Module;
 
 class UndoChange {
@@ -41,7 +42,7 @@ class UndoChange {
 
 class UndoJournal {
  public:
-  UndoJournal() = default;
+  explicit UndoJournal(Database& scene) : m_scene(scene) {}
   ~UndoJournal() { clear(); }
   UndoJournal(UndoJournal const&) = delete;
   UndoJournal& operator=(UndoJournal const&) = delete;
@@ -71,13 +72,13 @@ class UndoJournal {
 
   // --- for mutators ---
   // The step that is open and being recorded; 0 for none.
-  static uint64 getStep() { return s_step; }
-  static bool isRecording() { return s_step != 0; }
+  uint64 getStep() const { return m_step; }
+  bool isRecording() const { return m_step != 0; }
   // Whether a field that was last recorded in step `mark` has to be recorded now; marks it.
-  static bool isDue(uint64& mark) {
-    if (mark == s_step) return false;
-    mark = s_step;
-    return s_step != 0;
+  bool isDue(uint64& mark) const {
+    if (mark == m_step) return false;
+    mark = m_step;
+    return m_step != 0;
   }
   // Only while recording.
   void add(std::unique_ptr<UndoChange> change);
@@ -91,13 +92,13 @@ class UndoJournal {
   };
 
   bool move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name);
-  static void swapAll(Changes& changes, bool backward);
+  void swapAll(Changes& changes, bool backward);
   void keepWithinLimit();
 
-  static uint64 s_step;
-
+  Database& m_scene;
   bool m_enabled = false;
   int m_depth = 0;
+  uint64 m_step = 0;
   uint64 m_lastStep = 0;
   Changes m_open;
   std::deque<Step> m_done, m_undone;  // the next one to be undone or redone is at the back

@@ -2,23 +2,22 @@
 
 #include <typeinfo>
 
-namespace {
-
-HEventManager s_manager;
-
-}  // namespace
-
-HEventManager* g_eventManager = &s_manager;
-
 HSmartEventStaticDataStore HSmartEvent::s_staticData;
 
-void HEventManager::safeSubmit(HEvent const& event) {
+HEventManager::~HEventManager() {
+  HLock lock(HSmartEvent::s_staticData.section);
+  std::erase_if(HSmartEvent::s_staticData.pending, [this](auto const& entry) { return entry.first == this; });
+}
+
+void HEventManager::safeSubmit(HEvent const& event) { g_eventManager->submit(event); }
+
+void HEventManager::submit(HEvent const& event) {
   if (!event.mayJoinAnother()) {
     HLock lock(HSmartEvent::s_staticData.section);
-    if (!HSmartEvent::s_staticData.pending.insert(typeid(event)).second) return;
+    if (!HSmartEvent::s_staticData.pending.emplace(this, typeid(event)).second) return;
   }
-  HLock lock(g_eventManager->m_section);
-  g_eventManager->m_queue.push_back(event.clone());
+  HLock lock(m_section);
+  m_queue.push_back(event.clone());
 }
 
 bool HEventManager::submitImmediate(HEvent const& event) {
@@ -40,7 +39,7 @@ void HEventManager::deliverQueued() {
     if (!event->mayJoinAnother()) {
       HLock lock(HSmartEvent::s_staticData.section);
       HEvent const& known = *event;
-      HSmartEvent::s_staticData.pending.erase(typeid(known));
+      HSmartEvent::s_staticData.pending.erase({this, typeid(known)});
     }
     submitImmediate(*event);
   }

@@ -1,14 +1,16 @@
-// Events tell views and other listeners of changes. Submitting is safe from any thread; events are delivered
-// on the main thread, in the order in which they were submitted.
+// Events tell views and other listeners of changes. Each scene has an event manager. Submitting is safe from
+// any thread; events are delivered on the scene's thread, in the order in which they were submitted.
 #pragma once
 
 #include <deque>
 #include <functional>
 #include <memory>
+#include <set>
 #include <typeindex>
-#include <unordered_set>
+#include <utility>
 #include <vector>
 
+#include "host/base/ThreadLocal.h"
 #include "host/services/HCriticalSection.h"
 
 class HEvent {
@@ -19,10 +21,12 @@ class HEvent {
   virtual bool mayJoinAnother() const { return true; }
 };
 
-// The classes of which an event waits in the queue.
+class HEventManager;
+
+// The classes of which an event waits in a manager's queue.
 struct HSmartEventStaticDataStore {
   HCriticalSection section;
-  std::unordered_set<std::type_index> pending;
+  std::set<std::pair<HEventManager const*, std::type_index>> pending;
 };
 
 class HSmartEvent : public HEvent {
@@ -30,8 +34,8 @@ class HSmartEvent : public HEvent {
   static HSmartEventStaticDataStore s_staticData;
 };
 
-// Of each class that derives from this one at most one event is queued; later ones are dropped until it is
-// delivered.
+// Of each class that derives from this one a manager queues at most one event; later ones are dropped until
+// it is delivered.
 class HDontSubmitIfAnotherQueuedEvent : public HSmartEvent {
  public:
   bool mayJoinAnother() const override { return false; }
@@ -41,14 +45,20 @@ class HEventManager {
  public:
   using Listener = std::function<void(HEvent const&)>;
 
-  // Queues a copy of the event.
+  HEventManager() = default;
+  ~HEventManager();
+  HEventManager(HEventManager const&) = delete;
+  HEventManager& operator=(HEventManager const&) = delete;
+
+  // Queues a copy of the event, from any thread: here, or with the current manager of the thread.
+  void submit(HEvent const& event);
   static void safeSubmit(HEvent const& event);
-  // Delivers the event at once; main thread only. Answers whether anyone listens.
+  // Delivers the event at once; the scene's thread only. Returns whether anyone listens.
   bool submitImmediate(HEvent const& event);
-  // Delivers what is queued, also what listeners submit meanwhile; main thread only.
+  // Delivers what is queued, also what listeners submit meanwhile; the scene's thread only.
   void deliverQueued();
 
-  // Answers a number to stop listening with.
+  // Returns a number to stop listening with.
   int addListener(Listener listener);
   void removeListener(int number);
 
@@ -59,4 +69,5 @@ class HEventManager {
   int m_lastNumber = 0;
 };
 
-extern HEventManager* g_eventManager;
+// That of the thread's current scene; of the default scene on a thread that has none.
+extern TALIX_THREAD_LOCAL HEventManager* g_eventManager;

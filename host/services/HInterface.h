@@ -1,18 +1,20 @@
-// The program's own face towards the user: questions and settings.
+// The program's own face towards the user: questions and settings. Safe from several threads.
 #pragma once
 
 #include <functional>
 #include <optional>
 
 #include "host/base/HString.h"
+#include "host/services/HCriticalSection.h"
 #include "host/services/Profile.h"
 #include "host/services/ProfileValues.h"
 
 class HInterface {
  public:
-  // Puts a yes-or-no question; without anyone to ask the answer is no. Answers 1 for yes, 0 for no.
+  // Puts a yes-or-no question to whoever answers those of the current scene; without anyone the answer is no.
+  // Returns 1 for yes, 0 for no.
   int askQuestion(HString const& text, int buttons);
-  void setAsker(std::function<bool(HString const&)> asker) { m_asker = std::move(asker); }
+  void setAsker(std::function<bool(HString const&)> asker);
 
   // --- profile: settings by section and entry, in memory and in INI files ---
   //
@@ -58,7 +60,7 @@ class HInterface {
   std::optional<std::string> findProfileText(HString const& section, HString const& entry,
                                              HString const& file) const;
 
-  std::function<bool(HString const&)> m_asker;
+  HCriticalSection m_section;  // guards what follows
   Profile m_profile;
   std::string m_profileFile;  // empty: the default profile is in memory only
 };

@@ -66,6 +66,7 @@ std::optional<std::string> defaultIn(Known const& table, HString const& section,
 
 std::optional<std::string> HInterface::findProfileText(HString const& section, HString const& entry,
                                                        HString const& file) const {
+  const HLock lock(m_section);
   if (!file.IsEmpty()) {
     Profile other;
     // Without a file there is no entry, which is no reason to complain.
@@ -111,10 +112,12 @@ HString HInterface::getProfileString(HString const& section, HString const& entr
 }
 
 int HInterface::getProfile(ProfileInt const& known) const {
+  const HLock lock(m_section);
   return knownNumber(m_profile.find(known.section, known.entry), known);
 }
 
 double HInterface::getProfile(ProfileDouble const& known) const {
+  const HLock lock(m_section);
   return knownNumber(m_profile.find(known.section, known.entry), known);
 }
 
@@ -135,6 +138,7 @@ bool HInterface::writeProfileBool(HString const& section, HString const& entry, 
 
 bool HInterface::writeProfileString(HString const& section, HString const& entry, HString const& value,
                                     HString const& file) {
+  const HLock lock(m_section);
   const auto setIn = [&](Profile& profile) {
     if (profile.set(section.GetString(), entry.GetString(), value.GetString())) return true;
     warned("A profile cannot hold the entry \"" + entry.GetString() + "\" in the section \"" +
@@ -153,6 +157,7 @@ bool HInterface::writeProfileString(HString const& section, HString const& entry
 }
 
 bool HInterface::loadProfile(HString const& path) {
+  const HLock lock(m_section);
   m_profileFile.clear();
   std::error_code error;
   if (std::filesystem::exists(path.GetString(), error) && warned(m_profile.read(path.GetString())))
@@ -161,4 +166,7 @@ bool HInterface::loadProfile(HString const& path) {
   return true;
 }
 
-bool HInterface::saveProfile(HString const& path) const { return !warned(m_profile.write(path.GetString())); }
+bool HInterface::saveProfile(HString const& path) const {
+  const HLock lock(m_section);
+  return !warned(m_profile.write(path.GetString()));
+}

@@ -1,11 +1,7 @@
 #include "host/services/Manipulator.h"
 
-namespace {
+#include "host/services/SceneServices.h"
 
-Manipulator::EToolType s_current = Manipulator::Select;
+Manipulator::EToolType Manipulator::getCurrentToolType() { return SceneServices::getCurrent().tool; }
 
-}  // namespace
-
-Manipulator::EToolType Manipulator::getCurrentToolType() { return s_current; }
-
-void Manipulator::setCurrentToolType(EToolType type) { s_current = type; }
+void Manipulator::setCurrentToolType(EToolType type) { SceneServices::getCurrent().tool = type; }

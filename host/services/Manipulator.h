@@ -1,4 +1,4 @@
-// The interactive editing tool.
+// The interactive editing tool of the current scene.
 #pragma once
 
 class Manipulator {

@@ -1,10 +1,9 @@
 // Long operations: what is being done, how far it is, and whether the user cancelled it. Tasks may stand
-// inside each other.
+// inside each other. Each scene has a stack.
 #pragma once
 
-#include <atomic>
 #include <functional>
-#include <vector>
+#include <memory>
 
 #include "host/base/HString.h"
 
@@ -17,6 +16,12 @@ class OperationStack {
   };
   // Told after each change of the innermost task, with null when the last one ends.
   using Display = std::function<void(Task const*)>;
+  enum EScene { CurrentScene };
+
+  OperationStack();
+  // Has no tasks of its own: every call goes to the stack of the thread's current scene.
+  explicit OperationStack(EScene);
+  ~OperationStack();
 
   // A task from `first` to `last`, at `position`, that each stepTask moves by `step`. False when the user has
   // cancelled already.
@@ -27,21 +32,21 @@ class OperationStack {
   void setTaskPos(int position);
   void stepTask();
 
-  int getNumTasks() const { return static_cast<int>(m_tasks.size()); }
-  bool isCancelled() const { return m_cancelled; }
+  int getNumTasks() const;
+  bool isCancelled() const;
   // Safe from any thread and from a signal handler.
-  void cancel() { m_cancelled = true; }
+  void cancel();
   // Drops all tasks and the cancel mark: whoever runs commands calls it after each.
   void reset();
 
-  void setDisplay(Display display) { m_display = std::move(display); }
+  void setDisplay(Display display);
 
  private:
-  void show() const;
+  struct State;
+  State& state() const;
 
-  std::vector<Task> m_tasks;
-  std::atomic<bool> m_cancelled = false;
-  Display m_display;
+  std::unique_ptr<State> m_own;
 };
 
+// That of the thread's current scene; of the default scene on a thread that has none.
 extern OperationStack g_theOperationStack;

@@ -45,7 +45,7 @@ class DeviceImport {
 
  private:
   bool isFree(const std::string& name) const {
-    const PropertyTable& table = PropertyTable::getInstance();
+    const PropertyTable& table = m_device.getDatabase()->getPropertyTable();
     const unsigned known = table.findId(name);
     return !m_used.contains(name) && !m_device.getAttribute(name.c_str()) &&
            (!known || table.getType(known) == m_type);

@@ -12,7 +12,7 @@ namespace {
 class NodeKeys {
  public:
   explicit NodeKeys(Node const* node) {
-    NLEClip const* clip = g_db->getActiveClip();
+    NLEClip const* clip = node->getDatabase()->getActiveClip();
     if (!clip) return;
     for (Controller const* channel : std::initializer_list<Controller const*>{
              node->getTranslationChannel(), node->getRotationChannel(), node->getScaleChannel()}) {
@@ -50,7 +50,7 @@ struct Statistics {
 
 Statistics measure(Node const* a, Node const* b, TSimpleArray<HTimeRange> const& ranges, bool mustHaveKeys,
                    int64 step = 0) {
-  if (step <= 0) step = HTimeManager::getInstance()->getTicksPerFrame();
+  if (step <= 0) step = a->getDatabase()->getTimeManager()->getTicksPerFrame();
   step = std::min(step, kForever);
   const NodeKeys keysOfA(a), keysOfB(b);
   Statistics found;

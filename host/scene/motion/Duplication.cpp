@@ -17,8 +17,10 @@ namespace {
 
 class Duplication {
  public:
-  explicit Duplication(std::vector<Module*> originals)
-      : m_originals(std::move(originals)), m_waiting(m_originals.begin(), m_originals.end()) {}
+  Duplication(Database& scene, std::vector<Module*> originals)
+      : m_scene(scene),
+        m_originals(std::move(originals)),
+        m_waiting(m_originals.begin(), m_originals.end()) {}
 
   // The copies in the order of their originals.
   std::vector<Module*> make();
@@ -41,6 +43,7 @@ class Duplication {
   void copyNode(Node const& original, Node& copy) const;
   void copyClipKeys() const;
 
+  Database& m_scene;
   std::vector<Module*> m_originals;
   std::unordered_set<Module const*> m_waiting;  // those whose copy was not tried yet
   std::unordered_map<Module const*, Module*> m_copies;
@@ -60,7 +63,7 @@ void Duplication::makeWithParents(Module* original) {
 void Duplication::makeOne(Module* original) {
   m_waiting.erase(original);
   HRuntimeClass* type = original->getRuntimeClass();
-  Module* copy = g_db->createModule(type, original->getName().GetStr(), counterpart(original->getParent()));
+  Module* copy = m_scene.createModule(type, original->getName().GetStr(), counterpart(original->getParent()));
   if (copy) {
     m_copies.emplace(original, copy);
     return;
@@ -120,7 +123,7 @@ void copyChannels(Module const& original, Module& copy) {
     own->setInterpType(static_cast<int>(channel.getInterpolation()));
     own->setLocked(channel.isLocked());
     own->beginDataEdit(HTimeRange::forever());
-    for (NLEClip* clip = g_db->getHeadClip(); clip; clip = clip->getNext())
+    for (NLEClip* clip = own->getDatabase()->getHeadClip(); clip; clip = clip->getNext())
       copyKeys(channel, clip, *own, clip);
     own->endDataEdit();
   }
@@ -152,8 +155,8 @@ void Duplication::copyClipKeys() const {
     auto* clip = objectAs<NLEClip>(original);
     if (Module* copy = copyOf(original); clip && copy) clips.emplace_back(clip, static_cast<NLEClip*>(copy));
   }
-  for (int i = 0; !clips.empty() && i < g_db->getNumModules(); ++i) {
-    Module* module = g_db->getModule(i);
+  for (int i = 0; !clips.empty() && i < m_scene.getNumModules(); ++i) {
+    Module* module = m_scene.getModule(i);
     for (int k = 0; k < module->getNumChannels(); ++k) {
       Controller* channel = module->getChannel(k);
       channel->beginDataEdit(HTimeRange::forever());
@@ -175,7 +178,7 @@ std::vector<Module*> Duplication::make() {
     if (auto* node = objectAs<Node>(original)) copyNode(*node, *static_cast<Node*>(copy));
     if (auto* clip = objectAs<NLEClip>(original)) copyLayers(*clip, *static_cast<NLEClip*>(copy));
     if (auto* camera = objectAs<OpticalCamera>(copy); camera && camera->getDeviceID() != 0) {
-      if (!m_deviceNumbers) m_deviceNumbers.emplace();
+      if (!m_deviceNumbers) m_deviceNumbers.emplace(m_scene);
       camera->setDeviceID(m_deviceNumbers->take());
     }
   }
@@ -189,7 +192,7 @@ void Database::duplicateSelectedObjects() {
   std::vector<Module*> originals;
   for (int i = 0; i < getNumSelectedModules(); ++i) originals.push_back(getSelectedModule(i));
   Module const* primary = getPrimarySelectedModule();
-  Duplication duplication(std::move(originals));
+  Duplication duplication(*this, std::move(originals));
   const std::vector<Module*> copies = duplication.make();
   if (copies.empty()) return;
   m_selection.clear();

@@ -9,6 +9,7 @@
 #include "host/scene/KeyTimes.h"
 #include "host/scene/Marker.h"
 #include "host/scene/RawValues.h"
+#include "host/scene/SceneScope.h"
 
 namespace {
 
@@ -462,5 +463,6 @@ bool Adjustment::run() {
 bool Node::parentAdjust(Node* target, HTimeRange const& range) {
   if (target == getNodeParent() || range.isEmpty()) return true;
   if (target && (target == this || target->isDescendedFrom(this))) return false;
+  const SceneScope scope(*getDatabase());
   return Adjustment(*this, target, range).run();
 }

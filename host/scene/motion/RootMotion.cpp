@@ -8,6 +8,7 @@
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/KeyTimes.h"
+#include "host/scene/SceneScope.h"
 
 namespace {
 
@@ -312,6 +313,8 @@ class ActiveClip {
 
 void keepMotionAsRoots(std::vector<Marker*> const& markers) {
   // Children first: what a marker does hangs on its parents as they were.
+  if (markers.empty()) return;
+  const SceneScope scope(*markers.front()->getDatabase());
   Frames frames;
   std::vector<std::pair<Marker*, Frame const*>> concerned;
   for (auto marker = markers.rbegin(); marker != markers.rend(); ++marker) {
