@@ -5,6 +5,7 @@
 
 #include "app/Info.h"
 #include "app/Run.h"
+#include "host/base/OutOfMemory.h"
 
 namespace {
 
@@ -37,7 +38,7 @@ Ctrl-C cancels an operation that shows its progress, and the line fails; otherwi
 ends the program. Questions are put at a terminal; without one the answer is no.
 
 Exit status: 0 all succeeded, 1 a command failed, 2 the command line is wrong, 3 a file could not be
-read or written.
+read or written, 4 out of memory.
 )";
 
 void addPluginOptions(CLI::App& app, PluginChoice& plugin) {
@@ -95,6 +96,7 @@ CLI::App* addRun(CLI::App& app, RunArguments& run) {
 int main(int argc, char** argv) {
   // Whoever stops reading our output makes a write fail; that is reported as such.
   std::signal(SIGPIPE, SIG_IGN);
+  endProgramWhenOutOfMemory();
 
   CLI::App app("talix edits motion capture takes by script, without a window.", "talix");
   app.set_version_flag("--version", "talix " TALIX_VERSION);

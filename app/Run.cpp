@@ -73,6 +73,11 @@ int finished(int status, bool written) {
   return static_cast<int>(Status::FileFailed);
 }
 
+// After a take that could not be opened or saved.
+int failureOf(ScriptRunner const& runner) {
+  return static_cast<int>(runner.status() == Status::OutOfMemory ? Status::OutOfMemory : Status::FileFailed);
+}
+
 bool runStandardInput(ScriptRunner& runner) {
   std::string line;
   for (int number = 1; std::getline(std::cin, line); ++number)
@@ -132,7 +137,7 @@ int runScripts(RunRequest const& request) {
     session->setUndo(std::any_of(texts.begin(), texts.end(), usesUndo) ||
                      std::any_of(request.parts.begin(), request.parts.end(), isStandardInput));
     for (std::string const& file : request.opens)
-      if (!runner.runSilently("open " + quotedText(file))) return static_cast<int>(Status::FileFailed);
+      if (!runner.runSilently("open " + quotedText(file))) return failureOf(runner);
     runParts(runner, request.parts, texts);
   } catch (FileError const& error) {
     return finished(failed(Status::FileFailed, error.what()), runner.finish());
@@ -140,8 +145,7 @@ int runScripts(RunRequest const& request) {
   status = static_cast<int>(runner.status());
   if (runner.mayGoOn()) {
     for (std::string const& file : request.saves)
-      if (!runner.runSilently("save " + quotedText(file)) && status == 0)
-        status = static_cast<int>(Status::FileFailed);
+      if (!runner.runSilently("save " + quotedText(file)) && status == 0) status = failureOf(runner);
   }
   return finished(status, runner.finish());
 }

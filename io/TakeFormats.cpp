@@ -62,8 +62,9 @@ Writer writerFor(const std::string& path) {
 
 void checkTakeTarget(const std::string& path) {
   writerFor(path);
-  const std::filesystem::path folder = std::filesystem::absolute(path).parent_path();
-  if (!std::filesystem::is_directory(folder))
+  std::error_code error;
+  const std::filesystem::path folder = std::filesystem::absolute(path, error).parent_path();
+  if (error || !std::filesystem::is_directory(folder, error))
     throw FileError(path, "cannot be written: there is no such folder");
 }
 

@@ -27,21 +27,29 @@ bool ScriptRunner::runLine(std::string_view line, std::string const& file, int n
   LineResult const& result = m_session.run(line);
   if (result.outcome == LineResult::Outcome::Blank) return true;
   report(result, file, number);
-  if (result.failed() && m_status == Status::Done) {
-    m_status = result.outcome == LineResult::Outcome::FileFailed ? Status::FileFailed : Status::CommandFailed;
-  }
+  note(result);
   if (m_style.flushLines) std::fflush(m_out);
   return mayGoOn();
+}
+
+void ScriptRunner::note(LineResult const& result) {
+  if (!result.failed()) return;
+  m_torn |= result.torn;
+  if (m_status != Status::Done && !m_torn) return;
+  m_status = result.outcome == LineResult::Outcome::OutOfMemory  ? Status::OutOfMemory
+             : result.outcome == LineResult::Outcome::FileFailed ? Status::FileFailed
+                                                                 : Status::CommandFailed;
 }
 
 bool ScriptRunner::runSilently(std::string_view line) {
   LineResult const& result = m_session.run(line);
   writeLogLines(result, "");
+  if (result.outcome == LineResult::Outcome::OutOfMemory) note(result);
   return !result.failed();
 }
 
 bool ScriptRunner::mayGoOn() const {
-  return !std::ferror(m_out) && (m_status == Status::Done || m_style.keepGoing);
+  return !std::ferror(m_out) && !m_torn && (m_status == Status::Done || m_style.keepGoing);
 }
 
 bool ScriptRunner::finish() { return std::fflush(m_out) == 0 && !std::ferror(m_out); }

@@ -11,11 +11,11 @@
 namespace talix {
 
 // How a run ended; also the program's exit status.
-enum class Status { Done = 0, CommandFailed = 1, BadCommandLine = 2, FileFailed = 3 };
+enum class Status { Done = 0, CommandFailed = 1, BadCommandLine = 2, FileFailed = 3, OutOfMemory = 4 };
 
 struct RunStyle {
   bool json = false;
-  bool keepGoing = false;   // a failed line does not end the run
+  bool keepGoing = false;   // a failed line does not end the run, unless it left a torn scene
   bool nameLines = false;   // errors name the file and the line: for people at a terminal
   bool flushLines = false;  // what a line prints is written at once: for input that comes line by line
 };
@@ -33,7 +33,7 @@ class ScriptRunner {
   // Runs a line that belongs to no script: only its log lines are written. False when it failed.
   bool runSilently(std::string_view line);
 
-  // The first failure decides.
+  // The first failure decides, and a torn scene over all.
   Status status() const { return m_status; }
   // Whether a failed line or lost output forbids saving.
   bool mayGoOn() const;
@@ -48,7 +48,10 @@ class ScriptRunner {
   RunStyle m_style;
   std::FILE* m_out;
   std::FILE* m_err;
+  void note(LineResult const& result);
+
   Status m_status = Status::Done;
+  bool m_torn = false;
   std::string m_text;
 };
 

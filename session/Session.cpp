@@ -59,24 +59,46 @@ void Session::setUndo(bool on) {
 
 LineResult const& Session::run(std::string_view line) {
   const SceneScope scope(m_scene);
+  const bool keepsSteps = m_scene.getUndoJournal().isEnabled();
+  const ThrowsBadAlloc throws(keepsSteps);
   m_result.log.clear();
   m_result.value = Variable();
+  m_result.torn = false;
+  m_lackOfMemory = "Out of memory";
+  try {
+    runStep(line);
+  } catch (std::bad_alloc const&) {
+    m_result.outcome = LineResult::Outcome::OutOfMemory;
+  }
+  if (m_result.outcome == LineResult::Outcome::OutOfMemory) takeBack();
+  if (m_result.failed()) m_result.value = Variable();
+  return m_result;
+}
+
+// The step is closed last: until then everything can be taken back.
+void Session::runStep(std::string_view line) {
   const LogCollector collector(m_result.log);
   UndoJournal& journal = m_scene.getUndoJournal();
   journal.beginStep();
   m_result.outcome = guarded(line);
   m_result.command = m_line.name();
+  if (m_result.outcome == LineResult::Outcome::OutOfMemory) return;
   if (journal.isEnabled()) {
     // The line may have set it.
     constexpr int64 kMebibyte = 1 << 20;
     journal.setMemoryLimit(g_interface->getProfile(profile::kUndoMemory) * kMebibyte);
   }
-  journal.endStep(m_line.name());
-  if (m_result.failed()) m_result.value = Variable();
   m_scene.releaseRemoved();
   g_theOperationStack.reset();
   g_eventManager->deliverQueued();
-  return m_result;
+  journal.endStep(m_line.name());
+}
+
+void Session::takeBack() {
+  m_result.torn = !m_scene.getUndoJournal().discardStep();
+  m_scene.releaseRemoved();
+  g_theOperationStack.reset();
+  m_result.log.push_back({LogLevel::Error, m_lackOfMemory});
 }
 
 LineResult::Outcome Session::guarded(std::string_view line) {
@@ -96,9 +118,10 @@ LineResult::Outcome Session::guarded(std::string_view line) {
     return Outcome::FileFailed;
   } catch (char const* text) {
     // How the host's own arrays report that memory ran out.
-    writeLog(LogLevel::Error, text);
+    m_lackOfMemory = text;
+    return Outcome::OutOfMemory;
   } catch (std::bad_alloc const&) {
-    writeLog(LogLevel::Error, "Out of memory");
+    return Outcome::OutOfMemory;
   } catch (std::exception const& error) {
     writeLog(LogLevel::Error, error.what());
   }

@@ -1,8 +1,9 @@
 // Runs script lines against the scene.
 //
 // A line runs through its command's own argument check; what the command logs meanwhile is collected. Nothing
-// that a command does or throws ends the program. A session works on one scene, on whichever thread asks it
-// to.
+// that a command does or throws ends the program, but for a lack of memory that leaves nothing to go on with:
+// a line that runs out of it is taken back whole where steps are kept (setUndo), else the scene counts as
+// torn. A session works on one scene, on whichever thread asks it to.
 #pragma once
 
 #include <memory>
@@ -27,14 +28,17 @@ struct LineResult {
   enum class Outcome {
     Blank,  // nothing was run
     Done,
-    Failed,     // refused, or the command failed
-    FileFailed  // a file could not be read or written
+    Failed,      // refused, or the command failed
+    FileFailed,  // a file could not be read or written
+    OutOfMemory  // the command ran out of memory
   } outcome = Outcome::Blank;
   std::string command;  // as typed
   Variable value;       // empty when there is none
   std::vector<LogLine> log;
 
-  bool failed() const { return outcome == Outcome::Failed || outcome == Outcome::FileFailed; }
+  bool torn = false;  // the scene may hold half of what the line was to do
+
+  bool failed() const { return outcome > Outcome::Done; }
 };
 
 class Session {
@@ -67,6 +71,8 @@ class Session {
 
   LineResult::Outcome execute();
   LineResult::Outcome guarded(std::string_view line);
+  void runStep(std::string_view line);
+  void takeBack();
   void warnOfExclusions() const;
 
   Database& m_scene;
@@ -75,6 +81,7 @@ class Session {
   CommandRegistry m_registry;
   ScriptLine m_line;
   LineResult m_result;
+  char const* m_lackOfMemory = nullptr;  // how it was reported
 };
 
 }  // namespace talix

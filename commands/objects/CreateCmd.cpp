@@ -56,6 +56,8 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
   }
 
  private:
+  static constexpr int kMostCopies = 1'000'000;
+
   // What the options ask for.
   struct Request {
     bool addSelect = false;
@@ -64,7 +66,8 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
     TSimpleArray<NLEClip*> inactiveClips;
     int multiple = 0;
 
-    // In the order given. False, with a message, for a parent that is not there.
+    // In the order given. False, with a message, for a parent that is not there and a count that is too
+    // large.
     bool read(Given const& given) {
       for (CommandOption const& option : given) {
         Variable const* arg = option.getArgCount() ? &option.getArg(0) : nullptr;
@@ -97,6 +100,10 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
             break;
           case kMultiple:
             multiple = arg->getIntValue(-1);
+            if (multiple > kMostCopies) {
+              logError("-multiple is at most %d, not %d.", kMostCopies, multiple);
+              return false;
+            }
             break;
           default:
             break;

@@ -5,7 +5,8 @@
 #include <ostream>
 #include <string>
 
-// Writes a file under a temporary name in the same folder and renames it once `write` has returned and all is
-// on disk. Throws std::system_error, and what `write` throws; then no temporary file is left and what stood
-// at `path` is untouched.
+// Writes a nameless file in the same folder and gives it the name once `write` has returned and all is on
+// disk: whatever ends the program meanwhile leaves nothing behind. A symbolic link is followed, the rights of
+// an existing file are kept; one that may not be written is refused. Throws std::system_error, and what
+// `write` throws; then what stood at `path` is untouched. The stream only goes forward.
 void replaceFile(const std::string& path, const std::function<void(std::ostream&)>& write);

@@ -96,8 +96,18 @@ void Attribute::takeAsDefault() {
 
 void Attribute::referTo(Value const& value) {
   if (auto* module = std::get_if<Module*>(&value)) refer(*module);
-  if (auto* modules = std::get_if<Modules>(&value))
-    for (Module* module : *modules) refer(module);
+  if (auto* modules = std::get_if<Modules>(&value)) referToAll(*modules);
+}
+
+// On an exception to none of them.
+void Attribute::referToAll(Modules const& modules) {
+  auto referred = modules.begin();
+  try {
+    for (; referred != modules.end(); ++referred) refer(*referred);
+  } catch (...) {
+    while (referred != modules.begin()) release(*--referred);
+    throw;
+  }
 }
 
 void Attribute::releaseFrom(Value const& value) {
@@ -107,6 +117,7 @@ void Attribute::releaseFrom(Value const& value) {
 }
 
 void Attribute::store(Value value, bool set, bool react) {
+  record();
   referTo(value);
   releaseFrom(m_value);
   put(std::move(value), set, react);
@@ -146,9 +157,11 @@ int64 Attribute::bytesBeside(Value const& value) {
   return static_cast<int64>(bytes);
 }
 
+void Attribute::record() {
+  if (m_module && m_module->isRecorded()) m_module->journal().addOnce<Change>(m_undoMark, *this);
+}
+
 void Attribute::put(Value value, bool set, bool react) {
-  if (m_module && m_module->isRecorded() && m_module->journal().isDue(m_undoMark))
-    m_module->journal().add(std::make_unique<Change>(*this));
   m_value = std::move(value);
   m_set = set;
   if (react && m_reaction && m_module) m_reaction(*m_module, *this);
@@ -163,6 +176,7 @@ void Attribute::unset(bool, bool, bool react) { store(m_default, false, react); 
 void Attribute::forget(Module* module) {
   auto const* modules = std::get_if<Modules>(&m_value);
   if (!modules) return store(static_cast<Module*>(nullptr), m_set, true);
+  record();
   // The others are referred to as before: releasing and taking them all would cost too much in a long list.
   Modules others;
   others.reserve(modules->size());

@@ -86,12 +86,14 @@ class Attribute : public HObject, private ModuleReferrer {
  private:
   friend class Module;
 
-  // The mutator: every change of any attribute passes here.
+  // The mutator: every change of any attribute is recorded and then put in place.
+  void record();
   void put(Value value, bool set, bool react);
   struct Change;
   static int64 bytesBeside(Value const& value);  // held outside of the value itself
   void forget(Module* module) override;
   void referTo(Value const& value);
+  void referToAll(Modules const& modules);
   void releaseFrom(Value const& value);
 
   HString m_name;

@@ -43,14 +43,14 @@ struct ConnectingLines::Change : UndoChange {
 };
 
 void ConnectingLines::store(Node* target, MarkerConnection const* line) {
-  if (m_source.isRecorded() && m_source.journal().isDue(m_undoMark))
-    m_source.journal().add(std::make_unique<Change>(*this));
+  if (m_source.isRecorded()) m_source.journal().addOnce<Change>(m_undoMark, *this);
   const bool known = leadTo(target);
   if (line && known) {
     *findLine(m_lines, target) = *line;
   } else if (line) {
-    m_lines.push_back(*line);
+    m_lines.reserve(m_lines.size() + 1);
     refer(target);
+    m_lines.push_back(*line);
   } else if (known) {
     m_lines.erase(findLine(m_lines, target));
     release(target);

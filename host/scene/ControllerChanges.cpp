@@ -55,8 +55,9 @@ struct Controller::KeyChange : UndoChange {
     keys.emplace_back(track, time);
   }
   void takeSnapshot(KeyTrack const& track) {
-    snapshot = std::make_unique<KeyTrack>(track);
-    for (Slot const& slot : keys) slot.putInto(*snapshot);
+    auto before = std::make_unique<KeyTrack>(track);
+    for (Slot const& slot : keys) slot.putInto(*before);
+    snapshot = std::move(before);
     std::vector<Slot>().swap(keys);
   }
 
@@ -95,12 +96,8 @@ Controller::ClipTrack& Controller::clipTrack(NLEClip* clip, int layer) {
 
 Controller::KeyChange* Controller::changeOf(ClipTrack& track) {
   if (!m_module || !m_module->isRecorded()) return nullptr;
-  UndoJournal& journal = m_module->journal();
-  if (journal.isDue(track.undoMark)) {
-    auto change = std::make_unique<KeyChange>(*this, track);
-    track.change = change.get();
-    journal.add(std::move(change));
-  }
+  if (auto* change = m_module->journal().addOnce<KeyChange>(track.undoMark, *this, track))
+    track.change = change;
   return track.change;
 }
 
@@ -195,6 +192,5 @@ struct Controller::SettingsChange : UndoChange {
 };
 
 void Controller::recordSettings() {
-  if (m_module && m_module->isRecorded() && m_module->journal().isDue(m_settingsMark))
-    m_module->journal().add(std::make_unique<SettingsChange>(*this));
+  if (m_module && m_module->isRecorded()) m_module->journal().addOnce<SettingsChange>(m_settingsMark, *this);
 }

@@ -91,10 +91,10 @@ Module* Database::createModule(HRuntimeClass* type, char const* name, Module* pa
   module->m_database = this;
   module->setUp();
   module->m_name = m_index->freeName(parent, wanted);
-  Module* entered = module.release();
-  enter(entered);
-  if (parent) entered->storeParent(parent);
-  return entered;
+  Module* created = module.get();
+  add(std::move(module));
+  if (parent) created->storeParent(parent);
+  return created;
 }
 
 bool Database::addToScene(Module* module, bool uniqueName, Character const* character, bool select, bool) {
@@ -106,7 +106,7 @@ bool Database::addToScene(Module* module, bool uniqueName, Character const* char
   if (module->m_name.IsEmpty()) module->m_name = module->getRuntimeClass()->getName();
   auto* parent = const_cast<Character*>(character);
   if (uniqueName) module->m_name = m_index->freeName(parent, module->m_name);
-  enter(module);
+  add(std::unique_ptr<Module>(module));
   if (parent) module->storeParent(parent);
   if (select) module->setSelected(true);
   return true;

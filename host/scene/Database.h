@@ -174,14 +174,16 @@ class Database {
 
   void needsSorting(Module* parent) { m_unsortedParents.push_back(parent); }
   bool mayJoin(Module const* module) const;
-  // Mutators of membership: put a set-up module with its name and parent into every index, and take it out.
-  void enter(Module* module);
-  void leave(Module* module);
+  // Mutators of membership: put a set-up module with its name and parent into the scene, and take it out.
+  void add(std::unique_ptr<Module> module);
+  void remove(Module* module);
   void storeActive(NLEClip* clip, int layer);  // mutator
   struct Membership;
   struct SettingsChange;
-  void join(Module* module);    // every index takes it, by its order of creation
-  void unjoin(Module* module);  // and lets it go
+  // Puts a module into every list and index, by its order of creation; on an exception nothing has changed.
+  void index(Module* module);
+  void unindex(Module* module) noexcept;
+  void takeFromLists(Module* module) noexcept;
   void removeAll();
 
   OrderedList<Module, &Module::m_sceneSlot> m_modules;

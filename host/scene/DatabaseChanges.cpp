@@ -11,39 +11,53 @@
 
 // A module came into the scene or left it; it keeps its parent, its children and its place among all.
 struct Database::Membership : UndoChange {
-  explicit Membership(Module& concerned) : UndoChange(&concerned), module(concerned) {}
+  explicit Membership(Module& concerned)
+      : UndoChange(&concerned), module(concerned), inScene(concerned.isInScene()) {}
   void swap() override {
+    const bool now = module.isInScene();
     Database& scene = *module.getDatabase();
-    module.isInScene() ? scene.unjoin(&module) : scene.join(&module);
+    if (now != inScene) inScene ? scene.index(&module) : scene.unindex(&module);
+    inScene = now;
   }
   int64 memoryUse() const override { return sizeof *this + module.memoryUse(); }
 
   Module& module;
+  bool inScene;
 };
 
-void Database::enter(Module* module) {
+void Database::add(std::unique_ptr<Module> owned) {
+  Module* module = owned.get();
   if (m_journal.isRecording()) {
-    m_journal.add(std::make_unique<Membership>(*module));
+    auto change = std::make_unique<Membership>(*module);
+    owned.release();  // the change destroys a module that is not in the scene
+    m_journal.add(std::move(change));
     module->m_enteredStep = m_journal.getStep();
   }
   module->m_order = ++m_created;
-  join(module);
+  index(module);
+  owned.release();
   if (auto* clip = objectAs<NLEClip>(module); clip && getNumClips() == 1) setActiveClip(clip);
 }
 
-void Database::join(Module* module) {
+void Database::index(Module* module) {
   if (getNumModules() > 0 && getModule(getNumModules() - 1)->m_order > module->m_order) m_unsorted = true;
-  m_modules.append(module);
-  m_byId.emplace(module->getID(), module);
-  ++m_countByClass[module->getRuntimeClass()];
-  m_index->add(module);
-  if (auto* node = objectAs<Node>(module)) m_nodes.append(node);
-  if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.append(character);
-  if (auto* clip = objectAs<NLEClip>(module)) m_clips.append(clip);
-  module->linkToParent();
+  int& count = m_countByClass[module->getRuntimeClass()];
+  try {
+    m_modules.append(module);
+    m_byId.emplace(module->getID(), module);
+    m_index->add(module);
+    if (auto* node = objectAs<Node>(module)) m_nodes.append(node);
+    if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.append(character);
+    if (auto* clip = objectAs<NLEClip>(module)) m_clips.append(clip);
+    module->linkToParent();
+  } catch (...) {
+    takeFromLists(module);
+    throw;
+  }
+  ++count;
 }
 
-void Database::leave(Module* module) {
+void Database::remove(Module* module) {
   m_selection.remove(module);
   module->forgetByAll();
   if (auto* clip = objectAs<NLEClip>(module)) {
@@ -52,18 +66,22 @@ void Database::leave(Module* module) {
       for (int i = 0; i < other->getNumChannels(); ++i) other->getChannel(i)->forgetClip(clip);
   }
   if (m_journal.isRecording()) m_journal.add(std::make_unique<Membership>(*module));
-  unjoin(module);
+  unindex(module);
 }
 
-void Database::unjoin(Module* module) {
+void Database::unindex(Module* module) noexcept {
   if (m_priority == module) m_priority = nullptr;
+  --m_countByClass.find(module->getRuntimeClass())->second;
+  takeFromLists(module);
+  m_index->forgetParent(module);
+}
+
+void Database::takeFromLists(Module* module) noexcept {
   module->unlinkFromParent();
   if (auto* node = objectAs<Node>(module)) m_nodes.remove(node);
   if (auto* character = objectAs<Character>(module)) m_subjects->m_subjects.remove(character);
   if (auto* clip = objectAs<NLEClip>(module)) m_clips.remove(clip);
   m_index->remove(module);
-  m_index->forgetParent(module);
-  --m_countByClass[module->getRuntimeClass()];
   m_byId.erase(module->getID());
   m_modules.remove(module);
 }
@@ -74,9 +92,10 @@ bool Database::removeFromScene(Module* module, bool, bool, bool, bool) {
   TSimpleArray<Module*> all(64, 4096);
   module->getModAndDecedents(all);
   if (module->getParent()) module->storeParent(nullptr);
+  m_removed.reserve(m_removed.size() + static_cast<size_t>(all.getCount()));
   // Children first, so that a module never outlives its parent in the scene.
   for (int i = all.getCount() - 1; i >= 0; --i) {
-    leave(all[i]);
+    remove(all[i]);
     // What the journal tells of is the journal's to destroy.
     if (all[i]->m_undoHolds == 0) m_removed.emplace_back(all[i]);
   }
@@ -123,7 +142,7 @@ struct Database::SettingsChange : UndoChange {
 
 void Database::recordSettings() {
   checkThread();
-  if (m_journal.isDue(m_undoMark)) m_journal.add(std::make_unique<SettingsChange>(*this));
+  m_journal.addOnce<SettingsChange>(m_undoMark, *this);
 }
 
 void Database::storeActive(NLEClip* clip, int layer) {

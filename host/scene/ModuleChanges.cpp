@@ -25,8 +25,9 @@ struct Module::NameChange : UndoChange {
 void Module::storeName(HString const& name) {
   if (isRecorded()) journal().add(std::make_unique<NameChange>(*this));
   const bool indexed = isInScene();
+  HString given = name;
   if (indexed) m_database->getIndex().remove(this);
-  m_name = name;
+  m_name = std::move(given);
   if (indexed) m_database->getIndex().add(this);
 }
 
@@ -90,11 +91,12 @@ void Module::sortChildren() {
 // Of attributes (channels), the last one: later ones have gone before it.
 template <class T>
 struct Module::Addition : UndoChange {
-  Addition(Module& concerned, std::vector<std::unique_ptr<T>>& list) : UndoChange(&concerned), items(list) {}
+  Addition(Module& concerned, std::vector<std::unique_ptr<T>>& list)
+      : UndoChange(&concerned), items(list), before(list.size()) {}
   void swap() override {
     if (held) {
       items.push_back(std::move(held));
-    } else {
+    } else if (items.size() > before) {
       held = std::move(items.back());
       items.pop_back();
     }
@@ -102,17 +104,18 @@ struct Module::Addition : UndoChange {
   int64 memoryUse() const override { return sizeof *this + sizeof(T); }
 
   std::vector<std::unique_ptr<T>>& items;
+  size_t before;  // how many there were
   std::unique_ptr<T> held;
 };
 
 void Module::storeAttribute(std::unique_ptr<Attribute> attribute) {
-  m_attributes.push_back(std::move(attribute));
   if (isRecorded()) journal().add(std::make_unique<Addition<Attribute>>(*this, m_attributes));
+  m_attributes.push_back(std::move(attribute));
 }
 
 void Module::storeChannel(std::unique_ptr<Controller> channel) {
-  m_channels.push_back(std::move(channel));
   if (isRecorded()) journal().add(std::make_unique<Addition<Controller>>(*this, m_channels));
+  m_channels.push_back(std::move(channel));
 }
 
 int64 Module::memoryUse() const {

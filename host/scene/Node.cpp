@@ -271,8 +271,7 @@ struct Node::PreTransformChange : UndoChange {
 };
 
 void Node::storePreTransform(Vec3 const& translation, TalixRotation const& rotation) {
-  if (isRecorded() && journal().isDue(m_preTransformMark))
-    journal().add(std::make_unique<PreTransformChange>(*this));
+  if (isRecorded()) journal().addOnce<PreTransformChange>(m_preTransformMark, *this);
   m_preTranslation = translation;
   m_preRotation = rotation;
   markMoved(this);

@@ -42,30 +42,37 @@ struct PropertyTable::Addition : UndoChange {
   Addition(PropertyTable& concerned, HString const& text, DataSource::PropertyType kind)
       : UndoChange(nullptr), table(concerned), name(text), type(kind) {}
   void swap() override {
-    table.findId(name) ? table.removeLast() : static_cast<void>(table.store(name, type));
+    const bool now = table.findId(name) != 0;
+    if (now != isThere) isThere ? static_cast<void>(table.store(name, type)) : table.removeLast();
+    isThere = now;
   }
   int64 memoryUse() const override { return static_cast<int64>(sizeof *this + name.GetString().size()); }
 
   PropertyTable& table;
   HString name;
   DataSource::PropertyType type;
+  bool isThere = false;  // in the other state
 };
 
 unsigned PropertyTable::add(HString const& name, DataSource::PropertyType type) {
   if (const unsigned known = findId(name)) return getType(known) == type ? known : 0;
   if (!Module::isValidPropertyName(name) || m_entries.size() == kIdMask) return 0;
-  const unsigned id = store(name, type);
   if (m_journal.isRecording()) m_journal.add(std::make_unique<Addition>(*this, name, type));
-  return id;
+  return store(name, type);
 }
 
 unsigned PropertyTable::store(HString const& name, DataSource::PropertyType type) {
-  m_entries.push_back({name, type});
-  const auto id = static_cast<unsigned>(m_entries.size());
-  m_ids.emplace(name.GetString(), id);
   HString lower = name;
   lower.MakeLower();
-  m_idsByLowerName[lower.GetString()].push_back(id);
+  std::vector<unsigned>& sameButCase = m_idsByLowerName[lower.GetString()];
+  sameButCase.reserve(sameButCase.size() + 1);
+  m_entries.reserve(m_entries.size() + 1);
+  Entry entry{name, type};
+  const auto id = static_cast<unsigned>(m_entries.size() + 1);
+  m_ids.emplace(name.GetString(), id);
+  // What may fail has been done.
+  sameButCase.push_back(id);
+  m_entries.push_back(std::move(entry));
   return id;
 }
 

@@ -41,8 +41,9 @@ void SceneIndex::ByAge::insert(Module* module) {
     return;
   }
   if (!m_several) {
-    m_several = std::make_unique<std::set<Module*, Earlier>>();
-    m_several->insert(m_only);
+    auto several = std::make_unique<std::set<Module*, Earlier>>();
+    several->insert(m_only);
+    m_several = std::move(several);
     m_only = nullptr;
   }
   m_several->insert(m_several->end(), module);  // most often the last
@@ -50,7 +51,7 @@ void SceneIndex::ByAge::insert(Module* module) {
 
 void SceneIndex::ByAge::erase(Module* module) {
   if (!m_several) {
-    m_only = nullptr;
+    if (m_only == module) m_only = nullptr;
     return;
   }
   m_several->erase(module);
@@ -69,13 +70,19 @@ void SceneIndex::add(Module* module) {
     }
     found->second.modules.insert(module);
   };
-  insert(m_byName, [](std::string_view name) { return name; });
-  insert(m_byParent, [&](std::string_view name) { return ChildKey{module->m_parent, name}; });
+  try {
+    insert(m_byName, [](std::string_view name) { return name; });
+    insert(m_byParent, [&](std::string_view name) { return ChildKey{module->m_parent, name}; });
+  } catch (...) {
+    remove(module);
+    throw;
+  }
 }
 
-void SceneIndex::remove(Module* module) {
+void SceneIndex::remove(Module* module) noexcept {
   const auto erase = [&](auto& map, auto const& key) {
     const auto found = map.find(key);
+    if (found == map.end()) return;
     found->second.modules.erase(module);
     if (found->second.modules.empty()) map.erase(found);
   };
@@ -199,12 +206,16 @@ HString SceneIndex::freeName(Module const* parent, HString const& wanted) {
 }
 
 // A name has become free below a parent.
-void SceneIndex::freeNumber(Module const* parent, std::string_view name) {
+void SceneIndex::freeNumber(Module const* parent, std::string_view name) noexcept {
   const auto numbers = m_numbers.find(parent);
   if (numbers == m_numbers.end()) return;
   std::string_view base;
   const int number = trailingNumber(name, base);
   if (number == 0) return;
-  const auto known = numbers->second.find(std::string(base));
-  if (known != numbers->second.end() && number < known->second.next) known->second.freed.insert(number);
+  try {
+    const auto known = numbers->second.find(std::string(base));
+    if (known != numbers->second.end() && number < known->second.next) known->second.freed.insert(number);
+  } catch (std::bad_alloc const&) {
+    m_numbers.erase(numbers);  // they are counted anew
+  }
 }

@@ -13,8 +13,10 @@
 
 class SceneIndex {
  public:
+  // On an exception the index is as before.
   void add(Module* module);
-  void remove(Module* module);  // before its name or parent changes
+  // Before its name or parent changes; nothing when it is not there.
+  void remove(Module* module) noexcept;
   // A module is leaving the scene: what is known of its children's names goes.
   void forgetParent(Module const* parent) { m_numbers.erase(parent); }
 
@@ -86,7 +88,7 @@ class SceneIndex {
   void forEachWithSuffix(std::vector<std::string_view> const& names, Visit visit) const;
   ByAge const* modulesNamed(std::string_view name) const;
   ByAge const* childrenNamed(Module const* parent, std::string_view name) const;
-  void freeNumber(Module const* parent, std::string_view name);
+  void freeNumber(Module const* parent, std::string_view name) noexcept;
 
   std::unordered_map<std::string_view, Bucket> m_byName;
   std::unordered_map<ChildKey, Bucket, ChildHash> m_byParent;

@@ -6,18 +6,16 @@ struct Selection::Change : UndoChange {
       : UndoChange(nullptr), selection(concerned), primary(concerned.m_primary) {}
 
   void swap() override {
-    const auto toggle = [this](Entry& entry) {
-      if (entry.module->isSelected()) {
-        selection.take(entry.module);
-      } else {
-        entry.module->m_selectionOrder = entry.order;
-        selection.insert(entry.module);
-      }
+    const auto put = [this](Entry& entry, bool selected) {
+      if (!selected) return selection.take(entry.module);
+      if (entry.module->isSelected()) return;
+      entry.module->m_selectionOrder = entry.order;
+      selection.insert(entry.module);
     };
     if (done) {
-      for (auto entry = entries.rbegin(); entry != entries.rend(); ++entry) toggle(*entry);
+      for (auto entry = entries.rbegin(); entry != entries.rend(); ++entry) put(*entry, entry->was);
     } else {
-      for (Entry& entry : entries) toggle(entry);
+      for (Entry& entry : entries) put(entry, !entry.was);
     }
     done = !done;
     std::swap(primary, selection.m_primary);
@@ -38,7 +36,8 @@ struct Selection::Change : UndoChange {
 
   struct Entry {
     Module* module;
-    uint64 order;  // when it is selected
+    uint64 order : 63;  // when it is selected
+    uint64 was : 1;     // selected before
   };
   Selection& selection;
   Module* primary;
@@ -48,25 +47,26 @@ struct Selection::Change : UndoChange {
 
 void Selection::record(Module* module) {
   if (!m_journal.isRecording()) return;
-  if (m_journal.isDue(m_undoMark)) {
-    auto change = std::make_unique<Change>(*this);
-    m_change = change.get();
-    m_journal.add(std::move(change));
-  }
-  if (module) m_change->entries.push_back({module, module->m_selectionOrder});
+  if (auto* change = m_journal.addOnce<Change>(m_undoMark, *this)) m_change = change;
+  if (module) m_change->entries.push_back({module, module->m_selectionOrder, module->isSelected()});
 }
 
 void Selection::insert(Module* module) {
   const int count = getCount();
   m_unsorted |= count > 0 && at(count - 1)->m_selectionOrder > module->m_selectionOrder;
-  m_modules.append(module);
-  if (auto* node = objectAs<Node>(module)) m_nodes.append(node);
-  if (auto* marker = objectAs<Marker>(module)) m_markers.append(marker);
-  if (auto* character = objectAs<Character>(module)) m_characters.append(character);
-  if (auto* bone = objectAs<LabelingBone>(module)) m_bones.append(bone);
+  try {
+    m_modules.append(module);
+    if (auto* node = objectAs<Node>(module)) m_nodes.append(node);
+    if (auto* marker = objectAs<Marker>(module)) m_markers.append(marker);
+    if (auto* character = objectAs<Character>(module)) m_characters.append(character);
+    if (auto* bone = objectAs<LabelingBone>(module)) m_bones.append(bone);
+  } catch (...) {
+    take(module);
+    throw;
+  }
 }
 
-void Selection::take(Module* module) {
+void Selection::take(Module* module) noexcept {
   m_modules.remove(module);
   if (auto* node = objectAs<Node>(module)) m_nodes.remove(node);
   if (auto* marker = objectAs<Marker>(module)) m_markers.remove(marker);

@@ -35,7 +35,7 @@ class Selection {
   struct Change;
   void record(Module* module);  // a module that is about to be selected or deselected, null: primary only
   void insert(Module* module);
-  void take(Module* module);
+  void take(Module* module) noexcept;
 
   UndoJournal& m_journal;
   OrderedList<Module, &Module::m_selectionSlot> m_modules;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <string>
+#include <utility>
 
 #include "host/scene/Database.h"
 
@@ -19,55 +20,69 @@ void UndoJournal::setEnabled(bool enabled) {
 }
 
 void UndoJournal::beginStep() {
-  if (m_depth++ == 0 && m_enabled) m_step = ++m_lastStep;
+  if (m_depth == 0 && m_enabled) {
+    if (!m_reserve.fill()) throw std::bad_alloc();
+    m_step = ++m_lastStep;
+  }
+  ++m_depth;
 }
 
 void UndoJournal::add(std::unique_ptr<UndoChange> change) { m_open.push_back(std::move(change)); }
 
 void UndoJournal::endStep(HString const& name) {
-  if (--m_depth > 0) return;
-  m_step = 0;
-  if (m_open.empty()) return;
-  Step step;
-  step.changes.swap(m_open);
-  const bool changed = std::any_of(step.changes.begin(), step.changes.end(),
-                                   [](auto const& change) { return !change->isVoid(); });
+  if (m_depth == 1 && !m_open.empty()) keep(name);
+  if (--m_depth == 0) m_step = 0;
+}
+
+void UndoJournal::keep(HString const& name) {
+  const bool changed =
+      std::any_of(m_open.begin(), m_open.end(), [](auto const& change) { return !change->isVoid(); });
   if (!changed) {
     // What is hidden, as the numbers behind the order of the selection, becomes what earlier steps know.
-    swapAll(step.changes, true);
+    swapAll(m_open, true);
+    m_open.clear();
     return;
   }
 
+  Step step;
   step.name = name;
-  step.changes.shrink_to_fit();
-  step.memory = static_cast<int64>(sizeof step + step.changes.capacity() * sizeof step.changes[0]);
-  for (auto const& change : step.changes) step.memory += change->memoryUse();
-  m_memoryUse += step.memory;
+  m_open.shrink_to_fit();
+  step.memory = static_cast<int64>(sizeof step + m_open.capacity() * sizeof m_open[0]);
+  for (auto const& change : m_open) step.memory += change->memoryUse();
+  if (step.memory > m_memoryLimit) {
+    writeLog(LogLevel::Warning, name.GetString() + " needs more memory to be undone (" +
+                                    std::to_string(step.memory / 1000000) + " MB) than undo may use (" +
+                                    std::to_string(m_memoryLimit / 1000000) + " MB) and cannot be undone.");
+  }
+  m_done.push_back(std::move(step));
+  // Nothing fails from here on.
+  m_done.back().changes.swap(m_open);
+  m_memoryUse += m_done.back().memory;
   for (Step const& undone : m_undone) m_memoryUse -= undone.memory;
   m_undone.clear();
-  m_done.push_back(std::move(step));
-  keepWithinLimit();
-}
-
-void UndoJournal::keepWithinLimit() {
-  while (!m_done.empty() && m_memoryUse > m_memoryLimit) {
-    if (m_done.size() == 1) {
-      writeLog(LogLevel::Warning, m_done.front().name.GetString() + " needs more memory to be undone (" +
-                                      std::to_string(m_memoryUse / 1000000) + " MB) than undo may use (" +
-                                      std::to_string(m_memoryLimit / 1000000) + " MB) and cannot be undone.");
-    }
+  for (; !m_done.empty() && m_memoryUse > m_memoryLimit; m_done.pop_front())
     m_memoryUse -= m_done.front().memory;
-    m_done.pop_front();
-  }
 }
 
-void UndoJournal::swapAll(Changes& changes, bool backward) {
+bool UndoJournal::discardStep() {
+  const bool known = m_step != 0 || m_depth == 0;
+  m_depth = 0;
+  swapAll(m_open, true);
+  m_step = 0;
+  m_open.clear();
+  return known;
+}
+
+void UndoJournal::swapAll(Changes& changes, bool backward) noexcept {
+  const uint64 step = std::exchange(m_step, 0);
+  const MustFinish mustFinish(m_reserve);
   if (backward) {
     for (auto change = changes.rbegin(); change != changes.rend(); ++change) (*change)->swap();
   } else {
     for (auto const& change : changes) change->swap();
   }
   m_scene.restoreOrder();
+  m_step = step;
 }
 
 bool UndoJournal::undo(HString& name) { return move(m_done, m_undone, true, name); }
@@ -76,13 +91,10 @@ bool UndoJournal::redo(HString& name) { return move(m_undone, m_done, false, nam
 
 bool UndoJournal::move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name) {
   if (from.empty() || !m_open.empty()) return false;
-  const uint64 step = m_step;
-  m_step = 0;
+  name = from.back().name;
   to.push_back(std::move(from.back()));
   from.pop_back();
   swapAll(to.back().changes, backward);
-  m_step = step;
-  name = to.back().name;
   return true;
 }
 

@@ -9,6 +9,9 @@
 //  2. A module that came into the scene within the step needs no records of its own: it comes and goes whole.
 //  3. A module lives as long as a change tells of it, in the scene or out of it.
 //  4. A new step that changed something drops what could be redone.
+//  5. A change is added before the scene changes. Swapping it brings the recorded state back wherever the
+//  mutator
+//     stopped after that, so that a step which ran out of memory can be discarded.
 //
 // Current time, ranges and the priority module are no part of it.
 #pragma once
@@ -18,6 +21,7 @@
 #include <vector>
 
 #include "host/base/HString.h"
+#include "host/base/OutOfMemory.h"
 
 class Database;
 class Module;
@@ -51,10 +55,15 @@ class UndoJournal {
   void setEnabled(bool enabled);
   bool isEnabled() const { return m_enabled; }
 
-  // Steps may stand inside each other: the outermost counts.
+  // Steps may stand inside each other: the outermost counts. Throws std::bad_alloc, and the step is not open,
+  // when there is not even the memory to take it back.
   void beginStep();
-  // `name`: what is shown when the step is undone. Nothing changed, no step.
+  // `name`: what is shown when the step is undone. Nothing changed, no step. On an exception the step is open
+  // still.
   void endStep(HString const& name);
+  // Takes back what the open step, and all that stand in it, changed; nothing stays of it. False when that is
+  // not known in full: steps are not kept, or were forgotten meanwhile.
+  bool discardStep();
 
   // Takes back the last step (does the next one again). False when there is none. A step that is open must
   // have changed nothing yet. `name`: that of the step.
@@ -74,14 +83,19 @@ class UndoJournal {
   // The step that is open and being recorded; 0 for none.
   uint64 getStep() const { return m_step; }
   bool isRecording() const { return m_step != 0; }
-  // Whether a field that was last recorded in step `mark` has to be recorded now; marks it.
-  bool isDue(uint64& mark) const {
-    if (mark == m_step) return false;
-    mark = m_step;
-    return m_step != 0;
-  }
   // Only while recording.
   void add(std::unique_ptr<UndoChange> change);
+  // Adds a change of a field that was last recorded in step `mark`, unless that is the one that is open. The
+  // change; null when nothing is to be recorded.
+  template <class Change, class... Args>
+  Change* addOnce(uint64& mark, Args&&... args) {
+    if (mark == m_step || m_step == 0) return nullptr;
+    auto change = std::make_unique<Change>(std::forward<Args>(args)...);
+    Change* added = change.get();
+    add(std::move(change));
+    mark = m_step;
+    return added;
+  }
 
  private:
   using Changes = std::vector<std::unique_ptr<UndoChange>>;
@@ -92,8 +106,8 @@ class UndoJournal {
   };
 
   bool move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name);
-  void swapAll(Changes& changes, bool backward);
-  void keepWithinLimit();
+  void swapAll(Changes& changes, bool backward) noexcept;
+  void keep(HString const& name);
 
   Database& m_scene;
   bool m_enabled = false;
@@ -101,6 +115,7 @@ class UndoJournal {
   uint64 m_step = 0;
   uint64 m_lastStep = 0;
   Changes m_open;
+  MemoryReserve m_reserve;            // for taking back
   std::deque<Step> m_done, m_undone;  // the next one to be undone or redone is at the back
   int64 m_memoryUse = 0;
   int64 m_memoryLimit = int64{1} << 30;
