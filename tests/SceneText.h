@@ -1,5 +1,5 @@
 // The whole scene as text, completely and in one order: what undo has to restore. Not in it: current time,
-// ranges, the priority module.
+// the priority module.
 #pragma once
 
 #include <iomanip>
@@ -34,7 +34,14 @@ class SceneText {
 
   void writeSettings() {
     HTimeManager const& time = *m_scene.getTimeManager();
-    m_out << "rate " << time.getTicksPerFrame() << " up " << m_scene.getUpAxis() << "\nselected";
+    m_out << "rate " << time.getTicksPerFrame() << " up " << m_scene.getUpAxis() << "\nranges";
+    const auto range = [this](HTimeRange const& each) {
+      m_out << " " << each.getStart() << "-" << each.getEnd();
+    };
+    range(time.getPlayRange());
+    range(time.getAnimRange());
+    for (int i = 0; i < time.getNumSelectedRanges(); ++i) range(time.getSelectedTimeRange(i));
+    m_out << "\nselected";
     for (int i = 0; i < m_scene.getNumSelectedModules(); ++i)
       m_out << " " << name(m_scene.getSelectedModule(i));
     m_out << "\nselected nodes";

@@ -2,6 +2,7 @@
 //
 #include <benchmark/benchmark.h>
 #include <cmath>
+#include <malloc.h>
 #include <memory>
 #include <random>
 
@@ -111,6 +112,36 @@ void setKeyInOrder(benchmark::State& state, Timed timed) { setKey(state, inOrder
 TIMED_BENCHMARKS(setKeyInOrder);
 void setKeyAtRandom(benchmark::State& state, Timed timed) { setKey(state, shuffled(kKeys), timed); }
 TIMED_BENCHMARKS(setKeyAtRandom);
+
+// What a step of one new key, or of one that is overwritten, holds beyond the track itself.
+void bytesOfStep(benchmark::State& state, bool overwrite) {
+  const auto held = [] { return static_cast<double>(mallinfo2().uordblks); };
+  constexpr int64 kSteps = 100'000;
+  for (auto _ : state) {
+    double bytes[2];
+    for (const bool kept : {false, true}) {
+      Scene scene(1);
+      Vec3Controller* channel = scene.channel(0);
+      const auto setAll = [&](double value) {
+        for (int64 i = 0; i < kSteps; ++i) {
+          g_db->getUndoJournal().beginStep();
+          channel->setKey(i * period(), Vec3(static_cast<double>(i), value, std::sin(i)), KeyTrack::kAll);
+          g_db->getUndoJournal().endStep("setKey");
+        }
+      };
+      if (overwrite) setAll(1);
+      g_db->getUndoJournal().setEnabled(kept);
+      const double before = held();
+      setAll(2);
+      bytes[kept] = held() - before;
+      g_db->getUndoJournal().setEnabled(false);
+    }
+    state.counters["bytes"] = (bytes[1] - bytes[0]) / kSteps;
+  }
+  state.SetItemsProcessed(state.iterations() * 2 * kSteps);
+}
+BENCHMARK_CAPTURE(bytesOfStep, added, false)->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(bytesOfStep, overwritten, true)->Unit(benchmark::kMillisecond);
 
 // A tenth of the keys of every marker, in 20 ranges.
 void cutKeyRanges(benchmark::State& state, Timed timed) {

@@ -1,6 +1,7 @@
 #include <map>
 
 #include "host/command/ScriptCommand.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/services/HInterface.h"
 
@@ -41,16 +42,15 @@ bool hasKeys(Module const* top, NLEClip const* clip) {
 
 // Channels are paired by index: both modules are expected to be of one make.
 void CollapseCmd::copyData(Module const* source, Module* target) {
-  target->beginDataEdit(HTimeRange::forever());
+  DataEdit edit(*target);
   target->addToClip(m_clip);
   bool copied = false;
   for (int i = 0; i < source->getNumChannels() && i < target->getNumChannels(); ++i)
     copied |= target->getChannel(i)->copyFrom(source->getChannel(i), true, false);
   if (copied) {
-    target->endDataEdit();
     ++m_copied;
   } else {
-    target->discardDataEdit();
+    edit.discard();
   }
 }
 

@@ -1,4 +1,5 @@
 #include "host/command/ScriptCommand.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 
 namespace {
@@ -52,12 +53,11 @@ bool CopyDataCmd::execute(Given const&, Args const& args, Variable&) {
     const HString to = args[i].getStringValue(-1);
     Controller* destination = findPlug(to);
     if (!destination) return false;
-    destination->beginDataEdit(HTimeRange::forever());
+    const DataEdit edit(*destination);
     if (destination->copyFrom(source, true, false))
       copied = true;
     else
       logError("Could not copy data from %s to %s", from.GetStr(), to.GetStr());
-    destination->endDataEdit();
   }
   return copied;
 }

@@ -1,4 +1,5 @@
 #include "host/command/ScriptCommand.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/PropertyTable.h"
@@ -26,12 +27,11 @@ unsigned selectedMask(unsigned id) {
 // The key is whole; it is left selected on the mask.
 void keyAt(Controller& channel, int64 time, unsigned mask) {
   const HTimeRange range(time - 1, time + 1);
-  channel.beginDataEdit(range);
+  const DataEdit edit(channel, range);
   Controller::Values value;
   channel.evaluateLayer(time, value);  // so that all layers together stay as they are
   channel.writeKeyAt(time, value, 7);
   channel.selectKeys(range, mask);
-  channel.endDataEdit();
 }
 
 bool CreateKeyCmd::execute(Given const&, Args const&, Variable&) {

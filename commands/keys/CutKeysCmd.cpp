@@ -1,5 +1,6 @@
 #include "commands/Targets.h"
 #include "commands/keys/KeyTargets.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 
@@ -49,11 +50,10 @@ class KeyCut {
   void cutAll(Controller& channel, unsigned mask, unsigned lost) {
     m_keys += channel.getNumKeys();
     KeyTrack const& track = *channel.findActiveTrack();
-    channel.beginDataEdit(m_allLayers ? channel.getKeyRangeInClip(g_db->getActiveClip())
-                                      : rangeBetween(track, track.nextHolding(-1, mask),
-                                                     track.previousHolding(track.count(), mask)));
+    const DataEdit edit(channel, m_allLayers ? channel.getKeyRangeInClip(g_db->getActiveClip())
+                                             : rangeBetween(track, track.nextHolding(-1, mask),
+                                                            track.previousHolding(track.count(), mask)));
     channel.deleteKeys(HTimeRange::forever(), lost, m_allLayers);
-    channel.endDataEdit();
     ++m_channels;
   }
 
@@ -61,9 +61,8 @@ class KeyCut {
     HTimeManager const* time = HTimeManager::getInstance();
     for (int i = 0; i < time->getNumSelectedRanges(); ++i) {
       const HTimeRange range = time->getSelectedTimeRange(i);
-      channel.beginDataEdit(range);
+      const DataEdit edit(channel, range);
       m_keys += channel.deleteKeys(range, lost, m_allLayers);
-      channel.endDataEdit();
     }
     if (time->getNumSelectedRanges() > 0) ++m_channels;
   }
@@ -72,10 +71,9 @@ class KeyCut {
     const int count = channel.getNumSelectedKeys(mask);
     if (count == 0) return;
     KeyTrack const& track = *channel.findActiveTrack();
-    channel.beginDataEdit(
-        rangeBetween(track, track.nextSelected(-1, mask), track.previousSelected(track.count(), mask)));
+    const DataEdit edit(channel, rangeBetween(track, track.nextSelected(-1, mask),
+                                              track.previousSelected(track.count(), mask)));
     channel.deleteSelectedKeys(lost);
-    channel.endDataEdit();
     m_keys += count;
     ++m_channels;
   }

@@ -1,5 +1,6 @@
 #include "commands/keys/KeyClipboard.h"
 #include "commands/keys/KeyTargets.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 
@@ -53,12 +54,11 @@ bool pasteAll(ClipboardManager const& clipboard, Controller& channel, int64 time
     Command::logError("The pasted keys would lie beyond the time line.");
     return false;
   }
-  channel.beginDataEdit(HTimeRange(time, time + length));
+  const DataEdit edit(channel, HTimeRange(time, time + length));
   for (int i = 0; i < clipboard.getNumControllerKeys(); ++i) {
     const ClipboardManager::tagKey record = clipboard.getControllerKey(i);
     paste(record, channel, time + (record.time - source.getStart()));
   }
-  channel.endDataEdit();
   return true;
 }
 

@@ -3,6 +3,7 @@
 
 #include "commands/keys/KeyTargets.h"
 #include "host/keys/KeyReduction.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 
@@ -57,9 +58,8 @@ class KeyThinning {
 
   void thin(Controller& channel, bool first, std::vector<HTimeRange> const& ranges, HTimeRange const& hull) {
     if (ranges.empty()) return;
-    channel.beginDataEdit(hull);
+    const DataEdit edit(channel, hull);
     if (first) m_keys += channel.reduceKeys(ranges, m_tolerances);
-    channel.endDataEdit();
     ++m_channels;
   }
 
@@ -67,9 +67,8 @@ class KeyThinning {
     const int selected = channel.getNumSelectedKeys();
     if (selected == 0) return;
     const auto timeOf = [&](int i) { return channel.getKeyTime(channel.getSelectedKeyIndex(i)); };
-    channel.beginDataEdit(HTimeRange(timeOf(0), timeOf(selected - 1)));
+    const DataEdit edit(channel, HTimeRange(timeOf(0), timeOf(selected - 1)));
     if (first) m_keys += channel.reduceSelectedKeys(m_tolerances);
-    channel.endDataEdit();
     ++m_channels;
   }
 

@@ -4,6 +4,7 @@
 #include "commands/ChannelValues.h"
 #include "commands/Events.h"
 #include "commands/keys/KeyTargets.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/HTimeManager.h"
 
 namespace {
@@ -80,9 +81,8 @@ void NewKey::write(BoolController& channel) const {
 }
 
 void NewKey::writeOn(Controller& channel) const {
-  channel.beginDataEdit(HTimeRange(time - 1, time + 1));
+  const DataEdit edit(channel, HTimeRange(time - 1, time + 1));
   withKind(channel, [&](auto& typed) { write(typed); });
-  channel.endDataEdit();
 }
 
 // Reads the value for a channel of that kind; false, with a message, when it cannot be keyed.

@@ -1,6 +1,7 @@
 #include "commands/properties/ChannelWriting.h"
 
 #include "commands/Angles.h"
+#include "host/scene/DataEdit.h"
 
 namespace {
 
@@ -71,13 +72,12 @@ void writeKey(BoolController& channel, int i, ChannelWrite const& write) {
 
 void ChannelWrite::applyTo(Controller& channel) const {
   if (byDefault) {
-    channel.beginDefaultEdit();
+    const DataEdit edit = DataEdit::ofDefault(channel);
     withKind(channel, [&](auto& typed) { writeDefault(typed, *this); });
   } else {
-    channel.beginDataEdit(channel.getKeyRange());
+    const DataEdit edit(channel, channel.getKeyRange());
     withKind(channel, [&](auto& typed) {
       for (int i = 0; i < typed.getNumSelectedKeys(); ++i) writeKey(typed, i, *this);
     });
   }
-  channel.endDataEdit();
 }

@@ -1,4 +1,5 @@
 #include "commands/transforms/TransformWriting.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Marker.h"
 
 namespace {
@@ -32,13 +33,12 @@ bool writePosition(TransformWrite const& write) {
   Controller* channel = node.getTranslationChannel();
   if (!isWritable(*channel, write.byDefault)) return false;
   if (write.byDefault) {
-    channel->beginDefaultEdit();
+    const DataEdit edit = DataEdit::ofDefault(*channel);
     write.world ? node.setConstWSPos(write.vector) : node.setConstLocalPos(write.vector);
   } else {
-    channel->beginDataEdit(write.edited());
+    const DataEdit edit(*channel, write.edited());
     write.world ? node.setWSPos(write.time, write.vector) : node.setLocalPos(write.time, write.vector);
   }
-  channel->endDataEdit();
   return true;
 }
 

@@ -1,4 +1,5 @@
 #include "commands/transforms/TransformWriting.h"
+#include "host/scene/DataEdit.h"
 
 namespace {
 
@@ -31,9 +32,8 @@ bool SetScaleCmd::execute(Given const& given, Args const& args, Variable&) {
   if (!isWritable(*node.getScaleChannel(), write.byDefault)) return true;
   if (write.byDefault) {
     // Kept: the write of the default value stands in the bracket, the one at a time does not.
-    node.beginDataEdit(write.edited());
+    const DataEdit edit(node, write.edited());
     node.setConstLocalScale(write.world ? localScale(node, write.vector, write.time) : write.vector);
-    node.endDataEdit();
   } else {
     write.world ? node.setWSScale(write.time, write.vector) : node.setLocalScale(write.time, write.vector);
   }

@@ -3,6 +3,7 @@
 #include <cmath>
 
 #include "commands/Targets.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/HTimeManager.h"
 
 bool readWrite(Given const& given, Args const& args, WriteOptions const& which, char const* command,
@@ -47,8 +48,7 @@ bool writeRotation(TransformWrite const& write, TalixRotation const& rotation) {
     write.world ? node.setConstWSRot(rotation) : node.setConstLocalRot(rotation, true);
     return true;
   }
-  node.beginDataEdit(write.edited());
+  const DataEdit edit(node, write.edited());
   write.world ? node.setWSRot(write.time, rotation) : node.setLocalRot(write.time, rotation);
-  node.endDataEdit();
   return true;
 }

@@ -195,6 +195,9 @@ class KeyTrack {
   // Shares all leaves with the other: nothing was changed since one was copied from the other.
   bool sharesAll(KeyTrack const&) const;
 
+  // The tree, for those who compare tracks leaf by leaf; null without keys.
+  KeyNode const* root() const { return m_root.get(); }
+
   // Bytes held, shared leaves counted in full.
   int64 memoryUse() const;
   // Bytes held that no other track shares.

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 
+#include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/UndoJournal.h"
@@ -142,6 +143,13 @@ struct Attribute::Change : UndoChange {
   int64 memoryUse() const override {
     return static_cast<int64>(sizeof *this) + std::max(bytesBeside(value), bytesBeside(attribute.m_value));
   }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    // The name and the selection have changes of their own.
+    changes.tell(SceneChange::Kind::attribute, attribute.m_module, attribute.m_name.GetString(),
+                 text(value, set), text(attribute.m_value, attribute.m_set), !isVoid());
+  }
+  static std::string text(Value const& value, bool set) { return set ? textOf(value) : "not set"; }
 
   Attribute& attribute;
   Value value;

@@ -1,8 +1,9 @@
 // A static value of a module: one class for each of the seventeen kinds.
 //
-// Setters end with four flags, true unless a caller has a reason: undoable (the journal records the change),
-// notify (views are told), react (the module takes the change on, as a changed name renames it) and markSet
-// (the attribute counts as set from now on). Those that answer a bool answer whether the value was taken.
+// Setters end with four flags, true unless a caller has a reason: undoable and notify, which are the host's
+// and do nothing (an open undo step records every change and tells of it), react (the module takes the change
+// on, as a changed name renames it) and markSet (the attribute counts as set from now on). Those that return
+// a bool return whether the value was taken.
 #pragma once
 
 #include <memory>

@@ -9,7 +9,7 @@ void ClipboardManager::startClipboardCopy(ClipboardDataType, ControllerDataType 
 
 void ClipboardManager::finishClipboardCopy(bool keep) {
   if (keep) {
-    m_keys.swap(m_incoming);
+    m_keys = std::make_shared<std::vector<tagKey> const>(std::move(m_incoming));
     m_type = m_incomingType;
     m_order = m_incomingOrder;
     m_filled = true;
@@ -19,6 +19,6 @@ void ClipboardManager::finishClipboardCopy(bool keep) {
 
 HTimeRange ClipboardManager::getControllerDataRange() const {
   HTimeRange range;
-  for (tagKey const& key : m_keys) range.include(key.time);
+  for (int i = 0; i < getNumControllerKeys(); ++i) range.include(getControllerKey(i).time);
   return range;
 }

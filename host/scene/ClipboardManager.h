@@ -1,6 +1,7 @@
 // The key clipboard. One that was never filled fits every channel and holds no keys.
 #pragma once
 
+#include <memory>
 #include <vector>
 
 #include "host/math/TalixRotation.h"
@@ -29,13 +30,14 @@ class ClipboardManager {
   bool isEmpty() const { return !m_filled; }
   ControllerDataType getControllerDataType() const { return m_type; }
   TalixRotation::RotOrder getRotationOrder() const { return m_order; }
-  int getNumControllerKeys() const { return static_cast<int>(m_keys.size()); }
-  tagKey getControllerKey(int i) const { return m_keys[static_cast<size_t>(i)]; }
+  int getNumControllerKeys() const { return m_keys ? static_cast<int>(m_keys->size()) : 0; }
+  tagKey getControllerKey(int i) const { return (*m_keys)[static_cast<size_t>(i)]; }
   // From the earliest to the latest key; empty without keys.
   HTimeRange getControllerDataRange() const;
 
  private:
-  std::vector<tagKey> m_keys, m_incoming;
+  std::shared_ptr<std::vector<tagKey> const> m_keys;  // null: none; shared by copies, which cost nothing
+  std::vector<tagKey> m_incoming;
   ControllerDataType m_type = OtherKeys, m_incomingType = OtherKeys;
   TalixRotation::RotOrder m_order = TalixRotation::XYZ, m_incomingOrder = TalixRotation::XYZ;
   bool m_filled = false;

@@ -1,5 +1,6 @@
 #include "host/scene/Clips.h"
 
+#include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
 
 H_DEFINE_ABSTRACT_CLASS(NLEClip);
@@ -25,6 +26,11 @@ struct NLEClip::LocksChange : UndoChange {
   void swap() override { clip.m_layerLocks.swap(locks); }
   bool isVoid() const override { return locks == clip.m_layerLocks; }
   int64 memoryUse() const override { return static_cast<int64>(sizeof *this + locks.capacity() / 8); }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    changes.tell(SceneChange::Kind::attribute, &clip, "LayerLocks", textOf(Attribute::Value(locks)),
+                 textOf(Attribute::Value(clip.m_layerLocks)));
+  }
 
   NLEClip& clip;
   std::vector<bool> locks;

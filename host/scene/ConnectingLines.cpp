@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
 
 Vec3 MarkerConnection::getDefaultColor() { return {128, 128, 128}; }
@@ -36,6 +37,22 @@ struct ConnectingLines::Change : UndoChange {
   int64 memoryUse() const override {
     return static_cast<int64>(sizeof *this +
                               std::max(other.size(), lines.m_lines.size()) * sizeof(MarkerConnection));
+  }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    changes.tell(
+        SceneChange::Kind::attribute, &lines.m_source, "ConnectingLines", text(other), text(lines.m_lines),
+        !std::equal(other.begin(), other.end(), lines.m_lines.begin(), lines.m_lines.end(), areSame));
+  }
+  static bool areSame(MarkerConnection const& a, MarkerConnection const& b) {
+    return a.getTarget() == b.getTarget() && a.getConnectingColor() == b.getConnectingColor();
+  }
+  static std::string text(std::vector<MarkerConnection> const& all) {
+    std::string text;
+    for (MarkerConnection const& line : all)
+      text += (text.empty() ? "" : " ") + textOf(line.getTarget()) + " (" +
+              textOf(line.getConnectingColor()) + ")";
+    return text;
   }
 
   ConnectingLines& lines;

@@ -5,12 +5,15 @@
 //  or
 //     composes on the right (rotations). A lowest layer without keys gives the default value.
 //  3. Key operations read and edit the active layer of the active clip.
-//  4. Every change of keys stands between beginDataEdit and endDataEdit.
+//  4. Every change of keys stands between beginDataEdit and endDataEdit (DataEdit); the setters here open an
+//  edit of
+//     their own, so that callers do so only to make one of several.
 //
 // Times are ticks, angles radians, lengths millimetres. Masks: 1 x, 2 y, 4 z, 7 all; one-valued channels use
 // 1 or 7.
 #pragma once
 
+#include <cassert>
 #include <functional>
 #include <memory>
 #include <span>
@@ -25,6 +28,9 @@
 #include "host/time/HTimeRange.h"
 
 class Database;
+class PackedStep;
+class UndoChange;
+struct TrackName;
 class Module;
 class NLEClip;
 struct ReductionTolerances;
@@ -62,6 +68,7 @@ class Controller : public DataSource {
   bool isLocked() const { return m_locked; }
   void setLocked(bool locked);
 
+  // Ranges are hints.
   virtual void beginDefaultEdit();
   virtual void beginDataEdit(HTimeRange const& range);
   virtual void endDataEdit();
@@ -124,6 +131,13 @@ class Controller : public DataSource {
   bool hasKeysInClip(NLEClip const* clip) const;
   HTimeRange getKeyRangeInClip(NLEClip const* clip) const;
   void forgetClip(NLEClip const* clip);
+  // Calls visit(clip, layer) for every track, with or without keys.
+  template <class Visit>
+  void forEachTrack(Visit visit) const {
+    for (ClipTrack const& track : m_tracks) visit(track.clip, track.layer);
+  }
+  // The change of single keys that a kept undo step holds as bytes.
+  static std::unique_ptr<UndoChange> unpackKeys(TrackName const& track, PackedStep& step);
 
   // Copies default value, interpolation and the keys of the active clip from a channel of the same kind.
   // Locked layers stay as they are, with a warning. False when the kinds differ or no layer is editable.
@@ -175,6 +189,7 @@ class Controller : public DataSource {
   ClipTrack& clipTrack(NLEClip* clip, int layer);
   // The change of a track in this undo step; null when none is to be recorded.
   KeyChange* changeOf(ClipTrack& track);
+  void checkEdit() const { assert(m_editDepth > 0 && "keys change outside of an edit"); }
   void recordSettings();
   int64 memoryAlone() const;
   void evaluateInClip(NLEClip const* clip, int64 time, Values& values) const;

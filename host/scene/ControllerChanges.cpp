@@ -1,6 +1,7 @@
 // The mutators of a channel: its keys, its settings.
 #include <algorithm>
 
+#include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Clips.h"
 #include "host/scene/Controller.h"
 #include "host/scene/Database.h"
@@ -20,6 +21,7 @@ struct Controller::KeyChange : UndoChange {
     KeyTrack::Key key;  // with its time
     bool present = false;
 
+    Slot() = default;
     Slot(KeyTrack const& track, int64 time) {
       key.time = time;
       const int64 index = track.find(time);
@@ -36,8 +38,8 @@ struct Controller::KeyChange : UndoChange {
     void putInto(KeyTrack& track) const { present ? track.restore(key) : track.restoreNone(key.time); }
   };
 
-  KeyChange(Controller& concerned, ClipTrack const& track)
-      : UndoChange(concerned.m_module), channel(concerned), clip(track.clip), layer(track.layer) {}
+  KeyChange(Controller& concerned, NLEClip* ofClip, int ofLayer)
+      : UndoChange(concerned.m_module), channel(concerned), clip(ofClip), layer(ofLayer) {}
 
   // Keys from first to last are about to change; a single time also when it has no key yet.
   void note(KeyTrack const& track, int64 first, int64 last) {
@@ -81,12 +83,54 @@ struct Controller::KeyChange : UndoChange {
            (snapshot ? std::max(snapshot->memoryAlone(), track().memoryAlone()) : 0);
   }
 
+  // A key is its time, its flags and, when it is there, its values.
+  bool isSmall() const override { return !snapshot; }
+  void pack(PackedStep& step) const override {
+    step.putTrack({&channel, clip, layer});
+    step.put(static_cast<unsigned char>(keys.size()));
+    for (Slot const& slot : keys) {
+      step.put(slot.key.time);
+      step.put(static_cast<unsigned short>(slot.key.components | slot.key.selected << 3 |
+                                           slot.key.bridges << 6 | slot.present << 9));
+      for (int i = 0; slot.present && i < width(); ++i) step.put(slot.key.values[static_cast<size_t>(i)]);
+    }
+  }
+  void unpack(PackedStep& step) {
+    size_t left = step.take<unsigned char>();
+    keys.reserve(left);
+    for (; left > 0; --left) {
+      Slot slot;
+      slot.key.time = step.take<int64>();
+      const auto flags = step.take<unsigned short>();
+      slot.key.components = flags & 7;
+      slot.key.selected = flags >> 3 & 7;
+      slot.key.bridges = flags >> 6 & 7;
+      slot.present = flags >> 9 & 1;
+      for (int i = 0; slot.present && i < width(); ++i)
+        slot.key.values[static_cast<size_t>(i)] = step.take<double>();
+      keys.push_back(slot);
+    }
+  }
+  int width() const { return static_cast<int>(shapeOf(channel.getPropertyType())); }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    KeyTrack& before = changes.keysBefore(channel, clip, layer);
+    if (snapshot) before = *snapshot;
+    for (auto slot = keys.rbegin(); slot != keys.rend(); ++slot) slot->putInto(before);
+  }
+
   Controller& channel;
   NLEClip* clip;
   int layer;
   std::vector<Slot> keys;
   std::unique_ptr<KeyTrack> snapshot;  // in place of keys
 };
+
+std::unique_ptr<UndoChange> Controller::unpackKeys(TrackName const& track, PackedStep& step) {
+  auto change = std::make_unique<KeyChange>(*track.channel, track.clip, track.layer);
+  change->unpack(step);
+  return change;
+}
 
 Controller::ClipTrack& Controller::clipTrack(NLEClip* clip, int layer) {
   for (ClipTrack& track : m_tracks)
@@ -96,12 +140,13 @@ Controller::ClipTrack& Controller::clipTrack(NLEClip* clip, int layer) {
 
 Controller::KeyChange* Controller::changeOf(ClipTrack& track) {
   if (!m_module || !m_module->isRecorded()) return nullptr;
-  if (auto* change = m_module->journal().addOnce<KeyChange>(track.undoMark, *this, track))
+  if (auto* change = m_module->journal().addOnce<KeyChange>(track.undoMark, *this, track.clip, track.layer))
     track.change = change;
   return track.change;
 }
 
 KeyTrack* Controller::editTrack(NLEClip* clip, int layer, int64 first, int64 last) {
+  checkEdit();
   ClipTrack& track = clipTrack(clip, layer);
   if (KeyChange* change = changeOf(track)) change->note(track.track, first, last);
   return &track.track;
@@ -122,6 +167,7 @@ KeyTrack* Controller::trackToDelete(NLEClip* clip, int layer, int64 first, int64
 }
 
 KeyTrack& Controller::replaceTrack(NLEClip* clip, int layer) {
+  checkEdit();
   ClipTrack& track = clipTrack(clip, layer);
   KeyChange* change = changeOf(track);
   if (change && !change->snapshot) change->takeSnapshot(track.track);
@@ -147,11 +193,17 @@ struct Controller::TracksChange : UndoChange {
            std::max(alone, channel.memoryAlone());
   }
 
+  void tell(ChangeSetBuilder& changes) const override {
+    changes.tellNoKeys(channel);
+    for (ClipTrack const& track : tracks) changes.keysBefore(channel, track.clip, track.layer) = track.track;
+  }
+
   Controller& channel;
   std::vector<ClipTrack> tracks;
 };
 
 void Controller::storeTracks(std::vector<ClipTrack> tracks) {
+  checkEdit();
   if (m_module && m_module->isRecorded()) m_module->journal().add(std::make_unique<TracksChange>(*this));
   m_tracks = std::move(tracks);
   // What was recorded of single tracks stands before this change: later edits are recorded anew.
@@ -184,6 +236,21 @@ struct Controller::SettingsChange : UndoChange {
            locked == channel.m_locked;
   }
   int64 memoryUse() const override { return sizeof *this; }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    Module const* module = channel.m_module;
+    const std::string name = channel.getName().GetString();
+    const auto values = [this](Values const& all) {
+      return textOfList(std::span(all).first(static_cast<size_t>(shapeOf(channel.getPropertyType()))));
+    };
+    const auto setting = [&](char const* which, std::string const& before, std::string const& after) {
+      changes.tell(SceneChange::Kind::attribute, module, name + which, before, after);
+    };
+    changes.tell(SceneChange::Kind::byDefault, module, name, values(byDefault), values(channel.m_default));
+    setting(".Interpolation", channel.getInterpTypeName(static_cast<int>(interpolation)),
+            channel.getInterpTypeName(static_cast<int>(channel.m_interpolation)));
+    setting(".Locked", locked ? "true" : "false", channel.m_locked ? "true" : "false");
+  }
 
   Controller& channel;
   Values byDefault;

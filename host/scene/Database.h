@@ -17,6 +17,7 @@ class CalibrationMgr;
 class ClipboardManager;
 class HTimeManager;
 class PropertyTable;
+struct SceneAside;
 class SceneIndex;
 class SubjectManager;
 struct SceneServices;
@@ -50,8 +51,8 @@ class Database {
   // select: it becomes selected. False, and the caller keeps the module, when createModule would refuse.
   bool addToScene(Module* module, bool uniqueName, Character const* character, bool select, bool notify);
   // Takes the module and all below it out of the scene, with every reference to them. It lives on until
-  // releaseRemoved. False when it is not in the scene. The flags: with its children, from the selection,
-  // undoable, notify; children always go with it.
+  // releaseRemoved. False when it is not in the scene. The flags are the host's and do nothing: children go
+  // with it, it is deselected, and an open undo step records it.
   bool removeFromScene(Module* module, bool children, bool deselect, bool undoable, bool notify);
   // Copies the selected modules with all that they hold, clips with their keys on every module; children only
   // when they are selected. A copy stands below the copy of its original's parent when there is one, else
@@ -117,7 +118,7 @@ class Database {
   // Whether active properties follow what is keyed; off at start.
   bool getAutoUpdateProperties() const { return m_autoUpdateProperties; }
   void setAutoUpdateProperties(bool on) { m_autoUpdateProperties = on; }
-  // Drops active properties that no module has any more. notify: views are told.
+  // Drops active properties that no module has any more. notify does nothing.
   void syncActiveProperties(bool notify);
 
   // --- settings ---
@@ -132,10 +133,14 @@ class Database {
   // The axis that points up: 0 x, 1 y, 2 z; -1 until a take or the user sets it.
   int getUpAxis() const { return m_upAxis; }
   void setUpAxis(int axis);
-  // For mutators of what the journal keeps together: active clip, layer and properties, up axis, frame rate.
+  // For mutators of what the journal keeps together: active clip, layer and properties, up axis, frame
+  // rate and ranges.
   void recordSettings();
 
   UndoJournal& getUndoJournal() { return m_journal; }
+  // For steps that are discarded: what of the scene they do not tell of.
+  std::unique_ptr<SceneAside> putAside() const;
+  void putBack(SceneAside& aside) noexcept;
   // Puts lists in order again after undo and redo, and forgets what was cached.
   void restoreOrder();
   // Forgets every cached world transform: what is active has changed.

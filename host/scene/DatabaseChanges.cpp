@@ -2,8 +2,10 @@
 #include <algorithm>
 
 #include "host/scene/CalibrationMgr.h"
+#include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
+#include "host/scene/SceneAside.h"
 #include "host/scene/SceneIndex.h"
 #include "host/scene/SubjectManager.h"
 
@@ -20,6 +22,7 @@ struct Database::Membership : UndoChange {
     inScene = now;
   }
   int64 memoryUse() const override { return sizeof *this + module.memoryUse(); }
+  void tell(ChangeSetBuilder& changes) const override { changes.tellMembership(module, inScene); }
 
   Module& module;
   bool inScene;
@@ -104,7 +107,7 @@ bool Database::removeFromScene(Module* module, bool, bool, bool, bool) {
 
 // --- what is active ---
 
-// The frame rate is among it: what frames mean hangs on it. Small, and changed together as often as not.
+// The frame rate and the ranges are among it. Small, and changed together as often as not.
 struct Database::SettingsChange : UndoChange {
   explicit SettingsChange(Database& concerned)
       : UndoChange(nullptr),
@@ -113,23 +116,58 @@ struct Database::SettingsChange : UndoChange {
         layer(scene.m_activeLayer),
         upAxis(scene.m_upAxis),
         properties(scene.m_activeProperties),
-        rate(scene.m_time->getFrameRate()) {}
+        time(scene.m_time->getSettings()) {}
   void swap() override {
     std::swap(clip, scene.m_activeClip);
     std::swap(layer, scene.m_activeLayer);
     std::swap(upAxis, scene.m_upAxis);
     std::swap(properties, scene.m_activeProperties);
-    const HFrameRate now = scene.m_time->getFrameRate();
-    scene.m_time->setFrameRate(rate);
-    rate = now;
+    scene.m_time->swapSettings(time);
   }
   bool isVoid() const override {
     return clip == scene.m_activeClip && layer == scene.m_activeLayer && upAxis == scene.m_upAxis &&
-           properties == scene.m_activeProperties && rate == scene.m_time->getFrameRate();
+           properties == scene.m_activeProperties && time == scene.m_time->getSettings();
   }
   int64 memoryUse() const override {
     return static_cast<int64>(sizeof *this +
                               sizeof(unsigned) * (properties.size() + scene.m_activeProperties.size()));
+  }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    const auto setting = [&](char const* name, std::string const& before, std::string const& after) {
+      changes.tell(SceneChange::Kind::attribute, nullptr, name, before, after);
+    };
+    const auto names = [this](std::vector<unsigned> const& ids) {
+      std::string text;
+      for (const unsigned id : ids)
+        text += (text.empty() ? "" : " ") + scene.getPropertyTable().getName(id).GetString() +
+                textOfBits(id >> 28 & 7);
+      return text;
+    };
+    changes.tell(SceneChange::Kind::attribute, nullptr, "ActiveClip", textOf(clip),
+                 textOf(scene.m_activeClip), clip != scene.m_activeClip);
+    setting("ActiveLayer", std::to_string(clip ? layer : -1), std::to_string(scene.getActiveLayer()));
+    setting("ActiveProperties", names(properties), names(scene.m_activeProperties));
+    setting("UpAxis", std::to_string(upAxis), std::to_string(scene.m_upAxis));
+    const HTimeManager::Settings now = scene.m_time->getSettings();
+    setting("FrameRate", textOf(time.rate.getFrameRate()), textOf(now.rate.getFrameRate()));
+    setting("AnimRange", textOfRange(time.animRange), textOfRange(now.animRange));
+    setting("PlayRange", textOfRange(time.playRange), textOfRange(now.playRange));
+    const auto ranges = [](std::vector<HTimeRange> const& all) {
+      std::string text;
+      for (HTimeRange const& range : all) text += (text.empty() ? "" : " ") + textOfRange(range);
+      return text;
+    };
+    setting("SelectedRanges", ranges(time.selected), ranges(now.selected));
+  }
+  static std::string textOfRange(HTimeRange const& range) {
+    return std::to_string(range.getStart()) + " " + std::to_string(range.getEnd());
+  }
+  static std::string textOfBits(unsigned bits) {
+    std::string text = bits == 0 || bits == 7 ? "" : ".";
+    for (int c = 0; c < 3 && !text.empty(); ++c)
+      if (bits >> c & 1) text += "xyz"[c];
+    return text;
   }
 
   Database& scene;
@@ -137,7 +175,7 @@ struct Database::SettingsChange : UndoChange {
   int layer;
   int upAxis;
   std::vector<unsigned> properties;
-  HFrameRate rate;
+  HTimeManager::Settings time;
 };
 
 void Database::recordSettings() {
@@ -161,6 +199,18 @@ void Database::setActiveProperties(std::vector<unsigned> ids) {
 void Database::setUpAxis(int axis) {
   recordSettings();
   m_upAxis = axis;
+}
+
+// --- what a discarded step brings back beside its changes ---
+
+std::unique_ptr<SceneAside> Database::putAside() const {
+  return std::make_unique<SceneAside>(SceneAside{m_time->getTime(), m_priority, *m_clipboard});
+}
+
+void Database::putBack(SceneAside& aside) noexcept {
+  m_time->setTime(aside.time, true);
+  m_priority = aside.priority;
+  std::swap(*m_clipboard, aside.clipboard);
 }
 
 // --- after undo and redo ---

@@ -18,8 +18,19 @@ void HTimeManager::reset() {
 }
 
 void HTimeManager::setFrameRate(HFrameRate const& rate) {
-  if (m_scene) m_scene->recordSettings();
+  record();
   m_rate = rate;
+}
+
+void HTimeManager::record() {
+  if (m_scene) m_scene->recordSettings();
+}
+
+void HTimeManager::swapSettings(Settings& settings) noexcept {
+  std::swap(m_rate, settings.rate);
+  std::swap(m_animRange, settings.animRange);
+  std::swap(m_playRange, settings.playRange);
+  m_selected.swap(settings.selected);
 }
 
 void HTimeManager::checkThread() const {
@@ -80,24 +91,24 @@ double HTimeManager::stringToFrameDouble(HString const& text, bool relative) con
 }
 
 void HTimeManager::setAnimRange(HTimeRange range) {
-  checkThread();
+  record();
   m_animRange = range;
 }
 
 void HTimeManager::setPlayRange(HTimeRange range, bool keepTime) {
-  checkThread();
+  record();
   m_playRange = range;
   if (!keepTime && !range.isEmpty()) setTime(std::clamp(m_time, range.getStart(), range.getEnd()), true);
 }
 
 void HTimeManager::clearSelectedTimeRanges() {
-  checkThread();
+  record();
   m_selected.clear();
 }
 
 void HTimeManager::addSelectedTimeRange(HTimeRange range) {
-  checkThread();
   if (range.isEmpty()) return;
+  record();
   const auto before = [](HTimeRange const& a, HTimeRange const& b) { return a.getEnd() < b.getStart(); };
   // All ranges that meet the new one grow into it.
   const auto [first, last] = std::equal_range(m_selected.begin(), m_selected.end(), range, before);

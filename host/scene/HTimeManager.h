@@ -13,7 +13,7 @@ class HTimeManager {
   enum ERoundDirection { RoundDown, RoundNearest, RoundUp };
 
   // A new scene's: 120 frames a second, "Custom", time 0, play and animation ranges 0 to 100 frames.
-  // scene: whose time it is, which records a change of the rate; null: nobody's.
+  // scene: whose time it is, which records changes of it; null: nobody's.
   explicit HTimeManager(Database* scene = nullptr);
   static HTimeManager* getInstance();  // that of the current scene
   void reset();
@@ -27,7 +27,7 @@ class HTimeManager {
   int64 getTime() const { return m_time; }
   // The time of a frame; beyond the time line it is the time line's end.
   int64 getTime(int frame) const;
-  // Moves the current time. `notify` tells listeners of the scene.
+  // Moves the current time. notify does nothing.
   void setTime(int64 time, bool notify);
 
   // Ticks over ticks per frame, truncated toward zero.
@@ -58,8 +58,19 @@ class HTimeManager {
   void addSelectedTimeRange(HTimeRange range);
   void clearSelectedTimeRanges();
 
+  // What undo brings back: all but the current time.
+  struct Settings {
+    HFrameRate rate;
+    HTimeRange animRange, playRange;
+    std::vector<HTimeRange> selected;
+    bool operator==(Settings const&) const = default;
+  };
+  Settings getSettings() const { return {m_rate, m_animRange, m_playRange, m_selected}; }
+  void swapSettings(Settings& settings) noexcept;
+
  private:
   void checkThread() const;
+  void record();
 
   Database* m_scene;
   HFrameRate m_rate;

@@ -15,7 +15,7 @@ class Marker : public Node {
 
   bool isUnlabeled() const;
   // Keys the fill type at a time, where keys can be edited; an attribute of that name is in the way of it.
-  // notify: views are told.
+  // notify does nothing.
   void setFillType(int64 const& time, EFillType const& type, bool notify);
   EFillType getFillType(int64 time) const;
   // Whether the frames behind a time, up to the next key, have data although keys are missing there, because

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/ModuleChildren.h"
@@ -10,7 +11,7 @@
 
 H_DEFINE_ABSTRACT_CLASS(Module);
 
-struct Module::DataEdit {
+struct Module::OpenEdit {
   int depth = 0;
   struct Before {
     Controller* channel;
@@ -250,25 +251,28 @@ HTimeRange Module::getDataRange() const {
 
 void Module::beginDataEdit(HTimeRange const& range) {
   if (!m_dataEdit) {
-    m_dataEdit = std::make_unique<DataEdit>();
+    m_dataEdit = std::make_unique<OpenEdit>();
     for (auto const& channel : m_channels) m_dataEdit->before.push_back({channel.get(), channel->getState()});
   }
   ++m_dataEdit->depth;
-  for (DataEdit::Before const& before : m_dataEdit->before) before.channel->beginDataEdit(range);
+  for (OpenEdit::Before const& before : m_dataEdit->before) before.channel->beginDataEdit(range);
 }
 
 void Module::endDataEdit() {
   if (!m_dataEdit) return;
   // Not the channels that were added meanwhile: their edit did not begin.
-  for (DataEdit::Before const& before : m_dataEdit->before) before.channel->endDataEdit();
+  for (OpenEdit::Before const& before : m_dataEdit->before) before.channel->endDataEdit();
   if (--m_dataEdit->depth == 0) m_dataEdit.reset();
 }
 
 void Module::discardDataEdit() {
   if (!m_dataEdit) return;
-  for (DataEdit::Before const& before : m_dataEdit->before) before.channel->restore(before.state);
+  for (OpenEdit::Before const& before : m_dataEdit->before) before.channel->restore(before.state);
   // Channels that were added meanwhile held no keys.
-  for (size_t i = m_dataEdit->before.size(); i < m_channels.size(); ++i) m_channels[i]->storeTracks({});
+  for (size_t i = m_dataEdit->before.size(); i < m_channels.size(); ++i) {
+    const DataEdit edit(*m_channels[i]);
+    m_channels[i]->storeTracks({});
+  }
   endDataEdit();
 }
 

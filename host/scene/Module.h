@@ -149,7 +149,7 @@ class Module : public HObject {
   friend class ModuleReferrer;
   friend class SceneIndex;
   friend class Selection;
-  friend class UndoChange;
+  friend class ModuleHold;
 
   void storeName(HString const& name);                        // mutator
   void storeParent(Module* parent);                           // mutator: unlinks, links at the end
@@ -189,6 +189,6 @@ class Module : public HObject {
   std::vector<std::unique_ptr<Controller>> m_channels;
   // With the number of references that each holds; null: none yet.
   std::unique_ptr<std::unordered_map<ModuleReferrer*, int>> m_referrers;
-  struct DataEdit;
-  std::unique_ptr<DataEdit> m_dataEdit;  // only while an edit is open
+  struct OpenEdit;
+  std::unique_ptr<OpenEdit> m_dataEdit;  // only while an edit is open
 };

@@ -1,4 +1,5 @@
 // The mutators of a module: its name, its parent, what attributes and channels it has.
+#include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
 #include "host/scene/ModuleChildren.h"
 #include "host/scene/SceneIndex.h"
@@ -17,6 +18,8 @@ struct Module::NameChange : UndoChange {
     return static_cast<int64>(sizeof *this +
                               std::max(name.GetString().size(), module.m_name.GetString().size()));
   }
+
+  void tell(ChangeSetBuilder& changes) const override { changes.tellName(module, name); }
 
   Module& module;
   HString name;
@@ -44,6 +47,7 @@ struct Module::ParentChange : UndoChange {
     order = orderNow;
   }
   int64 memoryUse() const override { return sizeof *this; }
+  void tell(ChangeSetBuilder& changes) const override { changes.tellParent(module, parent); }
 
   Module& module;
   Module* parent;
@@ -92,7 +96,7 @@ void Module::sortChildren() {
 template <class T>
 struct Module::Addition : UndoChange {
   Addition(Module& concerned, std::vector<std::unique_ptr<T>>& list)
-      : UndoChange(&concerned), items(list), before(list.size()) {}
+      : UndoChange(&concerned), module(concerned), items(list), before(list.size()) {}
   void swap() override {
     if (held) {
       items.push_back(std::move(held));
@@ -102,7 +106,18 @@ struct Module::Addition : UndoChange {
     }
   }
   int64 memoryUse() const override { return sizeof *this + sizeof(T); }
+  void tell(ChangeSetBuilder& changes) const override {
+    if (items.size() > before) tell(changes, *items[before]);
+  }
+  void tell(ChangeSetBuilder& changes, Attribute const& added) const {
+    changes.tell(SceneChange::Kind::attribute, &module, added.getName().GetString(), "",
+                 textOf(added.getRawValue()), true);
+  }
+  void tell(ChangeSetBuilder& changes, Controller& added) const {
+    changes.tell(SceneChange::Kind::created, &module, added.getName().GetString(), "", "", true);
+  }
 
+  Module& module;
   std::vector<std::unique_ptr<T>>& items;
   size_t before;  // how many there were
   std::unique_ptr<T> held;

@@ -3,6 +3,8 @@
 #include <algorithm>
 #include <cmath>
 
+#include "host/scene/ChangeSetBuilder.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/Editability.h"
 #include "host/scene/HTimeManager.h"
@@ -20,19 +22,23 @@ int64 now(Node const& node) { return node.getDatabase()->getTimeManager()->getTi
 
 }  // namespace
 
-void Node::markMoved(Module* module) {
+void Node::markMoved(Module* module) noexcept {
   const uint64 epoch = module->getDatabase()->m_worldCache.epoch;
   auto const* top = objectAs<Node>(module);
   if (top && top->m_worldEpoch != epoch) return;
-  std::vector<Module*> open{module};
-  while (!open.empty()) {
-    Module* next = open.back();
-    open.pop_back();
-    if (auto* node = objectAs<Node>(next)) {
-      if (node->m_worldEpoch != epoch) continue;
-      node->m_worldEpoch = 0;
+  try {
+    std::vector<Module*> open{module};
+    while (!open.empty()) {
+      Module* next = open.back();
+      open.pop_back();
+      if (auto* node = objectAs<Node>(next)) {
+        if (node->m_worldEpoch != epoch) continue;
+        node->m_worldEpoch = 0;
+      }
+      for (int i = 0; i < next->getNumChildren(); ++i) open.push_back(next->getChild(i));
     }
-    for (int i = 0; i < next->getNumChildren(); ++i) open.push_back(next->getChild(i));
+  } catch (std::bad_alloc const&) {
+    module->getDatabase()->forgetWorldCache();
   }
 }
 
@@ -197,13 +203,12 @@ Vec3 Node::translationFor(Vec3 const& inParent) const {
 void Node::writeAt(Controller* channel, int64 time, Controller::Values const& values) {
   if (obstacleToValue(*channel) != Obstacle::none) return;
   if (getDatabase()->getActiveClip()) {
-    channel->beginDataEdit(HTimeRange(time, time));
+    const DataEdit edit(*channel, HTimeRange(time, time));
     channel->writeKeyAt(time, channel->solveLayer(time, values), KeyTrack::kAll);
   } else {
-    channel->beginDefaultEdit();
+    const DataEdit edit = DataEdit::ofDefault(*channel);
     channel->setDefaultValues(values);
   }
-  channel->endDataEdit();
 }
 
 void Node::setLocalPos(int64 time, Vec3 const& position) {
@@ -264,6 +269,12 @@ struct Node::PreTransformChange : UndoChange {
     return translation == node.m_preTranslation && rotation == node.m_preRotation;
   }
   int64 memoryUse() const override { return sizeof *this; }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    constexpr auto kind = SceneChange::Kind::attribute;
+    changes.tell(kind, &node, "PreTranslation", textOf(translation), textOf(node.m_preTranslation));
+    changes.tell(kind, &node, "PreRotation", textOf(rotation), textOf(node.m_preRotation));
+  }
 
   Node& node;
   Vec3 translation;

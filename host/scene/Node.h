@@ -20,7 +20,7 @@ class Node : public Module {
   RotController* getRotationChannel() const { return m_rotation; }
   Vec3Controller* getScaleChannel() const { return m_scale; }
   // Marks the nodes at and below a module as moved, stopping where that is known already.
-  static void markMoved(Module* module);
+  static void markMoved(Module* module) noexcept;
 
   // The channel that key searches of a node look at: "Translation".
   Controller* getTransformChannel() const { return m_translation; }

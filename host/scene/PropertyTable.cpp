@@ -48,6 +48,8 @@ struct PropertyTable::Addition : UndoChange {
   }
   int64 memoryUse() const override { return static_cast<int64>(sizeof *this + name.GetString().size()); }
 
+  void tell(ChangeSetBuilder&) const override {}  // shows in the channels that have the name
+
   PropertyTable& table;
   HString name;
   DataSource::PropertyType type;

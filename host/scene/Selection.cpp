@@ -1,5 +1,7 @@
 #include "host/scene/Selection.h"
 
+#include "host/scene/ChangeSetBuilder.h"
+
 // What was selected and deselected in a step, one after the other.
 struct Selection::Change : UndoChange {
   explicit Change(Selection& concerned)
@@ -32,6 +34,15 @@ struct Selection::Change : UndoChange {
   }
   int64 memoryUse() const override {
     return static_cast<int64>(sizeof *this + entries.capacity() * sizeof(Entry));
+  }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    constexpr auto kind = SceneChange::Kind::selection;
+    const auto text = [](bool selected) { return selected ? "true" : "false"; };
+    for (auto entry = entries.rbegin(); entry != entries.rend(); ++entry)
+      changes.tell(kind, entry->module, "", text(entry->was), text(entry->module->isSelected()));
+    changes.tell(kind, nullptr, "Primary", textOf(primary), textOf(selection.m_primary),
+                 primary != selection.m_primary);
   }
 
   struct Entry {

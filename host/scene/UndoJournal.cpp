@@ -4,15 +4,13 @@
 #include <string>
 #include <utility>
 
+#include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
+#include "host/scene/SceneAside.h"
 
-UndoChange::UndoChange(Module* owner) : m_owner(owner) {
-  if (m_owner) ++m_owner->m_undoHolds;
-}
+UndoJournal::UndoJournal(Database& scene) : m_scene(scene) {}
 
-UndoChange::~UndoChange() {
-  if (m_owner && --m_owner->m_undoHolds == 0 && !m_owner->isInScene()) delete m_owner;
-}
+UndoJournal::~UndoJournal() { clear(); }
 
 void UndoJournal::setEnabled(bool enabled) {
   m_enabled = enabled;
@@ -22,6 +20,7 @@ void UndoJournal::setEnabled(bool enabled) {
 void UndoJournal::beginStep() {
   if (m_depth == 0 && m_enabled) {
     if (!m_reserve.fill()) throw std::bad_alloc();
+    m_aside = m_scene.putAside();
     m_step = ++m_lastStep;
   }
   ++m_depth;
@@ -31,7 +30,9 @@ void UndoJournal::add(std::unique_ptr<UndoChange> change) { m_open.push_back(std
 
 void UndoJournal::endStep(HString const& name) {
   if (m_depth == 1 && !m_open.empty()) keep(name);
-  if (--m_depth == 0) m_step = 0;
+  if (--m_depth > 0) return;
+  m_step = 0;
+  m_aside.reset();
 }
 
 void UndoJournal::keep(HString const& name) {
@@ -44,24 +45,16 @@ void UndoJournal::keep(HString const& name) {
     return;
   }
 
-  Step step;
-  step.name = name;
-  m_open.shrink_to_fit();
-  step.memory = static_cast<int64>(sizeof step + m_open.capacity() * sizeof m_open[0]);
-  for (auto const& change : m_open) step.memory += change->memoryUse();
-  if (step.memory > m_memoryLimit) {
-    writeLog(LogLevel::Warning, name.GetString() + " needs more memory to be undone (" +
-                                    std::to_string(step.memory / 1000000) + " MB) than undo may use (" +
-                                    std::to_string(m_memoryLimit / 1000000) + " MB) and cannot be undone.");
-  }
-  m_done.push_back(std::move(step));
-  // Nothing fails from here on.
-  m_done.back().changes.swap(m_open);
-  m_memoryUse += m_done.back().memory;
-  for (Step const& undone : m_undone) m_memoryUse -= undone.memory;
+  m_done.push(m_open, name.GetString());
+  const MustFinish mustFinish(m_reserve);
   m_undone.clear();
-  for (; !m_done.empty() && m_memoryUse > m_memoryLimit; m_done.pop_front())
-    m_memoryUse -= m_done.front().memory;
+  if (m_done.getMemory() > m_memoryLimit && m_done.getLastMemory() > m_memoryLimit) {
+    writeLog(LogLevel::Warning, name.GetString() + " needs more memory to be undone (" +
+                                    std::to_string(m_done.getLastMemory() / 1000000) +
+                                    " MB) than undo may use (" + std::to_string(m_memoryLimit / 1000000) +
+                                    " MB) and cannot be undone.");
+  }
+  while (m_done.getMemory() > m_memoryLimit) m_done.dropFirst();
 }
 
 bool UndoJournal::discardStep() {
@@ -70,10 +63,12 @@ bool UndoJournal::discardStep() {
   swapAll(m_open, true);
   m_step = 0;
   m_open.clear();
+  if (m_aside && known) m_scene.putBack(*m_aside);
+  m_aside.reset();
   return known;
 }
 
-void UndoJournal::swapAll(Changes& changes, bool backward) noexcept {
+void UndoJournal::swapAll(UndoChanges& changes, bool backward) noexcept {
   const uint64 step = std::exchange(m_step, 0);
   const MustFinish mustFinish(m_reserve);
   if (backward) {
@@ -89,19 +84,30 @@ bool UndoJournal::undo(HString& name) { return move(m_done, m_undone, true, name
 
 bool UndoJournal::redo(HString& name) { return move(m_undone, m_done, false, name); }
 
-bool UndoJournal::move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name) {
-  if (from.empty() || !m_open.empty()) return false;
-  name = from.back().name;
-  to.push_back(std::move(from.back()));
-  from.pop_back();
-  swapAll(to.back().changes, backward);
+bool UndoJournal::move(UndoSteps& from, UndoSteps& to, bool backward, HString& name) {
+  if (from.getCount() == 0 || !m_open.empty()) return false;
+  const MustFinish mustFinish(m_reserve);
+  std::string text;
+  UndoChanges changes = from.pop(text);
+  swapAll(changes, backward);
+  to.push(changes, text);
+  name = text;
   return true;
 }
 
+ChangeSet UndoJournal::getChanges() const {
+  UndoChanges unpacked;
+  UndoChanges const* changes =
+      m_open.empty() && m_done.getCount() > 0 && m_depth == 0 ? m_done.getLast(unpacked) : &m_open;
+  ChangeSetBuilder builder;
+  for (auto change = changes->rbegin(); change != changes->rend(); ++change) (*change)->tell(builder);
+  return builder.finish();
+}
+
 void UndoJournal::clear() {
+  const MustFinish mustFinish(m_reserve);
   m_step = 0;
   m_undone.clear();
   m_open.clear();
   m_done.clear();
-  m_memoryUse = 0;
 }

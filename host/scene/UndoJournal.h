@@ -13,24 +13,26 @@
 //  mutator
 //     stopped after that, so that a step which ran out of memory can be discarded.
 //
-// Current time, ranges and the priority module are no part of it.
+// Current time and the priority module are no part of it.
 #pragma once
 
-#include <deque>
 #include <memory>
-#include <vector>
+#include <utility>
 
 #include "host/base/HString.h"
 #include "host/base/OutOfMemory.h"
+#include "host/scene/ChangeSet.h"
+#include "host/scene/UndoSteps.h"
 
+class ChangeSetBuilder;
 class Database;
-class Module;
+struct SceneAside;
 
 class UndoChange {
  public:
   // `owner`: the module that the change tells of; null for the scene's own state.
-  explicit UndoChange(Module* owner);
-  virtual ~UndoChange();
+  explicit UndoChange(Module* owner) : m_owner(owner) {}
+  virtual ~UndoChange() = default;
   UndoChange(UndoChange const&) = delete;
   UndoChange& operator=(UndoChange const&) = delete;
 
@@ -40,14 +42,21 @@ class UndoChange {
   // Bytes held, in whichever of its states holds more.
   virtual int64 memoryUse() const = 0;
 
+  // Whether a kept step holds it as a few bytes, which pack() appends.
+  virtual bool isSmall() const { return false; }
+  virtual void pack(PackedStep&) const {}
+  // Tells what the scene was before, as long as it is as the change left it. Of several changes of one thing
+  // in a step the first counts, which is told last.
+  virtual void tell(ChangeSetBuilder& changes) const = 0;
+
  private:
-  Module* m_owner;
+  ModuleHold m_owner;
 };
 
 class UndoJournal {
  public:
-  explicit UndoJournal(Database& scene) : m_scene(scene) {}
-  ~UndoJournal() { clear(); }
+  explicit UndoJournal(Database& scene);
+  ~UndoJournal();
   UndoJournal(UndoJournal const&) = delete;
   UndoJournal& operator=(UndoJournal const&) = delete;
 
@@ -61,23 +70,27 @@ class UndoJournal {
   // `name`: what is shown when the step is undone. Nothing changed, no step. On an exception the step is open
   // still.
   void endStep(HString const& name);
-  // Takes back what the open step, and all that stand in it, changed; nothing stays of it. False when that is
-  // not known in full: steps are not kept, or were forgotten meanwhile.
+  // Takes back what the open step, and all that stand in it, changed, with current time, priority module and
+  // key clipboard; nothing stays of it. False when that is not known in full: steps are not kept, or were
+  // forgotten meanwhile.
   bool discardStep();
 
   // Takes back the last step (does the next one again). False when there is none. A step that is open must
   // have changed nothing yet. `name`: that of the step.
   bool undo(HString& name);
   bool redo(HString& name);
-  int getNumUndoSteps() const { return static_cast<int>(m_done.size()); }
-  int getNumRedoSteps() const { return static_cast<int>(m_undone.size()); }
+  int getNumUndoSteps() const { return m_done.getCount(); }
+  int getNumRedoSteps() const { return m_undone.getCount(); }
+  // What the step that is open has changed so far, else what the last step did that can be undone. Worked out
+  // when asked for, at the cost of what differs.
+  ChangeSet getChanges() const;
   // Forgets everything, the step that is open included, which is not recorded any further.
   void clear();
 
   // Bytes that the steps may hold; the oldest go first. A step that is larger by itself goes as well, with a
   // warning.
   void setMemoryLimit(int64 bytes) { m_memoryLimit = bytes; }
-  int64 getMemoryUse() const { return m_memoryUse; }
+  int64 getMemoryUse() const { return m_done.getMemory() + m_undone.getMemory(); }
 
   // --- for mutators ---
   // The step that is open and being recorded; 0 for none.
@@ -98,15 +111,8 @@ class UndoJournal {
   }
 
  private:
-  using Changes = std::vector<std::unique_ptr<UndoChange>>;
-  struct Step {
-    Changes changes;
-    HString name;
-    int64 memory = 0;
-  };
-
-  bool move(std::deque<Step>& from, std::deque<Step>& to, bool backward, HString& name);
-  void swapAll(Changes& changes, bool backward) noexcept;
+  bool move(UndoSteps& from, UndoSteps& to, bool backward, HString& name);
+  void swapAll(UndoChanges& changes, bool backward) noexcept;
   void keep(HString const& name);
 
   Database& m_scene;
@@ -114,9 +120,10 @@ class UndoJournal {
   int m_depth = 0;
   uint64 m_step = 0;
   uint64 m_lastStep = 0;
-  Changes m_open;
-  MemoryReserve m_reserve;            // for taking back
-  std::deque<Step> m_done, m_undone;  // the next one to be undone or redone is at the back
-  int64 m_memoryUse = 0;
+  UndoChanges m_open;
+  std::unique_ptr<SceneAside> m_aside;  // as it was when the open step began
+  UndoTables m_tables;
+  UndoSteps m_done{m_tables}, m_undone{m_tables};  // the next one to be undone or redone is the last
   int64 m_memoryLimit = int64{1} << 30;
+  MemoryReserve m_reserve;  // for taking back
 };

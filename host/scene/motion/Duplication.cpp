@@ -10,6 +10,7 @@
 #include <unordered_set>
 
 #include "host/scene/CalibrationMgr.h"
+#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/Devices.h"
 
@@ -122,10 +123,9 @@ void copyChannels(Module const& original, Module& copy) {
     own->setDefaultValues(channel.getDefaultValues());
     own->setInterpType(static_cast<int>(channel.getInterpolation()));
     own->setLocked(channel.isLocked());
-    own->beginDataEdit(HTimeRange::forever());
+    const DataEdit edit(*own);
     for (NLEClip* clip = own->getDatabase()->getHeadClip(); clip; clip = clip->getNext())
       copyKeys(channel, clip, *own, clip);
-    own->endDataEdit();
   }
 }
 
@@ -159,9 +159,8 @@ void Duplication::copyClipKeys() const {
     Module* module = m_scene.getModule(i);
     for (int k = 0; k < module->getNumChannels(); ++k) {
       Controller* channel = module->getChannel(k);
-      channel->beginDataEdit(HTimeRange::forever());
+      const DataEdit edit(*channel);
       for (auto const& [clip, copy] : clips) copyKeys(*channel, clip, *channel, copy);
-      channel->endDataEdit();
     }
   }
 }
