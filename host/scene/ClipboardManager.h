@@ -4,6 +4,7 @@
 #include <memory>
 #include <vector>
 
+#include "host/base/ItemAt.h"
 #include "host/math/TalixRotation.h"
 #include "host/time/HTimeRange.h"
 
@@ -31,7 +32,7 @@ class ClipboardManager {
   ControllerDataType getControllerDataType() const { return m_type; }
   TalixRotation::RotOrder getRotationOrder() const { return m_order; }
   int getNumControllerKeys() const { return m_keys ? static_cast<int>(m_keys->size()) : 0; }
-  tagKey getControllerKey(int i) const { return (*m_keys)[static_cast<size_t>(i)]; }
+  tagKey getControllerKey(int i) const { return m_keys ? itemAt(*m_keys, i) : tagKey(); }
   // From the earliest to the latest key; empty without keys.
   HTimeRange getControllerDataRange() const;
 

@@ -48,9 +48,7 @@ int NLEClip::addLayer() {
   return getNumLayers() - 1;
 }
 
-bool NLEClip::isLayerLocked(int layer) const {
-  return layer >= 0 && layer < getNumLayers() && m_layerLocks[static_cast<size_t>(layer)];
-}
+bool NLEClip::isLayerLocked(int layer) const { return itemAt(m_layerLocks, layer); }
 
 void NLEClip::setLayerLocked(int layer, bool locked) {
   if (layer < 0 || layer >= getNumLayers()) return;

@@ -86,11 +86,11 @@ void Controller::writeKeyAt(int64 time, Values const& values, unsigned mask) {
 }
 
 void Controller::writeKey(int key, Values const& values, unsigned mask) {
-  if (KeyTrack const* track = findActiveTrack()) writeKeyAt(track->timeAt(key), values, mask);
+  if (KeyTrack const* track = activeTrackWith(key)) writeKeyAt(track->timeAt(key), values, mask);
 }
 
 void Controller::readKey(int key, Values& values) const {
-  KeyTrack const* track = findActiveTrack();
+  KeyTrack const* track = activeTrackWith(key);
   values = track ? track->at(key).values : m_default;
 }
 
@@ -198,6 +198,11 @@ KeyTrack const* Controller::findActiveTrack() const {
   return clip ? findTrack(clip, scene.getActiveLayer()) : nullptr;
 }
 
+KeyTrack const* Controller::activeTrackWith(int key) const {
+  KeyTrack const* track = findActiveTrack();
+  return track && key >= 0 && key < track->count() ? track : nullptr;
+}
+
 int Controller::getNumKeys() const {
   KeyTrack const* track = findActiveTrack();
   return track ? asInt(track->count()) : 0;
@@ -220,7 +225,7 @@ int Controller::getNumSelectedKeys(unsigned mask) const {
 
 int Controller::getSelectedKeyIndex(int i) const {
   KeyTrack const* track = findActiveTrack();
-  return track && i < track->countSelected() ? asInt(track->selectedIndex(i)) : -1;
+  return track && i >= 0 && i < track->countSelected() ? asInt(track->selectedIndex(i)) : -1;
 }
 
 unsigned Controller::getSelectedKeyFlags(int i) const {
@@ -229,12 +234,12 @@ unsigned Controller::getSelectedKeyFlags(int i) const {
 }
 
 int64 Controller::getKeyTime(int key) const {
-  KeyTrack const* track = findActiveTrack();
+  KeyTrack const* track = activeTrackWith(key);
   return track ? track->timeAt(key) : 0;
 }
 
 bool Controller::keyHasComponents(int key, unsigned mask) const {
-  KeyTrack const* track = findActiveTrack();
+  KeyTrack const* track = activeTrackWith(key);
   return track && (track->at(key).components & mask) == mask;
 }
 
@@ -345,7 +350,7 @@ int Controller::getNumInterpTypes() const { return m_numInterpTypes; }
 
 char const* Controller::getInterpTypeName(int i) const {
   static constexpr char const* names[] = {"Constant", "Linear", "Cubic"};
-  return names[i];
+  return i >= 0 && i < m_numInterpTypes ? names[i] : nullptr;
 }
 
 void Controller::setInterpType(int i) {

@@ -73,7 +73,8 @@ class Controller : public DataSource {
   virtual void beginDataEdit(HTimeRange const& range);
   virtual void endDataEdit();
 
-  // --- keys of the active layer ---
+  // --- keys of the active layer; a key beyond them has no time (0), components or flags, its value is the
+  // default one, and none is written ---
   virtual int getNumKeys() const;
   virtual int getNumKeys(unsigned mask) const;
   virtual int getNumSelectedKeys() const;
@@ -117,8 +118,8 @@ class Controller : public DataSource {
 
   // --- interpolation ---
   virtual int getNumInterpTypes() const;
-  virtual char const* getInterpTypeName(int i) const;
-  virtual void setInterpType(int i);  // a number that is none of the channel's is not taken
+  virtual char const* getInterpTypeName(int i) const;  // null beyond them
+  virtual void setInterpType(int i);                   // a number that is none of the channel's is not taken
   Interpolation getInterpolation() const { return m_interpolation; }
 
   // --- clips and layers
@@ -177,6 +178,7 @@ class Controller : public DataSource {
     KeyChange* change = nullptr;  // that of the undo step in undoMark
   };
   ClipTrack const* find(NLEClip const* clip, int layer) const;
+  KeyTrack const* activeTrackWith(int key) const;  // null when it has no key of that index
   // The mutator of a track: that of the active layer, made when there is none, for an edit of keys from
   // `first` to `last`; only at a single time it may add one. Null on the base clip.
   KeyTrack* editTrack(int64 first, int64 last);

@@ -8,6 +8,7 @@
 #include <memory>
 #include <vector>
 
+#include "host/base/ItemAt.h"
 #include "host/base/Log.h"
 #include "host/base/ThreadLocal.h"
 #include "host/scene/Clips.h"
@@ -89,7 +90,7 @@ class Database {
   Node* getSelectedNode(int i) const { return m_selection.getNode(i); }
   int getNumSelectedMarkers() const { return m_selection.getNumMarkers(); }
   Marker* getSelectedMarker(int i) const { return m_selection.getMarker(i); }
-  LabelingBone* getSelectedLabelingBone(int i) const;  // null beyond them
+  LabelingBone* getSelectedLabelingBone(int i) const { return m_selection.getLabelingBone(i); }
   void selectAllModules(bool select);
   Selection& getSelection() { return m_selection; }
 
@@ -113,7 +114,7 @@ class Database {
   // --- active properties: channels, or components of channels, that key commands work on ---
   int getNumActiveProperties() const { return static_cast<int>(m_activeProperties.size()); }
   // A property id with its component bits (PropertyTable).
-  unsigned int getActiveProperty(int i) const { return m_activeProperties[static_cast<size_t>(i)]; }
+  unsigned int getActiveProperty(int i) const { return itemAt(m_activeProperties, i); }  // 0 beyond them
   void setActiveProperties(std::vector<unsigned> ids);
   // Whether active properties follow what is keyed; off at start.
   bool getAutoUpdateProperties() const { return m_autoUpdateProperties; }

@@ -84,7 +84,6 @@ HString attributeValue(Attribute const& attribute, double& value) {
 }  // namespace
 
 Controller* Module::addChannel(HString const& name, DataSource::PropertyType type) {
-  if (getAttribute(name.GetStr())) return nullptr;
   const unsigned id = m_database->getPropertyTable().add(name, type);
   if (id == 0) return nullptr;
   if (Controller* existing = getProperty(id)) return existing;
@@ -101,8 +100,9 @@ HString Module::getPropertyVal(HString const& name, double& value, bool byDefaul
   const int component = splitComponent(channelName);
   PropertyTable const& table = m_database->getPropertyTable();
   const unsigned id = table.findId(channelName);
-  if (id != 0) {
-    const DataSource::PropertyType type = table.getType(id);
+  const DataSource::PropertyType type = table.getType(id);
+  const bool several = type == DataSource::Vec3Property || type == DataSource::RotProperty;
+  if (id != 0 && (several || component < 0)) {
     Controller const* channel = getProperty(id);
     HString text;
     if (!channel) {
@@ -110,7 +110,6 @@ HString Module::getPropertyVal(HString const& name, double& value, bool byDefaul
       return text;
     }
     const int64 now = m_database->getTimeManager()->getTime();
-    const bool several = type == DataSource::Vec3Property || type == DataSource::RotProperty;
     if (several && component < 0) return "Use getVectorProperty for this type of property";
     value =
         several ? componentValue(*channel, component, byDefault, now) : scalarValue(*channel, byDefault, now);

@@ -15,7 +15,7 @@ uint64 SubjectManager::getNumSelectedSubjects() const {
 }
 
 Character* SubjectManager::getSelectedSubject(uint64 i) const {
-  return m_scene.getSelection().getCharacter(static_cast<int>(i));
+  return m_scene.getSelection().getCharacter(static_cast<int64>(i));
 }
 
 bool SubjectManager::removeSubject(Character* subject, bool removeLabels, bool undoable, bool notify) {

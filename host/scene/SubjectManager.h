@@ -8,7 +8,7 @@ class SubjectManager {
   explicit SubjectManager(Database& scene) : m_scene(scene) {}
 
   uint64 getNumSubjects() const { return static_cast<uint64>(m_subjects.getCount()); }
-  Character* getSubject(uint64 i) const { return m_subjects.at(static_cast<int>(i)); }
+  Character* getSubject(uint64 i) const { return m_subjects.at(static_cast<int64>(i)); }
   Character* getSubject(HString const& name) const;  // the first created of that name
   uint64 getNumSelectedSubjects() const;
   Character* getSelectedSubject(uint64 i) const;

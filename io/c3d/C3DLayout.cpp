@@ -7,6 +7,7 @@
 #include "host/time/Ticks.h"
 #include "io/FileError.h"
 #include "io/FrameRates.h"
+#include "io/TextScanner.h"
 
 namespace talix {
 
@@ -83,9 +84,8 @@ class LayoutFinder {
       warn("the scale of the coordinates is missing; 1 is assumed");
       scale = 1;
     } else if (std::abs(scale - m_header.scale) > 1e-6 * std::abs(scale)) {
-      note(TakeNote::Level::Info, "the header's scale " + std::to_string(m_header.scale) +
-                                      " differs from POINT:SCALE " + std::to_string(scale) +
-                                      ", which is taken");
+      note(TakeNote::Level::Info, "the header's scale " + shortNumber(m_header.scale) +
+                                      " differs from POINT:SCALE " + shortNumber(scale) + ", which is taken");
     }
     m_layout.real = scale < 0;
     m_layout.scale = std::abs(scale);

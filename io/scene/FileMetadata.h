@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "host/scene/Module.h"
+#include "host/scene/PropertyTable.h"
 
 namespace talix::fileMetadata {
 
@@ -34,6 +35,9 @@ inline constexpr const char* kOutputs = "OutputChannels";
 inline constexpr const char* kDescription = "Description";
 // Of a bone: the file's channel names in their order, separated by blanks, a string.
 inline constexpr const char* kFileChannels = "FileChannels";
+
+// Takes these names for attributes, so that no channel of a file gets one of them.
+void reserveNames(PropertyTable& table);
 
 using Record = std::vector<std::string>;
 

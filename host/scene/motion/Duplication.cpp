@@ -135,7 +135,7 @@ void Duplication::copyNode(Node const& original, Node& copy) const {
   copy.setPreRotation(original.getPreRotation(), false);
   copy.setPreTranslation(original.getPreTranslation());
   for (int i = 0; i < original.getNumConnectingLines(); ++i) {
-    MarkerConnection const& line = original.getConnectingLine(i);
+    const MarkerConnection line = original.getConnectingLine(i);
     MarkerConnection own(static_cast<Node*>(counterpart(line.getTarget())));
     own.setConnectingColor(line.getConnectingColor());
     copy.addConnectingLine(own);
