@@ -97,6 +97,7 @@ struct PropertyTable::AttributeAddition : UndoChange {
     isThere = now;
   }
   int64 memoryUse() const override { return static_cast<int64>(sizeof *this + name.size()); }
+  void tell(ChangeSetBuilder&) const override {}  // shows in the attributes that have the name
 
   PropertyTable& table;
   std::string name;
