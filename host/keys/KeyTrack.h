@@ -22,6 +22,7 @@
 
 #include <array>
 #include <cstddef>
+#include <vector>
 
 #include "host/base/Types.h"
 #include "host/keys/KeyNode.h"
@@ -129,6 +130,10 @@ class KeyTrack {
   // neighbours that go.
   int64 deleteRange(int64 first, int64 last, unsigned mask, BridgeEnds const& ends);
   int64 deleteSelected(unsigned mask, BridgeEnds const& ends);
+
+  // Takes out of each key, by index, these components; what is left bridges over them, so that no data is
+  // lost. The last key that holds a component must keep it. Returns the number of keys that lost something.
+  int64 thin(std::vector<unsigned char> const& lost);
 
   // Bridges. Whether any key bridges a component of the mask; constant time.
   bool bridgesAny(unsigned mask = kAll) const { return m_root && m_root->counts.bridgesAny(normal(mask)); }

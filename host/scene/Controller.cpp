@@ -8,9 +8,10 @@
 #include "host/scene/Clips.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
+#include "host/scene/Devices.h"
 #include "host/scene/Editability.h"
 #include "host/scene/HTimeManager.h"
-#include "host/scene/MarkerRuns.h"
+#include "host/scene/Marker.h"
 
 H_DEFINE_ABSTRACT_CLASS(DataSource);
 H_DEFINE_ABSTRACT_CLASS(Controller);
@@ -122,7 +123,6 @@ int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayer
   Database const& scene = *getDatabase();
   NLEClip* clip = scene.getActiveClip();
   const int64 first = range.getStart(), last = range.getEnd();
-  const CutRuns cut(*this, first, last);
   for (ClipTrack const& track : m_tracks)
     if (track.clip == clip && (track.layer == scene.getActiveLayer() ||
                                (allLayers && obstacleToKeys(*this, clip, track.layer) == Obstacle::none)))
@@ -137,7 +137,6 @@ int Controller::deleteSelectedKeys(unsigned mask) {
   const int64 first = track->timeAt(track->selectedIndex(0));
   const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
   const DataEdit edit(*this, HTimeRange(first, last));
-  const CutRuns cut(*this, first, last);
   NLEClip* clip = getDatabase()->getActiveClip();
   const int layer = getDatabase()->getActiveLayer();
   KeyTrack* edited = track->bridgesAny() ? &replaceTrack(clip, layer) : editTrack(first, last);
@@ -196,6 +195,17 @@ KeyTrack const* Controller::findActiveTrack() const {
   Database const& scene = *getDatabase();
   NLEClip const* clip = scene.getActiveClip();
   return clip ? findTrack(clip, scene.getActiveLayer()) : nullptr;
+}
+
+KeyTrack const* Controller::findDataTrack(NLEClip const* clip) const {
+  for (int layer = 0; clip && layer < clip->getNumLayers(); ++layer)
+    if (KeyTrack const* track = findTrack(clip, layer); track && !track->empty()) return track;
+  return nullptr;
+}
+
+bool Controller::isMeasured() const {
+  if (auto const* marker = objectAs<Marker>(m_module)) return marker->getTranslationChannel() == this;
+  return objectAs<AnalogDevice>(m_module) != nullptr;
 }
 
 int Controller::getNumKeys() const {

@@ -96,9 +96,8 @@ class Controller : public DataSource {
   virtual int deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers);
   virtual int deleteSelectedKeys(unsigned mask);
   // Removes the keys in the ranges (sorted and disjoint; the selected keys) that the curve of the layer does
-  // not need within the tolerances, measured against the curve as it is now (KeyReduction.h says how). A
-  // marker's fill type becomes "reduced" at the key before each run that goes. They answer how many keys lost
-  // something.
+  // not need within the tolerances, measured against the curve as it is now (KeyReduction.h says how). What
+  // stays bridges over them. They return how many keys lost something.
   int reduceKeys(std::span<HTimeRange const> ranges, ReductionTolerances const& tolerances);
   int reduceSelectedKeys(ReductionTolerances const& tolerances);
 
@@ -107,7 +106,7 @@ class Controller : public DataSource {
   // Values that are not finite are not written.
   void writeKey(int key, Values const& values, unsigned mask);
   void writeKeyAt(int64 time, Values const& values, unsigned mask);
-  void evaluate(int64 time, Values& values) const;
+  virtual void evaluate(int64 time, Values& values) const;
   // The value of the active layer alone, to which a relative edit adds.
   void evaluateLayer(int64 time, Values& values) const;
   // The value that the active layer must have at a time for all layers together to give `wanted`.
@@ -126,6 +125,13 @@ class Controller : public DataSource {
   // clip and layer; null when it has none there.
   KeyTrack const* findTrack(NLEClip const* clip, int layer) const;
   KeyTrack const* findActiveTrack() const;
+  // --- data ---
+  // The keys that tell where the channel has data in a clip (DataRanges.h): those of the lowest layer that
+  // has any; null without keys.
+  KeyTrack const* findDataTrack(NLEClip const* clip) const;
+  // Whether its values are measurements, which are never made up where there is no data: a marker's
+  // translation, a device's channels. Other channels have values at all times.
+  bool isMeasured() const;
   // Replaces the keys in a clip and layer: how importers, copies and undo put whole tracks in place.
   void setTrack(NLEClip* clip, int layer, KeyTrack track);
   bool hasKeysInClip(NLEClip const* clip) const;

@@ -121,6 +121,8 @@ class Module : public HObject {
   bool isInScene() const { return m_sceneSlot != kNoSlot; }
 
  protected:
+  // The same for a channel of a class of its own.
+  Controller* addChannel(HString const& name, std::unique_ptr<Controller> channel);
   Module();
   // Gives the module its built-in attributes and channels; called once, by the database, before it enters the
   // scene. A subclass calls its base first.

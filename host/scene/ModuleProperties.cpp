@@ -84,11 +84,15 @@ HString attributeValue(Attribute const& attribute, double& value) {
 }  // namespace
 
 Controller* Module::addChannel(HString const& name, DataSource::PropertyType type) {
+  return addChannel(name, Controller::create(type));
+}
+
+Controller* Module::addChannel(HString const& name, std::unique_ptr<Controller> channel) {
+  const DataSource::PropertyType type = channel ? channel->getPropertyType() : DataSource::NoProperty;
   if (getAttribute(name.GetStr())) return nullptr;
   const unsigned id = m_database->getPropertyTable().add(name, type);
   if (id == 0) return nullptr;
   if (Controller* existing = getProperty(id)) return existing;
-  std::unique_ptr<Controller> channel = Controller::create(type);
   channel->m_module = this;
   channel->m_propertyId = id;
   channel->m_id = ControlID(++m_database->m_lastID);

@@ -82,10 +82,10 @@ class Editability : public testing::Test {
   }
   // Two layers with keys in both, the upper one active; "\s\m" to copy from; all keys of "\b\m" selected.
   void build(char const* selection) {
-    for (char const* line : {"newScene", "create Clip take", "create BlendClip mix", "create SolvingBone b s",
-                             "create Marker m -parent b", "addChannel b\\m FillType int",
-                             "create Marker m -parent s", "setPosition b\\m <0 0 9> -preTrans", "addLayer",
-                             "setProperty Translation 7 7 7 -d -onMod s\\m", "selectChannels Translation"})
+    for (char const* line :
+         {"newScene", "create Clip take", "create BlendClip mix", "create SolvingBone b s",
+          "create Marker m -parent b", "create Marker m -parent s", "setPosition b\\m <0 0 9> -preTrans",
+          "addLayer", "setProperty Translation 7 7 7 -d -onMod s\\m", "selectChannels Translation"})
       run(line);
     for (int i = 0; i < 24; ++i) {
       const std::string x = std::to_string(i % 6), module = i / 6 % 2 ? "b\\m" : "s\\m";

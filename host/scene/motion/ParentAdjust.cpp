@@ -126,13 +126,12 @@ std::optional<std::vector<HTimeRange>> dataOf(Marker const& marker, NLEClip cons
   Times keys;
   mergeKeyTimes(keys, *marker.getTranslationChannel(), clip);
   std::vector<HTimeRange> data;
-  bool bridged = false;
+  KeyTrack const* track = marker.getTranslationChannel()->findDataTrack(&clip);
   for (const int64 key : keys) {
-    if (bridged)
+    if (track && track->bridgedAt(key))
       data.back().include(key);
     else
       data.emplace_back(key, key);
-    bridged = marker.isReducedBehind(key);
   }
   return data;
 }

@@ -5,6 +5,7 @@
 #include <cmath>
 #include <unordered_map>
 
+#include "host/keys/DataRanges.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/KeyTimes.h"
@@ -14,8 +15,6 @@ namespace {
 
 using Times = KeyTimes;
 
-// Keys at most so far apart were measured; no capture system is slower.
-constexpr int64 kSlowestSampling = kTicksPerSecond / 20;
 // Motion over more frames than these is followed at its keys only.
 constexpr int64 kMostFrames = 1'000'000;
 
@@ -177,7 +176,6 @@ class Baking {
 
   Times const& frameTimes(Node const* parent);
   Times timesOf(Marker const& marker, bool moves);
-  bool isMeasured(Marker const& marker) const;
   void put(NewTrack& made) const;
 
   NLEClip* m_clip;
@@ -202,32 +200,17 @@ Times const& Baking::frameTimes(Node const* parent) {
   return times;
 }
 
-// By its lowest layer: those above hold edits.
-bool Baking::isMeasured(Marker const& marker) const {
-  KeyTrack const* track = marker.getTranslationChannel()->findTrack(m_clip, 0);
-  if (!track) return false;
-  if (track->empty()) return true;  // a point that was never seen
-  Controller const* fillType = marker.getChannel("FillType");
-  if (fillType && fillType->hasKeysInClip(m_clip)) return true;
-  for (int64 i = 1; i < track->count(); ++i)
-    if (track->timeAt(i) - track->timeAt(i - 1) <= kSlowestSampling) return true;
-  return false;
-}
-
 Times Baking::timesOf(Marker const& marker, bool moves) {
   Times own = keyTimes(*marker.getTranslationChannel(), m_clip);
   if (!moves) return own;
   Times const& follow = frameTimes(marker.getNodeParent());
-  if (!isMeasured(marker)) return merged(own, follow);
-  if (!marker.getChannel("FillType")) return own;
-  // Between a key that stands for reduced ones and the next key there is data.
-  Times reduced;
-  for (size_t i = 0; i + 1 < own.size(); ++i) {
-    if (!marker.isReducedBehind(own[i])) continue;
-    const auto from = std::upper_bound(follow.begin(), follow.end(), own[i]);
-    reduced.insert(reduced.end(), from, std::lower_bound(from, follow.end(), own[i + 1]));
-  }
-  return merged(own, reduced);
+  KeyTrack const* data = marker.getTranslationChannel()->findDataTrack(m_clip);
+  if (!data) return merged(own, follow);
+  Times bridged;
+  const DataRanges ranges(*data, 1);
+  std::copy_if(follow.begin(), follow.end(), std::back_inserter(bridged),
+               [&](int64 time) { return ranges.hasDataAt(time); });
+  return merged(own, bridged);
 }
 
 // Replaces the keys of all layers by those of one; key selection stays.

@@ -75,7 +75,7 @@ class KeyReductionTest : public SceneTest {
 
   static KeyTrack reducedBy(KeyTrack const& track, ReductionRule const& rule) {
     KeyTrack reduced = track;
-    eraseComponents(reduced, redundantKeys(track, rule));
+    reduced.thin(redundantKeys(track, rule));
     return reduced;
   }
 };
@@ -158,14 +158,12 @@ class ReduceChannelTest : public SceneTest {
     const HTimeRange all[] = {HTimeRange::forever()};
     return channel->reduceKeys(all, by);
   }
-  // The fill types by own key, a blank without one.
-  static std::string fillTypes(Marker const* marker, int frames) {
+  // x: a key, -: a bridge, blank: no data.
+  static std::string data(Controller const* channel, int frames) {
+    KeyTrack const& track = *channel->findActiveTrack();
     std::string text;
-    Controller const* channel = marker->getChannel("FillType");
     for (int i = 0; i < frames; ++i)
-      text += channel && channel->hasKeyAt(i * kFrame)
-                  ? std::to_string(static_cast<int>(marker->getFillType(i * kFrame)))
-                  : " ";
+      text += track.find(i * kFrame) >= 0 ? 'x' : track.bridgedAt(i * kFrame) ? '-' : ' ';
     return text;
   }
   static std::string keys(Controller const* channel, int frames) {
@@ -180,43 +178,34 @@ class ReduceChannelTest : public SceneTest {
   ReductionTolerances m_tolerances{.length = 0.1, .angle = 0.1, .ofRange = 0.001};
 };
 
-TEST_F(ReduceChannelTest, FillTypesOfAMarkerTellWhatWasReduced) {
+TEST_F(ReduceChannelTest, ThinningOpensNoGapAndClosesNone) {
   fill(m_channel, "xxxxxx   xx xxxx");
   m_marker->setFillType(3 * kFrame, Marker::Filled, false);
-  m_marker->setFillType(5 * kFrame, Marker::EditedByHand, false);
   EXPECT_EQ(reduceAll(m_channel, m_tolerances), 6);
-  EXPECT_EQ(keys(m_channel, 16), "x    x   xx x  x");
-  EXPECT_EQ(fillTypes(m_marker, 16), "4    2      4  0");
+  EXPECT_EQ(data(m_channel, 16), "x----x   xx x--x");
+  EXPECT_EQ(m_marker->getFillType(3 * kFrame), Marker::Filled);
   EXPECT_EQ(reduceAll(m_channel, m_tolerances), 0);
+  BoolController const* occluded = m_marker->getOccludedChannel();
+  EXPECT_FALSE(occluded->getValue(3 * kFrame));
+  EXPECT_TRUE(occluded->getValue(7 * kFrame));
 }
 
-// The frames that count as data although they hold no key.
-TEST_F(ReduceChannelTest, EditsInAReducedRunKeepWhatWasSeen) {
-  const auto data = [&] {
-    std::string text;
-    for (int i = 0; i < 16; ++i)
-      text += m_channel->hasKeyAt(i * kFrame) ? 'x' : m_marker->isReducedBehind((i - 1) * kFrame) ? '-' : ' ';
-    return text;
-  };
+TEST_F(ReduceChannelTest, EditsOfAThinnedCurveTakeOnlyTheDataThatWasChosen) {
   fill(m_channel, "xxxxxxxxxxxx  xx");
   EXPECT_EQ(reduceAll(m_channel, m_tolerances), 10);
-  EXPECT_EQ(data(), "x----------x  xx");
+  EXPECT_EQ(data(m_channel, 16), "x----------x  xx");
   m_channel->setKey(4 * kFrame, {4, 1, 0}, KeyTrack::kAll);
-  EXPECT_EQ(data(), "x---x------x  xx");
-  m_marker->setLocalPos(8 * kFrame, {8, 1, 0});
-  m_marker->setFillType(8 * kFrame, Marker::EditedByHand, true);
-  EXPECT_EQ(data(), "x---x---x--x  xx");
-  EXPECT_EQ(m_marker->getFillType(8 * kFrame), Marker::EditedByHand);
-
-  // What is cut was not seen, up to the keys on either side.
-  m_channel->deleteKeys(HTimeRange(4 * kFrame, 6 * kFrame), KeyTrack::kAll, false);
-  EXPECT_EQ(data(), "x       x--x  xx");
-  EXPECT_EQ(m_marker->getFillType(8 * kFrame), Marker::EditedByHand);
-  m_channel->selectKeys(HTimeRange(11 * kFrame, 14 * kFrame), KeyTrack::kAll);
-  m_channel->deleteSelectedKeys(KeyTrack::kAll);
-  EXPECT_EQ(data(), "x       x      x");
-  m_channel->deleteKeys(HTimeRange::forever(), KeyTrack::kAll, true);
-  EXPECT_EQ(data(), std::string(16, ' '));
+  EXPECT_EQ(data(m_channel, 16), "x---x------x  xx");
+  EXPECT_EQ(m_channel->deleteKeys(HTimeRange(4 * kFrame, 6 * kFrame), KeyTrack::kAll, false), 1);
+  EXPECT_EQ(data(m_channel, 16), "x--x   x---x  xx");
+  EXPECT_NEAR(m_channel->getValue(3 * kFrame).y, 0.75, 1e-12);
+  EXPECT_NEAR(m_channel->getValue(7 * kFrame).y, 4.0 / 7, 1e-12);
+  EXPECT_EQ(m_channel->deleteKey(5 * kFrame, KeyTrack::kAll), 0);
+  EXPECT_EQ(m_channel->deleteKey(11 * kFrame, KeyTrack::kAll), 1);
+  EXPECT_EQ(data(m_channel, 16), "x--x   x--x   xx");
+  m_channel->selectKeys(HTimeRange(3 * kFrame, 14 * kFrame), KeyTrack::kAll);
+  EXPECT_EQ(m_channel->deleteSelectedKeys(KeyTrack::kAll), 4);
+  EXPECT_EQ(data(m_channel, 16), "x-x            x");
 }
 
 TEST_F(ReduceChannelTest, ReducedCurvesCanBeReducedFurther) {
@@ -224,22 +213,16 @@ TEST_F(ReduceChannelTest, ReducedCurvesCanBeReducedFurther) {
   EXPECT_GT(reduceAll(m_channel, m_tolerances), 100);
   const int left = m_channel->getNumKeys();
   EXPECT_GT(reduceAll(m_channel, {.length = 1, .angle = 0, .ofRange = 0}), left / 3);
-  EXPECT_EQ(fillTypes(m_marker, 200).find_first_not_of("4 "), 199u);
+  EXPECT_EQ(data(m_channel, 201).find(' '), 200u);
 }
 
-TEST_F(ReduceChannelTest, LayersAboveTellNothingOfOcclusion) {
+TEST_F(ReduceChannelTest, LayersAboveTellNothingOfGaps) {
   fill(m_channel, "xx   xx");
   m_clip->addLayer();
   g_db->setActiveLayer(1);
-  fill(m_channel, "xxxxxxx");
-  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 5);
-  EXPECT_EQ(m_marker->getChannel("FillType"), nullptr);
-  // A fill type above would hide the one that reduction writes below.
-  m_marker->setFillType(0, Marker::Filled, false);
-  g_db->setActiveLayer(0);
-  fill(m_channel, "xxxx");
-  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 2);
-  EXPECT_EQ(m_marker->getFillType(0), Marker::Reduced);
+  fill(m_channel, "xx  xxx");
+  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 3);
+  EXPECT_FALSE(m_marker->isSeenAt(3 * kFrame));
 }
 
 TEST_F(ReduceChannelTest, RangesThatHoldEveryKeyAndSelectionOfAllAreAll) {

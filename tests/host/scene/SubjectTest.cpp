@@ -108,6 +108,13 @@ TEST_F(SubjectTest, BelowACharacterThatStandsStill) {
   }
 }
 
+// The positions of a marker have data between its keys of this time.
+void bridge(Marker* marker, NLEClip* clip, int64 first, int64 last) {
+  KeyTrack track = *marker->getTranslationChannel()->findTrack(clip, 0);
+  track.bridge(first, last);
+  marker->getTranslationChannel()->setTrack(clip, 0, std::move(track));
+}
+
 TEST_F(SubjectTest, BelowMovingParents) {
   for (int round = 0; round < 10; ++round) {
     g_db->newScene();
@@ -127,8 +134,8 @@ TEST_F(SubjectTest, BelowMovingParents) {
     animate(measured, clip, 0, 1, 10, 30);
     animate(measured, other, 0, 1, 10, 30);
     animate(reduced, clip, 0, 10);
-    reduced->setFillType(0, Marker::Reduced, false);
-    reduced->setFillType(10 * kFrame, Marker::Recorded, false);
+    bridge(sparse, clip, 0, kFrames * kFrame);
+    bridge(reduced, clip, 0, 0);
     never->getTranslationChannel()->setTrack(clip, 0, KeyTrack(KeyTrack::Shape::Vector));
 
     std::vector<double> all;

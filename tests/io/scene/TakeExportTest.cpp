@@ -25,22 +25,6 @@ class TakeExportTest : public SceneTest {
   }
 };
 
-TEST_F(TakeExportTest, ReducedRunsAreDataOtherGapsAreNot) {
-  Take take = smallTake("walk");
-  addPoint(take, "Bob", "M", {0, 0, 0}, "x x x");
-  open(take);
-  auto* marker = at<Marker>("\\Bob\\M");
-  EXPECT_EQ(seen(onlyPoint()), "x x x");
-  marker->setFillType(at100(1), Marker::Reduced, false);
-  marker->setFillType(at100(3), Marker::Recorded, false);
-  EXPECT_EQ(seen(onlyPoint()), "xxx x");
-  EXPECT_EQ(onlyPoint().at(1).values[0], 1);
-  // Behind the last key there is nothing to reduce.
-  marker->setFillType(at100(5), Marker::Reduced, false);
-  marker->getTranslationChannel()->deleteKey(at100(5), KeyTrack::kAll);
-  EXPECT_EQ(seen(onlyPoint()), "xxx  ");
-}
-
 TEST_F(TakeExportTest, LayersAndPartialKeysAreEvaluated) {
   Take take = smallTake("walk");
   addPoint(take, "Bob", "M", {0, 0, 0}, "xx xx");

@@ -240,7 +240,9 @@ TEST_F(ParentAdjustTest, MarkersGainNoDataInTheirGaps) {
   parent->getRotationChannel()->setKey(kFrames * kFrame, TalixRotation({0, 0, 3}), 7);
   const std::set<int> seen = {3, 4, 5, 20, 30};
   for (const int frame : seen) marker->setLocalPos(frame * kFrame, {100.0 * frame, 0, 0});
-  marker->setFillType(20 * kFrame, Marker::Reduced, false);  // to 30 thinned out, so there is data
+  KeyTrack bridged = *marker->getTranslationChannel()->findActiveTrack();
+  bridged.bridge(20 * kFrame, 20 * kFrame);
+  marker->getTranslationChannel()->setTrack(g_db->getActiveClip(), 0, bridged);
   marker->getTranslationChannel()->deleteKey(3 * kFrame, 2 | 4);
   std::map<int, Vec3> before;
   for (int i = 0; i <= kFrames; ++i) before[i] = marker->getWSPos(i * kFrame);
