@@ -127,7 +127,7 @@ class SceneText {
   void writeKeys(KeyTrack const& track, std::string const& where) {
     m_out << "  " << where << track.checkInvariants();
     track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
-      m_out << " " << key.time << ":" << int{key.components} << int{key.selected};
+      m_out << " " << key.time << ":" << int{key.components} << int{key.selected} << int{key.bridges};
       for (int i = 0; i < track.width(); ++i) m_out << "," << key.values[static_cast<size_t>(i)];
     });
     m_out << "\n";

@@ -18,6 +18,7 @@ class ClipboardManager {
            z = 0;             // one-valued channels use x; rotations are Euler radians in the source's order
     unsigned components = 0;  // 1 x, 2 y, 4 z
     unsigned flags = 0;       // the key's own, as its channel reports them
+    unsigned bridges = 0;     // components whose data goes on to the next record that has them
   };
 
   // What is added until finishClipboardCopy replaces the content; keep: false takes the copy back. order: the

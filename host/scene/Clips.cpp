@@ -2,6 +2,7 @@
 
 #include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 
 H_DEFINE_ABSTRACT_CLASS(NLEClip);
 H_DEFINE_CLASS(Clip);
@@ -57,6 +58,28 @@ void NLEClip::setLayerLocked(int layer, bool locked) {
   std::vector<bool> locks = m_layerLocks;
   locks[static_cast<size_t>(layer)] = locked;
   storeLayerLocks(std::move(locks));
+}
+
+int64 NLEClip::getFramePeriod() const { return getDatabase()->getTimeManager()->getTicksPerFrame(); }
+
+struct Clip::FileTimeChange : UndoChange {
+  explicit FileTimeChange(Clip& concerned)
+      : UndoChange(&concerned), clip(concerned), time(concerned.m_fileTime) {}
+  void swap() override { std::swap(clip.m_fileTime, time); }
+  bool isVoid() const override { return time == clip.m_fileTime; }
+  int64 memoryUse() const override { return sizeof *this; }
+
+  Clip& clip;
+  FileTime time;
+};
+
+void Clip::setFileTime(FileTime const& time) {
+  if (isRecorded()) journal().add(std::make_unique<FileTimeChange>(*this));
+  m_fileTime = time;
+}
+
+int64 Clip::getFramePeriod() const {
+  return m_fileTime.rate > 0 ? ticksPerFrameAt(m_fileTime.rate) : NLEClip::getFramePeriod();
 }
 
 void Clip::setUp() {

@@ -10,7 +10,6 @@
 #include "host/scene/Database.h"
 #include "host/scene/Devices.h"
 #include "host/scene/Editability.h"
-#include "host/scene/HTimeManager.h"
 #include "host/scene/Marker.h"
 
 H_DEFINE_ABSTRACT_CLASS(DataSource);
@@ -109,8 +108,18 @@ int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
       editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
 }
 
+int64 Controller::getDataPeriod(NLEClip const& clip) const {
+  const int64 frame = clip.getFramePeriod();
+  auto const* taken = objectAs<Clip>(&clip);
+  const double rate = taken ? taken->getFileTime().sampleRate : 0;
+  if (!(rate > 0) || getPropertyType() != FloatProperty || !objectAs<AnalogDevice>(m_module)) return frame;
+  // Samples that do not go with the frames are not at multiples of their period.
+  const int64 sample = ticksPerFrameAt(rate);
+  return frame % sample == 0 ? sample : frame;
+}
+
 KeyTrack::BridgeEnds Controller::bridgeEnds() const {
-  return {m_interpolation, HTimeManager::getInstance()->getTicksPerFrame()};
+  return {m_interpolation, getDataPeriod(*getDatabase()->getActiveClip())};
 }
 
 int Controller::deleteKey(int64 time, unsigned mask) {
@@ -123,11 +132,16 @@ int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayer
   Database const& scene = *getDatabase();
   NLEClip* clip = scene.getActiveClip();
   const int64 first = range.getStart(), last = range.getEnd();
-  for (ClipTrack const& track : m_tracks)
-    if (track.clip == clip && (track.layer == scene.getActiveLayer() ||
-                               (allLayers && obstacleToKeys(*this, clip, track.layer) == Obstacle::none)))
-      deleted += trackToDelete(clip, track.layer, first, last)->deleteRange(first, last, mask, bridgeEnds());
-  if (deleted) changed();
+  bool bridged = false;  // data may go without a key
+  for (ClipTrack const& track : m_tracks) {
+    if (track.clip != clip || (track.layer != scene.getActiveLayer() &&
+                               !(allLayers && obstacleToKeys(*this, clip, track.layer) == Obstacle::none)))
+      continue;
+    KeyTrack* edited = trackToDelete(clip, track.layer, first, last);
+    bridged = bridged || edited->bridgesAny(mask);
+    deleted += edited->deleteRange(first, last, mask, bridgeEnds());
+  }
+  if (deleted || bridged) changed();
   return static_cast<int>(deleted);
 }
 
@@ -143,6 +157,12 @@ int Controller::deleteSelectedKeys(unsigned mask) {
   const int64 deleted = edited->deleteSelected(mask, bridgeEnds());
   if (deleted) changed();
   return static_cast<int>(deleted);
+}
+
+void Controller::bridgeKeys(HTimeRange const& range, unsigned mask) {
+  if (!findActiveTrack()) return;
+  editTrack(range.getStart(), range.getEnd())->bridge(range.getStart(), range.getEnd(), mask);
+  changed();
 }
 
 bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo) {

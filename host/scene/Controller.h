@@ -90,11 +90,14 @@ class Controller : public DataSource {
 
   virtual int selectKeys(HTimeRange const& range, unsigned mask);
   virtual int deselectKeys(HTimeRange const& range, unsigned mask);
-  // These answer how many keys lost something. allLayers: in every layer of the active clip that
-  // is not locked.
+  // These return how many keys lost something, and take away no other data than what was chosen: a key, all
+  // frames of a range, the selected keys and what lies between neighbours among them (KeyTrack::deleteRange).
+  // allLayers: in every layer of the active clip that is not locked.
   virtual int deleteKey(int64 time, unsigned mask);
   virtual int deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers);
   virtual int deleteSelectedKeys(unsigned mask);
+  // Lets the keys in a range bridge these components to their next keys, so that there is data between them.
+  void bridgeKeys(HTimeRange const& range, unsigned mask);
   // Removes the keys in the ranges (sorted and disjoint; the selected keys) that the curve of the layer does
   // not need within the tolerances, measured against the curve as it is now (KeyReduction.h says how). What
   // stays bridges over them. They return how many keys lost something.
@@ -132,6 +135,9 @@ class Controller : public DataSource {
   // Whether its values are measurements, which are never made up where there is no data: a marker's
   // translation, a device's channels. Other channels have values at all times.
   bool isMeasured() const;
+  // Ticks between the times at which it may have data in a clip: the clip's frames, the samples of a device's
+  // float channels.
+  int64 getDataPeriod(NLEClip const& clip) const;
   // Replaces the keys in a clip and layer: how importers, copies and undo put whole tracks in place.
   void setTrack(NLEClip* clip, int layer, KeyTrack track);
   bool hasKeysInClip(NLEClip const* clip) const;

@@ -14,6 +14,7 @@ void HTimeManager::reset() {
   m_rate = HFrameRate();
   m_time = 0;
   m_animRange = m_playRange = HTimeRange(0, getTime(100));
+  m_animRangeChosen = false;
   m_selected.clear();
 }
 
@@ -90,9 +91,10 @@ double HTimeManager::stringToFrameDouble(HString const& text, bool relative) con
   return rate.frameFromTimecode(text, frame) ? static_cast<double>(frame) : 0;
 }
 
-void HTimeManager::setAnimRange(HTimeRange range) {
+void HTimeManager::setAnimRange(HTimeRange range, bool chosen) {
   record();
   m_animRange = range;
+  m_animRangeChosen = chosen;
 }
 
 void HTimeManager::setPlayRange(HTimeRange range, bool keepTime) {

@@ -48,7 +48,9 @@ class HTimeManager {
 
   HTimeRange getAnimRange() const { return m_animRange; }
   HTimeRange getPlayRange() const { return m_playRange; }
-  void setAnimRange(HTimeRange range);
+  // chosen: by the user, so that a take is saved over this range.
+  void setAnimRange(HTimeRange range, bool chosen);
+  bool isAnimRangeChosen() const { return m_animRangeChosen; }
   // `keepTime`: the current time stays although it lies outside.
   void setPlayRange(HTimeRange range, bool keepTime);
 
@@ -76,5 +78,6 @@ class HTimeManager {
   HFrameRate m_rate;
   int64 m_time = 0;
   HTimeRange m_animRange, m_playRange;
+  bool m_animRangeChosen = false;
   std::vector<HTimeRange> m_selected;
 };

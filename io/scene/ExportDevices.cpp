@@ -97,20 +97,19 @@ class DeviceExport {
 
   KeyTrack samplesOfBridged(const Controller& channel) {
     const FrameGrid& frames = m_sampler.grid();
-    const int64 period = ticksPerFrameAt(analogRate());
     FrameGrid grid;
-    grid.period = frames.period % period == 0 ? period : frames.period;
+    grid.period = channel.getDataPeriod(*m_sampler.clip());
     grid.firstFrame = frames.start() / grid.period;
     grid.count = frames.count * (frames.period / grid.period);
-    FrameSampler sampler(m_out.scene, grid);
+    const FrameSampler sampler(m_out.scene, grid);
     m_out.keysLeftOut += sampler.keysOffGrid(channel);
     return sampler.sampleWhere(sampler.framesWithData(channel), channel);
   }
 
   double analogRate() const {
-    return m_sampler.clip()
-               ? fileMetadata::number(*m_sampler.clip(), fileMetadata::kAnalogRate, m_out.take.rate)
-               : m_out.take.rate;
+    const auto* clip = objectAs<Clip>(m_sampler.clip());
+    const double rate = clip ? clip->getFileTime().sampleRate : 0;
+    return rate > 0 ? rate : m_out.take.rate;
   }
 
   bool isLayered(const Controller& channel) const {

@@ -22,7 +22,6 @@ inline constexpr const char* kFileName = "FileName";
 inline constexpr const char* kFileFormat = "FileFormat";                        // string: "C3D", "BVH", "TRC"
 inline constexpr const char* kFileUnit = "FileUnit";                            // string: the file's own word
 inline constexpr const char* kFileUnitInMillimetres = "FileUnitInMillimetres";  // float
-inline constexpr const char* kAnalogRate = "AnalogRate";                        // float: samples a second
 // Records: seconds, label, context, subject, description.
 inline constexpr const char* kEvents = "Events";
 // Records: channel in the scene, name in the file, unit, description, scale, offset.

@@ -78,7 +78,6 @@ void importAnalog(TakeImport& import, Take& take, const std::string& path) {
                        analog.unit, analog.description, fileMetadata::numberText(analog.scale),
                        fileMetadata::numberText(analog.offset)});
   fileMetadata::setRecords(import.clip(), fileMetadata::kAnalogChannels, records);
-  fileMetadata::setNumber(import.clip(), fileMetadata::kAnalogRate, take.analogRate);
 }
 
 }  // namespace

@@ -62,7 +62,7 @@ constexpr Writer kWriters[] = {
     {"setBoneLength 5", {"P", "P", "!", "P", "P", "P", "P"}, "select b"},
     {"copyData \\s\\m.Translation \\b\\m.Translation", {"KD", "x", "x", "KD!", "x", "x", "x"}},
     // Other channels of the module are copied where some are locked.
-    {"collapse", {"KD", ".", "!", "KD!", "!", "!", "x"}, "select s b"},
+    {"collapse", {"KD", "K", "!", "KD!", "!", "!", "x"}, "select s b"},
 };
 
 class Editability : public testing::Test {

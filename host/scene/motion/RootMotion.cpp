@@ -205,6 +205,8 @@ Times Baking::timesOf(Marker const& marker, bool moves) {
   if (!moves) return own;
   Times const& follow = frameTimes(marker.getNodeParent());
   KeyTrack const* data = marker.getTranslationChannel()->findDataTrack(m_clip);
+  // One with an empty track belongs to the clip and was never seen.
+  if (!data && marker.getTranslationChannel()->findTrack(m_clip, 0)) return own;
   if (!data) return merged(own, follow);
   Times bridged;
   const DataRanges ranges(*data, 1);
