@@ -108,7 +108,7 @@ class Curve {
     return good;
   }
 
-  // Whether the curve holds when all keys between the anchor and `next` go and all behind stay for now.
+  // Whether the curve holds when all keys between the anchor and `next` go and all later ones stay for now.
   bool mayJoin(Kept const& kept, int64 next) const {
     const auto [beforePrevious, previous, anchor] = kept;
     if (!spanHolds(point(previous), anchor, next, point(next + 1))) return false;
@@ -123,7 +123,7 @@ class Curve {
     const auto keyHolds = [&](int64 i) {
       return isNear(between(before, a, b, after, m_times[at(i)]), valuesAt(point(i)));
     };
-    // What does not hold mostly strays in the middle.
+    // What does not hold mostly deviates most in the middle.
     const int64 middle = first + (last - first) / 2;
     if (middle > first && !keyHolds(middle)) return false;
     for (int64 i = first; i < last; ++i)

@@ -3,7 +3,7 @@
 // Method. From a key that stays, the farthest key is sought up to which everything between can go; the search
 // doubles its reach until that fails and then halves. Each attempt compares the new curve with the original
 // one at every key and every whole frame of the spans that it changes: the one span that loses keys and, for
-// "Cubic", whose slopes look at the neighbours, also the span before it and the one behind. So the new curve
+// "Cubic", whose slopes look at the neighbours, also the spans before and after it. So the new curve
 // is never farther from the original one than the tolerance at any key or frame, however many keys go.
 //
 // Cost. An attempt that spans m keys costs m, a span that results of m keys costs O(m log m), whatever the

@@ -65,7 +65,7 @@ class KeyTrack {
   // caller; a cursor of another or a changed track only costs a search.
   struct Cursor {
     const KeyLeaf* leaf = nullptr;  // valid only while the version is the track's
-    const KeyLeaf* next = nullptr;  // the leaf behind it, null behind the last
+    const KeyLeaf* next = nullptr;  // the next leaf, null after the last
     int64 firstIndex = 0;           // of the leaf
     int slot = 0;
     uint64 version = 0;
@@ -149,7 +149,7 @@ class KeyTrack {
   void restore(Key const& key);
   void restoreNone(int64 time);
 
-  // Selection. Only components that a key holds can be selected. Selecting answers the number of
+  // Selection. Only components that a key holds can be selected. Selecting returns the number of
   // keys in the range that hold a component of the mask; deselecting the number of keys that lost a flag.
   int64 select(int64 first, int64 last, unsigned mask = kAll);
   int64 deselect(int64 first, int64 last, unsigned mask = kAll);

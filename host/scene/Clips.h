@@ -15,7 +15,7 @@ class NLEClip : public Module {
 
   // Layers count from 0; every clip has at least one. Channels hold keys by layer.
   int getNumLayers() const { return static_cast<int>(m_layerLocks.size()); }
-  int addLayer();  // answers its number
+  int addLayer();  // returns its number
   bool isLayerLocked(int layer) const;
   void setLayerLocked(int layer, bool locked);
 

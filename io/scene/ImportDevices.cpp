@@ -28,7 +28,7 @@ class DeviceImport {
                const std::string& path)
       : m_import(import), m_device(device), m_type(type), m_path(path) {}
 
-  // Answers the channel's name.
+  // Returns the channel's name.
   std::string add(const std::string& name, const char* byDefault, KeyTrack track) {
     const std::string mended = channelName(name, byDefault);
     std::string free = mended;

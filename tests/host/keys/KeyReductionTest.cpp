@@ -80,7 +80,7 @@ class KeyReductionTest : public SceneTest {
   }
 };
 
-TEST_F(KeyReductionTest, NoCurveStraysBeyondTheToleranceAndEndsStay) {
+TEST_F(KeyReductionTest, NoCurveDeviatesBeyondTheToleranceAndEndsStay) {
   for (const Shape shape : {Shape::Scalar, Shape::Vector, Shape::Rotation})
     for (const Interpolation kind : {Interpolation::Constant, Interpolation::Linear, Interpolation::Cubic})
       for (const bool partial : {false, true}) {
@@ -100,7 +100,7 @@ TEST_F(KeyReductionTest, NoCurveStraysBeyondTheToleranceAndEndsStay) {
             const int64 next = track.timeAt(i + 1);
             if (track.timeAt(i) >= (next - 1) / kPeriod * kPeriod || next <= 0) continue;
             ASSERT_GE(reduced.find(track.timeAt(i)), 0) << "before a gap";
-            ASSERT_GE(reduced.find(next), 0) << "behind a gap";
+            ASSERT_GE(reduced.find(next), 0) << "after a gap";
           }
         }
         EXPECT_GT(removed, 200) << static_cast<int>(shape) << static_cast<int>(kind) << partial;
@@ -126,7 +126,7 @@ TEST_F(KeyReductionTest, WhatIsSimpleIsFoundOut) {
   EXPECT_EQ(left(steps, Interpolation::Linear, 0), 21);    // its ends, of which the last has one
   EXPECT_EQ(left(arc, Interpolation::Linear, 1e-6), 2);
   EXPECT_LE(left(parabola, Interpolation::Cubic, 0.1), 12);
-  // A line strays by s * s / 8 * 2e-3 from a span of s frames.
+  // A line deviates by s * s / 8 * 2e-3 from a span of s frames.
   EXPECT_NEAR(static_cast<double>(left(parabola, Interpolation::Linear, 0.1)), 1001 / 20.0 + 1, 2);
 }
 

@@ -1,4 +1,4 @@
-// A key track as plainly as it can be written: a sorted vector, every question answered by looking at all
+// A key track as plainly as it can be written: a sorted vector, every query looks at all
 // keys.
 #pragma once
 
@@ -37,7 +37,7 @@ class KeyTrackModel {
     mask = normal(mask);
     return std::count_if(keys.begin(), keys.end(), [mask](Key const& k) { return (k.selected & mask) != 0; });
   }
-  // The first key behind `index`, in steps of `step`, whose flags meet the mask.
+  // The first key after `index`, in steps of `step`, whose flags meet the mask.
   int64 walk(int64 index, int step, unsigned char Key::*flags, unsigned mask, bool any = true) const {
     mask = normal(mask);
     for (index = std::clamp<int64>(index, -1, size()) + step; index >= 0 && index < size(); index += step)

@@ -85,6 +85,11 @@ TEST_F(TakeExportTest, AClipKeepsItsOwnFrames) {
     EXPECT_EQ(!marker->getOccludedChannel()->getValue(at100(frame)), isSeen) << frame;
   }
 
+  g_db->getActiveClip()->setSelected(true);
+  g_db->duplicateSelectedObjects();
+  g_db->setActiveClip(objectAs<NLEClip>(g_db->getSelectedModule(0)));
+  EXPECT_EQ(differenceOf(second, save()), "");
+
   // Thinned, its samples come back.
   auto* channel = at<AnalogDevice>("\\Analog")->getChannel("emg");
   const HTimeRange all[] = {HTimeRange::forever()};
