@@ -66,10 +66,7 @@ bool hasSceneRate(const Take& take, const Database& scene) {
 void bridgeSamples(Take& take) {
   const auto bridge = [](KeyTrack& track, double rate) {
     const KeyTrack samples = track;
-    const int64 period = ticksPerFrameAt(rate);
-    DataRanges(samples, period).visitRanges(-kForever, kForever, [&](int64 start, int64 end) {
-      if (start < end) track.bridge(start, end - 1);
-    });
+    DataRanges(samples, ticksPerFrameAt(rate)).bridge(track);
   };
   for (TakePoint& point : take.points) {
     bridge(point.positions, take.rate);

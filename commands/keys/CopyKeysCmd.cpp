@@ -72,7 +72,9 @@ class KeyCopy {
 
   // The components whose data goes on after a key, which may lack them.
   static unsigned dataAfter(KeyTrack const& track, KeyTrack::Key const& key) {
-    return key.bridges | (track.bridgedAt(key.time) & ~static_cast<unsigned>(key.components));
+    return key.components == KeyTrack::kAll
+               ? key.bridges
+               : key.bridges | (track.bridgedAt(key.time) & ~static_cast<unsigned>(key.components));
   }
   static unsigned bridgesToSelected(KeyTrack const& track, int64 index, KeyTrack::Key const& key) {
     unsigned kept = 0;

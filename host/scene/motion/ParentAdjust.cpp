@@ -4,6 +4,7 @@
 #include <cmath>
 #include <optional>
 
+#include "host/keys/DataRanges.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/KeyTimes.h"
@@ -332,6 +333,7 @@ KeyTrack Adjustment::keyed(Controller const& channel, Times const& times,
     while (m_times[i] != time) ++i;
     track.set(time, goals[i]);
   }
+  if (now) DataRanges::bridgeAlike(track, *now);
   for (int64 key = now ? now->nextSelected(-1, KeyTrack::kAll) : -1; key >= 0;
        key = now->nextSelected(key, KeyTrack::kAll)) {
     const KeyTrack::Key selected = now->at(key);

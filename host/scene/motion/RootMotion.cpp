@@ -217,6 +217,7 @@ Times Baking::timesOf(Marker const& marker, bool moves) {
 
 // Replaces the keys of all layers by those of one; key selection stays.
 void Baking::put(NewTrack& made) const {
+  if (KeyTrack const* data = made.channel->findDataTrack(m_clip)) DataRanges::bridgeAlike(made.track, *data);
   for (int layer = 0; layer < m_clip->getNumLayers(); ++layer) {
     KeyTrack const* former = made.channel->findTrack(m_clip, layer);
     if (!former) continue;

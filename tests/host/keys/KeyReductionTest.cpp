@@ -190,24 +190,6 @@ TEST_F(ReduceChannelTest, ThinningOpensNoGapAndClosesNone) {
   EXPECT_TRUE(occluded->getValue(7 * kFrame));
 }
 
-TEST_F(ReduceChannelTest, EditsOfAThinnedCurveTakeOnlyTheDataThatWasChosen) {
-  fill(m_channel, "xxxxxxxxxxxx  xx");
-  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 10);
-  EXPECT_EQ(data(m_channel, 16), "x----------x  xx");
-  m_channel->setKey(4 * kFrame, {4, 1, 0}, KeyTrack::kAll);
-  EXPECT_EQ(data(m_channel, 16), "x---x------x  xx");
-  EXPECT_EQ(m_channel->deleteKeys(HTimeRange(4 * kFrame, 6 * kFrame), KeyTrack::kAll, false), 1);
-  EXPECT_EQ(data(m_channel, 16), "x--x   x---x  xx");
-  EXPECT_NEAR(m_channel->getValue(3 * kFrame).y, 0.75, 1e-12);
-  EXPECT_NEAR(m_channel->getValue(7 * kFrame).y, 4.0 / 7, 1e-12);
-  EXPECT_EQ(m_channel->deleteKey(5 * kFrame, KeyTrack::kAll), 0);
-  EXPECT_EQ(m_channel->deleteKey(11 * kFrame, KeyTrack::kAll), 1);
-  EXPECT_EQ(data(m_channel, 16), "x--x   x--x   xx");
-  m_channel->selectKeys(HTimeRange(3 * kFrame, 14 * kFrame), KeyTrack::kAll);
-  EXPECT_EQ(m_channel->deleteSelectedKeys(KeyTrack::kAll), 4);
-  EXPECT_EQ(data(m_channel, 16), "x-x            x");
-}
-
 TEST_F(ReduceChannelTest, ReducedCurvesCanBeReducedFurther) {
   fill(m_channel, std::string(200, 'x'), 0.01);
   EXPECT_GT(reduceAll(m_channel, m_tolerances), 100);

@@ -258,6 +258,7 @@ TEST_F(ParentAdjustTest, MarkersGainNoDataInTheirGaps) {
       EXPECT_TRUE(far < 0.0100001 || !data || !range.contains(i * kFrame)) << "frame " << i;
     }
     EXPECT_EQ(marker->getDataRange(), HTimeRange(3 * kFrame, 30 * kFrame));
+    EXPECT_TRUE(marker->isSeenAt(27 * kFrame + 1) && !marker->isSeenAt(18 * kFrame)) << "bridges stay";
     marker->discardDataEdit();
     hang(marker, parent);
   }
