@@ -104,6 +104,25 @@ class KeyTrackModel {
     return changed;
   }
 
+  int64 thin(std::vector<unsigned char> const& lost) {
+    for (unsigned c = 1; c < 8; c *= 2) {
+      Key* kept = nullptr;
+      bool loses = false;
+      for (size_t i = 0; i < keys.size(); ++i) {
+        if (!(keys[i].components & c)) continue;
+        loses = loses || (lost[i] & c);
+        if (lost[i] & c) continue;
+        if (kept && loses) kept->bridges |= static_cast<unsigned char>(c);
+        kept = &keys[i];
+        loses = false;
+      }
+    }
+    int64 changed = 0;
+    for (size_t i = 0; i < keys.size(); ++i) changed += lose(keys[i], lost[i] & keys[i].components);
+    std::erase_if(keys, [](Key const& k) { return k.components == 0; });
+    return changed;
+  }
+
   void bridge(int64 first, int64 last, unsigned mask, bool on) {
     edit(first, last, [mask = normal(mask), on](Key& k) {
       const auto bits = static_cast<unsigned char>(mask & k.components);
