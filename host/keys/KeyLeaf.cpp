@@ -121,15 +121,14 @@ void KeyLeaf::erase(int first, int last) {
 void KeyLeaf::setFlags(int slot, KeyFlags const& fresh) {
   const KeyFlags old = flags(slot);
   if (fresh == old) return;
+  // Columns that have to be written out come first: there may be no memory for them.
+  const unsigned bits = fresh.components | fresh.bridges << kBridgeShift;
+  if (plain() && bits != kWhole) insertBits(m_flags, kWhole, kWhole, 0, 0);
+  if (m_selection.empty() && fresh.selected) insertBits(m_selection, 0, 0, 0, 0);
   counts.count(old, -1);
   counts.count(fresh, 1);
-  const auto write = [&](Column& column, unsigned absent, unsigned bits) {
-    if (column.empty() && bits == absent) return;
-    if (column.empty()) insertBits(column, absent, absent, 0, 0);
-    column[slot] = static_cast<unsigned char>(bits);
-  };
-  write(m_flags, kWhole, fresh.components | fresh.bridges << kBridgeShift);
-  write(m_selection, 0, fresh.selected);
+  if (!plain()) m_flags[slot] = static_cast<unsigned char>(bits);
+  if (!m_selection.empty()) m_selection[slot] = static_cast<unsigned char>(fresh.selected);
 }
 
 void KeyLeaf::dropIdleFlags() {

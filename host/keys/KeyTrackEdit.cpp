@@ -354,9 +354,8 @@ void KeyTrack::capBridges(int64 first, int64 last, unsigned mask, BridgeEnds con
   };
   cap(before, endsBefore);
   cap(after, beginsAfter);
-  for (const unsigned part : KeyParts(m_shape, cut)) {
+  for (const unsigned part : KeyParts(m_shape, cut))
     endBridge(previousHolding(lowerBound(first), part), part);
-  }
 }
 
 int64 KeyTrack::deleteRange(int64 first, int64 last, unsigned mask, BridgeEnds const& ends) {
