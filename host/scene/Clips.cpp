@@ -69,6 +69,14 @@ struct Clip::FileTimeChange : UndoChange {
   bool isVoid() const override { return time == clip.m_fileTime; }
   int64 memoryUse() const override { return sizeof *this; }
 
+  void tell(ChangeSetBuilder& changes) const override {
+    const auto text = [](FileTime const& of) {
+      return textOf(Attribute::Value(of.rate)) + " " + std::to_string(of.firstFrame) + " " +
+             std::to_string(of.frameCount) + " " + textOf(Attribute::Value(of.sampleRate));
+    };
+    changes.tell(SceneChange::Kind::attribute, &clip, "FileTime", text(time), text(clip.m_fileTime));
+  }
+
   Clip& clip;
   FileTime time;
 };

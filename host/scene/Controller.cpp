@@ -161,6 +161,7 @@ int Controller::deleteSelectedKeys(unsigned mask) {
 
 void Controller::bridgeKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return;
+  const DataEdit edit(*this, range);
   editTrack(range.getStart(), range.getEnd())->bridge(range.getStart(), range.getEnd(), mask);
   changed();
 }

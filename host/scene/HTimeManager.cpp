@@ -32,6 +32,7 @@ void HTimeManager::swapSettings(Settings& settings) noexcept {
   std::swap(m_animRange, settings.animRange);
   std::swap(m_playRange, settings.playRange);
   m_selected.swap(settings.selected);
+  std::swap(m_animRangeChosen, settings.animRangeChosen);
 }
 
 void HTimeManager::checkThread() const {

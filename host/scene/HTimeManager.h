@@ -65,9 +65,10 @@ class HTimeManager {
     HFrameRate rate;
     HTimeRange animRange, playRange;
     std::vector<HTimeRange> selected;
+    bool animRangeChosen = false;
     bool operator==(Settings const&) const = default;
   };
-  Settings getSettings() const { return {m_rate, m_animRange, m_playRange, m_selected}; }
+  Settings getSettings() const { return {m_rate, m_animRange, m_playRange, m_selected, m_animRangeChosen}; }
   void swapSettings(Settings& settings) noexcept;
 
  private:
