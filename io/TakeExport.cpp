@@ -72,9 +72,8 @@ Take exportTake(Database& scene, std::vector<TakeNote>& notes) {
   const FrameGrid grid = framesToSave(scene, notes);
   Take take;
   const auto* clip = objectAs<Clip>(scene.getActiveClip());
-  take.rate = clip && clip->getFileTime().rate > 0
-                  ? clip->getFileTime().rate
-                  : scene.getTimeManager()->getFrameRate().getFrameRate();
+  take.rate = clip && clip->getFileTime().rate > 0 ? clip->getFileTime().rate
+                                                   : scene.getTimeManager()->getFrameRate().getFrameRate();
   take.firstFrame = grid.firstFrame;
   take.frameCount = grid.count;
   if (scene.getUpAxis() >= 0) take.up = static_cast<Axis>(scene.getUpAxis());
