@@ -31,7 +31,7 @@ class KeyColumn {
     m_begin = m_size = m_capacity = 0;
   }
 
-  // Opens a gap of n elements at `at` and answers its start. The limit bounds the capacity.
+  // Opens a gap of n elements at `at` and returns its start. The limit bounds the capacity.
   T* open(int at, int n, int limit) {
     if (at == 0 && m_begin >= n) {
       m_begin -= n;
@@ -55,7 +55,12 @@ class KeyColumn {
       move(data() + from, data() + to, m_size - to);
     }
     m_size -= to - from;
-    if (m_size < m_capacity / 4) reallocate(m_size);
+    if (m_size < m_capacity / 4) shrink();
+  }
+
+  // Gives back the room for more elements.
+  void shrink() {
+    if (m_size < m_capacity) reallocate(m_size);
   }
 
  private:
@@ -74,6 +79,7 @@ class KeyColumn {
   }
 
   void reallocate(int capacity) {
+    if (capacity == 0) return clear();
     auto fresh = std::make_unique_for_overwrite<T[]>(static_cast<size_t>(capacity));
     move(fresh.get(), data(), m_size);
     m_data = std::move(fresh);

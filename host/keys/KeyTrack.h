@@ -7,9 +7,9 @@
 //  key all or none.
 //  4. The counts in inner nodes (keys; keys, selected keys and bridges by component) are those of their
 //  leaves.
-//  5. No leaf is empty; what a leaf stores in a compact form has it: even times (a start and a period), no
-//  flags (every key whole, nothing bridged), no selection, equal values stored once, values stored as floats
-//  without loss.
+//  5. No leaf is empty; what a leaf stores in a compact form has it: even times (a start and a period) or
+//  offsets (KeyTimes.h), no flags (every key whole, nothing bridged), no selection, equal values stored once,
+//  values stored as floats without loss.
 //
 // Bridges tell where there is data between keys (DataRanges.h): a key that bridges a component goes on to the
 // next key that has it. Values between keys do not depend on them.

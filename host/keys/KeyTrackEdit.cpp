@@ -12,6 +12,7 @@ struct KeyTrack::LeafEdit {
 
   Kind kind;
   unsigned mask;
+  bool many = false;  // more than one key is visited
   int64 affected = 0;
   void (*change)(void*, double*) = nullptr;  // Transform
   void* context = nullptr;
@@ -228,6 +229,7 @@ int64 KeyTrack::edit(int64 firstIndex, int64 lastIndex, LeafEdit& what) {
   lastIndex = std::min(lastIndex, count());
   if (firstIndex >= lastIndex || what.skips(*m_root.get())) return 0;
   changed();
+  what.many = lastIndex - firstIndex > 1;
   editBelow(m_root, firstIndex, lastIndex, what);
   while (m_root && !m_root->isLeaf() && asInner(*m_root.get()).size() == 1) {
     KeyNodeRef only = asInner(*m_root.get()).childRef(0);
@@ -248,7 +250,11 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
   if (node->isLeaf()) {
     auto& leaf = asLeaf(*node.get());
     what.apply(leaf, static_cast<int>(first), static_cast<int>(last));
-    if (leaf.size() == 0) node.reset();
+    if (leaf.size() == 0) {
+      node.reset();
+    } else if (what.erases() && what.many) {
+      leaf.pack();
+    }
     return;
   }
 
@@ -265,7 +271,7 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
     inner.childChanged(i, counts);
     before += keys;
   }
-  if (what.erases()) inner.mend(firstChild, i - 1);
+  if (what.erases()) inner.mend(firstChild, i - 1, what.many);
   if (inner.size() == 0) node.reset();
 }
 
