@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cstring>
 #include <memory>
+#include <new>
 #include <type_traits>
 
 #include "host/base/Types.h"
@@ -58,9 +59,11 @@ class KeyColumn {
     if (m_size < m_capacity / 4) shrink();
   }
 
-  // Gives back the room for more elements.
+  // Gives back the room for more elements, if there is memory to do it with.
   void shrink() {
-    if (m_size < m_capacity) reallocate(m_size);
+    if (m_size == m_capacity) return;
+    if (m_size == 0) return clear();
+    if (T* fresh = new (std::nothrow) T[static_cast<size_t>(m_size)]) adopt(fresh, m_size);
   }
 
  private:
@@ -78,11 +81,11 @@ class KeyColumn {
     reallocate(std::max(needed, std::min(m_size + m_size / 2, limit)));
   }
 
-  void reallocate(int capacity) {
-    if (capacity == 0) return clear();
-    auto fresh = std::make_unique_for_overwrite<T[]>(static_cast<size_t>(capacity));
-    move(fresh.get(), data(), m_size);
-    m_data = std::move(fresh);
+  void reallocate(int capacity) { adopt(new T[static_cast<size_t>(capacity)], capacity); }
+
+  void adopt(T* fresh, int capacity) {
+    move(fresh, data(), m_size);
+    m_data.reset(fresh);
     m_begin = 0;
     m_capacity = capacity;
   }

@@ -78,13 +78,14 @@ void KeyLeaf::write(int slot, const double* values, unsigned mask) {
   setFlags(slot, {components(slot) | mask, bridges(slot), selected(slot)});
 }
 
+// Times come first: they may need memory for another form, of which there may be none.
 void KeyLeaf::erase(int first, int last) {
+  m_times.erase(first, last);
   if (m_form == Form::Double) m_doubles.erase(first * m_width, last * m_width);
   if (m_form == Form::Float) m_floats.erase(first * m_width, last * m_width);
   for (int slot = first; slot < last; ++slot) counts.count(flags(slot), -1);
   if (!plain()) m_flags.erase(first, last);
   if (!m_selection.empty()) m_selection.erase(first, last);
-  m_times.erase(first, last);
   dropIdleFlags();
 }
 

@@ -153,6 +153,7 @@ void KeyTimes::add(int slot, int64 start, int64 period, int n, int limit) {
 }
 
 void KeyTimes::append(KeyTimes const& from, int first, int last) {
+  if (first == last) return;
   const int limit = m_size + last - first;
   if (from.even()) return append(from[first], from.m_unit, last - first, limit);
   for (int slot = first; slot < last; ++slot) append(from[slot], 0, 1, limit);
