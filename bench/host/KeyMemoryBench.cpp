@@ -49,7 +49,7 @@ void thinHour(benchmark::State& state, LostOf lostOf) {
       keysBefore += static_cast<double>(track.count());
       const std::vector<unsigned char> lost = lostOf(track);
       state.ResumeTiming();
-      eraseComponents(track, lost);
+      track.thin(lost);
       bytesAfter += static_cast<double>(track.memoryUse());
       keysAfter += static_cast<double>(track.count());
     }
