@@ -109,7 +109,7 @@ int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
 }
 
 KeyTrack::BridgeEnds Controller::bridgeEnds() const {
-  return {m_interpolation, HTimeManager::getInstance()->getTicksPerFrame()};
+  return {m_interpolation, getDatabase()->getTimeManager()->getTicksPerFrame()};
 }
 
 int Controller::deleteKey(int64 time, unsigned mask) {
