@@ -31,6 +31,12 @@ class SampleTimes {
     return steps < static_cast<uint64>(m_count - from) ? from + static_cast<int64>(steps) : m_count;
   }
 
+  // `count` of them from index `from` on.
+  SampleTimes part(int64 from, int64 count) const {
+    return m_list ? SampleTimes({m_list + from, static_cast<size_t>(count)})
+                  : SampleTimes(m_start + m_period * from, m_period, count);
+  }
+
   void read(int64 from, int n, int64* out) const {
     if (m_list) {
       std::copy_n(m_list + from, n, out);

@@ -27,6 +27,7 @@
 class Database;
 class Module;
 class NLEClip;
+class SampleTimes;
 struct ReductionTolerances;
 
 class Controller : public DataSource {
@@ -119,6 +120,14 @@ class Controller : public DataSource {
   // clip and layer; null when it has none there.
   KeyTrack const* findTrack(NLEClip const* clip, int layer) const;
   KeyTrack const* findActiveTrack() const;
+  // Calls visit(clip, layer, track) for all tracks, empty ones too.
+  template <class Visit>
+  void forEachTrack(Visit visit) const {
+    for (ClipTrack const& each : m_tracks) visit(each.clip, each.layer, each.track);
+  }
+  // The values at ascending times in a clip that holds keys (null: the default value), as KeyTrack holds
+  // them, one after the other. Several threads may do so at once.
+  void sample(NLEClip const* clip, SampleTimes const& times, double* out) const;
   // Replaces the keys in a clip and layer: how importers, copies and undo put whole tracks in place.
   void setTrack(NLEClip* clip, int layer, KeyTrack track);
   bool hasKeysInClip(NLEClip const* clip) const;
@@ -129,12 +138,13 @@ class Controller : public DataSource {
   // Locked layers stay as they are, with a warning. False when the kinds differ or no layer is editable.
   virtual bool copyFrom(Controller const* source, bool keys, bool selectionToo);
 
+  // What adds nothing in a layer above the lowest.
+  virtual Values neutral() const { return {}; }
+
   // The shape that keys of a kind of channel have.
   static KeyTrack::Shape shapeOf(PropertyType type);
 
  protected:
-  // Adds nothing in a layer above the lowest.
-  virtual Values neutral() const { return {}; }
   Controller(Interpolation interpolation, int numInterpTypes)
       : m_interpolation(interpolation), m_numInterpTypes(static_cast<unsigned char>(numInterpTypes)) {}
   // Layers above the lowest: adds `layer` to `values`.

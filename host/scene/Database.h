@@ -17,6 +17,7 @@ class CalibrationMgr;
 class ClipboardManager;
 class HTimeManager;
 class PropertyTable;
+class MotionScope;
 class SceneIndex;
 class SubjectManager;
 struct SceneServices;
@@ -150,6 +151,10 @@ class Database {
   HTimeManager* getTimeManager() const { return m_time.get(); }
   PropertyTable& getPropertyTable() const { return *m_properties; }
   SceneServices& getServices() const { return *m_services; }
+  // For keeping the motion of several nodes at once; null: none.
+  MotionScope* getMotionScope() const { return m_motionScope; }
+  void setMotionScope(MotionScope* scope) { m_motionScope = scope; }
+
   CalibrationMgr* getCalibrationMgr() const { return m_calibration.get(); }
   ClipboardManager* getClipboardManager() const { return m_clipboard.get(); }
   SubjectManager* getSubjectManager() const { return m_subjects.get(); }
@@ -222,6 +227,7 @@ class Database {
   SceneServices* m_services;
   std::unique_ptr<HTimeManager> m_time;
   std::unique_ptr<PropertyTable> m_properties;
+  MotionScope* m_motionScope = nullptr;
   std::unique_ptr<CalibrationMgr> m_calibration;
   std::unique_ptr<ClipboardManager> m_clipboard;
   std::unique_ptr<SubjectManager> m_subjects;

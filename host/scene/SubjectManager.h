@@ -14,8 +14,8 @@ class SubjectManager {
   Character* getSelectedSubject(uint64 i) const;
 
   // Takes a character out of the scene with all below it but the markers, which become unlabeled roots and
-  // move in the world as before (RootMotion.h). removeLabels: they are named as markers without a label are,
-  // "unlabeled", "unlabeled_1" and so on; else they keep their names, with the character's in front as a
+  // move in the world as before (MotionKeeper.h). removeLabels: they are named as markers without a label
+  // are, "unlabeled", "unlabeled_1" and so on; else they keep their names, with the character's in front as a
   // namespace, even where such a name is taken. undoable, notify: as for removeFromScene. False when the
   // character is not in the scene.
   bool removeSubject(Character* subject, bool removeLabels, bool undoable, bool notify);
