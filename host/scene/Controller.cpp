@@ -6,7 +6,6 @@
 #include <cmath>
 
 #include "host/scene/Clips.h"
-#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/Editability.h"
 #include "host/scene/HTimeManager.h"
@@ -77,7 +76,7 @@ void Controller::setDefaultValues(Values const& values) {
 
 void Controller::writeKeyAt(int64 time, Values const& values, unsigned mask) {
   if (!areFinite(values, mask)) return;
-  const DataEdit edit(*this, HTimeRange(time, time));
+  const OwnEdit edit(*this, HTimeRange(time, time));
   KeyTrack* track = editTrack(time, time);
   if (!track) return;
   // A new key of a one-valued or rotation channel is whole whatever the mask.
@@ -96,14 +95,14 @@ void Controller::readKey(int key, Values& values) const {
 
 int Controller::selectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  const DataEdit edit(*this, range);
+  const OwnEdit edit(*this, range);
   return static_cast<int>(
       editTrack(range.getStart(), range.getEnd())->select(range.getStart(), range.getEnd(), mask));
 }
 
 int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  const DataEdit edit(*this, range);
+  const OwnEdit edit(*this, range);
   return static_cast<int>(
       editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
 }
@@ -117,7 +116,7 @@ int Controller::deleteKey(int64 time, unsigned mask) {
 }
 
 int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers) {
-  const DataEdit edit(*this, range);
+  const OwnEdit edit(*this, range);
   int64 deleted = 0;
   Database const& scene = *getDatabase();
   NLEClip* clip = scene.getActiveClip();
@@ -136,7 +135,7 @@ int Controller::deleteSelectedKeys(unsigned mask) {
   if (!track || track->countSelected() == 0) return 0;
   const int64 first = track->timeAt(track->selectedIndex(0));
   const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
-  const DataEdit edit(*this, HTimeRange(first, last));
+  const OwnEdit edit(*this, HTimeRange(first, last));
   const CutRuns cut(*this, first, last);
   NLEClip* clip = getDatabase()->getActiveClip();
   const int layer = getDatabase()->getActiveLayer();
@@ -358,7 +357,7 @@ void Controller::setInterpType(int i) {
 // --- clips and layers ---
 
 void Controller::setTrack(NLEClip* clip, int layer, KeyTrack track) {
-  const DataEdit edit(*this);
+  const OwnEdit edit(*this);
   assert(track.shape() == shapeOf(getPropertyType()));
   replaceTrack(clip, layer) = std::move(track);
   changed();
@@ -383,12 +382,12 @@ void Controller::forgetClip(NLEClip const* clip) {
   std::copy_if(m_tracks.begin(), m_tracks.end(), std::back_inserter(others),
                [&](ClipTrack const& track) { return track.clip != clip; });
   if (others.size() == m_tracks.size()) return;
-  const DataEdit edit(*this);
+  const OwnEdit edit(*this);
   storeTracks(std::move(others));
 }
 
 void Controller::restore(State const& state) {
-  const DataEdit edit(*this);
+  const OwnEdit edit(*this);
   storeTracks(state.tracks);
   setDefaultValues(state.byDefault);
   setInterpType(static_cast<int>(state.interpolation));

@@ -189,6 +189,22 @@ class Controller : public DataSource {
   ClipTrack& clipTrack(NLEClip* clip, int layer);
   // The change of a track in this undo step; null when none is to be recorded.
   KeyChange* changeOf(ClipTrack& track);
+  // An edit, unless one is open.
+  class OwnEdit {
+   public:
+    explicit OwnEdit(Controller& channel, HTimeRange const& range = HTimeRange::forever())
+        : m_channel(channel.m_editDepth == 0 ? &channel : nullptr) {
+      if (m_channel) m_channel->beginDataEdit(range);
+    }
+    ~OwnEdit() {
+      if (m_channel) m_channel->endDataEdit();
+    }
+    OwnEdit(OwnEdit const&) = delete;
+    OwnEdit& operator=(OwnEdit const&) = delete;
+
+   private:
+    Controller* m_channel;
+  };
   void checkEdit() const { assert(m_editDepth > 0 && "keys change outside of an edit"); }
   void recordSettings();
   int64 memoryAlone() const;

@@ -139,7 +139,7 @@ class Database {
 
   UndoJournal& getUndoJournal() { return m_journal; }
   // For steps that are discarded: what of the scene they do not tell of.
-  std::unique_ptr<SceneAside> putAside() const;
+  void putAside(SceneAside& aside) const;
   void putBack(SceneAside& aside) noexcept;
   // Puts lists in order again after undo and redo, and forgets what was cached.
   void restoreOrder();
