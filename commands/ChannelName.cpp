@@ -15,8 +15,9 @@ int componentOf(char letter) {
 ChannelName channelNameFrom(HString text, Suffix suffix) {
   Controller::fixChannelStr(text);
   const int dot = text.ReverseFind('.'), last = text.GetLength() - 1;
-  if (dot < 0 || dot == last) return {text, -1};
-  const int component = componentOf(text[dot + 1]);
-  if (suffix == Suffix::componentCut && (component < 0 || dot + 1 != last)) return {text, -1};
+  if (dot < 0 || (dot == last && suffix != Suffix::allCut)) return {text, -1};
+  const bool isLetter = dot + 1 == last;
+  const int component = isLetter || suffix == Suffix::anyCut ? componentOf(text[dot + 1]) : -1;
+  if (suffix == Suffix::componentCut && component < 0) return {text, -1};
   return {text.Left(static_cast<uint64>(dot)), component};
 }

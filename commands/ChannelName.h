@@ -15,6 +15,7 @@ struct ChannelName {
 enum class Suffix {
   anyCut,        // whatever follows the last dot is cut, unless the dot ends the text
   componentCut,  // only .x .y .z (either case) are cut
+  allCut,        // whatever follows the last dot is cut; only .x .y .z are components
 };
 
 // The text goes through Controller::fixChannelStr first.

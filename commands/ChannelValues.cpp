@@ -34,11 +34,22 @@ bool readValue(Args const& args, DataSource::PropertyType kind, int component, C
   if (kind == DataSource::RotProperty) return readAngles(args, component, value.vector);
   if (!isOneNumber(args)) return false;
   value.number = args[1].getFloatValue(-1);
-  value.integer = args[1].getIntValue(-1);
+  value.integer = integerFrom(args[1]);
   value.state = args[1].getBoolValue(-1);
   return kind != DataSource::BoolProperty ||
          (value.integer >= Variable::False && value.integer <= Variable::Toggle);
 }
+
+int64 integerFrom(Variable const& number) {
+  constexpr double kFar = 1e18;  // sums with integers stay within 64 bits
+  return static_cast<int64>(std::clamp(number.getFloatValue(-1), -kFar, kFar));
+}
+
+bool canBeHeld(double value) { return std::isfinite(value); }
+
+bool canBeHeld(int64 value) { return value >= INT_MIN && value <= INT_MAX; }
+
+bool canBeHeld(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
 
 int nearestInt(double value) {
   return static_cast<int>(std::clamp<double>(std::round(value), INT_MIN, INT_MAX));
@@ -46,10 +57,7 @@ int nearestInt(double value) {
 
 double changed(double current, double given, bool relative) { return relative ? current + given : given; }
 
-int changed(int current, int given, bool relative) {
-  if (!relative) return given;
-  return static_cast<int>(std::clamp<int64>(int64{current} + given, INT_MIN, INT_MAX));
-}
+int64 changed(int current, int64 given, bool relative) { return relative ? current + given : given; }
 
 Vec3 changed(Vec3 const& current, Vec3 const& given, Change const& change) {
   if (change.component < 0) return change.relative ? current + given : given;

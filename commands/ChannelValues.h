@@ -24,9 +24,11 @@ inline bool isOneNumber(Args const& args) { return args.getCount() == 2 && args[
 struct ChannelValue {
   Vec3 vector;  // angles in radians
   double number = 0;
-  int integer = 0;
+  int64 integer = 0;  // beyond the integers it fits no channel
   Variable::BoolType state = Variable::False;
 };
+// A number truncated toward zero; within 64 bits.
+int64 integerFrom(Variable const& number);
 // False for another shape than a channel of that kind takes.
 [[nodiscard]] bool readValue(Args const& args, DataSource::PropertyType kind, int component,
                              ChannelValue& value);
@@ -63,8 +65,9 @@ inline Controller::Values layerValue(Controller const& channel, int64 time) {
 // The nearest integer, as integer channels show values between their keys.
 int nearestInt(double value);
 
+// The results may be ones that cannot be held.
 double changed(double current, double given, bool relative);
-int changed(int current, int given, bool relative);  // a sum beyond the integers is the nearest one
+int64 changed(int current, int64 given, bool relative);
 Vec3 changed(Vec3 const& current, Vec3 const& given, Change const& change);
 // Angles by axis in radians, counted in an order.
 TalixRotation changed(TalixRotation const& current, Vec3 const& angles, Change const& change,
@@ -72,3 +75,9 @@ TalixRotation changed(TalixRotation const& current, Vec3 const& angles, Change c
 inline bool changed(bool current, Variable::BoolType given) {
   return given == Variable::Toggle ? !current : given == Variable::True;
 }
+
+// Whether a channel or an attribute can hold a result: numbers are finite, integers have 32 bits.
+bool canBeHeld(double value);
+bool canBeHeld(int64 value);
+bool canBeHeld(Vec3 const& value);
+inline bool canBeHeld(TalixRotation const&) { return true; }

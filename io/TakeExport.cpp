@@ -1,3 +1,4 @@
+#include "host/scene/Devices.h"
 #include "host/scene/HTimeManager.h"
 #include "io/TakeScene.h"
 #include "io/scene/FileMetadata.h"
@@ -7,17 +8,48 @@ namespace talix {
 
 namespace {
 
-// The whole frames of the animation range.
-FrameGrid animationFrames(const Database& scene) {
-  const HTimeManager* time = scene.getTimeManager();
-  const HTimeRange range = time->getAnimRange();
+// The whole frames in a range.
+FrameGrid framesIn(const HTimeRange& range, int64 period) {
   FrameGrid grid;
-  grid.period = time->getTicksPerFrame();
-  const auto floorFrame = [&](int64 ticks) {
-    return ticks >= 0 ? ticks / grid.period : -((-ticks + grid.period - 1) / grid.period);
-  };
-  grid.firstFrame = floorFrame(range.getStart() + grid.period - 1);
-  grid.count = range.isEmpty() ? 0 : std::max<int64>(0, floorFrame(range.getEnd()) - grid.firstFrame + 1);
+  grid.period = period;
+  grid.firstFrame = frameAtOrAfter(range.getStart(), period);
+  if (!range.isEmpty())
+    grid.count = std::max<int64>(0, frameAtOrBefore(range.getEnd(), period) - grid.firstFrame + 1);
+  return grid;
+}
+
+// Of what a take can hold.
+HTimeRange keyRangeIn(const Database& scene, const NLEClip& clip) {
+  HTimeRange range;
+  for (int i = 0; i < scene.getNumModules(); ++i) {
+    const Module* module = scene.getModule(i);
+    if (!module->isKindOf(&Node::staticClass()) && !module->isKindOf(&AnalogDevice::staticClass())) continue;
+    for (int k = 0; k < module->getNumChannels(); ++k)
+      range.include(module->getChannel(k)->getKeyRangeInClip(&clip));
+  }
+  return range;
+}
+
+// Those of the active clip's file, and of keys beyond, as far as an animation range that the user chose goes;
+// without a file the animation range.
+FrameGrid framesToSave(const Database& scene, std::vector<TakeNote>& notes) {
+  const HTimeManager* time = scene.getTimeManager();
+  const auto* clip = objectAs<Clip>(scene.getActiveClip());
+  if (!clip || !(clip->getFileTime().rate > 0))
+    return framesIn(time->getAnimRange(), time->getTicksPerFrame());
+
+  const Clip::FileTime& file = clip->getFileTime();
+  const int64 period = clip->getFramePeriod();
+  HTimeRange range = keyRangeIn(scene, *clip);
+  if (file.frameCount > 0)
+    range.include(HTimeRange(file.firstFrame * period, (file.firstFrame + file.frameCount - 1) * period));
+  const int64 all = framesIn(range, period).count;
+  if (time->isAnimRangeChosen()) range.intersect(time->getAnimRange());
+  const FrameGrid grid = framesIn(range, period);
+  if (grid.count < all)
+    notes.push_back({TakeNote::Level::Warning, "the animation range leaves out " +
+                                                   std::to_string(all - grid.count) + " of the clip's " +
+                                                   std::to_string(all) + " frames"});
   return grid;
 }
 
@@ -37,20 +69,22 @@ void recallFile(Take& take, const NLEClip& clip) {
 }  // namespace
 
 Take exportTake(Database& scene, std::vector<TakeNote>& notes) {
-  const FrameGrid grid = animationFrames(scene);
+  const FrameGrid grid = framesToSave(scene, notes);
   Take take;
-  take.rate = scene.getTimeManager()->getFrameRate().getFrameRate();
+  const auto* clip = objectAs<Clip>(scene.getActiveClip());
+  take.rate = clip && clip->getFileTime().rate > 0 ? clip->getFileTime().rate
+                                                   : scene.getTimeManager()->getFrameRate().getFrameRate();
   take.firstFrame = grid.firstFrame;
   take.frameCount = grid.count;
   if (scene.getUpAxis() >= 0) take.up = static_cast<Axis>(scene.getUpAxis());
-  if (const NLEClip* clip = scene.getActiveClip()) recallFile(take, *clip);
+  if (const NLEClip* active = scene.getActiveClip()) recallFile(take, *active);
 
   TakeExport out{scene, FrameSampler(scene, grid), take, notes};
   exportPoints(out);
   exportDevices(out);
   exportJoints(out);
   if (out.keysLeftOut)
-    out.warn("takes hold the whole frames of the animation range only; " + std::to_string(out.keysLeftOut) +
+    out.warn("takes hold values at whole frames of their range only; " + std::to_string(out.keysLeftOut) +
              (out.keysLeftOut == 1 ? " key" : " keys") + " between or outside them " +
              (out.keysLeftOut == 1 ? "was" : "were") + " left out");
   return take;

@@ -1,5 +1,6 @@
 #include <filesystem>
 
+#include "host/keys/DataRanges.h"
 #include "host/scene/HTimeManager.h"
 #include "io/FileError.h"
 #include "io/TakeScene.h"
@@ -54,9 +55,34 @@ HFrameRate frameRate(double rate) {
   return result;
 }
 
+// Whether the scene can have the take's rate.
+bool takesRate(const Take& take) { return take.rate <= HFrameRate::kMaximum; }
+
+bool hasSceneRate(const Take& take, const Database& scene) {
+  return scene.getTimeManager()->getTicksPerFrame() == ticksPerFrameAt(take.rate);
+}
+
+// Between consecutive samples there is data, at the scene's frames as well.
+void bridgeSamples(Take& take) {
+  const auto bridge = [](KeyTrack& track, double rate) {
+    const KeyTrack samples = track;
+    DataRanges(samples, ticksPerFrameAt(rate)).bridge(track);
+  };
+  for (TakePoint& point : take.points) {
+    bridge(point.positions, take.rate);
+    bridge(point.residuals, take.rate);
+  }
+  for (ModelOutput& output : take.outputs) bridge(output.values, take.rate);
+  for (TakeAnalogChannel& analog : take.analog) bridge(analog.samples, take.analogRate);
+  for (TakeJoint& joint : take.joints) {
+    bridge(joint.translations, take.rate);
+    bridge(joint.rotations, take.rate);
+  }
+}
+
 void setSceneTime(TakeImport& import, const Take& take) {
   HTimeManager* time = import.clip().getDatabase()->getTimeManager();
-  if (take.rate > HFrameRate::kMaximum)
+  if (!takesRate(take))
     import.warn("the scene counts at most " + fileMetadata::numberText(HFrameRate::kMaximum) +
                 " frames a second and keeps its rate; keys lie at their times");
   else
@@ -64,13 +90,15 @@ void setSceneTime(TakeImport& import, const Take& take) {
   const int64 period = ticksPerFrameAt(take.rate);
   const int64 last = take.firstFrame + std::max<int64>(take.frameCount, 1) - 1;
   const HTimeRange range(take.firstFrame * period, last * period);
-  time->setAnimRange(range);
+  time->setAnimRange(range, false);
   time->setPlayRange(range, false);
 }
 
 void noteSceneTime(TakeImport& import, const Take& take) {
-  const HFrameRate& rate = import.clip().getDatabase()->getTimeManager()->getFrameRate();
-  if (rate.getTicksPerFrame() != ticksPerFrameAt(take.rate))
+  HTimeManager* time = import.clip().getDatabase()->getTimeManager();
+  time->setAnimRange(time->getAnimRange(), false);
+  const HFrameRate& rate = time->getFrameRate();
+  if (!hasSceneRate(take, *import.clip().getDatabase()))
     import.info("the take has " + fileMetadata::numberText(take.rate) + " frames a second, the scene " +
                 fileMetadata::numberText(rate.getFrameRate()) + "; keys keep their times");
 }
@@ -119,6 +147,7 @@ void importTake(Take take, const std::string& path, int up, Database& scene, std
 
   std::vector<TakeNote> said;
   TakeImport import(scene, *clip, UpAxisConversion(static_cast<int>(take.up), axis), fileName, said);
+  if (firstTake ? !takesRate(take) : !hasSceneRate(take, scene)) bridgeSamples(take);
   for (const TakeNote& note : take.notes)
     note.level == TakeNote::Level::Warning ? import.warn(note.text) : import.info(note.text);
   try {
@@ -131,6 +160,7 @@ void importTake(Take take, const std::string& path, int up, Database& scene, std
   noteAxes(import, take, formerAxis, axis, firstTake);
   scene.setUpAxis(axis);
   rememberFile(*clip, take);
+  clip->setFileTime({take.rate, take.firstFrame, take.frameCount, take.analogRate});
   importPoints(import, take);
   importJoints(import, take);
   import.noteRepeatedNames();

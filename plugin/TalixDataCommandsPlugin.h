@@ -27,7 +27,9 @@ class TalixDataCommandsPlugin : public CommandPluginBase {
   bool isReady() const override { return true; }
 
   int getNumCommands() const override { return m_scriptCommands.getCount(); }
-  Command* getCommand(int index) const override { return m_scriptCommands[index]; }
+  Command* getCommand(int index) const override {
+    return index >= 0 && index < m_scriptCommands.getCount() ? m_scriptCommands[index] : nullptr;
+  }
   int getNumControlStreamCommands() const override { return m_controlStreamCommands.getCount(); }
   ControlSystem::ICommandProvider* getControlStreamCommand(int index) const override {
     return m_controlStreamCommands[index];

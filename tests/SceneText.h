@@ -56,6 +56,9 @@ class SceneText {
     for (NLEClip* clip = m_scene.getHeadClip(); clip; clip = clip->getNext()) {
       m_out << " " << name(clip) << ":";
       for (int layer = 0; layer < clip->getNumLayers(); ++layer) m_out << clip->isLayerLocked(layer);
+      if (auto const* own = objectAs<Clip>(clip))
+        m_out << " " << own->getFileTime().rate << " " << own->getFileTime().firstFrame << " "
+              << own->getFileTime().frameCount << " " << own->getFileTime().sampleRate;
     }
     m_out << "\nnodes";
     for (int i = 0; i < m_scene.getNumNodes(); ++i) m_out << " " << name(m_scene.getNode(i));
@@ -127,7 +130,7 @@ class SceneText {
   void writeKeys(KeyTrack const& track, std::string const& where) {
     m_out << "  " << where << track.checkInvariants();
     track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
-      m_out << " " << key.time << ":" << int{key.components} << int{key.selected};
+      m_out << " " << key.time << ":" << int{key.components} << int{key.selected} << int{key.bridges};
       for (int i = 0; i < track.width(); ++i) m_out << "," << key.values[static_cast<size_t>(i)];
     });
     m_out << "\n";

@@ -174,9 +174,6 @@ void reduceTake(benchmark::State& state, Curve curve, Interpolation interpolatio
   for (auto _ : state) {
     state.PauseTiming();
     scene.fill(original);
-    for (int m = 0; m < kMarkers; ++m)
-      if (Controller* types = scene.channel(m)->getModule()->getChannel("FillType"))
-        types->deleteKeys(HTimeRange::forever(), KeyTrack::kAll, true);
     removed = 0;
     state.ResumeTiming();
     for (int m = 0; m < kMarkers; ++m)

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "bench/Shuffled.h"
+#include "host/keys/DataRanges.h"
 #include "host/keys/KeyTrack.h"
 
 namespace {
@@ -173,5 +174,28 @@ void evaluateAtRandom(benchmark::State& state) {
   state.SetItemsProcessed(state.iterations());
 }
 BENCHMARK(evaluateAtRandom)->Arg(20'000)->Arg(kMillion);
+
+enum class Seen { All, WithGaps, Thinned };
+
+// Going through the runs of frames with data.
+void findData(benchmark::State& state, Seen seen) {
+  const int64 n = state.range(0);
+  KeyTrack track = makeTrack(n);
+  for (int64 i = 900; seen == Seen::WithGaps && i < n; i += 1000)
+    track.eraseRange(i * kPeriod, (i + 9) * kPeriod);
+  std::vector<unsigned char> lost(static_cast<size_t>(n));
+  for (size_t i = 1; i + 1 < lost.size(); i += 2) lost[i] = KeyTrack::kAll;
+  if (seen == Seen::Thinned) track.thin(lost);
+  int64 runs = 0;
+  for (auto _ : state) {
+    runs = 0;
+    DataRanges(track, kPeriod).visitRanges(0, n * kPeriod, [&](int64, int64) { ++runs; });
+    benchmark::DoNotOptimize(runs);
+  }
+  state.counters["runs"] = static_cast<double>(runs);
+}
+BENCHMARK_CAPTURE(findData, all, Seen::All)->Arg(kMillion)->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(findData, withGaps, Seen::WithGaps)->Arg(kMillion)->Unit(benchmark::kMicrosecond);
+BENCHMARK_CAPTURE(findData, thinned, Seen::Thinned)->Arg(kMillion)->Unit(benchmark::kMicrosecond);
 
 }  // namespace

@@ -103,11 +103,7 @@ void oneLine(benchmark::State& state, char const* before, char const* line, int6
         g_db->createModule(&Marker::staticClass(), HString("m" + std::to_string(m)), nullptr)));
   for (auto _ : state) {
     state.PauseTiming();
-    for (Marker* marker : markers) {
-      marker->getTranslationChannel()->setTrack(fixture.clip, 0, track);
-      if (Controller* types = marker->getChannel("FillType"))
-        types->deleteKeys(HTimeRange::forever(), KeyTrack::kAll, true);
-    }
+    for (Marker* marker : markers) marker->getTranslationChannel()->setTrack(fixture.clip, 0, track);
     fixture.run("select -type Marker");
     if (*before && !fixture.run(before)) return state.SkipWithError(before);
     bool done = true;

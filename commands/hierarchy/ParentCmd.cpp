@@ -4,6 +4,7 @@
 #include "host/scene/Constraints.h"
 #include "host/scene/Database.h"
 #include "host/scene/Setups.h"
+#include "host/scene/motion/MotionScope.h"
 #include "host/services/OperationStack.h"
 
 namespace {
@@ -91,6 +92,7 @@ bool ParentCmd::execute(Given const& given, Args const&, Variable&) {
     logWarning("Can't use -showProgress flag without -adjust flag. Ignoring");
   }
 
+  const MotionScope motion(*g_db);
   for (int i = 0; i < count; ++i) {
     Module* module = g_db->getSelectedModule(i);
     if (module == parent) continue;

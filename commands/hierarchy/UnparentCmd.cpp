@@ -1,5 +1,6 @@
 #include "commands/hierarchy/Adjusting.h"
 #include "host/scene/Database.h"
+#include "host/scene/motion/MotionScope.h"
 #include "host/services/OperationStack.h"
 
 namespace {
@@ -41,6 +42,7 @@ bool UnparentCmd::execute(Given const& given, Args const&, Variable&) {
   // kept: whoever returns early leaves the task pushed.
   if (adjusting.showProgress) g_theOperationStack.pushTask(0, g_db->getNumSelectedNodes(), 0, 1, true, "");
 
+  const MotionScope motion(*g_db);
   for (int i = 0; i < count; ++i) {
     Module* module = g_db->getSelectedModule(i);
     Module* parent = module->getParent();

@@ -39,36 +39,59 @@ class KeyCopy {
         m_order(rotationOrderOf(*channel.getModule())),
         m_mask(componentsOfCopy()) {}
 
-  // Answers the number of keys.
+  // Returns the number of keys.
   int run() {
     KeyTrack const* track = m_channel.findActiveTrack();
     if (!track) return 0;
     if (m_choice != Choice::ranges) {
-      addKeys(*track, 0, track->count());
+      addKeys(*track, 0, track->count(), false);
       return m_count;
     }
     HTimeManager const* time = HTimeManager::getInstance();
-    for (int i = 0; i < time->getNumSelectedRanges(); ++i) {
+    for (int i = 0, ranges = time->getNumSelectedRanges(); i < ranges; ++i) {
       const HTimeRange range = time->getSelectedTimeRange(i);
-      addKeys(*track, track->lowerBound(range.getStart()), track->lowerBound(range.getEnd() + 1));
+      const int64 last = track->lowerBound(range.getEnd() + 1);
+      const bool goesOn = i + 1 < ranges && last < track->count() &&
+                          time->getSelectedTimeRange(i + 1).contains(track->timeAt(last));
+      addKeys(*track, track->lowerBound(range.getStart()), last, goesOn);
     }
     return m_count;
   }
 
  private:
-  void addKeys(KeyTrack const& track, int64 first, int64 last) {
+  // goesOn: the key after the last one is copied as well.
+  void addKeys(KeyTrack const& track, int64 first, int64 last, bool goesOn) {
+    int64 index = first;
     track.forEach(first, last, [&](KeyTrack::Key const& key) {
-      if (m_choice != Choice::selected || key.selected) add(key);
+      const bool nextToo = index + 1 < last || goesOn;
+      if (m_choice != Choice::selected) add(key, nextToo ? dataAfter(track, key) : 0);
+      if (m_choice == Choice::selected && key.selected) add(key, bridgesToSelected(track, index, key));
+      ++index;
     });
   }
 
-  void add(KeyTrack::Key const& key) {
+  // The components whose data goes on after a key, which may lack them.
+  static unsigned dataAfter(KeyTrack const& track, KeyTrack::Key const& key) {
+    return key.components == KeyTrack::kAll
+               ? key.bridges
+               : key.bridges | (track.bridgedAt(key.time) & ~static_cast<unsigned>(key.components));
+  }
+  static unsigned bridgesToSelected(KeyTrack const& track, int64 index, KeyTrack::Key const& key) {
+    unsigned kept = 0;
+    for (const unsigned component : {1u, 2u, 4u})
+      if (const int64 next = key.bridges & component ? track.nextHolding(index, component) : -1; next >= 0)
+        kept |= component & track.at(next).selected;
+    return kept;
+  }
+
+  void add(KeyTrack::Key const& key, unsigned bridges) {
     ClipboardManager::tagKey record;
     record.time = key.time;
     record.components = isOneValued(m_channel)         ? key.components
                         : m_choice == Choice::selected ? key.selected
                                                        : m_mask;
     record.flags = key.components;
+    record.bridges = bridges & record.components;
     Vec3 const value = valueOf(key, record.components);
     value.getValue(record.x, record.y, record.z);
     g_db->getClipboardManager()->addKey(record);

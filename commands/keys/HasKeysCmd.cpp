@@ -66,7 +66,7 @@ bool HasKeysCmd::execute(Given const& given, Args const& args, Variable& result)
   Module const* module = moduleAt(args[0].getStringValue(-1),
                                   "%s  is not a valid unique path to a Module in the scene.");  // kept
   if (!module) return false;
-  const ChannelName wanted = channelNameFrom(args[1].getStringValue(-1), Suffix::anyCut);
+  const ChannelName wanted = channelNameFrom(args[1].getStringValue(-1), Suffix::allCut);
   Controller const* channel = module->getProperty(wanted.name);
   if (!channel) {
     // kept: the module's name stands in the channel's place.

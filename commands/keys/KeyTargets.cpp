@@ -1,5 +1,6 @@
 #include "commands/keys/KeyTargets.h"
 
+#include <climits>
 #include <cstdlib>
 
 #include "commands/ChannelName.h"
@@ -42,11 +43,16 @@ ChannelComponents channelNamed(HString const& name, Given const& given, int onMo
 Variable framesOf(Controller const& channel, unsigned mask,
                   bool (*wanted)(KeyTrack::Key const&, unsigned mask)) {
   TSimpleArray<int> frames(0, 64);
+  int beyond = 0;
   HTimeManager const* time = HTimeManager::getInstance();
   if (KeyTrack const* track = channel.findActiveTrack())
     track->forEach(0, track->count(), [&](KeyTrack::Key const& key) {
-      if (wanted(key, mask)) frames.add(time->getFrame(key.time));
+      if (!wanted(key, mask)) return;
+      const int64 frame = key.time / time->getTicksPerFrame();
+      frame >= INT_MIN&& frame <= INT_MAX ? frames.add(static_cast<int>(frame)) : static_cast<void>(++beyond);
     });
+  if (beyond > 0)
+    Command::logWarning("%d keys are not listed: their frames are beyond the range of integers.", beyond);
   Variable list(Variable::IntArray, frames.getCount());
   for (int i = 0; i < frames.getCount(); ++i) list.setValue(frames[i], i);
   return list;

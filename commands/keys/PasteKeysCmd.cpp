@@ -46,6 +46,25 @@ void paste(ClipboardManager::tagKey const& record, Controller& channel, int64 ti
   if (mask) channel.writeKeyAt(time, {record.x, record.y, record.z}, mask);
 }
 
+// The data that goes on from record to record does so from key to key, keys that were there before included.
+void pasteBridges(ClipboardManager const& clipboard, Controller& channel, int64 shift) {
+  const bool split = channel.getPropertyType() == DataSource::Vec3Property;
+  for (const unsigned part : {1u, 2u, 4u}) {
+    if (!split && part != 1) break;
+    const unsigned mask = split ? part : KeyTrack::kAll;
+    int64 start = 0;
+    bool goesOn = false;
+    for (int i = 0; i < clipboard.getNumControllerKeys(); ++i) {
+      const ClipboardManager::tagKey record = clipboard.getControllerKey(i);
+      if (!(record.components & mask)) continue;
+      const bool bridges = (record.bridges & mask) != 0;
+      if (goesOn && !bridges) channel.bridgeKeys(HTimeRange(start, record.time + shift - 1), mask);
+      if (!goesOn && bridges) start = record.time + shift;
+      goesOn = bridges;
+    }
+  }
+}
+
 // All keys, the first of them at `time`. False, with a message, when they reach beyond the time line.
 bool pasteAll(ClipboardManager const& clipboard, Controller& channel, int64 time) {
   const HTimeRange source = clipboard.getControllerDataRange();
@@ -59,6 +78,7 @@ bool pasteAll(ClipboardManager const& clipboard, Controller& channel, int64 time
     const ClipboardManager::tagKey record = clipboard.getControllerKey(i);
     paste(record, channel, time + (record.time - source.getStart()));
   }
+  pasteBridges(clipboard, channel, time - source.getStart());
   return true;
 }
 

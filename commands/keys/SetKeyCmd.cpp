@@ -38,51 +38,69 @@ struct NewKey {
   ChannelValue value;
   TalixRotation::RotOrder givenOrder = TalixRotation::XYZ;  // of three angles
 
-  void writeOn(Controller& channel) const;
+  // False, with a message, when the channel cannot hold the value.
+  [[nodiscard]] bool writeOn(Controller& channel) const;
 
  private:
-  void write(Vec3Controller& channel) const;
-  void write(RotController& channel) const;
-  void write(FloatController& channel) const;
-  void write(IntController& channel) const;
-  void write(BoolController& channel) const;
+  bool write(Vec3Controller& channel) const;
+  bool write(RotController& channel) const;
+  bool write(FloatController& channel) const;
+  bool write(IntController& channel) const;
+  bool write(BoolController& channel) const;
 };
 
-void NewKey::write(Vec3Controller& channel) const {
+bool NewKey::write(Vec3Controller& channel) const {
   Vec3 wanted = value.vector;
   if (change.relative) wanted = changed(Vec3(layerValue(channel, time).data()), wanted, change);
+  if (!canBeHeld(wanted)) return false;
   if (change.component >= 0)
     channel.setComponentKey(time, wanted[change.component], 1u << change.component);
   else
     channel.setKey(time, wanted, 7);
+  return true;
 }
 
-void NewKey::write(RotController& channel) const {
+bool NewKey::write(RotController& channel) const {
   TalixRotation current;
   if (change.relative || change.component >= 0) current.setQuaternion(layerValue(channel, time).data());
   // Kept: without "-onMod" three angles count in XYZ, while a component counts in the module's own order.
   const TalixRotation::RotOrder order =
       change.component < 0 ? givenOrder : rotationOrderOf(*channel.getModule());
   channel.setKey(time, changed(current, value.vector, change, order), 7);
+  return true;
 }
 
-void NewKey::write(FloatController& channel) const {
-  const double current = change.relative ? layerValue(channel, time)[0] : 0;
-  channel.setKey(time, changed(current, value.number, change.relative), 1);
+bool NewKey::write(FloatController& channel) const {
+  const double wanted =
+      changed(change.relative ? layerValue(channel, time)[0] : 0, value.number, change.relative);
+  if (!canBeHeld(wanted)) return false;
+  channel.setKey(time, wanted, 1);
+  return true;
 }
 
-void NewKey::write(IntController& channel) const {
+bool NewKey::write(IntController& channel) const {
   const int current = change.relative ? nearestInt(layerValue(channel, time)[0]) : 0;
-  channel.setKey(time, changed(current, value.integer, change.relative), 1);
+  const int64 wanted = changed(current, value.integer, change.relative);
+  if (!canBeHeld(wanted)) return false;
+  channel.setKey(time, static_cast<int>(wanted), 1);
+  return true;
 }
 
-void NewKey::write(BoolController& channel) const {
+bool NewKey::write(BoolController& channel) const {
   channel.setKey(time, changed(layerValue(channel, time)[0] != 0, value.state), 1);
+  return true;
 }
 
-void NewKey::writeOn(Controller& channel) const {
-  const DataEdit edit(channel, HTimeRange(time - 1, time + 1));
-  withKind(channel, [&](auto& typed) { write(typed); });
+bool NewKey::writeOn(Controller& channel) const {
+  bool taken = true;
+  {
+    const DataEdit edit(channel, HTimeRange(time - 1, time + 1));
+    withKind(channel, [&](auto& typed) { taken = write(typed); });
+  }
+  if (!taken)
+    Command::logError("The value is too large for %s on %s.", channel.getName().GetStr(),
+                      channel.getModule()->getName().GetStr());
+  return taken;
 }
 
 // Reads the value for a channel of that kind; false, with a message, when it cannot be keyed.
@@ -121,8 +139,7 @@ bool writeOnMod(NewKey const& key, Module const& module, unsigned id, char const
                       typed, module.getName().GetStr());
     return false;
   }
-  key.writeOn(*channel);
-  return true;
+  return key.writeOn(*channel);
 }
 
 bool writeOnCandidates(NewKey const& key, Candidates const& candidates, unsigned id) {
@@ -130,8 +147,7 @@ bool writeOnCandidates(NewKey const& key, Candidates const& candidates, unsigned
     return false;
   return candidates.each([&](Module& module) {
     Controller* channel = module.getProperty(id);
-    if (channel && channel->isEditable()) key.writeOn(*channel);
-    return true;
+    return !channel || !channel->isEditable() || key.writeOn(*channel);
   });
 }
 

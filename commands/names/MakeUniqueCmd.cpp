@@ -5,10 +5,12 @@
 #include <unordered_map>
 #include <unordered_set>
 #include <utility>
+#include <vector>
 
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
 #include "host/scene/ModulePath.h"
+#include "host/services/OperationStack.h"
 
 namespace {
 
@@ -29,6 +31,38 @@ NumberedName split(std::string_view name) {
   std::from_chars(name.data() + last + 1, name.data() + name.size(), number);
   return {name.substr(0, last - 1), number};
 }
+
+// Numbers full paths: equal numbers, equal paths. The names from the root to a deep module would be written
+// out anew for every module of a chain; so each path is the number of the path above it and a name.
+class PathNumbers {
+ public:
+  size_t of(Module const& module) {
+    std::vector<Module const*> unknown;
+    Module const* known = &module;
+    for (; known && !m_byModule.contains(known); known = known->getParent()) unknown.push_back(known);
+    size_t path = known ? m_byModule.at(known) : 0;
+    for (auto next = unknown.rbegin(); next != unknown.rend(); ++next) {
+      const auto [entry, isNew] =
+          m_byName.try_emplace({path, (*next)->getName().GetString()}, m_byName.size() + 1);
+      m_byModule[*next] = path = entry->second;
+    }
+    return path;
+  }
+  // A module has another name: the paths at and below it are others.
+  void forget(Module const& renamed) {
+    std::vector<Module const*> open{&renamed};
+    while (!open.empty()) {
+      Module const* module = open.back();
+      open.pop_back();
+      if (m_byModule.erase(module) == 0) continue;  // then none below it is known
+      for (int i = 0; i < module->getNumChildren(); ++i) open.push_back(module->getChild(i));
+    }
+  }
+
+ private:
+  std::unordered_map<Module const*, size_t> m_byModule;
+  std::map<std::pair<size_t, std::string>, size_t> m_byName;
+};
 
 // Remembers which of the paths TEXT_1, TEXT_2, ... were found taken, so that many modules that clash do not
 // all try them again.
@@ -81,12 +115,16 @@ class MakeUniqueCmd final : public ScriptCommand<MakeUniqueCmd> {
                                        .purpose = "Renames modules so that no two have the same full path."};
 
   bool execute(Given const&, Args const&, Variable&) override {
-    std::unordered_set<std::string> seen;
+    std::unordered_set<size_t> seen;
+    PathNumbers paths;
     TakenPaths taken;
     const int count = g_db->getNumModules();
     for (int i = 0; i < count; ++i) {
+      if (g_theOperationStack.isCancelled()) return false;
       Module* module = g_db->getModule(i);
-      if (!seen.insert(module->getFullPathString().GetString()).second) rename(*module, taken);
+      if (seen.insert(paths.of(*module)).second) continue;
+      rename(*module, taken);
+      paths.forget(*module);
     }
     return true;
   }

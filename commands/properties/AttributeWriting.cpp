@@ -20,18 +20,30 @@ bool wrongShape(char const* command) {
 
 // --- one value ---
 
+// Why a value of the right shape is not taken.
+bool refuse(char const* reason) {
+  Command::logError("%s", reason);
+  return false;
+}
+
+template <class Attributes, class Value>
+bool put(Attributes& attribute, Value const& value, char const* limits) {
+  return attribute.setValue(value, true, true, true, true) || refuse(limits);
+}
+
+constexpr char const kTooLarge[] = "The value is too large.";
+
 // Integers and temperatures.
 template <class Integers>
 bool setInteger(Integers& attribute, Args const& args, bool relative) {
-  return isOneNumber(args) &&
-         attribute.setValue(changed(attribute.getValue(), args[1].getIntValue(-1), relative), true, true,
-                            true, true);
+  if (!isOneNumber(args)) return false;
+  const int64 value = changed(attribute.getValue(), integerFrom(args[1]), relative);
+  return canBeHeld(value) ? put(attribute, static_cast<int>(value), kTooLarge) : refuse(kTooLarge);
 }
 
 bool setFloat(FloatAttribute& attribute, Args const& args, bool relative) {
   return isOneNumber(args) &&
-         attribute.setValue(changed(attribute.getValue(), args[1].getFloatValue(-1), relative), true, true,
-                            true, true);
+         put(attribute, changed(attribute.getValue(), args[1].getFloatValue(-1), relative), kTooLarge);
 }
 
 bool setEnum(EnumAttribute& attribute, Args const& args) {
@@ -45,30 +57,31 @@ bool setString(StringAttribute& attribute, Args const& args) {
 }
 
 bool setLines(MultiStringAttribute& attribute, Args const& args) {
-  if (!isOne(args, Variable::String)) return false;
-  attribute.setValue(args[1].getStringValue(-1), true, true, true, true);
-  return true;
+  return isOne(args, Variable::String) &&
+         attribute.setValue(args[1].getStringValue(-1), true, true, true, true);
 }
 
 bool setBool(BoolAttribute& attribute, Args const& args) {
-  if (!isOne(args, Variable::Bool)) return false;
-  attribute.setValue(changed(attribute.getValue(), args[1].getBoolValue(-1)), true, true, true, true);
-  return true;
+  return isOne(args, Variable::Bool) &&
+         attribute.setValue(changed(attribute.getValue(), args[1].getBoolValue(-1)), true, true, true, true);
 }
 
 // A number of frames, or a text of frames or timecode.
 bool setTime(TimeAttribute& attribute, Args const& args, bool relative) {
   HTimeManager const& times = *HTimeManager::getInstance();
   double frames = 0;
-  if (isOneNumber(args))
+  if (isOneNumber(args)) {
     frames = args[1].getFloatValue(-1);
-  else if (isOne(args, Variable::String))
-    frames = times.stringToFrameDouble(args[1].getStringValue(-1), attribute.isRelative());
-  else
+  } else if (!isOne(args, Variable::String)) {
     return false;
+  } else if (!times.framesFromString(args[1].getStringValue(-1), attribute.isRelative(), frames)) {
+    Command::logError("\"%s\" is neither a number of frames nor timecode.", args[1].getStringValue(-1));
+    return false;
+  }
+  constexpr char const kBeyond[] = "The time lies beyond the time line.";
+  if (!times.isOnTimeLine(frames)) return refuse(kBeyond);
   const int64 ticks = times.getTimeFromFrameDouble(frames);
-  attribute.setValue(relative ? attribute.getTime() + ticks : ticks, true, true, true, true);
-  return true;
+  return put(attribute, relative ? attribute.getTime() + ticks : ticks, kBeyond);
 }
 
 // --- several values ---
@@ -79,8 +92,7 @@ bool setVector(VectorAttribute& attribute, Args const& args, Change const& chang
   // Kept: with a component the whole new value is added, so that the other components double.
   Vec3 value = changed(attribute.getValue(), given, {change.component, false});
   if (change.relative) value += attribute.getValue();
-  attribute.setValue(value, true, true, true, true);
-  return true;
+  return put(attribute, value, kTooLarge);
 }
 
 bool setRotation(RotationAttribute& attribute, Args const& args, Change const& change, char const* command) {
@@ -89,8 +101,7 @@ bool setRotation(RotationAttribute& attribute, Args const& args, Change const& c
   // Kept: as for vectors, with a component the whole new rotation is composed.
   const TalixRotation value = changed(attribute.getValue(), angles, {change.component, false},
                                       rotationOrderOf(*attribute.getModule()));
-  attribute.setValue(change.relative ? attribute.getValue() * value : value, true, true, true, true);
-  return true;
+  return attribute.setValue(change.relative ? attribute.getValue() * value : value, true, true, true, true);
 }
 
 bool readColor(Args const& args, Vec3& color) {
@@ -111,8 +122,8 @@ bool setColor(ColorAttribute& attribute, Args const& args, bool relative, char c
   }
   Vec3 color;
   if (!readColor(args, color)) return wrongShape(command);
-  attribute.setValue(relative ? attribute.getValue() + color : color, true, true, true, true);
-  return true;
+  return put(attribute, relative ? attribute.getValue() + color : color,
+             "Red, green and blue are numbers from 0 to 255.");
 }
 
 // Pairs of a label and its state. The pairs before one that does not fit stay written.
@@ -144,8 +155,7 @@ bool setMatrix(MatrixAttribute& attribute, Args const& args, char const* command
   const auto n = static_cast<int>(std::sqrt(count - 1));
   Matrix matrix(static_cast<uint64>(n));
   for (int i = 0; i < n * n; ++i) matrix[static_cast<uint64>(i / n)][i % n] = args[i + 1].getFloatValue(-1);
-  attribute.setValue(matrix, true, true, true, true);
-  return true;
+  return put(attribute, matrix, kTooLarge);
 }
 
 // --- references ---
@@ -156,8 +166,7 @@ bool setReference(ModAttribute& attribute, Args const& args) {
   Module* module = nullptr;  // an empty path stands for none
   if (!path.IsEmpty() && !(module = moduleAt(path, "%s does not specify a module in the scene.")))
     return false;
-  attribute.setValue(module, true, true, true, true);
-  return true;
+  return attribute.setValue(module, true, true, true, true);
 }
 
 // A path that names no module leaves its entry empty.
@@ -166,8 +175,7 @@ bool setReferences(MultiModAttribute& attribute, Args const& args) {
   TSimpleArray<Module*> modules;
   for (int i = 0; i < args[1].getNumItems(); ++i)
     modules.add(g_db->getModuleWithPath(args[1].getStringValue(i), nullptr, false));
-  attribute.setValue(modules, true, true, true, true);
-  return true;
+  return attribute.setValue(modules, true, true, true, true);
 }
 
 }  // namespace

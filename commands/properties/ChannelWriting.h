@@ -8,6 +8,7 @@ struct ChannelWrite {
   Change change;
   ChannelValue value;
 
-  // Without a selected key nothing changes. Whether the channel may be edited is the caller's business.
+  // Without a selected key nothing changes. Values that the channel cannot hold are not written, with a
+  // warning. Whether the channel may be edited is the caller's business.
   void applyTo(Controller& channel) const;
 };

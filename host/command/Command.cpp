@@ -2,6 +2,7 @@
 
 #include <cstdarg>
 
+#include "host/base/ItemAt.h"
 #include "host/base/Log.h"
 #include "host/base/Text.h"
 
@@ -39,6 +40,12 @@ int Command::getOptionSyntax(char const* name, int& argCount, Variable::VarType&
 }
 
 bool Command::isUndoable() const { return true; }
+
+CommandOption const& Command::getOption(int i) const {
+  static CommandOption const& nothing = *CommandOption::createInstance("", 0, Variable::None, false);
+  CommandOption const* option = itemAt(m_options, i);
+  return option ? *option : nothing;
+}
 
 bool Command::unref() {
   if (--m_references > 0) return false;

@@ -46,7 +46,7 @@ class Command : public HObject {
   HString const& getPurpose() const { return m_purpose; }
 
   int getNumOptions() const { return static_cast<int>(m_options.size()); }
-  CommandOption const& getOption(int i) const { return *m_options[static_cast<size_t>(i)]; }
+  CommandOption const& getOption(int i) const;  // one without a name beyond them
 
   void ref() { ++m_references; }
   // Lets go of one reference; with the last the command is destroyed, and the answer is true.

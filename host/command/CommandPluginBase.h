@@ -40,7 +40,7 @@ class CommandPluginBase : public HomCorePluginBase {
 
   // The host holds the commands' only reference and releases them after the plug-in object is gone.
   virtual int getNumCommands() const = 0;
-  virtual Command* getCommand(int index) const = 0;  // index within the count
+  virtual Command* getCommand(int index) const = 0;  // null beyond them
 
   virtual void loadScriptCommands();
   virtual int getNumScriptCommands() const;

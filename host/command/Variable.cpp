@@ -163,7 +163,7 @@ void Variable::setElement(int i, Set set) {
   std::visit(
       [&](auto& held) {
         if constexpr (isVector<std::decay_t<decltype(held)>>) {
-          if (i < static_cast<int>(held.size())) set(held[static_cast<size_t>(i)]);
+          if (i >= 0 && i < static_cast<int>(held.size())) set(held[static_cast<size_t>(i)]);
         }
       },
       m_value);

@@ -143,3 +143,14 @@ HTimeRange DataRanges::rangeAround(int64 frameTime) const {
     if (from == 0 || start > frameAtOrAfter(time, m_period) * m_period) return range;
   }
 }
+
+void DataRanges::bridge(KeyTrack& track, unsigned mask) const {
+  visitRanges(-kForever, kForever, [&](int64 start, int64 end) {
+    if (start < end) track.bridge(start, end - 1, mask);
+  });
+}
+
+void DataRanges::bridgeAlike(KeyTrack& track, KeyTrack const& data) {
+  for (const unsigned part : KeyParts(data.shape(), KeyTrack::kAll))
+    if (data.bridgesAny(part)) DataRanges(data, 1, part).bridge(track, part);
+}

@@ -53,6 +53,12 @@ class DataRanges {
     if (next <= end) visit(next, end);
   }
 
+  // Lets the keys of a track, mostly another one, bridge these components within each run of frames with
+  // data.
+  void bridge(KeyTrack& track, unsigned mask = KeyTrack::kAll) const;
+  // The same for all components and at all times where keys of `data` bridge.
+  static void bridgeAlike(KeyTrack& track, KeyTrack const& data);
+
  private:
   struct Scan;
   using Emit = bool (*)(void* context, int64 start, int64 end);  // false: no more

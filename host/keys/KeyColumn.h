@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <cstring>
 #include <memory>
+#include <new>
 #include <type_traits>
 
 #include "host/base/Types.h"
@@ -31,7 +32,7 @@ class KeyColumn {
     m_begin = m_size = m_capacity = 0;
   }
 
-  // Opens a gap of n elements at `at` and answers its start. The limit bounds the capacity.
+  // Opens a gap of n elements at `at` and returns its start. The limit bounds the capacity.
   T* open(int at, int n, int limit) {
     if (at == 0 && m_begin >= n) {
       m_begin -= n;
@@ -55,7 +56,20 @@ class KeyColumn {
       move(data() + from, data() + to, m_size - to);
     }
     m_size -= to - from;
-    if (m_size < m_capacity / 4) reallocate(m_size);
+    if (m_size < m_capacity / 4) shrink();
+  }
+
+  // Leaves n groups of `width` elements, by ascending position.
+  void keep(const int* groups, int n, int width) {
+    for (int i = 0; i < n; ++i) move(data() + i * width, data() + groups[i] * width, width);
+    m_size = n * width;
+  }
+
+  // Gives back the room for more elements, if there is memory to do it with.
+  void shrink() {
+    if (m_size == m_capacity) return;
+    if (m_size == 0) return clear();
+    if (T* fresh = new (std::nothrow) T[static_cast<size_t>(m_size)]) adopt(fresh, m_size);
   }
 
  private:
@@ -73,10 +87,11 @@ class KeyColumn {
     reallocate(std::max(needed, std::min(m_size + m_size / 2, limit)));
   }
 
-  void reallocate(int capacity) {
-    auto fresh = std::make_unique_for_overwrite<T[]>(static_cast<size_t>(capacity));
-    move(fresh.get(), data(), m_size);
-    m_data = std::move(fresh);
+  void reallocate(int capacity) { adopt(new T[static_cast<size_t>(capacity)], capacity); }
+
+  void adopt(T* fresh, int capacity) {
+    move(fresh, data(), m_size);
+    m_data.reset(fresh);
     m_begin = 0;
     m_capacity = capacity;
   }

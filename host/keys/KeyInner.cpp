@@ -80,7 +80,7 @@ void KeyInner::moveTail(int from, KeyInner& to) {
   m_size = std::min(m_size, from);
 }
 
-void KeyInner::mend(int first, int last) {
+void KeyInner::mend(int first, int last, bool tightly) {
   int kept = first;
   for (int k = first; k < m_size; ++k) {
     if (!m_children[at(k)]) continue;
@@ -95,19 +95,20 @@ void KeyInner::mend(int first, int last) {
   m_size = kept;
 
   for (int i = std::max(first - 1, 0); i + 1 < m_size && i <= last;) {
-    if (joins(i)) {
+    if (joins(i, tightly)) {
       join(i);
       --last;
-    } else {
-      ++i;
+      continue;
     }
+    ++i;
   }
 }
 
-// Small ones join a neighbour as long as the result keeps some room, so that the next insertion does not
-// split it.
-bool KeyInner::joins(int i) const {
-  const auto room = [](int64 a, int64 b, int64 limit) {
+// Edits of single keys keep some room, so that the next insertion does not split what the last deletion
+// joined. Edits of many keys, which are rarer and whose result mostly stays, fill nodes.
+bool KeyInner::joins(int i, bool tightly) const {
+  const auto room = [tightly](int64 a, int64 b, int64 limit) {
+    if (tightly) return a + b <= limit;
     return std::min(a, b) < std::max<int64>(limit / 4, 2) && a + b <= limit * 3 / 4;
   };
   if (level() == 1) return room(keys(i), keys(i + 1), asLeaf(child(i)).limit());
@@ -116,10 +117,11 @@ bool KeyInner::joins(int i) const {
 
 void KeyInner::join(int i) {
   KeyNodeRef& left = m_children[at(i)];
-  KeyNodeRef const right = std::move(m_children[at(i + 1)]);
+  KeyNodeRef const right = m_children[at(i + 1)];
   left.own();
   if (left->isLeaf()) {
     asLeaf(*left.get()).append(asLeaf(*right.get()), 0, asLeaf(*right.get()).size());
+    asLeaf(*left.get()).pack();
   } else {
     auto& to = asInner(*left.get());
     auto const& from = asInner(*right.get());

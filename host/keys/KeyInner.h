@@ -23,23 +23,24 @@ class KeyInner final : public KeyNode {
 
   // The child whose span the time falls into: the last one that starts at or before it, else the first.
   int childAtTime(int64 time) const;
-  // The child with the key of this index, which becomes its index in the child. An index behind the last key
+  // The child with the key of this index, which becomes its index in the child. An index after the last key
   // falls into the last child.
   int childAtIndex(int64& index) const;
   int64 keysBefore(int i) const;
 
   // To be called after child i has changed; `before` are the counts that it had.
   void childChanged(int i, KeyCounts const& before);
-  // Adds a child at position i. A full node splits: the answer is the new node to its right.
+  // Adds a child at position i. A full node splits: returns the new node to its right.
   KeyNodeRef insert(int i, KeyNodeRef child);
-  // Removes the empty references among the children first to last, then joins small neighbours around there.
-  void mend(int first, int last);
+  // Removes the empty references among the children first to last, then joins neighbours around there: small
+  // ones, or with `tightly` all that fit one node.
+  void mend(int first, int last, bool tightly);
 
  private:
   static size_t at(int i) { return static_cast<size_t>(i); }
   void place(int i, KeyNodeRef child);
   void moveTail(int from, KeyInner& to);
-  bool joins(int i) const;
+  bool joins(int i, bool tightly) const;
   void join(int i);
   void remove(int i);
 

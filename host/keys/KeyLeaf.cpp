@@ -23,13 +23,6 @@ bool fitFloats(const double* values, int n) {
   return true;
 }
 
-// How many of the ascending times lie before the time. Halves without branches, which could not be predicted.
-int countBefore(const int64* times, int n, int64 time) {
-  const int64* from = times;
-  for (; n > 1; n -= n / 2) from += from[n / 2 - 1] < time ? n / 2 : 0;
-  return static_cast<int>(from - times) + (n == 1 && *from < time);
-}
-
 // Values of every `step`-th key, of keys `width` wide, into a strided array.
 template <class T>
 void spread(const T* from, int width, int step, int n, int first, int end, double* out, ptrdiff_t stride) {
@@ -43,27 +36,6 @@ void spread(const T* from, int width, int step, int n, int first, int end, doubl
 
 }  // namespace
 
-int KeyLeaf::lowerBound(int64 time) const {
-  if (time > lastTime()) return m_size;
-  if (time <= firstTime()) return 0;
-  if (evenTimes()) return static_cast<int>((time - m_start - 1) / m_period + 1);
-  return countBefore(m_times.data(), m_size, time);
-}
-
-int KeyLeaf::lastAtOrBefore(int64 time) const {
-  if (time >= lastTime()) return m_size - 1;
-  if (evenTimes()) return static_cast<int>((time - m_start) / m_period);
-  return countBefore(m_times.data(), m_size, time + 1) - 1;
-}
-
-void KeyLeaf::readTimes(int slot, int n, int64* out) const {
-  if (evenTimes()) {
-    for (int i = 0; i < n; ++i) out[i] = m_start + m_period * (slot + i);
-  } else {
-    std::copy_n(m_times.data() + slot, n, out);
-  }
-}
-
 void KeyLeaf::readValues(int slot, int step, int n, int first, int end, double* out, ptrdiff_t stride) const {
   if (m_form == Form::Float) {
     spread(m_floats.data() + slot * m_width, m_width, step, n, first, end, out, stride);
@@ -75,26 +47,26 @@ void KeyLeaf::readValues(int slot, int step, int n, int first, int end, double* 
 }
 
 void KeyLeaf::insert(int slot, int64 time, const double* values, KeyFlags const& flags) {
-  insertTimes(slot, time, 0, 1);
   insertValues(slot, values, 1);
   insertFlags(slot, flags, 1);
-  ++m_size;
-  evenOutTimes();
+  m_times.insert(slot, time, m_limit);
 }
 
 void KeyLeaf::append(int64 start, int64 period, const double* values, int n) {
-  insertTimes(m_size, start, period, n);
-  insertValues(m_size, values, n);
-  insertFlags(m_size, {}, n);
-  m_size += n;
+  insertValues(size(), values, n);
+  insertFlags(size(), {}, n);
+  m_times.append(start, period, n, m_limit);
 }
 
 void KeyLeaf::append(KeyLeaf const& from, int first, int last) {
-  std::array<double, 4> one{};
-  for (int slot = first; slot < last; ++slot) {
-    from.values(slot, one.data());
-    insert(m_size, from.time(slot), one.data(), from.flags(slot));
-  }
+  const int n = last - first;
+  std::vector<double> values(static_cast<size_t>(n * m_width));
+  from.readValues(first, 1, n, 0, m_width, values.data(), m_width);
+  insertValues(size(), values.data(), n);
+  appendBits(m_flags, from.m_flags, kWhole, first, n);
+  appendBits(m_selection, from.m_selection, 0, first, n);
+  for (int slot = first; slot < last; ++slot) counts.count(from.flags(slot), 1);
+  m_times.append(from.m_times, first, last);
 }
 
 void KeyLeaf::write(int slot, const double* values, unsigned mask) {
@@ -106,106 +78,92 @@ void KeyLeaf::write(int slot, const double* values, unsigned mask) {
   setFlags(slot, {components(slot) | mask, bridges(slot), selected(slot)});
 }
 
+// Times come first: they may need memory for another form, of which there may be none.
 void KeyLeaf::erase(int first, int last) {
-  eraseTimes(first, last);
+  m_times.erase(first, last);
   if (m_form == Form::Double) m_doubles.erase(first * m_width, last * m_width);
   if (m_form == Form::Float) m_floats.erase(first * m_width, last * m_width);
   for (int slot = first; slot < last; ++slot) counts.count(flags(slot), -1);
   if (!plain()) m_flags.erase(first, last);
   if (!m_selection.empty()) m_selection.erase(first, last);
-  m_size -= last - first;
   dropIdleFlags();
-  evenOutTimes();
+}
+
+void KeyLeaf::keep(const int* slots, int n) {
+  KeyCounts left;
+  for (int i = 0; i < n; ++i) left.count(flags(slots[i]), 1);
+  counts = left;
+  if (m_form == Form::Double) m_doubles.keep(slots, n, m_width);
+  if (m_form == Form::Float) m_floats.keep(slots, n, m_width);
+  if (!plain()) m_flags.keep(slots, n, 1);
+  if (!m_selection.empty()) m_selection.keep(slots, n, 1);
+  m_times.keep(slots, n);
+  dropIdleFlags();
+}
+
+void KeyLeaf::pack() {
+  m_times.pack();
+  m_doubles.shrink();
+  m_floats.shrink();
+  m_flags.shrink();
+  m_selection.shrink();
 }
 
 void KeyLeaf::setFlags(int slot, KeyFlags const& fresh) {
   const KeyFlags old = flags(slot);
   if (fresh == old) return;
+  // Columns that have to be written out come first: there may be no memory for them.
+  const unsigned bits = fresh.components | fresh.bridges << kBridgeShift;
+  if (plain() && bits != kWhole) insertBits(m_flags, kWhole, kWhole, 0, 0);
+  if (m_selection.empty() && fresh.selected) insertBits(m_selection, 0, 0, 0, 0);
   counts.count(old, -1);
   counts.count(fresh, 1);
-  const auto write = [&](Column& column, unsigned absent, unsigned bits) {
-    if (column.empty() && bits == absent) return;
-    if (column.empty()) insertBits(column, absent, absent, 0, 0);
-    column[slot] = static_cast<unsigned char>(bits);
-  };
-  write(m_flags, kWhole, fresh.components | fresh.bridges << kBridgeShift);
-  write(m_selection, 0, fresh.selected);
+  if (!plain()) m_flags[slot] = static_cast<unsigned char>(bits);
+  if (!m_selection.empty()) m_selection[slot] = static_cast<unsigned char>(fresh.selected);
 }
 
 void KeyLeaf::dropIdleFlags() {
-  if (!plain() && counts.whole == m_size && !counts.bridgesAny(kWhole)) m_flags.clear();
+  if (!plain() && counts.whole == size() && !counts.bridgesAny(kWhole)) m_flags.clear();
   if (!m_selection.empty() && counts.selected == 0) m_selection.clear();
 }
 
 void KeyLeaf::transform(int first, int last, void (*change)(void*, double*), void* context) {
-  if (m_form == Form::One && plain() && first == 0 && last == m_size) {
+  if (m_form == Form::One && plain() && first == 0 && last == size()) {
     change(context, m_doubles.data());
     return;
   }
-  std::vector<double> all(static_cast<size_t>(m_size * m_width));
-  for (int slot = 0; slot < m_size; ++slot) {
+  std::vector<double> all(static_cast<size_t>(size() * m_width));
+  for (int slot = 0; slot < size(); ++slot) {
     double* one = all.data() + slot * m_width;
     values(slot, one);
     if (slot >= first && slot < last && components(slot) == kWhole) change(context, one);
   }
+  setValues(all.data(), size());
+}
+
+// Replaces all values, whose number may change.
+void KeyLeaf::setValues(const double* values, int n) {
   m_doubles.clear();
   m_floats.clear();
-  const int size = std::exchange(m_size, 0);
-  insertValues(0, all.data(), size);
-  m_size = size;
-}
-
-bool KeyLeaf::continuesEvenly(int slot, int64 start, int64 period, int n) {
-  if (n > 1 && m_size > 0 && (slot != m_size || start - lastTime() != period)) return false;
-  if (m_size == 0) {
-    m_start = start;
-    m_period = period;
-    return true;
-  }
-  if (m_size == 1) {
-    m_period = slot == 1 ? start - m_start : m_start - start;
-    if (slot == 0) m_start = start;
-    return true;
-  }
-  if (slot == m_size) return start - lastTime() == m_period;
-  if (slot != 0 || m_start - start != m_period) return false;
-  m_start = start;
-  return true;
-}
-
-void KeyLeaf::insertTimes(int slot, int64 start, int64 period, int n) {
-  if (evenTimes()) {
-    if (continuesEvenly(slot, start, period, n)) return;
-    spellOutTimes();
-  }
-  int64* gap = m_times.open(slot, n, m_limit);
-  for (int i = 0; i < n; ++i) gap[i] = start + period * i;
-}
-
-void KeyLeaf::eraseTimes(int first, int last) {
-  if (evenTimes()) {
-    if (last == m_size) return;
-    if (first == 0) {
-      m_start += m_period * last;
-      return;
-    }
-    spellOutTimes();
-  }
-  m_times.erase(first, last);
+  m_form = n == 1 || allEqual(values, m_width, n) ? Form::One
+           : fitFloats(values, n * m_width)       ? Form::Float
+                                                  : Form::Double;
+  addValues(0, values, n);
 }
 
 void KeyLeaf::insertValues(int slot, const double* values, int n) {
-  if (m_size == 0) {
-    m_form = n == 1 || allEqual(values, m_width, n) ? Form::One
-             : fitFloats(values, n * m_width)       ? Form::Float
-                                                    : Form::Double;
-  } else if (m_form == Form::One) {
+  if (size() == 0) return setValues(values, n);
+  if (m_form == Form::One) {
     if (sameBits(values, m_doubles.data(), m_width) && allEqual(values, m_width, n)) return;
     spellOutValues(fitFloats(m_doubles.data(), m_width) && fitFloats(values, n * m_width));
   } else if (m_form == Form::Float && !fitFloats(values, n * m_width)) {
     widen();
   }
+  addValues(slot, values, n);
+}
 
+// The form must hold them.
+void KeyLeaf::addValues(int slot, const double* values, int n) {
   if (m_form == Form::One) n = 1;
   if (m_form == Form::Float) {
     float* gap = m_floats.open(slot * m_width, n * m_width, m_limit * m_width);
@@ -222,19 +180,26 @@ void KeyLeaf::insertFlags(int slot, KeyFlags const& flags, int n) {
   for (int i = 0; i < n; ++i) counts.count(flags, 1);
 }
 
+void KeyLeaf::appendBits(Column& column, Column const& from, unsigned absent, int first, int n) {
+  if (column.empty() && from.empty()) return;
+  if (from.empty()) return insertBits(column, absent, absent, size(), n);
+  insertBits(column, absent, absent, 0, 0);
+  column.insert(column.size(), from.data() + first, n, m_limit);
+}
+
 // An absent column is written out first: each slot had the bits `absent`.
 void KeyLeaf::insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n) {
   const auto fill = [&](int at, int count, unsigned with) {
     std::memset(column.open(at, count, m_limit), static_cast<int>(with), static_cast<size_t>(count));
   };
-  if (column.empty() && m_size > 0) fill(0, m_size, absent);
+  if (column.empty() && size() > 0) fill(0, size(), absent);
   if (n > 0) fill(slot, n, bits);
 }
 
 void KeyLeaf::putValues(int slot, const double* values) {
   if (m_form == Form::One) {
     if (sameBits(values, m_doubles.data(), m_width)) return;
-    if (m_size > 1) spellOutValues(fitFloats(m_doubles.data(), m_width) && fitFloats(values, m_width));
+    if (size() > 1) spellOutValues(fitFloats(m_doubles.data(), m_width) && fitFloats(values, m_width));
   }
   if (m_form == Form::Float && !fitFloats(values, m_width)) widen();
   if (m_form == Form::Float) {
@@ -244,31 +209,12 @@ void KeyLeaf::putValues(int slot, const double* values) {
   }
 }
 
-void KeyLeaf::spellOutTimes() {
-  int64* times = m_times.open(0, m_size, m_limit);
-  for (int i = 0; i < m_size; ++i) times[i] = m_start + m_period * i;
-}
-
-// The ends tell almost always whether the times are even, so that asking after every edit costs next to
-// nothing.
-void KeyLeaf::evenOutTimes() {
-  if (evenTimes() || m_size == 0) return;
-  const int64 period = m_size > 1 ? m_times[1] - m_times[0] : 0;
-  const auto length = static_cast<uint64>(lastTime() - firstTime());
-  if (length != static_cast<uint64>(period) * static_cast<uint64>(m_size - 1)) return;
-  for (int i = 2; i < m_size; ++i)
-    if (m_times[i] - m_times[i - 1] != period) return;
-  m_start = firstTime();
-  m_period = period;
-  m_times.clear();
-}
-
 void KeyLeaf::spellOutValues(bool asFloats) {
   std::array<double, 4> one{};
   values(0, one.data());
   m_doubles.clear();
   m_form = asFloats ? Form::Float : Form::Double;
-  const int n = m_size * m_width;
+  const int n = size() * m_width;
   if (asFloats) {
     float* gap = m_floats.open(0, n, m_limit * m_width);
     for (int i = 0; i < n; ++i) gap[i] = static_cast<float>(one[static_cast<size_t>(i % m_width)]);
@@ -291,19 +237,19 @@ int64 KeyLeaf::memoryUse() const {
 }
 
 const char* KeyLeaf::checkInvariants() const {
-  if (m_size == 0) return "a leaf is empty";
-  if (m_size > m_limit) return "a leaf is too large";
-  for (int slot = 1; slot < m_size; ++slot)
+  if (size() == 0) return "a leaf is empty";
+  if (size() > m_limit) return "a leaf is too large";
+  for (int slot = 1; slot < size(); ++slot)
     if (time(slot) <= time(slot - 1)) return "key times do not ascend";
 
-  const int stored = m_form == Form::One ? m_width : m_size * m_width;
+  const int stored = m_form == Form::One ? m_width : size() * m_width;
   if ((m_form == Form::Float ? m_floats.size() : m_doubles.size()) != stored) return "values are missing";
-  if (!evenTimes() && m_times.size() != m_size) return "times are missing";
-  if (!plain() && m_flags.size() != m_size) return "flags are missing";
-  if (!m_selection.empty() && m_selection.size() != m_size) return "selection is missing";
+  if (!m_times.isWhole()) return "times are missing";
+  if (!plain() && m_flags.size() != size()) return "flags are missing";
+  if (!m_selection.empty() && m_selection.size() != size()) return "selection is missing";
 
   KeyCounts expected;
-  for (int slot = 0; slot < m_size; ++slot) {
+  for (int slot = 0; slot < size(); ++slot) {
     if (components(slot) == 0) return "a key holds no component";
     if (m_width != 3 && components(slot) != kWhole) return "a key that is keyed whole lacks components";
     if (m_width != 3 && bridges(slot) && bridges(slot) != kWhole) return "a key bridges in part";

@@ -1,6 +1,6 @@
 // A leaf of a key track: up to a few hundred keys. Each of its four parts has a compact form and a general
 // one:
-//  - times: a start and a period while they are evenly spaced, else one by one;
+//  - times: LeafTimes;
 //  - components and bridges: none while every key is whole and bridges nothing, else a byte for each key;
 //  - selection: none while no key is selected, else a byte for each key;
 //  - values: one key's while all are equal bit by bit, floats while that loses nothing, else doubles.
@@ -11,6 +11,7 @@
 
 #include "host/keys/KeyColumn.h"
 #include "host/keys/KeyNode.h"
+#include "host/keys/LeafTimes.h"
 
 class KeyLeaf final : public KeyNode {
  public:
@@ -20,22 +21,24 @@ class KeyLeaf final : public KeyNode {
   KeyLeaf(int width, int limit) : KeyNode(0), m_width(width), m_limit(limit) {}
   KeyLeaf(KeyLeaf const&) = default;
 
-  int size() const { return m_size; }
+  int size() const { return m_times.size(); }
   int limit() const { return m_limit; }
-  bool full() const { return m_size >= m_limit; }
-  bool evenTimes() const { return m_times.empty(); }
+  bool full() const { return size() >= m_limit; }
+  bool evenTimes() const { return m_times.even(); }
   bool plain() const { return m_flags.empty(); }  // every key is whole and bridges nothing
   bool dense() const { return evenTimes() && plain() && m_selection.empty(); }
 
-  int64 time(int slot) const { return evenTimes() ? m_start + m_period * slot : m_times[slot]; }
-  int64 firstTime() const { return time(0); }
-  int64 lastTime() const { return time(m_size - 1); }
-  int lowerBound(int64 time) const;      // the first key at or after the time, size() when there is none
-  int lastAtOrBefore(int64 time) const;  // the time must not lie before the first key
+  int64 time(int slot) const { return m_times[slot]; }
+  int64 firstTime() const { return m_times.front(); }
+  int64 lastTime() const { return m_times.back(); }
+  // The first key at or after the time, size() when there is none.
+  int lowerBound(int64 time) const { return m_times.lowerBound(time); }
+  // The time must not lie before the first key.
+  int lastAtOrBefore(int64 time) const { return m_times.lastAtOrBefore(time); }
   int lastAtOrBefore(int64 time, int guess) const {  // fast when it is the guess or the next slot
     for (int end = guess + 2; guess < end; ++guess) {
       if (this->time(guess) > time) break;
-      if (guess + 1 == m_size || this->time(guess + 1) > time) return guess;
+      if (guess + 1 == size() || this->time(guess + 1) > time) return guess;
     }
     return lastAtOrBefore(time);
   }
@@ -60,14 +63,14 @@ class KeyLeaf final : public KeyNode {
 
   // Whether every key holds a component of the mask.
   bool allHold(unsigned mask) const {
-    return plain() || counts.whole == m_size || (mask == 1 && counts.held[0] == m_size) ||
-           (mask == 2 && counts.held[1] == m_size) || (mask == 4 && counts.held[2] == m_size);
+    return plain() || counts.whole == size() || (mask == 1 && counts.held[0] == size()) ||
+           (mask == 2 && counts.held[1] == size()) || (mask == 4 && counts.held[2] == size());
   }
-  int64 period() const { return evenTimes() ? m_period : 0; }  // undefined with a single key
-  bool repeats() const { return m_form == Form::One; }         // all values are equal bit by bit
+  int64 period() const { return evenTimes() ? m_times.period() : 0; }  // 0 with one key too
+  bool repeats() const { return m_form == Form::One; }                 // all values are equal bit by bit
 
   // Decodes the times of n slots.
-  void readTimes(int slot, int n, int64* out) const;
+  void readTimes(int slot, int n, int64* out) const { m_times.read(slot, n, out); }
   // Decodes the components first to before end of n slots, which are `step` apart: those of the i-th go to
   // out[i * stride] and after.
   void readValues(int slot, int step, int n, int first, int end, double* out, ptrdiff_t stride) const;
@@ -90,6 +93,10 @@ class KeyLeaf final : public KeyNode {
   void append(KeyLeaf const& from, int first, int last);
   void write(int slot, const double* values, unsigned mask);
   void erase(int first, int last);
+  // Leaves the n ascending slots; cheaper than erasing the others run by run.
+  void keep(const int* slots, int n);
+  // To be called when an edit of many keys is done: gives back the room that it left.
+  void pack();
   void setFlags(int slot, KeyFlags const& flags);
   // To be called when a series of setFlags is done.
   void dropIdleFlags();
@@ -110,31 +117,26 @@ class KeyLeaf final : public KeyNode {
   // the bits `absent`.
   template <int Step, bool Any = true>
   int scan(Column const& bits, unsigned absent, int slot, unsigned mask) const {
-    if (bits.empty()) return slot >= 0 && slot < m_size && ((absent & mask) != 0) == Any ? slot : -1;
-    for (; slot >= 0 && slot < m_size; slot += Step)
+    if (bits.empty()) return slot >= 0 && slot < size() && ((absent & mask) != 0) == Any ? slot : -1;
+    for (; slot >= 0 && slot < size(); slot += Step)
       if (((bits[slot] & mask) != 0) == Any) return slot;
     return -1;
   }
 
-  void insertTimes(int slot, int64 start, int64 period, int n);
   void insertValues(int slot, const double* values, int n);
   void insertFlags(int slot, KeyFlags const& flags, int n);
+  void appendBits(Column& column, Column const& from, unsigned absent, int first, int n);
   void insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n);
-  void eraseTimes(int first, int last);
-  bool continuesEvenly(int slot, int64 start, int64 period, int n);
-  void spellOutTimes();
-  void evenOutTimes();
   void spellOutValues(bool asFloats);
   void widen();
+  void setValues(const double* values, int n);
+  void addValues(int slot, const double* values, int n);
   void putValues(int slot, const double* values);
 
   int m_width;
   int m_limit;
-  int m_size = 0;
   Form m_form = Form::One;
-  int64 m_start = 0;  // of even times
-  int64 m_period = 0;
-  KeyColumn<int64> m_times;
+  LeafTimes m_times;
   KeyColumn<double> m_doubles;  // with Form::One a single key's
   KeyColumn<float> m_floats;
   Column m_flags;  // components, and bridges above them

@@ -1,8 +1,10 @@
 // What the nodes of a key track's tree have in common: a reference count, a level and the counts of their
 // keys. Nodes are shared between snapshots; only a node with a single reference may be changed
-// (KeyNodeRef::own). The count is not atomic: tracks that share nodes belong to one thread.
+// (KeyNodeRef::own). The count is atomic: each thread may copy, read, drop and change tracks of its own
+// whatever nodes they share.
 #pragma once
 
+#include <atomic>
 #include <utility>
 
 #include "host/base/Types.h"
@@ -77,7 +79,9 @@ class KeyNode {
 
   bool isLeaf() const { return m_level == 0; }
   int level() const { return m_level; }  // 0 for leaves
-  bool isShared() const { return m_references > 1; }
+  // Nobody else begins to share a node that has one reference, as that takes a reference. Acquires what
+  // threads did that have dropped theirs, so that the node may be changed or destroyed.
+  bool isShared() const { return m_references.load(std::memory_order_acquire) > 1; }
 
   KeyNode& operator=(KeyNode const&) = delete;
 
@@ -88,7 +92,7 @@ class KeyNode {
 
  private:
   friend class KeyNodeRef;
-  int m_references = 0;
+  std::atomic<int> m_references = 0;
   int m_level;
 };
 
@@ -104,7 +108,8 @@ class KeyNodeRef {
     return *this;
   }
   ~KeyNodeRef() {
-    if (m_node && --m_node->m_references == 0) destroy(m_node);
+    if (m_node && (!m_node->isShared() || m_node->m_references.fetch_sub(1, std::memory_order_acq_rel) == 1))
+      destroy(m_node);
   }
 
   KeyNode* get() const { return m_node; }
@@ -116,12 +121,12 @@ class KeyNodeRef {
 
   // Replaces a node that others share by a copy, so that it may be changed.
   void own() {
-    if (m_node->m_references > 1) *this = KeyNodeRef(clone(*m_node));
+    if (m_node->isShared()) *this = KeyNodeRef(clone(*m_node));
   }
 
  private:
   void hold() {
-    if (m_node) ++m_node->m_references;
+    if (m_node) m_node->m_references.fetch_add(1, std::memory_order_relaxed);
   }
   static void destroy(KeyNode*);
   static KeyNode* clone(KeyNode const&);

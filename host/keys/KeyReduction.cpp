@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "host/keys/KeyInterpolation.h"
+#include "host/time/Ticks.h"
 
 namespace {
 
@@ -60,9 +61,8 @@ class Curve {
   int width() const { return static_cast<int>(m_shape); }
   Point point(int64 i) const { return {this, i < size() ? i : -1}; }
 
-  int64 firstFrameBehind(int64 time) const {
-    const int64 period = m_rule.framePeriod, whole = time / period;
-    return (whole + (time % period >= 0 ? 1 : 0)) * period;
+  int64 firstFrameAfter(int64 time) const {
+    return (frameAtOrBefore(time, m_rule.framePeriod) + 1) * m_rule.framePeriod;
   }
 
   void read(KeyTrack const& track, int component) {
@@ -70,11 +70,14 @@ class Curve {
     m_times.reserve(count);
     m_values.reserve(count * at(width()));
     int64 index = 0;
+    std::vector<unsigned char> bridged;
+    const unsigned parts = component < 0 ? KeyTrack::kAll : 1u << component;
     track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
       const int64 own = index++;
       if (component >= 0 && !(key.components >> component & 1)) return;
       m_index.push_back(own);
       m_times.push_back(key.time);
+      bridged.push_back((key.bridges & parts) == parts);
       m_stays.push_back(m_rule.mayGo && !m_rule.mayGo(key));
       for (int c = 0; c < width(); ++c) m_values.push_back(key.values[at(component < 0 ? c : component)]);
     });
@@ -82,10 +85,8 @@ class Curve {
     m_stays.front() = m_stays.back() = true;
     m_hasFrames.resize(m_times.size());
     for (int64 i = 0; i + 1 < size(); ++i) {
-      m_hasFrames[at(i)] = firstFrameBehind(m_times[at(i)]) < m_times[at(i + 1)];
-      const bool bridged = component < 0 && m_rule.isBridged;
-      if (m_rule.hasGaps && m_hasFrames[at(i)] && !(bridged && m_rule.isBridged(m_times[at(i)])))
-        m_stays[at(i)] = m_stays[at(i + 1)] = true;
+      m_hasFrames[at(i)] = firstFrameAfter(m_times[at(i)]) < m_times[at(i + 1)];
+      if (m_rule.hasGaps && m_hasFrames[at(i)] && !bridged[at(i)]) m_stays[at(i)] = m_stays[at(i + 1)] = true;
     }
   }
 
@@ -107,7 +108,7 @@ class Curve {
     return good;
   }
 
-  // Whether the curve holds when all keys between the anchor and `next` go and all behind stay for now.
+  // Whether the curve holds when all keys between the anchor and `next` go and all later ones stay for now.
   bool mayJoin(Kept const& kept, int64 next) const {
     const auto [beforePrevious, previous, anchor] = kept;
     if (!spanHolds(point(previous), anchor, next, point(next + 1))) return false;
@@ -122,7 +123,7 @@ class Curve {
     const auto keyHolds = [&](int64 i) {
       return isNear(between(before, a, b, after, m_times[at(i)]), valuesAt(point(i)));
     };
-    // What does not hold mostly strays in the middle.
+    // What does not hold mostly deviates most in the middle.
     const int64 middle = first + (last - first) / 2;
     if (middle > first && !keyHolds(middle)) return false;
     for (int64 i = first; i < last; ++i)
@@ -135,7 +136,7 @@ class Curve {
   bool framesHold(Point before, Point a, Point b, Point after, int64 i) const {
     if (m_keysSuffice) return true;
     const int64 end = m_times[at(i + 1)];
-    int64 frame = firstFrameBehind(m_times[at(i)]);
+    int64 frame = firstFrameAfter(m_times[at(i)]);
     if ((end - frame) / m_rule.framePeriod > kMostFrames) return false;
     for (; frame < end; frame += m_rule.framePeriod)
       if (!isNear(between(before, a, b, after, frame),
@@ -205,20 +206,6 @@ std::vector<unsigned char> redundantKeys(KeyTrack const& track, ReductionRule co
       lost[static_cast<size_t>(i)] = static_cast<unsigned char>(lost[static_cast<size_t>(i)] | 1u << c);
     });
   return lost;
-}
-
-int64 eraseComponents(KeyTrack& track, std::vector<unsigned char> const& lost) {
-  // From the back, run by run, so that the indices before stay.
-  int64 erased = 0;
-  for (size_t end = lost.size(); end > 0;) {
-    size_t first = end - 1;
-    while (first > 0 && lost[first - 1] == lost[end - 1]) --first;
-    if (lost[end - 1])
-      erased += track.eraseRange(track.timeAt(static_cast<int64>(first)),
-                                 track.timeAt(static_cast<int64>(end - 1)), lost[end - 1]);
-    end = first;
-  }
-  return erased;
 }
 
 double valueRange(KeyTrack const& track) {

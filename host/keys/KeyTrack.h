@@ -7,9 +7,9 @@
 //  key all or none.
 //  4. The counts in inner nodes (keys; keys, selected keys and bridges by component) are those of their
 //  leaves.
-//  5. No leaf is empty; what a leaf stores in a compact form has it: even times (a start and a period), no
-//  flags (every key whole, nothing bridged), no selection, equal values stored once, values stored as floats
-//  without loss.
+//  5. No leaf is empty; what a leaf stores in a compact form has it: even times (a start and a period) or
+//  offsets (LeafTimes.h), no flags (every key whole, nothing bridged), no selection, equal values stored once,
+//  values stored as floats without loss.
 //
 // Bridges tell where there is data between keys (DataRanges.h): a key that bridges a component goes on to the
 // next key that has it. Values between keys do not depend on them.
@@ -22,6 +22,7 @@
 
 #include <array>
 #include <cstddef>
+#include <vector>
 
 #include "host/base/Types.h"
 #include "host/keys/KeyNode.h"
@@ -64,7 +65,7 @@ class KeyTrack {
   // caller; a cursor of another or a changed track only costs a search.
   struct Cursor {
     const KeyLeaf* leaf = nullptr;  // valid only while the version is the track's
-    const KeyLeaf* next = nullptr;  // the leaf behind it, null behind the last
+    const KeyLeaf* next = nullptr;  // the next leaf, null after the last
     int64 firstIndex = 0;           // of the leaf
     int slot = 0;
     uint64 version = 0;
@@ -130,6 +131,10 @@ class KeyTrack {
   int64 deleteRange(int64 first, int64 last, unsigned mask, BridgeEnds const& ends);
   int64 deleteSelected(unsigned mask, BridgeEnds const& ends);
 
+  // Takes out of each key, by index, these components; what is left bridges over them, so that no data is
+  // lost. The last key that holds a component must keep it. Returns the number of keys that lost something.
+  int64 thin(std::vector<unsigned char> const& lost);
+
   // Bridges. Whether any key bridges a component of the mask; constant time.
   bool bridgesAny(unsigned mask = kAll) const { return m_root && m_root->counts.bridgesAny(normal(mask)); }
   // The components of the mask that have data at the time because a bridge passes over it or reaches it.
@@ -144,7 +149,7 @@ class KeyTrack {
   void restore(Key const& key);
   void restoreNone(int64 time);
 
-  // Selection. Only components that a key holds can be selected. Selecting answers the number of
+  // Selection. Only components that a key holds can be selected. Selecting returns the number of
   // keys in the range that hold a component of the mask; deselecting the number of keys that lost a flag.
   int64 select(int64 first, int64 last, unsigned mask = kAll);
   int64 deselect(int64 first, int64 last, unsigned mask = kAll);

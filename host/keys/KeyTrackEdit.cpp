@@ -8,20 +8,38 @@
 #include "host/time/Ticks.h"
 
 struct KeyTrack::LeafEdit {
-  enum class Kind : unsigned char { Erase, EraseSelected, Select, Deselect, Bridge, Unbridge, Transform };
+  enum class Kind : unsigned char {
+    Erase,
+    EraseSelected,
+    Thin,
+    Select,
+    Deselect,
+    Bridge,
+    Unbridge,
+    Transform
+  };
 
   Kind kind;
   unsigned mask;
+  bool many = false;  // more than one key is visited
   int64 affected = 0;
   void (*change)(void*, double*) = nullptr;  // Transform
   void* context = nullptr;
+  // Thin: what each key from the next one to be visited loses, and bridges from now on.
+  const unsigned char *lost = nullptr, *bridged = nullptr;
 
-  bool erases() const { return kind == Kind::Erase || kind == Kind::EraseSelected; }
+  bool erases() const { return kind == Kind::Erase || kind == Kind::EraseSelected || kind == Kind::Thin; }
   bool dropsWhole() const { return kind == Kind::Erase && mask == kAll; }
 
-  // Nothing below needs to be looked at.
-  bool skips(KeyNode const& node) const {
+  // Nothing below needs to be looked at. Thin visits all keys, so that a node's keys are the next ones.
+  bool skips(KeyNode const& node) {
     switch (kind) {
+      case Kind::Thin:
+        for (int64 i = 0; i < node.counts.keys; ++i)
+          if (lost[i] || bridged[i]) return false;
+        lost += node.counts.keys;
+        bridged += node.counts.keys;
+        return true;
       case Kind::Erase:
       case Kind::Select:
       case Kind::Bridge:
@@ -69,21 +87,26 @@ struct KeyTrack::LeafEdit {
   void eraseComponents(KeyLeaf& leaf, int first, int last) {
     int runEnd = last;
     for (int slot = last - 1; slot >= first; --slot) {
-      const auto [held, bridged, selected] = leaf.flags(slot);
-      const unsigned lost = mask & (kind == Kind::Erase ? held : selected);
-      affected += lost != 0;
-      if (lost == held) continue;
+      const KeyFlags now = leaf.flags(slot);
+      const unsigned gone = kind == Kind::Thin    ? lost[slot] & now.components
+                            : kind == Kind::Erase ? mask & now.components
+                                                  : mask & now.selected;
+      affected += gone != 0;
+      if (gone == now.components) continue;
 
       if (slot + 1 < runEnd) leaf.erase(slot + 1, runEnd);
       runEnd = slot;
-      if (lost != 0) {
+      if (gone != 0) {
         constexpr Values kAbsent{};
-        leaf.write(slot, kAbsent.data(), lost);
-        leaf.setFlags(slot, {held & ~lost, bridged & ~lost, selected & ~lost});
+        leaf.write(slot, kAbsent.data(), gone);
       }
+      leaf.setFlags(
+          slot, {now.components & ~gone, (now.bridges & ~gone) | (kind == Kind::Thin ? bridged[slot] : 0u),
+                 now.selected & ~gone});
     }
     if (first < runEnd) leaf.erase(first, runEnd);
     leaf.dropIdleFlags();
+    if (kind == Kind::Thin) lost += last, bridged += last;
   }
 };
 
@@ -228,6 +251,7 @@ int64 KeyTrack::edit(int64 firstIndex, int64 lastIndex, LeafEdit& what) {
   lastIndex = std::min(lastIndex, count());
   if (firstIndex >= lastIndex || what.skips(*m_root.get())) return 0;
   changed();
+  what.many = lastIndex - firstIndex > 1;
   editBelow(m_root, firstIndex, lastIndex, what);
   while (m_root && !m_root->isLeaf() && asInner(*m_root.get()).size() == 1) {
     KeyNodeRef only = asInner(*m_root.get()).childRef(0);
@@ -248,7 +272,11 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
   if (node->isLeaf()) {
     auto& leaf = asLeaf(*node.get());
     what.apply(leaf, static_cast<int>(first), static_cast<int>(last));
-    if (leaf.size() == 0) node.reset();
+    if (leaf.size() == 0) {
+      node.reset();
+    } else if (what.erases() && what.many) {
+      leaf.pack();
+    }
     return;
   }
 
@@ -265,7 +293,7 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
     inner.childChanged(i, counts);
     before += keys;
   }
-  if (what.erases()) inner.mend(firstChild, i - 1);
+  if (what.erases()) inner.mend(firstChild, i - 1, what.many);
   if (inner.size() == 0) node.reset();
 }
 
@@ -332,9 +360,8 @@ void KeyTrack::capBridges(int64 first, int64 last, unsigned mask, BridgeEnds con
   };
   cap(before, endsBefore);
   cap(after, beginsAfter);
-  for (const unsigned part : KeyParts(m_shape, cut)) {
+  for (const unsigned part : KeyParts(m_shape, cut))
     endBridge(previousHolding(lowerBound(first), part), part);
-  }
 }
 
 int64 KeyTrack::deleteRange(int64 first, int64 last, unsigned mask, BridgeEnds const& ends) {
@@ -364,6 +391,25 @@ int64 KeyTrack::deleteSelected(unsigned mask, BridgeEnds const& ends) {
     }
   }
   return affected;
+}
+
+int64 KeyTrack::thin(std::vector<unsigned char> const& lost) {
+  assert(static_cast<int64>(lost.size()) == count());
+  // A key bridges a component when the next key that holds it loses it and a later one keeps it.
+  std::vector<unsigned char> held, bridged(lost.size());
+  held.reserve(lost.size());
+  forEach(0, count(), [&](Key const& key) { held.push_back(key.components); });
+  unsigned nextLoses = 0, laterKeeps = 0;
+  for (size_t i = lost.size(); i-- > 0;) {
+    const unsigned gone = lost[i] & held[i], kept = held[i] & ~gone;
+    bridged[i] = static_cast<unsigned char>(kept & nextLoses & laterKeeps);
+    nextLoses = (nextLoses & ~kept) | gone;
+    laterKeeps |= kept;
+  }
+  LeafEdit what{LeafEdit::Kind::Thin, kAll};
+  what.lost = lost.data();
+  what.bridged = bridged.data();
+  return edit(0, count(), what);
 }
 
 void KeyTrack::bridge(int64 first, int64 last, unsigned mask) {

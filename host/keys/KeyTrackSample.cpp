@@ -43,6 +43,7 @@ class KeyTrack::Sampler {
 
   static constexpr int kChunk = 128;  // keys of a leaf, or samples, that are worked on at once
   static constexpr int kWindow = kChunk + 3;
+  static constexpr int kFirst = 1;        // where keys begin in the window
   static constexpr int kSparse = 8;       // keys for a sample from which single evaluation is faster
   static constexpr double kUnit = 1e-14;  // how far a unit quaternion's square may be from 1
 
@@ -81,7 +82,7 @@ class KeyTrack::Sampler {
   // Samples that are keys of the leaf, at each or each n-th of them.
   bool takeKeys(Place const& a) {
     KeyLeaf const& leaf = *a.leaf;
-    const int64 own = leaf.size() > 1 ? leaf.period() : 0, period = m_times.period();
+    const int64 own = leaf.period(), period = m_times.period();
     if (own == 0 || period % own != 0 || period == 0 || m_times[m_next] != a.time() ||
         !leaf.allHold(m_holding))
       return false;
@@ -153,38 +154,42 @@ class KeyTrack::Sampler {
   }
 
   // The window holds the key before `a` (for slopes), those from `a` to the slot `end`, and the next one
-  // (two). Returns the first of these last, which may be none.
+  // (two). Where there is none to take a slope from, any key does. Returns the first of these last, which may
+  // be none.
   Place fillWindow(Place const& a, int end) {
     const bool cubic = m_kind == Interpolation::Cubic;
-    m_size = 0;
+    Place before;
     if (cubic) {
       const bool follows = m_previous && m_previous.index + 1 == a.index &&
                            m_previous.leaf->components(m_previous.slot) & m_holding;
-      push(follows ? m_previous : m_track.neighbour(a, -1, m_holding, nullptr));
+      before = follows ? m_previous : m_track.neighbour(a, -1, m_holding, nullptr);
     }
-    m_starting = m_size;
+    m_size = kFirst;
+    put(0, before ? before : a);
+    m_span = kFirst;
     decode(*a.leaf, a.slot, end);
 
     m_previous = {a.leaf, a.index + end - 1 - a.slot, end - 1};
     const Place next = m_track.neighbour(m_previous, 1, m_holding, nullptr);
-    push(next);
+    if (next) put(m_size++, next);
     m_ending = m_size - 1;
-    if (next && cubic) push(m_track.neighbour(next, 1, m_holding, nullptr));
-    if (cubic) prepareTangents();
+    if (cubic) {
+      const Place after = next ? m_track.neighbour(next, 1, m_holding, nullptr) : next;
+      put(m_ending + 1, after ? after : a);
+      prepareTangents(static_cast<bool>(before), static_cast<bool>(after));
+    }
     return next;
   }
 
-  void push(Place const& key) {
-    if (!key) return;
-    m_keyTimes[m_size] = key.time();
-    for (int c = 0; c < width(); ++c) m_values[c][m_size] = key.value(m_firstComponent + c);
-    ++m_size;
+  void put(int i, Place const& key) {
+    m_keyTimes[i] = key.time();
+    for (int c = 0; c < width(); ++c) m_values[c][i] = key.value(m_firstComponent + c);
   }
 
   void decode(KeyLeaf const& leaf, int slot, int end) {
     if (!leaf.allHold(m_holding)) {
       for (; slot < end; ++slot)
-        if (leaf.components(slot) & m_holding) push({&leaf, 0, slot});
+        if (leaf.components(slot) & m_holding) put(m_size++, {&leaf, 0, slot});
       return;
     }
     leaf.readTimes(slot, end - slot, m_keyTimes + m_size);
@@ -196,23 +201,23 @@ class KeyTrack::Sampler {
   }
 
   // The weights of slopes at both ends of each span, which all components share.
-  void prepareTangents() {
-    std::array<double, kWindow> lengths;
+  void prepareTangents(bool hasBefore, bool hasAfter) {
+    double lengths[kWindow];
+    for (int i = 0; i < m_ending + 1; ++i)
+      lengths[i] = static_cast<double>(m_keyTimes[i + 1] - m_keyTimes[i]);
     bool even = true;
-    const int spans = m_size - 1;
-    for (int i = 0; i < spans; ++i) {
-      lengths[at(i)] = static_cast<double>(m_keyTimes[i + 1] - m_keyTimes[i]);
-      even = even && lengths[at(i)] == lengths[0];
+    for (int i = hasBefore ? 0 : kFirst; i < m_ending + hasAfter; ++i) even &= lengths[i] == lengths[kFirst];
+    if (even) {  // without divisions, which would cost as much as all the rest
+      std::fill_n(m_leaving + kFirst, m_ending - kFirst, Tangent::between(1, 1));
+      std::fill_n(m_arriving + kFirst, m_ending - kFirst, Tangent::between(1, 1));
+    } else {
+      for (int i = kFirst; i < m_ending; ++i) {
+        m_leaving[i] = Tangent::between(lengths[i], lengths[i - 1]);
+        m_arriving[i] = Tangent::between(lengths[i], lengths[i + 1]);
+      }
     }
-    const auto evenTangent = Tangent::between(1, 1);
-    for (int i = 0; i < spans; ++i) {
-      m_leaving[i] = i == 0 ? Tangent::oneSided()
-                     : even ? evenTangent
-                            : Tangent::between(lengths[at(i)], lengths[at(i - 1)]);
-      m_arriving[i] = i + 1 == spans ? Tangent::oneSided()
-                      : even         ? evenTangent
-                                     : Tangent::between(lengths[at(i)], lengths[at(i + 1)]);
-    }
+    if (!hasBefore) m_leaving[kFirst] = Tangent::oneSided();
+    if (!hasAfter) m_arriving[m_ending - 1] = Tangent::oneSided();
   }
 
   // The next n samples, which lie in spans of the window.
@@ -228,8 +233,8 @@ class KeyTrack::Sampler {
       } else {
         rotations<SquadSpan>(n, [this](int span) {
           const Quat a = quat(span);
-          return SquadSpan(m_leaving[span], m_arriving[span], quat(std::max(span - 1, 0)), a,
-                           interpolation::nearest(quat(span + 1), a), quat(std::min(span + 2, m_size - 1)));
+          return SquadSpan(m_leaving[span], m_arriving[span], quat(span - 1), a,
+                           interpolation::nearest(quat(span + 1), a), quat(span + 2));
         });
       }
     } else {
@@ -242,35 +247,34 @@ class KeyTrack::Sampler {
   void findSpans(int n) {
     std::array<int64, kChunk> times;
     m_times.read(m_next, n, times.data());
-    int span = m_starting;
+    int span = m_span;
     for (int i = 0; i < n; ++i) {
       const int64 time = times[at(i)];
       while (m_keyTimes[span + 1] <= time) ++span;
-      m_span[i] = span;
+      m_spans[i] = span;
       m_part[i] = static_cast<double>(time - m_keyTimes[span]) /
                   static_cast<double>(m_keyTimes[span + 1] - m_keyTimes[span]);
     }
-    m_starting = span;
+    m_span = span;
   }
 
   // A sample at a key is the key, even where what lies around is no number.
   void component(const double* values, int n, double* to) {
     if (m_kind == Interpolation::Constant) {
-      for (int i = 0; i < n; ++i) to[i * m_stride] = values[m_span[i]];
+      for (int i = 0; i < n; ++i) to[i * m_stride] = values[m_spans[i]];
     } else if (m_kind == Interpolation::Linear) {
       for (int i = 0; i < n; ++i) {
-        const double a = values[m_span[i]], b = values[m_span[i] + 1];
+        const double a = values[m_spans[i]], b = values[m_spans[i] + 1];
         to[i * m_stride] = m_part[i] == 0 ? a : a + (b - a) * m_part[i];
       }
     } else {
-      const int end = m_span[n - 1] + 1;
-      for (int i = m_span[0]; i < end; ++i) {
-        const double a = values[i], b = values[i + 1];
-        const double before = values[std::max(i - 1, 0)], after = values[std::min(i + 2, m_size - 1)];
+      const int end = m_spans[n - 1] + 1;
+      for (int i = m_spans[0]; i < end; ++i) {
+        const double before = values[i - 1], a = values[i], b = values[i + 1], after = values[i + 2];
         m_cubics[i] = CubicSpan(a, m_leaving[i](b - a, a - before), b, m_arriving[i](b - a, after - b));
       }
       for (int i = 0; i < n; ++i) {
-        CubicSpan const& cubic = m_cubics[m_span[i]];
+        CubicSpan const& cubic = m_cubics[m_spans[i]];
         to[i * m_stride] = m_part[i] == 0 ? cubic.start() : cubic.at(m_part[i]);
       }
     }
@@ -283,10 +287,10 @@ class KeyTrack::Sampler {
     for (int i = 0; i < n; ++i) {
       double* to = out(m_next + i);
       if (m_part[i] == 0) {
-        for (int c = 0; c < 4; ++c) to[c] = m_values[c][m_span[i]];
+        for (int c = 0; c < 4; ++c) to[c] = m_values[c][m_spans[i]];
         continue;
       }
-      if (m_span[i] != known) span = make(known = m_span[i]);
+      if (m_spans[i] != known) span = make(known = m_spans[i]);
       const Quat q = span.at(m_part[i]);
       to[0] = q.v.x, to[1] = q.v.y, to[2] = q.v.z, to[3] = q.r;
     }
@@ -306,16 +310,16 @@ class KeyTrack::Sampler {
   int64 m_next = 0;  // the sample
 
   // The window.
-  int m_size = 0, m_starting = 0, m_ending = 0;  // its keys; that at or before the next sample; where it ends
-  Place m_previous;                              // the last slot of the leaf in it, whether or not its key is
+  int m_size = 0, m_span = 0, m_ending = 0;  // its keys; the span of the next sample; the last span's end
+  Place m_previous;                          // the last slot of the leaf in it, whether or not its key is
   int64 m_keyTimes[kWindow];
   double m_values[4][kWindow];
   Tangent m_leaving[kWindow], m_arriving[kWindow];  // of the spans that start at the keys
   CubicSpan m_cubics[kWindow];
 
   // The batch.
-  int m_span[kChunk];
-  double m_part[kChunk];
+  int m_spans[kChunk];    // of each sample
+  double m_part[kChunk];  // how far it lies in that, from 0 to 1
 };
 
 void KeyTrack::sample(SampleTimes const& times, Interpolation kind, Values const& defaults, unsigned mask,

@@ -19,7 +19,7 @@ class SampleTimes {
 
   int64 count() const { return m_count; }
   int64 period() const { return m_period; }  // 0: a list
-  int64 operator[](int64 i) const { return m_list ? m_list[i] : m_start + m_period * i; }
+  int64 operator[](int64 i) const { return m_list ? m_list[i] : spaced(i); }
 
   // The index of the first one at or after `time`, not before index `from`; count() when there is none.
   int64 lowerBound(int64 time, int64 from) const {
@@ -31,15 +31,27 @@ class SampleTimes {
     return steps < static_cast<uint64>(m_count - from) ? from + static_cast<int64>(steps) : m_count;
   }
 
+  // `count` of them from index `from` on.
+  SampleTimes part(int64 from, int64 count) const {
+    return m_list ? SampleTimes({m_list + from, static_cast<size_t>(count)})
+                  : SampleTimes(m_start + m_period * from, m_period, count);
+  }
+
   void read(int64 from, int n, int64* out) const {
     if (m_list) {
       std::copy_n(m_list + from, n, out);
     } else {
-      for (int i = 0; i < n; ++i) out[i] = m_start + m_period * (from + i);
+      for (int i = 0; i < n; ++i) out[i] = spaced(from + i);
     }
   }
 
  private:
+  // Unsigned, since the whole time line is longer than a signed number holds.
+  int64 spaced(int64 i) const {
+    return static_cast<int64>(static_cast<uint64>(m_start) +
+                              static_cast<uint64>(m_period) * static_cast<uint64>(i));
+  }
+
   const int64* m_list = nullptr;
   int64 m_start = 0, m_period = 0;
   int64 m_count = 0;

@@ -8,6 +8,7 @@ struct Transform {
   TalixRotation rotation;
   Vec3 scale{1, 1, 1};
 
+  bool operator==(Transform const&) const = default;
   // What is given in this transform's space, in the space that this one is given in. Transforms do not shear,
   // so with uneven scales a product must begin at the root.
   Transform operator*(Transform const& inner) const;

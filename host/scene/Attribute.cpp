@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cmath>
 
+#include "host/base/ItemAt.h"
 #include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
@@ -28,61 +29,52 @@ H_DEFINE_CLASS(ModAttribute);
 H_DEFINE_CLASS(MatrixAttribute);
 H_DEFINE_CLASS(MultiModAttribute);
 
-std::unique_ptr<Attribute> Attribute::create(Type type, HString const& name, Labels labels) {
-  std::unique_ptr<Attribute> attribute;
+namespace {
+
+std::unique_ptr<Attribute> makeKind(Attribute::Type type, Attribute::Labels labels) {
   switch (type) {
-    case Integer:
-      attribute = std::make_unique<IntAttribute>();
-      break;
-    case Enumeration:
-      attribute = std::make_unique<EnumAttribute>(std::move(labels));
-      break;
-    case Float:
-      attribute = std::make_unique<FloatAttribute>();
-      break;
-    case String:
-      attribute = std::make_unique<StringAttribute>();
-      break;
-    case MultiString:
-      attribute = std::make_unique<MultiStringAttribute>();
-      break;
-    case Boolean:
-      attribute = std::make_unique<BoolAttribute>();
-      break;
-    case Vector:
-      attribute = std::make_unique<VectorAttribute>();
-      break;
-    case BitField:
-      attribute = std::make_unique<BitFieldAttribute>(std::move(labels));
-      break;
-    case Rotation:
-      attribute = std::make_unique<RotationAttribute>();
-      break;
-    case Time:
-      attribute = std::make_unique<TimeAttribute>();
-      break;
-    case Color:
-      attribute = std::make_unique<ColorAttribute>(Database::getDefaultModColor());
-      break;
-    case Event:
-      attribute = std::make_unique<EventAttribute>();
-      break;
-    case ModuleReference:
-      attribute = std::make_unique<ModAttribute>();
-      break;
-    case NoKind:
-      attribute = std::make_unique<NoneAttribute>();
-      break;
-    case MatrixKind:
-      attribute = std::make_unique<MatrixAttribute>();
-      break;
-    case MultiModule:
-      attribute = std::make_unique<MultiModAttribute>();
-      break;
-    case Temperature:
-      attribute = std::make_unique<TemperatureAttribute>();
-      break;
+    case Attribute::Integer:
+      return std::make_unique<IntAttribute>();
+    case Attribute::Enumeration:
+      return std::make_unique<EnumAttribute>(std::move(labels));
+    case Attribute::Float:
+      return std::make_unique<FloatAttribute>();
+    case Attribute::String:
+      return std::make_unique<StringAttribute>();
+    case Attribute::MultiString:
+      return std::make_unique<MultiStringAttribute>();
+    case Attribute::Boolean:
+      return std::make_unique<BoolAttribute>();
+    case Attribute::Vector:
+      return std::make_unique<VectorAttribute>();
+    case Attribute::BitField:
+      return std::make_unique<BitFieldAttribute>(std::move(labels));
+    case Attribute::Rotation:
+      return std::make_unique<RotationAttribute>();
+    case Attribute::Time:
+      return std::make_unique<TimeAttribute>();
+    case Attribute::Color:
+      return std::make_unique<ColorAttribute>(Database::getDefaultModColor());
+    case Attribute::Event:
+      return std::make_unique<EventAttribute>();
+    case Attribute::ModuleReference:
+      return std::make_unique<ModAttribute>();
+    case Attribute::NoKind:
+      return std::make_unique<NoneAttribute>();
+    case Attribute::MatrixKind:
+      return std::make_unique<MatrixAttribute>();
+    case Attribute::MultiModule:
+      return std::make_unique<MultiModAttribute>();
+    case Attribute::Temperature:
+      return std::make_unique<TemperatureAttribute>();
   }
+  return nullptr;
+}
+
+}  // namespace
+
+std::unique_ptr<Attribute> Attribute::create(Type type, HString const& name, Labels labels) {
+  std::unique_ptr<Attribute> attribute = makeKind(type, std::move(labels));
   attribute->m_name = name;
   return attribute;
 }
@@ -193,15 +185,34 @@ void Attribute::forget(Module* module) {
   put(std::move(others), m_set, true);
 }
 
-bool IntAttribute::setValue(int value, bool, bool notify, bool react, bool markSet) {
-  change(value, notify, react, markSet);
+// --- what values can be held ---
+
+bool Attribute::isInLimits(double value) { return std::isfinite(value); }
+
+bool Attribute::isInLimits(int64 ticks) { return ticks >= -kForever && ticks <= kForever; }
+
+bool Attribute::isInLimits(Vec3 const& v) {
+  return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z);
+}
+
+bool Attribute::isInLimits(Matrix const& value) {
+  for (uint64 row = 0; row < value.rows(); ++row)
+    if (!std::all_of(value[row], value[row] + value.cols(), [](double v) { return std::isfinite(v); }))
+      return false;
   return true;
 }
 
-bool TemperatureAttribute::setValue(int value, bool, bool notify, bool react, bool markSet) {
-  change(value, notify, react, markSet);
+bool Attribute::isOfScene(Module const* module) const {
+  return !module || !getModule() || module->getDatabase() == getModule()->getDatabase();
+}
+
+bool ColorAttribute::canHold(Vec3 const& value) const {
+  for (int i = 0; i < 3; ++i)
+    if (!(value[i] >= 0 && value[i] <= 255)) return false;
   return true;
 }
+
+// --- kinds of their own ---
 
 namespace {
 
@@ -211,14 +222,9 @@ int indexOf(Attribute::Labels const& labels, HString const& label) {
   return found == labels->end() ? -1 : static_cast<int>(found - labels->begin());
 }
 
-bool isFinite(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
-
 }  // namespace
 
-HString EnumAttribute::getEnumValue() const {
-  const int index = getIndex();
-  return index >= 0 && index < getNumItems() ? (*m_labels)[static_cast<size_t>(index)] : HString();
-}
+HString EnumAttribute::getEnumValue() const { return m_labels ? itemAt(*m_labels, getIndex()) : HString(); }
 
 int EnumAttribute::findLabel(HString const& label) const { return indexOf(m_labels, label); }
 
@@ -229,12 +235,6 @@ bool EnumAttribute::setValue(HString const& label, bool undoable, bool notify, b
 bool EnumAttribute::setIndex(int index, bool, bool notify, bool react, bool markSet) {
   if (index < 0 || index >= getNumItems()) return false;
   change(index, notify, react, markSet);
-  return true;
-}
-
-bool FloatAttribute::setValue(double value, bool, bool notify, bool react, bool markSet) {
-  if (!std::isfinite(value)) return false;
-  change(value, notify, react, markSet);
   return true;
 }
 
@@ -249,23 +249,13 @@ bool NameAttribute::setValue(HString const& value, bool, bool, int, bool, bool) 
   return getModule()->setName(value);
 }
 
-void MultiStringAttribute::setValue(HString const& value, bool, bool notify, bool react, bool markSet) {
-  change(value, notify, react, markSet);
-}
-
-void BoolAttribute::setValue(bool value, bool, bool notify, bool react, bool markSet) {
-  change(value, notify, react, markSet);
-}
-
-void VectorAttribute::setValue(Vec3 const& value, bool, bool notify, bool react, bool markSet) {
-  if (isFinite(value)) change(value, notify, react, markSet);
+HString BitFieldAttribute::getLabel(int field) const {
+  return m_labels ? itemAt(*m_labels, field) : HString();
 }
 
 int BitFieldAttribute::findLabel(HString const& label) const { return indexOf(m_labels, label); }
 
-bool BitFieldAttribute::getField(int field) const {
-  return field >= 0 && field < getNumFields() && valueAs<Bits>()[static_cast<size_t>(field)];
-}
+bool BitFieldAttribute::getField(int field) const { return itemAt(valueAs<Bits>(), field); }
 
 bool BitFieldAttribute::setValue(HString const& label, bool on, bool, bool notify, bool react, bool markSet) {
   const int field = findLabel(label);
@@ -274,10 +264,6 @@ bool BitFieldAttribute::setValue(HString const& label, bool on, bool, bool notif
   bits[static_cast<size_t>(field)] = on;
   change(std::move(bits), notify, react, markSet);
   return true;
-}
-
-void RotationAttribute::setValue(TalixRotation const& value, bool, bool notify, bool react, bool markSet) {
-  change(value, notify, react, markSet);
 }
 
 namespace {
@@ -294,35 +280,16 @@ double TimeAttribute::getValue() const { return timeOf(*this)->getFrameDouble(ge
 HString TimeAttribute::getStringValue() const {
   HTimeManager const* time = timeOf(*this);
   const HFrameRate rate = m_relative ? time->getFrameRate().withoutDrop() : time->getFrameRate();
-  return rate.timecodeFromFrame(time->getFrame(getTime()));
+  return rate.timecodeFromFrame(getTime() / rate.getTicksPerFrame());
 }
-
-void TimeAttribute::setValue(int64 ticks, bool, bool notify, bool react, bool markSet) {
-  change(std::clamp(ticks, -kForever, kForever), notify, react, markSet);
-}
-
-void ColorAttribute::setValue(Vec3 const& value, bool, bool notify, bool react, bool markSet) {
-  if (isFinite(value)) change(value, notify, react, markSet);
-}
-
-void ColorAttribute::setDefaultMode(bool undoable, bool notify) { unset(undoable, notify, true); }
 
 void EventAttribute::doCallBack() { change(std::monostate(), true, true, true); }
 
-void ModAttribute::setValue(Module* value, bool, bool notify, bool react, bool markSet) {
-  if (value && getModule() && value->getDatabase() != getModule()->getDatabase()) return;
-  change(value, notify, react, markSet);
-}
-
-void MatrixAttribute::setValue(Matrix const& value, bool, bool notify, bool react, bool markSet) {
-  for (uint64 row = 0; row < value.rows(); ++row)
-    if (!std::all_of(value[row], value[row] + value.cols(), [](double v) { return std::isfinite(v); }))
-      return;
-  change(value, notify, react, markSet);
-}
-
-void MultiModAttribute::setValue(TSimpleArray<Module*>& value, bool, bool notify, bool react, bool markSet) {
+bool MultiModAttribute::setValue(TSimpleArray<Module*>& value, bool, bool notify, bool react, bool markSet) {
   for (Module const* module : value)
-    if (module && getModule() && module->getDatabase() != getModule()->getDatabase()) return;
+    if (!isOfScene(module)) return false;
   change(Modules(value.begin(), value.end()), notify, react, markSet);
+  return true;
 }
+
+Module* MultiModAttribute::getModuleValue(int i) const { return itemAt(valueAs<Modules>(), i); }

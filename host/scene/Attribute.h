@@ -7,6 +7,7 @@
 #pragma once
 
 #include <memory>
+#include <type_traits>
 #include <variant>
 #include <vector>
 
@@ -83,6 +84,16 @@ class Attribute : public HObject, private ModuleReferrer {
   T const& valueAs() const {
     return *std::get_if<T>(&m_value);
   }
+  // Whether a module (null: none) is one of this attribute's own scene.
+  bool isOfScene(Module const* module) const;
+  static bool isInLimits(double value);
+  static bool isInLimits(int64 ticks);
+  static bool isInLimits(Vec3 const& value);
+  static bool isInLimits(Matrix const& value);
+  template <class T>
+  static bool isInLimits(T const&) {
+    return true;
+  }
 
  private:
   friend class Module;
@@ -108,26 +119,103 @@ class Attribute : public HObject, private ModuleReferrer {
   uint64 m_undoMark = 0;
 };
 
-// Integers that a kind of attribute holds: getValue and setValue.
-class IntAttribute : public Attribute {
-  H_DECLARE_CLASS(IntAttribute, Attribute)
-
+// A kind of attribute that holds one value as it is given.
+template <class T, Attribute::Type kType>
+class ValueAttribute : public Attribute {
  public:
-  explicit IntAttribute(int value = 0) : Attribute(value) {}
-  Type getType() const override { return Integer; }
-  int getValue() const { return valueAs<int>(); }
-  bool setValue(int value, bool undoable, bool notify, bool react, bool markSet);
+  using Given = std::conditional_t<std::is_scalar_v<T>, T, T const&>;
+
+  explicit ValueAttribute(T value = {}) : Attribute(Value(std::in_place_type<T>, std::move(value))) {}
+  Type getType() const override { return kType; }
+  Given getValue() const { return valueAs<T>(); }
+  virtual bool setValue(Given value, bool, bool notify, bool react, bool markSet) {
+    if (!canHold(value)) return false;
+    change(Value(std::in_place_type<T>, value), notify, react, markSet);
+    return true;
+  }
+
+ protected:
+  // Numbers are finite, times lie on the time line.
+  virtual bool canHold(Given value) const { return isInLimits(value); }
+};
+
+class IntAttribute : public ValueAttribute<int, Attribute::Integer> {
+  H_DECLARE_CLASS(IntAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
 };
 
 // Whole degrees Celsius.
-class TemperatureAttribute : public Attribute {
+class TemperatureAttribute : public ValueAttribute<int, Attribute::Temperature> {
   H_DECLARE_CLASS(TemperatureAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
+};
 
- public:
-  explicit TemperatureAttribute(int value = 0) : Attribute(value) {}
-  Type getType() const override { return Temperature; }
-  int getValue() const { return valueAs<int>(); }
-  bool setValue(int value, bool undoable, bool notify, bool react, bool markSet);
+class FloatAttribute : public ValueAttribute<double, Attribute::Float> {
+  H_DECLARE_CLASS(FloatAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
+};
+
+class BoolAttribute : public ValueAttribute<bool, Attribute::Boolean> {
+  H_DECLARE_CLASS(BoolAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
+};
+
+class VectorAttribute : public ValueAttribute<Vec3, Attribute::Vector> {
+  H_DECLARE_CLASS(VectorAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
+};
+
+class RotationAttribute : public ValueAttribute<TalixRotation, Attribute::Rotation> {
+  H_DECLARE_CLASS(RotationAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
+};
+
+class MatrixAttribute : public ValueAttribute<Matrix, Attribute::MatrixKind> {
+  H_DECLARE_CLASS(MatrixAttribute, Attribute)
+  MatrixAttribute() : ValueAttribute(Matrix(3)) {}
+};
+
+// Text of several lines.
+class MultiStringAttribute : public ValueAttribute<HString, Attribute::MultiString> {
+  H_DECLARE_CLASS(MultiStringAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
+};
+
+// Another module, or none. A module that leaves the scene is no longer referenced; one of another scene is
+// not taken.
+class ModAttribute : public ValueAttribute<Module*, Attribute::ModuleReference> {
+  H_DECLARE_CLASS(ModAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
+
+ protected:
+  bool canHold(Module* value) const override { return isOfScene(value); }
+};
+
+// Ticks, shown in frames and timecode.
+class TimeAttribute : public ValueAttribute<int64, Attribute::Time> {
+  H_DECLARE_CLASS(TimeAttribute, Attribute)
+
+  explicit TimeAttribute(int64 ticks = 0, bool relative = false)
+      : ValueAttribute(ticks), m_relative(relative) {}
+  int64 getTime() const { return ValueAttribute::getValue(); }
+  double getValue() const;                        // frames at its scene's rate
+  HString getStringValue() const;                 // timecode of the whole frames
+  bool isRelative() const { return m_relative; }  // a length of time rather than a moment
+
+ private:
+  bool m_relative;
+};
+
+// Red, green and blue, 0 to 255. In default mode it follows the scene's colour for its kind.
+class ColorAttribute : public ValueAttribute<Vec3, Attribute::Color> {
+  H_DECLARE_CLASS(ColorAttribute, Attribute)
+  using ValueAttribute::ValueAttribute;
+
+  bool isDefaultMode() const { return !isSet(); }
+  void setDefaultMode(bool undoable, bool notify) { unset(undoable, notify, true); }
+
+ protected:
+  bool canHold(Vec3 const& value) const override;
 };
 
 class EnumAttribute : public Attribute {
@@ -146,16 +234,6 @@ class EnumAttribute : public Attribute {
 
  private:
   Labels m_labels;
-};
-
-class FloatAttribute : public Attribute {
-  H_DECLARE_CLASS(FloatAttribute, Attribute)
-
- public:
-  explicit FloatAttribute(double value = 0) : Attribute(value) {}
-  Type getType() const override { return Float; }
-  double getValue() const { return valueAs<double>(); }
-  bool setValue(double value, bool undoable, bool notify, bool react, bool markSet);
 };
 
 class StringAttribute : public Attribute {
@@ -180,37 +258,6 @@ class NameAttribute final : public StringAttribute {
                 bool markSet) override;
 };
 
-// Text of several lines.
-class MultiStringAttribute : public Attribute {
-  H_DECLARE_CLASS(MultiStringAttribute, Attribute)
-
- public:
-  explicit MultiStringAttribute(HString const& value = {}) : Attribute(value) {}
-  Type getType() const override { return MultiString; }
-  HString getValue() const { return valueAs<HString>(); }
-  void setValue(HString const& value, bool undoable, bool notify, bool react, bool markSet);
-};
-
-class BoolAttribute : public Attribute {
-  H_DECLARE_CLASS(BoolAttribute, Attribute)
-
- public:
-  explicit BoolAttribute(bool value = false) : Attribute(value) {}
-  Type getType() const override { return Boolean; }
-  bool getValue() const { return valueAs<bool>(); }
-  void setValue(bool value, bool undoable, bool notify, bool react, bool markSet);
-};
-
-class VectorAttribute : public Attribute {
-  H_DECLARE_CLASS(VectorAttribute, Attribute)
-
- public:
-  explicit VectorAttribute(Vec3 const& value = {}) : Attribute(value) {}
-  Type getType() const override { return Vector; }
-  Vec3 const& getValue() const { return valueAs<Vec3>(); }
-  virtual void setValue(Vec3 const& value, bool undoable, bool notify, bool react, bool markSet);
-};
-
 class BitFieldAttribute : public Attribute {
   H_DECLARE_CLASS(BitFieldAttribute, Attribute)
 
@@ -219,7 +266,7 @@ class BitFieldAttribute : public Attribute {
       : Attribute(Bits(labels ? labels->size() : 0)), m_labels(std::move(labels)) {}
   Type getType() const override { return BitField; }
   int getNumFields() const { return static_cast<int>(valueAs<Bits>().size()); }
-  HString getLabel(int field) const { return (*m_labels)[static_cast<size_t>(field)]; }
+  HString getLabel(int field) const;  // empty outside the fields
   Labels const& getLabels() const { return m_labels; }
   int findLabel(HString const& label) const;  // exact case; -1: none
   bool getField(int field) const;             // false outside the fields
@@ -228,46 +275,6 @@ class BitFieldAttribute : public Attribute {
 
  private:
   Labels m_labels;
-};
-
-class RotationAttribute : public Attribute {
-  H_DECLARE_CLASS(RotationAttribute, Attribute)
-
- public:
-  explicit RotationAttribute(TalixRotation const& value = {}) : Attribute(value) {}
-  Type getType() const override { return Rotation; }
-  TalixRotation const& getValue() const { return valueAs<TalixRotation>(); }
-  virtual void setValue(TalixRotation const& value, bool undoable, bool notify, bool react, bool markSet);
-};
-
-// Ticks, shown in frames and timecode.
-class TimeAttribute : public Attribute {
-  H_DECLARE_CLASS(TimeAttribute, Attribute)
-
- public:
-  explicit TimeAttribute(int64 ticks = 0, bool relative = false) : Attribute(ticks), m_relative(relative) {}
-  Type getType() const override { return Time; }
-  int64 getTime() const { return valueAs<int64>(); }
-  double getValue() const;                        // frames at its scene's rate
-  HString getStringValue() const;                 // timecode of the whole frames
-  bool isRelative() const { return m_relative; }  // a length of time rather than a moment
-  void setValue(int64 ticks, bool undoable, bool notify, bool react, bool markSet);
-
- private:
-  bool m_relative;
-};
-
-// Red, green and blue, 0 to 255. In default mode it follows the scene's colour for its kind.
-class ColorAttribute : public Attribute {
-  H_DECLARE_CLASS(ColorAttribute, Attribute)
-
- public:
-  explicit ColorAttribute(Vec3 const& value = {}) : Attribute(value) {}
-  Type getType() const override { return Color; }
-  Vec3 const& getValue() const { return valueAs<Vec3>(); }
-  bool isDefaultMode() const { return !isSet(); }
-  void setValue(Vec3 const& value, bool undoable, bool notify, bool react, bool markSet);
-  void setDefaultMode(bool undoable, bool notify);
 };
 
 // A button: running it calls the module back.
@@ -288,28 +295,6 @@ class NoneAttribute : public Attribute {
   Type getType() const override { return NoKind; }
 };
 
-// Another module, or none. A module that leaves the scene is no longer referenced; one of another scene is
-// not taken.
-class ModAttribute : public Attribute {
-  H_DECLARE_CLASS(ModAttribute, Attribute)
-
- public:
-  ModAttribute() : Attribute(static_cast<Module*>(nullptr)) {}
-  Type getType() const override { return ModuleReference; }
-  Module* getValue() const { return valueAs<Module*>(); }
-  void setValue(Module* value, bool undoable, bool notify, bool react, bool markSet);
-};
-
-class MatrixAttribute : public Attribute {
-  H_DECLARE_CLASS(MatrixAttribute, Attribute)
-
- public:
-  MatrixAttribute() : Attribute(Matrix(3)) {}
-  Type getType() const override { return MatrixKind; }
-  Matrix const& getValue() const { return valueAs<Matrix>(); }
-  virtual void setValue(Matrix const& value, bool undoable, bool notify, bool react, bool markSet);
-};
-
 // Modules in order; an entry may be null. None of another scene is taken.
 class MultiModAttribute : public Attribute {
   H_DECLARE_CLASS(MultiModAttribute, Attribute)
@@ -318,6 +303,6 @@ class MultiModAttribute : public Attribute {
   MultiModAttribute() : Attribute(Modules()) {}
   Type getType() const override { return MultiModule; }
   int getNumModules() const { return static_cast<int>(valueAs<Modules>().size()); }
-  Module* getModuleValue(int i) const { return valueAs<Modules>()[static_cast<size_t>(i)]; }
-  void setValue(TSimpleArray<Module*>& value, bool undoable, bool notify, bool react, bool markSet);
+  Module* getModuleValue(int i) const;  // null beyond them
+  bool setValue(TSimpleArray<Module*>& value, bool undoable, bool notify, bool react, bool markSet);
 };

@@ -4,6 +4,7 @@
 #include <memory>
 #include <vector>
 
+#include "host/base/ItemAt.h"
 #include "host/math/TalixRotation.h"
 #include "host/time/HTimeRange.h"
 
@@ -18,6 +19,7 @@ class ClipboardManager {
            z = 0;             // one-valued channels use x; rotations are Euler radians in the source's order
     unsigned components = 0;  // 1 x, 2 y, 4 z
     unsigned flags = 0;       // the key's own, as its channel reports them
+    unsigned bridges = 0;     // components whose data goes on to the next record that has them
   };
 
   // What is added until finishClipboardCopy replaces the content; keep: false takes the copy back. order: the
@@ -31,7 +33,7 @@ class ClipboardManager {
   ControllerDataType getControllerDataType() const { return m_type; }
   TalixRotation::RotOrder getRotationOrder() const { return m_order; }
   int getNumControllerKeys() const { return m_keys ? static_cast<int>(m_keys->size()) : 0; }
-  tagKey getControllerKey(int i) const { return (*m_keys)[static_cast<size_t>(i)]; }
+  tagKey getControllerKey(int i) const { return m_keys ? itemAt(*m_keys, i) : tagKey(); }
   // From the earliest to the latest key; empty without keys.
   HTimeRange getControllerDataRange() const;
 

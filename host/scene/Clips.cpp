@@ -2,6 +2,7 @@
 
 #include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
+#include "host/scene/HTimeManager.h"
 
 H_DEFINE_ABSTRACT_CLASS(NLEClip);
 H_DEFINE_CLASS(Clip);
@@ -48,15 +49,43 @@ int NLEClip::addLayer() {
   return getNumLayers() - 1;
 }
 
-bool NLEClip::isLayerLocked(int layer) const {
-  return layer >= 0 && layer < getNumLayers() && m_layerLocks[static_cast<size_t>(layer)];
-}
+bool NLEClip::isLayerLocked(int layer) const { return itemAt(m_layerLocks, layer); }
 
 void NLEClip::setLayerLocked(int layer, bool locked) {
   if (layer < 0 || layer >= getNumLayers()) return;
   std::vector<bool> locks = m_layerLocks;
   locks[static_cast<size_t>(layer)] = locked;
   storeLayerLocks(std::move(locks));
+}
+
+int64 NLEClip::getFramePeriod() const { return getDatabase()->getTimeManager()->getTicksPerFrame(); }
+
+struct Clip::FileTimeChange : UndoChange {
+  explicit FileTimeChange(Clip& concerned)
+      : UndoChange(&concerned), clip(concerned), time(concerned.m_fileTime) {}
+  void swap() override { std::swap(clip.m_fileTime, time); }
+  bool isVoid() const override { return time == clip.m_fileTime; }
+  int64 memoryUse() const override { return sizeof *this; }
+
+  void tell(ChangeSetBuilder& changes) const override {
+    const auto text = [](FileTime const& of) {
+      return textOf(Attribute::Value(of.rate)) + " " + std::to_string(of.firstFrame) + " " +
+             std::to_string(of.frameCount) + " " + textOf(Attribute::Value(of.sampleRate));
+    };
+    changes.tell(SceneChange::Kind::attribute, &clip, "FileTime", text(time), text(clip.m_fileTime));
+  }
+
+  Clip& clip;
+  FileTime time;
+};
+
+void Clip::setFileTime(FileTime const& time) {
+  if (isRecorded()) journal().add(std::make_unique<FileTimeChange>(*this));
+  m_fileTime = time;
+}
+
+int64 Clip::getFramePeriod() const {
+  return m_fileTime.rate > 0 ? ticksPerFrameAt(m_fileTime.rate) : NLEClip::getFramePeriod();
 }
 
 void Clip::setUp() {

@@ -15,12 +15,14 @@ class NLEClip : public Module {
 
   // Layers count from 0; every clip has at least one. Channels hold keys by layer.
   int getNumLayers() const { return static_cast<int>(m_layerLocks.size()); }
-  int addLayer();  // answers its number
+  int addLayer();  // returns its number
   bool isLayerLocked(int layer) const;
   void setLayerLocked(int layer, bool locked);
 
   // Whether channels can hold keys in this clip.
   virtual bool holdsKeys() const { return true; }
+  // Ticks from frame to frame, by which its gaps go and it is saved: the scene's.
+  virtual int64 getFramePeriod() const;
   FloatController* getWeightChannel() const { return m_weight; }
 
  protected:
@@ -45,6 +47,20 @@ class Clip : public NLEClip {
   // One that is not in the scene yet.
   static Clip* createInstance();
 
+  // Of the file that it was read from. Its frames lie at the multiples of one frame's time.
+  struct FileTime {
+    double rate = 0;        // frames a second; 0: the clip is from no file
+    int64 firstFrame = 0;   // in the file's numbers
+    int64 frameCount = 0;   // those without data included
+    double sampleRate = 0;  // of devices, samples a second; 0: none
+
+    bool operator==(FileTime const&) const = default;
+  };
+  FileTime const& getFileTime() const { return m_fileTime; }
+  void setFileTime(FileTime const& time);
+  // The file's, else the scene's.
+  int64 getFramePeriod() const override;
+
   // Timecode offset, in ticks.
   int64 getSmpteOffset() const { return m_smpteOffset->getTime(); }
   void setSmpteOffset(int64 ticks);
@@ -53,7 +69,10 @@ class Clip : public NLEClip {
   void setUp() override;
 
  private:
+  struct FileTimeChange;
+
   TimeAttribute* m_smpteOffset = nullptr;
+  FileTime m_fileTime;
 };
 
 // Mixes its source clips ("Sources") by their "Weight" channels; holds no keys of its own.

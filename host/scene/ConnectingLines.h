@@ -3,7 +3,7 @@
 
 #include <vector>
 
-#include "host/base/Types.h"
+#include "host/base/ItemAt.h"
 #include "host/scene/MarkerConnection.h"
 #include "host/scene/ModuleReferrer.h"
 
@@ -15,7 +15,7 @@ class ConnectingLines final : private ModuleReferrer {
   ConnectingLines& operator=(ConnectingLines const&) = delete;
 
   int getCount() const { return static_cast<int>(m_lines.size()); }
-  MarkerConnection const& at(int i) const { return m_lines[static_cast<size_t>(i)]; }
+  MarkerConnection at(int i) const { return itemAt(m_lines, i); }
   bool leadTo(Node const* target) const;       // constant time
   MarkerConnection* find(Node const* target);  // null: none
   // Mutator: the line to a target, null for none.

@@ -6,11 +6,10 @@
 #include <cmath>
 
 #include "host/scene/Clips.h"
-#include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
+#include "host/scene/Devices.h"
 #include "host/scene/Editability.h"
-#include "host/scene/HTimeManager.h"
-#include "host/scene/MarkerRuns.h"
+#include "host/scene/Marker.h"
 
 H_DEFINE_ABSTRACT_CLASS(DataSource);
 H_DEFINE_ABSTRACT_CLASS(Controller);
@@ -77,7 +76,7 @@ void Controller::setDefaultValues(Values const& values) {
 
 void Controller::writeKeyAt(int64 time, Values const& values, unsigned mask) {
   if (!areFinite(values, mask)) return;
-  const DataEdit edit(*this, HTimeRange(time, time));
+  const OwnEdit edit(*this, HTimeRange(time, time));
   KeyTrack* track = editTrack(time, time);
   if (!track) return;
   // A new key of a one-valued or rotation channel is whole whatever the mask.
@@ -86,30 +85,40 @@ void Controller::writeKeyAt(int64 time, Values const& values, unsigned mask) {
 }
 
 void Controller::writeKey(int key, Values const& values, unsigned mask) {
-  if (KeyTrack const* track = findActiveTrack()) writeKeyAt(track->timeAt(key), values, mask);
+  if (KeyTrack const* track = activeTrackWith(key)) writeKeyAt(track->timeAt(key), values, mask);
 }
 
 void Controller::readKey(int key, Values& values) const {
-  KeyTrack const* track = findActiveTrack();
+  KeyTrack const* track = activeTrackWith(key);
   values = track ? track->at(key).values : m_default;
 }
 
 int Controller::selectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  const DataEdit edit(*this, range);
+  const OwnEdit edit(*this, range);
   return static_cast<int>(
       editTrack(range.getStart(), range.getEnd())->select(range.getStart(), range.getEnd(), mask));
 }
 
 int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  const DataEdit edit(*this, range);
+  const OwnEdit edit(*this, range);
   return static_cast<int>(
       editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
 }
 
+int64 Controller::getDataPeriod(NLEClip const& clip) const {
+  const int64 frame = clip.getFramePeriod();
+  auto const* taken = objectAs<Clip>(&clip);
+  const double rate = taken ? taken->getFileTime().sampleRate : 0;
+  if (!(rate > 0) || getPropertyType() != FloatProperty || !objectAs<AnalogDevice>(m_module)) return frame;
+  // Samples that do not go with the frames are not at multiples of their period.
+  const int64 sample = ticksPerFrameAt(rate);
+  return frame % sample == 0 ? sample : frame;
+}
+
 KeyTrack::BridgeEnds Controller::bridgeEnds() const {
-  return {m_interpolation, HTimeManager::getInstance()->getTicksPerFrame()};
+  return {m_interpolation, getDataPeriod(*getDatabase()->getActiveClip())};
 }
 
 int Controller::deleteKey(int64 time, unsigned mask) {
@@ -117,17 +126,21 @@ int Controller::deleteKey(int64 time, unsigned mask) {
 }
 
 int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers) {
-  const DataEdit edit(*this, range);
+  const OwnEdit edit(*this, range);
   int64 deleted = 0;
   Database const& scene = *getDatabase();
   NLEClip* clip = scene.getActiveClip();
   const int64 first = range.getStart(), last = range.getEnd();
-  const CutRuns cut(*this, first, last);
-  for (ClipTrack const& track : m_tracks)
-    if (track.clip == clip && (track.layer == scene.getActiveLayer() ||
-                               (allLayers && obstacleToKeys(*this, clip, track.layer) == Obstacle::none)))
-      deleted += trackToDelete(clip, track.layer, first, last)->deleteRange(first, last, mask, bridgeEnds());
-  if (deleted) changed();
+  bool bridged = false;  // data may go without a key
+  for (ClipTrack const& track : m_tracks) {
+    if (track.clip != clip || (track.layer != scene.getActiveLayer() &&
+                               !(allLayers && obstacleToKeys(*this, clip, track.layer) == Obstacle::none)))
+      continue;
+    KeyTrack* edited = trackToDelete(clip, track.layer, first, last);
+    bridged = bridged || edited->bridgesAny(mask);
+    deleted += edited->deleteRange(first, last, mask, bridgeEnds());
+  }
+  if (deleted || bridged) changed();
   return static_cast<int>(deleted);
 }
 
@@ -136,14 +149,20 @@ int Controller::deleteSelectedKeys(unsigned mask) {
   if (!track || track->countSelected() == 0) return 0;
   const int64 first = track->timeAt(track->selectedIndex(0));
   const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
-  const DataEdit edit(*this, HTimeRange(first, last));
-  const CutRuns cut(*this, first, last);
+  const OwnEdit edit(*this, HTimeRange(first, last));
   NLEClip* clip = getDatabase()->getActiveClip();
   const int layer = getDatabase()->getActiveLayer();
   KeyTrack* edited = track->bridgesAny() ? &replaceTrack(clip, layer) : editTrack(first, last);
   const int64 deleted = edited->deleteSelected(mask, bridgeEnds());
   if (deleted) changed();
   return static_cast<int>(deleted);
+}
+
+void Controller::bridgeKeys(HTimeRange const& range, unsigned mask) {
+  if (!findActiveTrack()) return;
+  const OwnEdit edit(*this, range);
+  editTrack(range.getStart(), range.getEnd())->bridge(range.getStart(), range.getEnd(), mask);
+  changed();
 }
 
 bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo) {
@@ -198,6 +217,22 @@ KeyTrack const* Controller::findActiveTrack() const {
   return clip ? findTrack(clip, scene.getActiveLayer()) : nullptr;
 }
 
+KeyTrack const* Controller::activeTrackWith(int key) const {
+  KeyTrack const* track = findActiveTrack();
+  return track && key >= 0 && key < track->count() ? track : nullptr;
+}
+
+KeyTrack const* Controller::findDataTrack(NLEClip const* clip) const {
+  for (int layer = 0; clip && layer < clip->getNumLayers(); ++layer)
+    if (KeyTrack const* track = findTrack(clip, layer); track && !track->empty()) return track;
+  return nullptr;
+}
+
+bool Controller::isMeasured() const {
+  if (auto const* marker = objectAs<Marker>(m_module)) return marker->getTranslationChannel() == this;
+  return objectAs<AnalogDevice>(m_module) != nullptr;
+}
+
 int Controller::getNumKeys() const {
   KeyTrack const* track = findActiveTrack();
   return track ? asInt(track->count()) : 0;
@@ -220,7 +255,7 @@ int Controller::getNumSelectedKeys(unsigned mask) const {
 
 int Controller::getSelectedKeyIndex(int i) const {
   KeyTrack const* track = findActiveTrack();
-  return track && i < track->countSelected() ? asInt(track->selectedIndex(i)) : -1;
+  return track && i >= 0 && i < track->countSelected() ? asInt(track->selectedIndex(i)) : -1;
 }
 
 unsigned Controller::getSelectedKeyFlags(int i) const {
@@ -229,12 +264,12 @@ unsigned Controller::getSelectedKeyFlags(int i) const {
 }
 
 int64 Controller::getKeyTime(int key) const {
-  KeyTrack const* track = findActiveTrack();
+  KeyTrack const* track = activeTrackWith(key);
   return track ? track->timeAt(key) : 0;
 }
 
 bool Controller::keyHasComponents(int key, unsigned mask) const {
-  KeyTrack const* track = findActiveTrack();
+  KeyTrack const* track = activeTrackWith(key);
   return track && (track->at(key).components & mask) == mask;
 }
 
@@ -345,7 +380,7 @@ int Controller::getNumInterpTypes() const { return m_numInterpTypes; }
 
 char const* Controller::getInterpTypeName(int i) const {
   static constexpr char const* names[] = {"Constant", "Linear", "Cubic"};
-  return names[i];
+  return i >= 0 && i < m_numInterpTypes ? names[i] : nullptr;
 }
 
 void Controller::setInterpType(int i) {
@@ -358,7 +393,7 @@ void Controller::setInterpType(int i) {
 // --- clips and layers ---
 
 void Controller::setTrack(NLEClip* clip, int layer, KeyTrack track) {
-  const DataEdit edit(*this);
+  const OwnEdit edit(*this);
   assert(track.shape() == shapeOf(getPropertyType()));
   replaceTrack(clip, layer) = std::move(track);
   changed();
@@ -383,12 +418,12 @@ void Controller::forgetClip(NLEClip const* clip) {
   std::copy_if(m_tracks.begin(), m_tracks.end(), std::back_inserter(others),
                [&](ClipTrack const& track) { return track.clip != clip; });
   if (others.size() == m_tracks.size()) return;
-  const DataEdit edit(*this);
+  const OwnEdit edit(*this);
   storeTracks(std::move(others));
 }
 
 void Controller::restore(State const& state) {
-  const DataEdit edit(*this);
+  const OwnEdit edit(*this);
   storeTracks(state.tracks);
   setDefaultValues(state.byDefault);
   setInterpType(static_cast<int>(state.interpolation));

@@ -33,6 +33,7 @@ class UndoChange;
 struct TrackName;
 class Module;
 class NLEClip;
+class SampleTimes;
 struct ReductionTolerances;
 
 class Controller : public DataSource {
@@ -73,7 +74,8 @@ class Controller : public DataSource {
   virtual void beginDataEdit(HTimeRange const& range);
   virtual void endDataEdit();
 
-  // --- keys of the active layer ---
+  // --- keys of the active layer; a key beyond them has no time (0), components or flags, its value is the
+  // default one, and none is written ---
   virtual int getNumKeys() const;
   virtual int getNumKeys(unsigned mask) const;
   virtual int getNumSelectedKeys() const;
@@ -90,15 +92,17 @@ class Controller : public DataSource {
 
   virtual int selectKeys(HTimeRange const& range, unsigned mask);
   virtual int deselectKeys(HTimeRange const& range, unsigned mask);
-  // These answer how many keys lost something. allLayers: in every layer of the active clip that
-  // is not locked.
+  // These return how many keys lost something, and take away no other data than what was chosen: a key, all
+  // frames of a range, the selected keys and what lies between neighbours among them (KeyTrack::deleteRange).
+  // allLayers: in every layer of the active clip that is not locked.
   virtual int deleteKey(int64 time, unsigned mask);
   virtual int deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers);
   virtual int deleteSelectedKeys(unsigned mask);
+  // Lets the keys in a range bridge these components to their next keys, so that there is data between them.
+  void bridgeKeys(HTimeRange const& range, unsigned mask);
   // Removes the keys in the ranges (sorted and disjoint; the selected keys) that the curve of the layer does
-  // not need within the tolerances, measured against the curve as it is now (KeyReduction.h says how). A
-  // marker's fill type becomes "reduced" at the key before each run that goes. They answer how many keys lost
-  // something.
+  // not need within the tolerances, measured against the curve as it is now (KeyReduction.h says how). What
+  // stays bridges over them. They return how many keys lost something.
   int reduceKeys(std::span<HTimeRange const> ranges, ReductionTolerances const& tolerances);
   int reduceSelectedKeys(ReductionTolerances const& tolerances);
 
@@ -107,7 +111,7 @@ class Controller : public DataSource {
   // Values that are not finite are not written.
   void writeKey(int key, Values const& values, unsigned mask);
   void writeKeyAt(int64 time, Values const& values, unsigned mask);
-  void evaluate(int64 time, Values& values) const;
+  virtual void evaluate(int64 time, Values& values) const;
   // The value of the active layer alone, to which a relative edit adds.
   void evaluateLayer(int64 time, Values& values) const;
   // The value that the active layer must have at a time for all layers together to give `wanted`.
@@ -117,8 +121,8 @@ class Controller : public DataSource {
 
   // --- interpolation ---
   virtual int getNumInterpTypes() const;
-  virtual char const* getInterpTypeName(int i) const;
-  virtual void setInterpType(int i);  // a number that is none of the channel's is not taken
+  virtual char const* getInterpTypeName(int i) const;  // null beyond them
+  virtual void setInterpType(int i);                   // a number that is none of the channel's is not taken
   Interpolation getInterpolation() const { return m_interpolation; }
 
   // --- clips and layers
@@ -126,16 +130,28 @@ class Controller : public DataSource {
   // clip and layer; null when it has none there.
   KeyTrack const* findTrack(NLEClip const* clip, int layer) const;
   KeyTrack const* findActiveTrack() const;
+  // Calls visit(clip, layer, track) for all tracks, empty ones too.
+  template <class Visit>
+  void forEachTrack(Visit visit) const {
+    for (ClipTrack const& each : m_tracks) visit(each.clip, each.layer, each.track);
+  }
+  // The values at ascending times in a clip that holds keys (null: the default value), as KeyTrack holds
+  // them, one after the other. Several threads may do so at once.
+  void sample(NLEClip const* clip, SampleTimes const& times, double* out) const;
+  // The keys that tell where the channel has data in a clip (DataRanges.h): those of the lowest layer that
+  // has any; null without keys.
+  KeyTrack const* findDataTrack(NLEClip const* clip) const;
+  // Whether its values are measurements, which are never made up where there is no data: a marker's
+  // translation, a device's channels. Other channels have values at all times.
+  bool isMeasured() const;
+  // Ticks between the times at which it may have data in a clip: the clip's frames, the samples of a device's
+  // float channels.
+  int64 getDataPeriod(NLEClip const& clip) const;
   // Replaces the keys in a clip and layer: how importers, copies and undo put whole tracks in place.
   void setTrack(NLEClip* clip, int layer, KeyTrack track);
   bool hasKeysInClip(NLEClip const* clip) const;
   HTimeRange getKeyRangeInClip(NLEClip const* clip) const;
   void forgetClip(NLEClip const* clip);
-  // Calls visit(clip, layer) for every track, with or without keys.
-  template <class Visit>
-  void forEachTrack(Visit visit) const {
-    for (ClipTrack const& track : m_tracks) visit(track.clip, track.layer);
-  }
   // The change of single keys that a kept undo step holds as bytes.
   static std::unique_ptr<UndoChange> unpackKeys(TrackName const& track, PackedStep& step);
 
@@ -143,12 +159,13 @@ class Controller : public DataSource {
   // Locked layers stay as they are, with a warning. False when the kinds differ or no layer is editable.
   virtual bool copyFrom(Controller const* source, bool keys, bool selectionToo);
 
+  // What adds nothing in a layer above the lowest.
+  virtual Values neutral() const { return {}; }
+
   // The shape that keys of a kind of channel have.
   static KeyTrack::Shape shapeOf(PropertyType type);
 
  protected:
-  // Adds nothing in a layer above the lowest.
-  virtual Values neutral() const { return {}; }
   Controller(Interpolation interpolation, int numInterpTypes)
       : m_interpolation(interpolation), m_numInterpTypes(static_cast<unsigned char>(numInterpTypes)) {}
   // Layers above the lowest: adds `layer` to `values`.
@@ -177,6 +194,7 @@ class Controller : public DataSource {
     KeyChange* change = nullptr;  // that of the undo step in undoMark
   };
   ClipTrack const* find(NLEClip const* clip, int layer) const;
+  KeyTrack const* activeTrackWith(int key) const;  // null when it has no key of that index
   // The mutator of a track: that of the active layer, made when there is none, for an edit of keys from
   // `first` to `last`; only at a single time it may add one. Null on the base clip.
   KeyTrack* editTrack(int64 first, int64 last);
@@ -189,6 +207,22 @@ class Controller : public DataSource {
   ClipTrack& clipTrack(NLEClip* clip, int layer);
   // The change of a track in this undo step; null when none is to be recorded.
   KeyChange* changeOf(ClipTrack& track);
+  // An edit, unless one is open.
+  class OwnEdit {
+   public:
+    explicit OwnEdit(Controller& channel, HTimeRange const& range = HTimeRange::forever())
+        : m_channel(channel.m_editDepth == 0 ? &channel : nullptr) {
+      if (m_channel) m_channel->beginDataEdit(range);
+    }
+    ~OwnEdit() {
+      if (m_channel) m_channel->endDataEdit();
+    }
+    OwnEdit(OwnEdit const&) = delete;
+    OwnEdit& operator=(OwnEdit const&) = delete;
+
+   private:
+    Controller* m_channel;
+  };
   void checkEdit() const { assert(m_editDepth > 0 && "keys change outside of an edit"); }
   void recordSettings();
   int64 memoryAlone() const;

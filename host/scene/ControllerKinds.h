@@ -87,8 +87,9 @@ class RotController : public Controller {
 
   Values solveLayer(int64 time, Values const& wanted) const override;
 
- protected:
   Values neutral() const override { return {0, 0, 0, 1}; }
+
+ protected:
   void compose(Values& values, Values const& layer) const override;
   void blend(Values const* values, double const* weights, int count, Values& out) const override;
 };

@@ -6,9 +6,6 @@
 #include "host/scene/Clips.h"
 #include "host/scene/Controller.h"
 #include "host/scene/Database.h"
-#include "host/scene/Devices.h"
-#include "host/scene/HTimeManager.h"
-#include "host/scene/MarkerRuns.h"
 #include "host/services/HInterface.h"
 
 namespace {
@@ -21,16 +18,6 @@ bool isLength(Controller const& channel) {
 double toleranceFor(Controller const& channel, KeyTrack const& track, ReductionTolerances const& tolerances) {
   if (channel.getPropertyType() == DataSource::RotProperty) return tolerances.angle;
   return isLength(channel) ? tolerances.length : tolerances.ofRange * valueRange(track);
-}
-
-// The marker whose occlusion the keys of this layer tell: those of its positions, in the lowest layer that
-// has any. Null for all other keys.
-Marker* markerSeenBy(Controller const& channel, NLEClip const* clip, int layer) {
-  auto* marker = objectAs<Marker>(channel.getModule());
-  if (!marker || marker->getTranslationChannel() != &channel) return nullptr;
-  while (layer-- > 0)
-    if (KeyTrack const* lower = channel.findTrack(clip, layer); lower && !lower->empty()) return nullptr;
-  return marker;
 }
 
 }  // namespace
@@ -64,18 +51,15 @@ int Controller::reduce(std::function<bool(KeyTrack::Key const&)> mayGo,
   if (!active || !clip->holdsKeys()) return 0;
 
   const KeyTrack original = *active;
-  Marker* marker = markerSeenBy(*this, clip, layer);
-  ReductionRule rule{.interpolation = m_interpolation,
-                     .tolerance = toleranceFor(*this, original, tolerances),
-                     .framePeriod = scene.getTimeManager()->getTicksPerFrame(),
-                     .isWhole = getPropertyType() == IntProperty,
-                     .mayGo = std::move(mayGo),
-                     .hasGaps = marker || objectAs<AnalogDevice>(m_module)};
-  if (marker) rule.isBridged = [marker](int64 time) { return marker->isReducedBehind(time); };
+  const ReductionRule rule{.interpolation = m_interpolation,
+                           .tolerance = toleranceFor(*this, original, tolerances),
+                           .framePeriod = bridgeEnds().framePeriod,
+                           .isWhole = getPropertyType() == IntProperty,
+                           .mayGo = std::move(mayGo),
+                           .hasGaps = isMeasured() && findDataTrack(clip) == active};
   KeyTrack reduced = original;
-  const int64 removed = eraseComponents(reduced, redundantKeys(original, rule));
+  const int64 removed = reduced.thin(redundantKeys(original, rule));
   if (removed == 0) return 0;
-  if (marker) markReduced(*marker, clip, layer, original, reduced);
   setTrack(clip, layer, std::move(reduced));
   return static_cast<int>(removed);
 }

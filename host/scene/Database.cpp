@@ -158,10 +158,6 @@ bool Database::setPrimarySelectedModule(Module* module) {
   return true;
 }
 
-LabelingBone* Database::getSelectedLabelingBone(int i) const {
-  return i >= 0 && i < m_selection.getNumLabelingBones() ? m_selection.getLabelingBone(i) : nullptr;
-}
-
 void Database::selectAllModules(bool select) {
   checkThread();
   if (!select) return m_selection.clear();

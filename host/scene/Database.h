@@ -8,6 +8,7 @@
 #include <memory>
 #include <vector>
 
+#include "host/base/ItemAt.h"
 #include "host/base/Log.h"
 #include "host/base/ThreadLocal.h"
 #include "host/scene/Clips.h"
@@ -17,6 +18,7 @@ class CalibrationMgr;
 class ClipboardManager;
 class HTimeManager;
 class PropertyTable;
+class MotionScope;
 struct SceneAside;
 class SceneIndex;
 class SubjectManager;
@@ -89,7 +91,7 @@ class Database {
   Node* getSelectedNode(int i) const { return m_selection.getNode(i); }
   int getNumSelectedMarkers() const { return m_selection.getNumMarkers(); }
   Marker* getSelectedMarker(int i) const { return m_selection.getMarker(i); }
-  LabelingBone* getSelectedLabelingBone(int i) const;  // null beyond them
+  LabelingBone* getSelectedLabelingBone(int i) const { return m_selection.getLabelingBone(i); }
   void selectAllModules(bool select);
   Selection& getSelection() { return m_selection; }
 
@@ -113,7 +115,7 @@ class Database {
   // --- active properties: channels, or components of channels, that key commands work on ---
   int getNumActiveProperties() const { return static_cast<int>(m_activeProperties.size()); }
   // A property id with its component bits (PropertyTable).
-  unsigned int getActiveProperty(int i) const { return m_activeProperties[static_cast<size_t>(i)]; }
+  unsigned int getActiveProperty(int i) const { return itemAt(m_activeProperties, i); }  // 0 beyond them
   void setActiveProperties(std::vector<unsigned> ids);
   // Whether active properties follow what is keyed; off at start.
   bool getAutoUpdateProperties() const { return m_autoUpdateProperties; }
@@ -139,7 +141,7 @@ class Database {
 
   UndoJournal& getUndoJournal() { return m_journal; }
   // For steps that are discarded: what of the scene they do not tell of.
-  std::unique_ptr<SceneAside> putAside() const;
+  void putAside(SceneAside& aside) const;
   void putBack(SceneAside& aside) noexcept;
   // Puts lists in order again after undo and redo, and forgets what was cached.
   void restoreOrder();
@@ -155,6 +157,10 @@ class Database {
   HTimeManager* getTimeManager() const { return m_time.get(); }
   PropertyTable& getPropertyTable() const { return *m_properties; }
   SceneServices& getServices() const { return *m_services; }
+  // For keeping the motion of several nodes at once; null: none.
+  MotionScope* getMotionScope() const { return m_motionScope; }
+  void setMotionScope(MotionScope* scope) { m_motionScope = scope; }
+
   CalibrationMgr* getCalibrationMgr() const { return m_calibration.get(); }
   ClipboardManager* getClipboardManager() const { return m_clipboard.get(); }
   SubjectManager* getSubjectManager() const { return m_subjects.get(); }
@@ -229,6 +235,7 @@ class Database {
   SceneServices* m_services;
   std::unique_ptr<HTimeManager> m_time;
   std::unique_ptr<PropertyTable> m_properties;
+  MotionScope* m_motionScope = nullptr;
   std::unique_ptr<CalibrationMgr> m_calibration;
   std::unique_ptr<ClipboardManager> m_clipboard;
   std::unique_ptr<SubjectManager> m_subjects;

@@ -203,9 +203,7 @@ void Database::setUpAxis(int axis) {
 
 // --- what a discarded step brings back beside its changes ---
 
-std::unique_ptr<SceneAside> Database::putAside() const {
-  return std::make_unique<SceneAside>(SceneAside{m_time->getTime(), m_priority, *m_clipboard});
-}
+void Database::putAside(SceneAside& aside) const { aside = {m_time->getTime(), m_priority, *m_clipboard}; }
 
 void Database::putBack(SceneAside& aside) noexcept {
   m_time->setTime(aside.time, true);

@@ -4,6 +4,7 @@
 #include <charconv>
 #include <cmath>
 
+#include "host/base/ItemAt.h"
 #include "host/scene/Database.h"
 
 HTimeManager::HTimeManager(Database* scene) : m_scene(scene) { reset(); }
@@ -14,6 +15,7 @@ void HTimeManager::reset() {
   m_rate = HFrameRate();
   m_time = 0;
   m_animRange = m_playRange = HTimeRange(0, getTime(100));
+  m_animRangeChosen = false;
   m_selected.clear();
 }
 
@@ -31,6 +33,7 @@ void HTimeManager::swapSettings(Settings& settings) noexcept {
   std::swap(m_animRange, settings.animRange);
   std::swap(m_playRange, settings.playRange);
   m_selected.swap(settings.selected);
+  std::swap(m_animRangeChosen, settings.animRangeChosen);
 }
 
 void HTimeManager::checkThread() const {
@@ -62,8 +65,12 @@ int64 HTimeManager::getTimeFromFrameDouble(double frame) const {
   if (std::isnan(frame)) return 0;
   const int64 ticks = getTicksPerFrame();
   const double whole = std::trunc(frame);
-  if (std::abs(whole) >= static_cast<double>(kForever / ticks)) return frame < 0 ? -kForever : kForever;
+  if (!isOnTimeLine(frame)) return frame < 0 ? -kForever : kForever;
   return static_cast<int64>(whole) * ticks + std::llround((frame - whole) * static_cast<double>(ticks));
+}
+
+bool HTimeManager::isOnTimeLine(double frame) const {
+  return std::abs(std::trunc(frame)) < static_cast<double>(kForever / getTicksPerFrame());
 }
 
 int64 HTimeManager::frameTime(int64 time, ERoundDirection direction, int64 origin) const {
@@ -81,19 +88,28 @@ void HTimeManager::frameRange(HTimeRange& range, bool outward, int64 origin) {
 }
 
 double HTimeManager::stringToFrameDouble(HString const& text, bool relative) const {
-  std::string const& s = text.GetString();
   double frames = 0;
-  const auto [end, error] = std::from_chars(s.data(), s.data() + s.size(), frames);
-  if (error == std::errc() && end == s.data() + s.size() && std::isfinite(frames)) return frames;
-  const HFrameRate rate = relative ? m_rate.withoutDrop() : m_rate;
-  int64 frame = 0;
-  return rate.frameFromTimecode(text, frame) ? static_cast<double>(frame) : 0;
+  return framesFromString(text, relative, frames) ? frames : 0;
 }
 
-void HTimeManager::setAnimRange(HTimeRange range) {
+bool HTimeManager::framesFromString(HString const& text, bool relative, double& frames) const {
+  std::string const& s = text.GetString();
+  const auto [end, error] = std::from_chars(s.data(), s.data() + s.size(), frames);
+  if (error == std::errc() && end == s.data() + s.size() && std::isfinite(frames)) return true;
+  const HFrameRate rate = relative ? m_rate.withoutDrop() : m_rate;
+  int64 frame = 0;
+  if (!rate.frameFromTimecode(text, frame)) return false;
+  frames = static_cast<double>(frame);
+  return true;
+}
+
+void HTimeManager::setAnimRange(HTimeRange range, bool chosen) {
   record();
   m_animRange = range;
+  m_animRangeChosen = chosen;
 }
+
+HTimeRange HTimeManager::getSelectedTimeRange(int i) const { return itemAt(m_selected, i); }
 
 void HTimeManager::setPlayRange(HTimeRange range, bool keepTime) {
   record();

@@ -35,6 +35,7 @@ class HTimeManager {
   double getFrameDouble(int64 time) const;
   // The nearest tick; beyond the time line it is the time line's end.
   int64 getTimeFromFrameDouble(double frame) const;
+  bool isOnTimeLine(double frame) const;
   // The time of the frame boundary next to `time` in a direction, counted from `origin`. Stays on the time
   // line.
   int64 frameTime(int64 time, ERoundDirection direction, int64 origin) const;
@@ -45,16 +46,20 @@ class HTimeManager {
   // Frames from a text: a number of frames or timecode; 0 for other texts. `relative` reads timecode as a
   // length of time, of which drop-frame counting leaves nothing out.
   double stringToFrameDouble(HString const& text, bool relative) const;
+  // The same; false for other texts.
+  bool framesFromString(HString const& text, bool relative, double& frames) const;
 
   HTimeRange getAnimRange() const { return m_animRange; }
   HTimeRange getPlayRange() const { return m_playRange; }
-  void setAnimRange(HTimeRange range);
+  // chosen: by the user, so that a take is saved over this range.
+  void setAnimRange(HTimeRange range, bool chosen);
+  bool isAnimRangeChosen() const { return m_animRangeChosen; }
   // `keepTime`: the current time stays although it lies outside.
   void setPlayRange(HTimeRange range, bool keepTime);
 
   // The selected ranges, sorted and disjoint.
   int getNumSelectedRanges() const { return static_cast<int>(m_selected.size()); }
-  HTimeRange getSelectedTimeRange(int i) const { return m_selected[static_cast<size_t>(i)]; }
+  HTimeRange getSelectedTimeRange(int i) const;  // empty beyond them
   void addSelectedTimeRange(HTimeRange range);
   void clearSelectedTimeRanges();
 
@@ -63,9 +68,10 @@ class HTimeManager {
     HFrameRate rate;
     HTimeRange animRange, playRange;
     std::vector<HTimeRange> selected;
+    bool animRangeChosen = false;
     bool operator==(Settings const&) const = default;
   };
-  Settings getSettings() const { return {m_rate, m_animRange, m_playRange, m_selected}; }
+  Settings getSettings() const { return {m_rate, m_animRange, m_playRange, m_selected, m_animRangeChosen}; }
   void swapSettings(Settings& settings) noexcept;
 
  private:
@@ -76,5 +82,6 @@ class HTimeManager {
   HFrameRate m_rate;
   int64 m_time = 0;
   HTimeRange m_animRange, m_playRange;
+  bool m_animRangeChosen = false;
   std::vector<HTimeRange> m_selected;
 };

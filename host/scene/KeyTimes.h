@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "host/scene/Clips.h"
+#include "host/scene/SceneReader.h"
 
 using KeyTimes = std::vector<int64>;  // ascending, in ticks
 
@@ -28,4 +29,8 @@ inline void mergeTimes(KeyTimes& times, KeyTimes const& more) {
 inline void mergeKeyTimes(KeyTimes& times, Controller const& channel, NLEClip const& clip) {
   for (int layer = 0; layer < clip.getNumLayers(); ++layer)
     if (KeyTrack const* track = channel.findTrack(&clip, layer)) mergeTimes(times, keyTimesOf(*track));
+}
+inline void mergeKeyTimes(KeyTimes& times, ChannelState const& channel, NLEClip const* clip) {
+  for (ChannelState::Layer const& layer : channel.layers)
+    if (layer.clip == clip) mergeTimes(times, keyTimesOf(layer.keys));
 }

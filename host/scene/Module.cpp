@@ -1,6 +1,7 @@
 #include "host/scene/Module.h"
 
 #include <algorithm>
+#include <cassert>
 
 #include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
@@ -108,16 +109,18 @@ Module::Children& Module::children() {
 
 int Module::getNumChildren() const { return m_children ? m_children->all.getCount() : 0; }
 
-Module* Module::getChild(int i) const { return m_children->all.at(i); }
+Module* Module::getChild(int i) const { return m_children ? m_children->all.at(i) : nullptr; }
 
 int Module::getNumNodeChildren() const { return m_children ? m_children->nodes.getCount() : 0; }
 
-Node* Module::getNodeChild(int i) const { return static_cast<Node*>(m_children->nodes.at(i)); }
+Node* Module::getNodeChild(int i) const {
+  return m_children ? static_cast<Node*>(m_children->nodes.at(i)) : nullptr;
+}
 
 int Module::getNumMarkerChildren() const { return m_children ? m_children->markers.getCount() : 0; }
 
 Marker* Module::getMarkerChild(int i) const {
-  return i >= 0 && i < getNumMarkerChildren() ? static_cast<Marker*>(m_children->markers.at(i)) : nullptr;
+  return m_children ? static_cast<Marker*>(m_children->markers.at(i)) : nullptr;
 }
 
 int Module::findMarkerChild(HString const& name) const {
@@ -189,6 +192,7 @@ Attribute* Module::getAttribute(ControlID id) const {
 }
 
 Attribute* Module::addAttribute(std::unique_ptr<Attribute> attribute, Attribute::Reaction reaction) {
+  assert(attribute->m_custom || PropertyTable::isBuiltInAttribute(attribute->getName()));
   const Attribute::Type type = attribute->getType();
   attribute->m_module = this;
   attribute->m_id = ControlID(++m_database->m_lastID);
@@ -203,13 +207,9 @@ Attribute* Module::addAttribute(std::unique_ptr<Attribute> attribute, Attribute:
 
 Attribute* Module::addCustomAttribute(std::unique_ptr<Attribute> attribute) {
   HString const& name = attribute->getName();
-  if (!isValidPropertyName(name) || getAttribute(name.GetStr()) || getChannel(name.GetStr())) return nullptr;
+  if (getAttribute(name.GetStr()) || !m_database->getPropertyTable().addAttribute(name)) return nullptr;
   attribute->m_custom = true;
   return addAttribute(std::move(attribute));
-}
-
-bool Module::isValidPropertyName(HString const& name) {
-  return !name.IsEmpty() && name.GetString().find_first_of(".\\") == std::string::npos;
 }
 
 // --- channels ---

@@ -9,6 +9,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "host/base/ItemAt.h"
 #include "host/base/TArray.h"
 #include "host/base/TSimpleArray.h"
 #include "host/scene/Attribute.h"
@@ -63,7 +64,7 @@ class Module : public HObject {
   Node* getNodeParent() const;
   int getNumNodeChildren() const;
   Node* getNodeChild(int i) const;
-  // The i-th marker among the direct children, in child order; null beyond them.
+  // The i-th marker among the direct children, in child order.
   Marker* getMarkerChild(int i) const;
   int getNumMarkerChildren() const;
   // Index of the first marker child of that name, -1: none.
@@ -80,28 +81,24 @@ class Module : public HObject {
 
   // --- attributes ---
   int getNumAttributes() const { return static_cast<int>(m_attributes.size()); }
-  Attribute* getAttribute(int i) const { return m_attributes[static_cast<size_t>(i)].get(); }
+  Attribute* getAttribute(int i) const { return itemAt(m_attributes, i); }
   Attribute* getAttribute(char const* name) const;  // exact case; null: none
   Attribute* getAttribute(ControlID id) const;
-  // Adds a custom attribute. Null when the name is taken by an attribute or channel or cannot stand.
+  // Adds a custom attribute. Null when the module has one of that name or PropertyTable knows an obstacle.
   Attribute* addCustomAttribute(std::unique_ptr<Attribute> attribute);
 
   // --- channels ---
   int getNumChannels() const { return static_cast<int>(m_channels.size()); }
-  Controller* getChannel(int i) const { return m_channels[static_cast<size_t>(i)].get(); }
+  Controller* getChannel(int i) const { return itemAt(m_channels, i); }
   Controller* getChannel(char const* name) const;
   Controller* getChannel(ControlID id) const;
   Controller* getProperty(HString const& name) const { return getChannel(name.GetStr()); }
   Controller* getProperty(unsigned id) const;  // component bits do not matter
-  // The module's channel of that name, added when it has none. Null when the name has another kind, is taken
-  // by an attribute, or cannot stand.
+  // The module's channel of that name, added when it has none. Null when PropertyTable knows an obstacle.
   Controller* addChannel(HString const& name, DataSource::PropertyType type);
   // The channel's or attribute's number into `value`: empty on success, else the text to show. byDefault: the
   // channel's default value instead of that at the current time. A name may end in ".x", ".y", ".z".
   HString getPropertyVal(HString const& name, double& value, bool byDefault) const;
-
-  // Names of channels and attributes hold no dot and no backslash and are not empty.
-  static bool isValidPropertyName(HString const& name);
 
   // --- data ---
   virtual bool hasKeysInClip(NLEClip const* clip, bool allLayers) const;
@@ -121,6 +118,8 @@ class Module : public HObject {
   bool isInScene() const { return m_sceneSlot != kNoSlot; }
 
  protected:
+  // The same for a channel of a class of its own.
+  Controller* addChannel(HString const& name, std::unique_ptr<Controller> channel);
   Module();
   // Gives the module its built-in attributes and channels; called once, by the database, before it enters the
   // scene. A subclass calls its base first.

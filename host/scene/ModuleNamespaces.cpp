@@ -11,7 +11,7 @@ constexpr char kJoint = ':';
 bool isValidNamespace(HString const& name) {
   std::string const& text = name.GetString();
   return !text.empty() && text.find('\\') == std::string::npos && text.front() != kJoint &&
-         text.back() != kJoint;
+         text.back() != kJoint && text.find("::") == std::string::npos;
 }
 
 // Where the namespace stands among the parts of a prefix ("actor1" in "stage:actor1"), as whole parts; npos:
@@ -69,6 +69,11 @@ bool Module::replaceNamespace(HString const& former, HString const& name) {
   const size_t at = isValidNamespace(name) ? findParts(prefixOf(own.GetString()), former.GetString())
                                            : std::string_view::npos;
   if (former.IsEmpty() || at == std::string_view::npos) return false;
+  // What addNamespace refuses cannot come in this way: one that the other parts hold.
   std::string text = own.GetString();
-  return setName(HString(text.replace(at, former.GetString().size(), name.GetString())));
+  const std::string before = text.substr(0, at), after = text.substr(at + former.GetString().size());
+  if (former != name && (findParts(before, name.GetString()) != std::string_view::npos ||
+                         findParts(prefixOf(after), name.GetString()) != std::string_view::npos))
+    return false;
+  return setName(HString(before + name.GetString() + after));
 }

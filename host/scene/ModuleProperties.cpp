@@ -84,11 +84,14 @@ HString attributeValue(Attribute const& attribute, double& value) {
 }  // namespace
 
 Controller* Module::addChannel(HString const& name, DataSource::PropertyType type) {
-  if (getAttribute(name.GetStr())) return nullptr;
+  return addChannel(name, Controller::create(type));
+}
+
+Controller* Module::addChannel(HString const& name, std::unique_ptr<Controller> channel) {
+  const DataSource::PropertyType type = channel ? channel->getPropertyType() : DataSource::NoProperty;
   const unsigned id = m_database->getPropertyTable().add(name, type);
   if (id == 0) return nullptr;
   if (Controller* existing = getProperty(id)) return existing;
-  std::unique_ptr<Controller> channel = Controller::create(type);
   channel->m_module = this;
   channel->m_propertyId = id;
   channel->m_id = ControlID(++m_database->m_lastID);
@@ -101,8 +104,9 @@ HString Module::getPropertyVal(HString const& name, double& value, bool byDefaul
   const int component = splitComponent(channelName);
   PropertyTable const& table = m_database->getPropertyTable();
   const unsigned id = table.findId(channelName);
-  if (id != 0) {
-    const DataSource::PropertyType type = table.getType(id);
+  const DataSource::PropertyType type = table.getType(id);
+  const bool several = type == DataSource::Vec3Property || type == DataSource::RotProperty;
+  if (id != 0 && (several || component < 0)) {
     Controller const* channel = getProperty(id);
     HString text;
     if (!channel) {
@@ -110,7 +114,6 @@ HString Module::getPropertyVal(HString const& name, double& value, bool byDefaul
       return text;
     }
     const int64 now = m_database->getTimeManager()->getTime();
-    const bool several = type == DataSource::Vec3Property || type == DataSource::RotProperty;
     if (several && component < 0) return "Use getVectorProperty for this type of property";
     value =
         several ? componentValue(*channel, component, byDefault, now) : scalarValue(*channel, byDefault, now);

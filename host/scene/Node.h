@@ -99,7 +99,7 @@ class Node : public Module {
   // --- connecting lines ---
   bool isConnectedTo(Node const* target) const { return m_lines.leadTo(target); }
   int getNumConnectingLines() const { return m_lines.getCount(); }
-  MarkerConnection const& getConnectingLine(int i) const { return m_lines.at(i); }
+  MarkerConnection getConnectingLine(int i) const { return m_lines.at(i); }
   // For reading: a line with another colour is added in place of the former one.
   MarkerConnection* getConnectionTo(Node const* target) { return m_lines.find(target); }
   // Replaces a line to the same target. One to a node of another scene is not taken.

@@ -22,8 +22,11 @@ class OrderedList {
   int getCount() const { return m_count; }
   static bool contains(T const* object) { return object->*Slot != kNoSlot; }
 
-  // The i-th object; i must lie in the list.
-  T* at(int i) const { return m_objects[holes() == 0 ? static_cast<size_t>(i) : slotOf(i)]; }
+  // The i-th object; null beyond them.
+  T* at(int64 i) const {
+    if (i < 0 || i >= m_count) return nullptr;
+    return m_objects[holes() == 0 ? static_cast<size_t>(i) : slotOf(static_cast<int>(i))];
+  }
   // How many objects stand before this one.
   int indexOf(T const* object) const { return countBefore(object->*Slot); }
 

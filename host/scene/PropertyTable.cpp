@@ -1,8 +1,36 @@
 #include "host/scene/PropertyTable.h"
 
+#include <algorithm>
 #include <string_view>
 
+#include "host/base/Text.h"
 #include "host/scene/Database.h"
+
+namespace {
+
+std::string lowerCase(HString name) {
+  name.MakeLower();
+  return name.GetString();
+}
+
+// "ty" is short for "Translation.y". Empty for other texts.
+std::string longForm(std::string_view name) {
+  if (name.size() != 2) return {};
+  const char channel = static_cast<char>(name[0] | 0x20), component = static_cast<char>(name[1] | 0x20);
+  char const* whole = channel == 't'   ? "Translation"
+                      : channel == 'r' ? "Rotation"
+                      : channel == 's' ? "Scale"
+                                       : nullptr;
+  return whole && component >= 'x' && component <= 'z' ? std::string(whole) + "." + component : std::string();
+}
+
+constexpr std::string_view kBuiltInAttributes[] = {
+    "color",       "deviceid",  "dofs",    "intrinsics", "locked",      "majoraxis",
+    "markers",     "minoraxis", "name",    "offset",     "reset",       "rotationorder",
+    "smpteoffset", "source",    "sources", "target",     "temperature", "visible"};
+static_assert(std::ranges::is_sorted(kBuiltInAttributes));
+
+}  // namespace
 
 PropertyTable& PropertyTable::getInstance() { return Database::current().getPropertyTable(); }
 
@@ -10,6 +38,7 @@ void PropertyTable::reset() {
   m_entries.clear();
   m_ids.clear();
   m_idsByLowerName.clear();
+  m_attributes.clear();
   add("Translation", DataSource::Vec3Property);
   add("Rotation", DataSource::RotProperty);
   add("Scale", DataSource::Vec3Property);
@@ -56,19 +85,96 @@ struct PropertyTable::Addition : UndoChange {
   bool isThere = false;  // in the other state
 };
 
+// A name for custom attributes.
+struct PropertyTable::AttributeAddition : UndoChange {
+  AttributeAddition(PropertyTable& concerned, std::string lowerName)
+      : UndoChange(nullptr), table(concerned), name(std::move(lowerName)) {}
+  void swap() override {
+    const bool now = table.m_attributes.contains(name);
+    if (now != isThere)
+      isThere ? static_cast<void>(table.m_attributes.insert(name))
+              : static_cast<void>(table.m_attributes.erase(name));
+    isThere = now;
+  }
+  int64 memoryUse() const override { return static_cast<int64>(sizeof *this + name.size()); }
+  void tell(ChangeSetBuilder&) const override {}  // shows in the attributes that have the name
+
+  PropertyTable& table;
+  std::string name;
+  bool isThere = false;  // in the other state
+};
+
+HString PropertyTable::obstacleTo(HString const& name) const {
+  std::string const& text = name.GetString();
+  if (!text.empty() && text.find_first_of(".\\") == std::string::npos && withoutOuterBlanks(text) == text)
+    return {};
+  return "it must not be empty, hold a dot or a backslash, nor begin or end with a blank";
+}
+
+HString PropertyTable::obstacleToChannel(HString const& name, DataSource::PropertyType type) const {
+  HString text = obstacleTo(name);
+  if (!text.IsEmpty()) return text;
+  const unsigned known = findId(name);
+  if (known && getType(known) != type)
+    text.Format("it is the name of %s channels", getTypeName(getType(known)));
+  else if (isBuiltInAttribute(name) || m_attributes.contains(lowerCase(name)))
+    text = "it is the name of an attribute";
+  return text;
+}
+
+HString PropertyTable::obstacleToAttribute(HString const& name) const {
+  HString text = obstacleTo(name);
+  if (!text.IsEmpty()) return text;
+  if (m_idsByLowerName.contains(lowerCase(name)))
+    text = "it is the name of a channel";
+  else if (const std::string whole = longForm(name.GetString()); !whole.empty())
+    text.Format("it is short for %s", whole.c_str());
+  return text;
+}
+
+bool PropertyTable::isBuiltInAttribute(HString const& name) {
+  return std::ranges::binary_search(kBuiltInAttributes, lowerCase(name));
+}
+
+char const* PropertyTable::getTypeName(DataSource::PropertyType type) {
+  switch (type) {
+    case DataSource::Vec3Property:
+      return "vector";
+    case DataSource::RotProperty:
+      return "rotation";
+    case DataSource::FloatProperty:
+      return "float";
+    case DataSource::IntProperty:
+      return "int";
+    case DataSource::BoolProperty:
+      return "bool";
+    case DataSource::NoProperty:
+      break;
+  }
+  return "";
+}
+
 unsigned PropertyTable::add(HString const& name, DataSource::PropertyType type) {
-  if (const unsigned known = findId(name)) return getType(known) == type ? known : 0;
-  if (!Module::isValidPropertyName(name) || m_entries.size() == kIdMask) return 0;
+  if (!obstacleToChannel(name, type).IsEmpty()) return 0;
+  if (const unsigned known = findId(name)) return known;
+  if (m_entries.size() == kIdMask) return 0;
   if (m_journal.isRecording()) m_journal.add(std::make_unique<Addition>(*this, name, type));
   return store(name, type);
 }
 
+bool PropertyTable::addAttribute(HString const& name) {
+  if (!obstacleToAttribute(name).IsEmpty()) return false;
+  const std::string lower = lowerCase(name);
+  if (m_attributes.contains(lower)) return true;
+  if (m_journal.isRecording()) m_journal.add(std::make_unique<AttributeAddition>(*this, lower));
+  m_attributes.insert(lower);
+  return true;
+}
+
 unsigned PropertyTable::store(HString const& name, DataSource::PropertyType type) {
-  HString lower = name;
-  lower.MakeLower();
-  std::vector<unsigned>& sameButCase = m_idsByLowerName[lower.GetString()];
+  std::vector<unsigned>& sameButCase = m_idsByLowerName[lowerCase(name)];
   sameButCase.reserve(sameButCase.size() + 1);
-  m_entries.reserve(m_entries.size() + 1);
+  if (m_entries.size() == m_entries.capacity()) m_entries.reserve(2 * m_entries.size() + 16);
   Entry entry{name, type};
   const auto id = static_cast<unsigned>(m_entries.size() + 1);
   m_ids.emplace(name.GetString(), id);
@@ -79,10 +185,9 @@ unsigned PropertyTable::store(HString const& name, DataSource::PropertyType type
 }
 
 void PropertyTable::removeLast() {
-  HString lower = m_entries.back().name;
-  m_ids.erase(lower.GetString());
-  lower.MakeLower();
-  const auto known = m_idsByLowerName.find(lower.GetString());
+  HString const& name = m_entries.back().name;
+  m_ids.erase(name.GetString());
+  const auto known = m_idsByLowerName.find(lowerCase(name));
   known->second.pop_back();
   if (known->second.empty()) m_idsByLowerName.erase(known);
   m_entries.pop_back();
@@ -90,9 +195,7 @@ void PropertyTable::removeLast() {
 
 HString PropertyTable::restoreCase(HString const& name) const {
   if (findId(name)) return name;
-  HString lower = name;
-  lower.MakeLower();
-  const auto found = m_idsByLowerName.find(lower.GetString());
+  const auto found = m_idsByLowerName.find(lowerCase(name));
   return found == m_idsByLowerName.end() || found->second.size() != 1 ? HString()
                                                                       : getName(found->second.front());
 }
@@ -116,34 +219,18 @@ unsigned Controller::mapPropertyName(HString const& name) {
 }
 
 void Controller::fixChannelStr(HString& text) {
-  static constexpr std::string_view kBlanks = " \t\r\n";
-  std::string const& given = text.GetString();
-  const size_t first = given.find_first_not_of(kBlanks);
-  if (first == std::string::npos) {
-    text = "";
+  std::string name(withoutOuterBlanks(text.GetString()));
+  // A channel that really has such a name is meant itself.
+  if (const std::string whole = longForm(name); !whole.empty() && !mapPropertyName(HString(name))) {
+    text = whole;
     return;
   }
-  std::string trimmed = given.substr(first, given.find_last_not_of(kBlanks) - first + 1);
-
-  if (trimmed.size() == 2) {
-    const char channel = static_cast<char>(trimmed[0] | 0x20),
-               component = static_cast<char>(trimmed[1] | 0x20);
-    char const* name = channel == 't'   ? "Translation"
-                       : channel == 'r' ? "Rotation"
-                       : channel == 's' ? "Scale"
-                                        : nullptr;
-    // A channel that really has such a name is meant itself.
-    if (name && component >= 'x' && component <= 'z' && !mapPropertyName(HString(trimmed))) {
-      text = std::string(name) + "." + component;
-      return;
-    }
-  }
   PropertyTable const& table = PropertyTable::getInstance();
-  HString known = table.restoreCase(HString(trimmed));
-  const size_t dot = trimmed.rfind('.');
+  HString known = table.restoreCase(HString(name));
+  const size_t dot = name.rfind('.');
   if (known.IsEmpty() && dot != std::string::npos) {
-    known = table.restoreCase(HString(trimmed.substr(0, dot)));
-    if (!known.IsEmpty()) known += HString(trimmed.substr(dot));
+    known = table.restoreCase(HString(name.substr(0, dot)));
+    if (!known.IsEmpty()) known += HString(name.substr(dot));
   }
-  text = known.IsEmpty() ? HString(std::move(trimmed)) : known;
+  text = known.IsEmpty() ? HString(std::move(name)) : known;
 }

@@ -1,4 +1,5 @@
-// The channel names of a scene, their ids and kinds. A channel name has one kind everywhere in it.
+// Names of channels and attributes in a scene. One name is a channel's or an attribute's in all of it,
+// whatever its case, since scripts write both alike; a channel name has one kind.
 //
 // An id is a small number (low 16 bits, from 1) to which the component bits of an active property may be
 // added.
@@ -7,6 +8,7 @@
 #include <optional>
 #include <string>
 #include <unordered_map>
+#include <unordered_set>
 #include <vector>
 
 #include "host/base/HString.h"
@@ -36,9 +38,22 @@ class PropertyTable {
   HString getName(unsigned id) const;  // empty when unknown
   DataSource::PropertyType getType(unsigned id) const;
 
-  // The id of a channel name, which is added when it is new. 0 when the name is known with another kind, is
-  // empty, holds a dot or a backslash, or the table is full (65,535 names).
+  // Why a name cannot be that of a channel of a kind, or of a custom attribute, as the end of a sentence ("it
+  // must not ..."); empty when it can.
+  HString obstacleToChannel(HString const& name, DataSource::PropertyType type) const;
+  HString obstacleToAttribute(HString const& name) const;
+
+  // The id of a channel name, which is added when it is new. 0 when there is an obstacle, or the table is
+  // full (65,535 names).
   unsigned add(HString const& name, DataSource::PropertyType type);
+  // Takes a name for custom attributes. False when there is an obstacle.
+  bool addAttribute(HString const& name);
+  // Whether some class of modules has a built-in attribute of that name. The names are listed here since no
+  // module of a class may exist yet.
+  static bool isBuiltInAttribute(HString const& name);
+
+  // "vector", "rotation", "float", "int", "bool"
+  static char const* getTypeName(DataSource::PropertyType type);
 
   // The known name that is equal but for case; empty when there is none, or none in exact case and several
   // others.
@@ -46,6 +61,8 @@ class PropertyTable {
 
  private:
   struct Addition;
+  struct AttributeAddition;
+  HString obstacleTo(HString const& name) const;                       // whatever it is to name
   unsigned store(HString const& name, DataSource::PropertyType type);  // mutator: adds at the end
   void removeLast();
 
@@ -57,4 +74,5 @@ class PropertyTable {
   std::vector<Entry> m_entries;  // id - 1
   std::unordered_map<std::string, unsigned> m_ids;
   std::unordered_map<std::string, std::vector<unsigned>> m_idsByLowerName;
+  std::unordered_set<std::string> m_attributes;  // custom ones, in lower case
 };

@@ -6,7 +6,7 @@
 class Module;
 
 struct SceneAside {
-  int64 time;
-  Module* priority;
+  int64 time = 0;
+  Module* priority = nullptr;
   ClipboardManager clipboard;
 };

@@ -27,7 +27,7 @@ class Selection {
   int getNumMarkers() const { return m_markers.getCount(); }
   Marker* getMarker(int i) const { return m_markers.at(i); }
   int getNumCharacters() const { return m_characters.getCount(); }
-  Character* getCharacter(int i) const { return m_characters.at(i); }
+  Character* getCharacter(int64 i) const { return m_characters.at(i); }
   int getNumLabelingBones() const { return m_bones.getCount(); }
   LabelingBone* getLabelingBone(int i) const { return m_bones.at(i); }
 

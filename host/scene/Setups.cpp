@@ -24,10 +24,8 @@ std::vector<Attribute*> ParameterizedSetup::parameters() const {
 int ParameterizedSetup::getNumParameters() const { return static_cast<int>(parameters().size()); }
 
 Parameter* ParameterizedSetup::getParameter(int i) {
-  const std::vector<Attribute*> all = parameters();
-  m_answered = i >= 0 && i < static_cast<int>(all.size())
-                   ? std::make_unique<Parameter>(all[static_cast<size_t>(i)])
-                   : nullptr;
+  Attribute* attribute = itemAt(parameters(), i);
+  m_answered = attribute ? std::make_unique<Parameter>(attribute) : nullptr;
   return m_answered.get();
 }
 

@@ -2,7 +2,7 @@
 
 #include "host/scene/Database.h"
 #include "host/scene/SceneIndex.h"
-#include "host/scene/motion/RootMotion.h"
+#include "host/scene/motion/MotionScope.h"
 
 Character* SubjectManager::getSubject(HString const& name) const {
   for (int i = 0; i < m_subjects.getCount(); ++i)
@@ -15,7 +15,7 @@ uint64 SubjectManager::getNumSelectedSubjects() const {
 }
 
 Character* SubjectManager::getSelectedSubject(uint64 i) const {
-  return m_scene.getSelection().getCharacter(static_cast<int>(i));
+  return m_scene.getSelection().getCharacter(static_cast<int64>(i));
 }
 
 bool SubjectManager::removeSubject(Character* subject, bool removeLabels, bool undoable, bool notify) {
@@ -26,7 +26,9 @@ bool SubjectManager::removeSubject(Character* subject, bool removeLabels, bool u
   for (Module* module : all)
     if (auto* marker = objectAs<Marker>(module)) markers.push_back(marker);
 
-  keepMotionAsRoots(markers);
+  // They become roots, and go on moving in the world as before.
+  const MotionScope motion(m_scene);
+  for (Marker* marker : markers) marker->parentAdjust(nullptr, HTimeRange::forever());
   const HString name = subject->getName();
   for (Marker* marker : markers) {
     marker->getParent()->removeChild(marker, false);

@@ -20,8 +20,10 @@ void UndoJournal::setEnabled(bool enabled) {
 void UndoJournal::beginStep() {
   if (m_depth == 0 && m_enabled) {
     if (!m_reserve.fill()) throw std::bad_alloc();
-    m_aside = m_scene.putAside();
+    if (!m_aside) m_aside = std::make_unique<SceneAside>();
+    m_scene.putAside(*m_aside);
     m_step = ++m_lastStep;
+    m_moves = 0;
   }
   ++m_depth;
 }
@@ -32,7 +34,6 @@ void UndoJournal::endStep(HString const& name) {
   if (m_depth == 1 && !m_open.empty()) keep(name);
   if (--m_depth > 0) return;
   m_step = 0;
-  m_aside.reset();
 }
 
 void UndoJournal::keep(HString const& name) {
@@ -58,13 +59,15 @@ void UndoJournal::keep(HString const& name) {
 }
 
 bool UndoJournal::discardStep() {
-  const bool known = m_step != 0 || m_depth == 0;
+  const bool open = m_step != 0, known = open || m_depth == 0;
   m_depth = 0;
   swapAll(m_open, true);
   m_step = 0;
   m_open.clear();
-  if (m_aside && known) m_scene.putBack(*m_aside);
-  m_aside.reset();
+  HString name;
+  while (open && m_moves > 0) redo(name);
+  while (open && m_moves < 0) undo(name);
+  if (open) m_scene.putBack(*m_aside);
   return known;
 }
 
@@ -91,6 +94,7 @@ bool UndoJournal::move(UndoSteps& from, UndoSteps& to, bool backward, HString& n
   UndoChanges changes = from.pop(text);
   swapAll(changes, backward);
   to.push(changes, text);
+  m_moves += backward ? 1 : -1;
   name = text;
   return true;
 }

@@ -120,6 +120,7 @@ class UndoJournal {
   int m_depth = 0;
   uint64 m_step = 0;
   uint64 m_lastStep = 0;
+  int m_moves = 0;  // steps undone, less those redone, since the open step began
   UndoChanges m_open;
   std::unique_ptr<SceneAside> m_aside;  // as it was when the open step began
   UndoTables m_tables;

@@ -52,12 +52,18 @@ void UndoSteps::push(UndoChanges& changes, std::string const& name) {
 }
 
 void UndoSteps::append(std::vector<unsigned char> const& bytes) {
-  const auto size = static_cast<Length>(bytes.size());
-  std::vector<unsigned char> frame(bytes.size() + kFrame);
-  std::memcpy(frame.data(), &size, sizeof size);
-  std::memcpy(frame.data() + sizeof size, bytes.data(), bytes.size());
-  std::memcpy(frame.data() + sizeof size + bytes.size(), &size, sizeof size);
-  m_bytes.insert(m_bytes.end(), frame.begin(), frame.end());
+  unsigned char size[sizeof(Length)];
+  const auto length = static_cast<Length>(bytes.size());
+  std::memcpy(size, &length, sizeof size);
+  const size_t before = m_bytes.size();
+  try {
+    m_bytes.insert(m_bytes.end(), size, size + sizeof size);
+    m_bytes.insert(m_bytes.end(), bytes.begin(), bytes.end());
+    m_bytes.insert(m_bytes.end(), size, size + sizeof size);
+  } catch (...) {
+    m_bytes.resize(before);
+    throw;
+  }
   ++m_count;
 }
 

@@ -109,12 +109,12 @@ struct UndoTables {
 // Writes the bytes of one step, and reads them.
 class PackedStep {
  public:
-  explicit PackedStep(UndoTables& tables) : m_tables(tables) {}
+  explicit PackedStep(UndoTables& tables) : m_tables(tables) { m_bytes.reserve(kUsual); }
   PackedStep(UndoTables& tables, std::vector<unsigned char> bytes)
       : m_tables(tables), m_bytes(std::move(bytes)) {}
   // What was used is released unless it was kept.
   ~PackedStep() {
-    for (const uint32 name : m_names) m_tables.names.release(name);
+    if (m_hasName) m_tables.names.release(m_name);
     for (const uint32 track : m_tracks) m_tables.tracks.release(track);
   }
   PackedStep(PackedStep const&) = delete;
@@ -126,9 +126,9 @@ class PackedStep {
     m_bytes.insert(m_bytes.end(), bytes, bytes + sizeof value);
   }
   void putName(std::string const& name) {
-    m_names.reserve(1);
-    m_names.push_back(m_tables.names.use(name));
-    put(m_names.back());
+    m_name = m_tables.names.use(name);
+    m_hasName = true;
+    put(m_name);
   }
   void putTrack(TrackName const& track) {
     m_tracks.reserve(m_tracks.size() + 1);
@@ -137,7 +137,7 @@ class PackedStep {
   }
   std::vector<unsigned char> const& bytes() const { return m_bytes; }
   void keep() {
-    m_names.clear();
+    m_hasName = false;
     m_tracks.clear();
   }
 
@@ -150,9 +150,9 @@ class PackedStep {
   }
   // What is taken of the tables is released with this object, when it was not to stay.
   std::string const& takeName(bool toStay) {
-    const auto name = take<uint32>();
-    if (!toStay) m_names.push_back(name);
-    return m_tables.names.at(name).value;
+    m_name = take<uint32>();
+    m_hasName = !toStay;
+    return m_tables.names.at(m_name).value;
   }
   TrackName const& takeTrack(bool toStay) {
     const auto track = take<uint32>();
@@ -162,10 +162,14 @@ class PackedStep {
   bool atEnd() const { return m_read == m_bytes.size(); }
 
  private:
+  static constexpr size_t kUsual = 64;
+
   UndoTables& m_tables;
   std::vector<unsigned char> m_bytes;
   size_t m_read = 0;
-  std::vector<uint32> m_names, m_tracks;
+  uint32 m_name = 0;
+  bool m_hasName = false;
+  std::vector<uint32> m_tracks;
 };
 
 class UndoSteps {

@@ -1,16 +1,24 @@
 #include "io/c3d/C3DLayout.h"
 
 #include <algorithm>
+#include <charconv>
 #include <cmath>
 #include <optional>
 
 #include "host/time/Ticks.h"
 #include "io/FileError.h"
 #include "io/FrameRates.h"
+#include "io/TextScanner.h"
 
 namespace talix {
 
 namespace {
+
+// A number that the file holds with 32 bits, in as few digits as tell it.
+std::string floatText(double value) {
+  char text[32];
+  return {text, std::to_chars(text, text + sizeof text, static_cast<float>(value)).ptr};
+}
 
 constexpr unsigned kMark = 0x50;
 constexpr int64 kMostInWord = 65535;
@@ -83,9 +91,8 @@ class LayoutFinder {
       warn("the scale of the coordinates is missing; 1 is assumed");
       scale = 1;
     } else if (std::abs(scale - m_header.scale) > 1e-6 * std::abs(scale)) {
-      note(TakeNote::Level::Info, "the header's scale " + std::to_string(m_header.scale) +
-                                      " differs from POINT:SCALE " + std::to_string(scale) +
-                                      ", which is taken");
+      note(TakeNote::Level::Info, "the header's scale " + floatText(m_header.scale) +
+                                      " differs from POINT:SCALE " + floatText(scale) + ", which is taken");
     }
     m_layout.real = scale < 0;
     m_layout.scale = std::abs(scale);

@@ -46,9 +46,7 @@ class DeviceExport {
 
   void finish() {
     if (m_out.take.analog.empty()) return;
-    m_out.take.analogRate =
-        m_sampler.clip() ? fileMetadata::number(*m_sampler.clip(), fileMetadata::kAnalogRate, m_out.take.rate)
-                         : m_out.take.rate;
+    m_out.take.analogRate = analogRate();
   }
 
  private:
@@ -63,8 +61,7 @@ class DeviceExport {
     }
     m_out.keysLeftOut += m_sampler.keysOffGrid(channel);
     const KeyTrack* track = m_sampler.asItIs(channel);
-    output.values =
-        track ? *track : m_sampler.sampleWhere(m_sampler.framesWithData(channel, nullptr), channel);
+    output.values = track ? *track : m_sampler.sampleWhere(m_sampler.framesWithData(channel), channel);
     m_out.take.outputs.push_back(std::move(output));
   }
 
@@ -83,9 +80,11 @@ class DeviceExport {
     m_out.take.analog.push_back(std::move(analog));
   }
 
-  // The keys inside the range, wherever they lie: devices sample faster than cameras.
+  // The keys inside the range, wherever they lie: devices sample faster than cameras. Where keys were taken
+  // out of a track that bridges over them, its samples.
   KeyTrack samples(const Controller& channel) {
-    const KeyTrack* lowest = m_sampler.lowestKeys(channel);
+    const KeyTrack* lowest = m_sampler.dataTrack(channel);
+    if (lowest && lowest->bridgesAny()) return samplesOfBridged(channel);
     if (!lowest) return m_sampler.clip() ? KeyTrack(KeyTrack::Shape::Scalar) : m_sampler.everyFrame(channel);
     KeyTrack track = *lowest;
     const FrameGrid& grid = m_sampler.grid();
@@ -94,6 +93,23 @@ class DeviceExport {
     if (isLayered(channel)) addLayers(track, channel);
     track.deselect(-kForever, kForever);
     return track;
+  }
+
+  KeyTrack samplesOfBridged(const Controller& channel) {
+    const FrameGrid& frames = m_sampler.grid();
+    FrameGrid grid;
+    grid.period = channel.getDataPeriod(*m_sampler.clip());
+    grid.firstFrame = frames.start() / grid.period;
+    grid.count = frames.count * (frames.period / grid.period);
+    const FrameSampler sampler(m_out.scene, grid);
+    m_out.keysLeftOut += sampler.keysOffGrid(channel);
+    return sampler.sampleWhere(sampler.framesWithData(channel), channel);
+  }
+
+  double analogRate() const {
+    const auto* clip = objectAs<Clip>(m_sampler.clip());
+    const double rate = clip ? clip->getFileTime().sampleRate : 0;
+    return rate > 0 ? rate : m_out.take.rate;
   }
 
   bool isLayered(const Controller& channel) const {

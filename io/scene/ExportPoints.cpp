@@ -1,4 +1,5 @@
 #include <cctype>
+#include <cmath>
 #include <string_view>
 
 #include "host/scene/Character.h"
@@ -53,7 +54,7 @@ class PointExport {
     point.description = fileMetadata::text(marker, fileMetadata::kDescription);
     m_out.keysLeftOut += m_sampler.keysOffGrid(translation);
 
-    const std::vector<bool> frames = m_sampler.framesWithData(translation, &marker);
+    const std::vector<bool> frames = m_sampler.framesWithData(translation);
     point.positions = positions(marker, frames);
     if (m_sampler.hasKeys(*marker.getResidualChannel())) point.residuals = residuals(marker, frames);
     point.cameras = cameras(marker);
@@ -81,7 +82,7 @@ class PointExport {
   // Where there is a position, and a residual was recorded.
   KeyTrack residuals(const Marker& marker, const std::vector<bool>& positioned) const {
     const Controller& residual = *marker.getResidualChannel();
-    std::vector<bool> frames = m_sampler.framesWithData(residual, nullptr);
+    std::vector<bool> frames = m_sampler.framesWithData(residual);
     bool allPositioned = true;
     for (size_t i = 0; i < frames.size(); ++i) {
       allPositioned = allPositioned && (positioned[i] || !frames[i]);
@@ -93,14 +94,14 @@ class PointExport {
 
   std::vector<unsigned char> cameras(const Marker& marker) const {
     const Controller* channel = marker.getChannel("Cameras");
-    const KeyTrack* track = channel ? m_sampler.lowestKeys(*channel) : nullptr;
+    const KeyTrack* track = channel ? m_sampler.dataTrack(*channel) : nullptr;
     if (!track || channel->getPropertyType() != DataSource::IntProperty) return {};
     const FrameGrid& grid = m_sampler.grid();
+    const KeyTrack known = m_sampler.sampleWhere(m_sampler.framesWithData(*channel), *channel);
     std::vector<unsigned char> masks(static_cast<size_t>(grid.count));
-    track->forEach(0, track->count(), [&](const KeyTrack::Key& key) {
-      if (grid.contains(key.time))
-        masks[static_cast<size_t>((key.time - grid.start()) / grid.period)] =
-            static_cast<unsigned char>(key.values[0]);
+    known.forEach(0, known.count(), [&](const KeyTrack::Key& key) {
+      masks[static_cast<size_t>((key.time - grid.start()) / grid.period)] =
+          static_cast<unsigned char>(std::lround(key.values[0]));
     });
     return masks;
   }

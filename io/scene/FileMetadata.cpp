@@ -49,6 +49,12 @@ Record splitLine(std::string_view line) {
 
 }  // namespace
 
+void reserveNames(PropertyTable& table) {
+  for (const char* name : {kFileName, kFileFormat, kFileUnit, kFileUnitInMillimetres, kEvents,
+                           kAnalogChannels, kOutputs, kDescription, kFileChannels})
+    table.addAttribute(name);
+}
+
 void setText(Module& module, const char* name, const std::string& text) {
   if (auto* attribute = attributeOf<StringAttribute>(module, name, Attribute::String))
     attribute->setValue(text, true, true, 0, true, true);

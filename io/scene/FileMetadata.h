@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "host/scene/Module.h"
+#include "host/scene/PropertyTable.h"
 
 namespace talix::fileMetadata {
 
@@ -22,7 +23,6 @@ inline constexpr const char* kFileName = "FileName";
 inline constexpr const char* kFileFormat = "FileFormat";                        // string: "C3D", "BVH", "TRC"
 inline constexpr const char* kFileUnit = "FileUnit";                            // string: the file's own word
 inline constexpr const char* kFileUnitInMillimetres = "FileUnitInMillimetres";  // float
-inline constexpr const char* kAnalogRate = "AnalogRate";                        // float: samples a second
 // Records: seconds, label, context, subject, description.
 inline constexpr const char* kEvents = "Events";
 // Records: channel in the scene, name in the file, unit, description, scale, offset.
@@ -34,6 +34,9 @@ inline constexpr const char* kOutputs = "OutputChannels";
 inline constexpr const char* kDescription = "Description";
 // Of a bone: the file's channel names in their order, separated by blanks, a string.
 inline constexpr const char* kFileChannels = "FileChannels";
+
+// Takes these names for attributes, so that no channel of a file gets one of them.
+void reserveNames(PropertyTable& table);
 
 using Record = std::vector<std::string>;
 

@@ -1,5 +1,9 @@
 #include "io/scene/FrameSampler.h"
 
+#include <algorithm>
+
+#include "host/keys/DataRanges.h"
+
 namespace talix {
 
 namespace {
@@ -52,20 +56,13 @@ bool FrameSampler::mayChange(const Controller& channel) const {
   return false;
 }
 
-const KeyTrack* FrameSampler::lowestKeys(const Controller& channel) const {
-  if (!m_clip) return nullptr;
-  for (int layer = 0; layer < m_clip->getNumLayers(); ++layer)
-    if (const KeyTrack* track = channel.findTrack(m_clip, layer); track && !track->empty()) return track;
-  return nullptr;
-}
-
 const KeyTrack* FrameSampler::asItIs(const Controller& channel) const {
-  const KeyTrack* lowest = lowestKeys(channel);
+  const KeyTrack* lowest = dataTrack(channel);
   if (!lowest || lowest != channel.findTrack(m_clip, 0)) return nullptr;
   for (int layer = 1; layer < m_clip->getNumLayers(); ++layer)
     if (const KeyTrack* track = channel.findTrack(m_clip, layer); track && !track->empty()) return nullptr;
   if (lowest->countHolding(1) != lowest->count() || lowest->countHolding(2) != lowest->count() ||
-      lowest->countHolding(4) != lowest->count() || lowest->countSelected() > 0)
+      lowest->countHolding(4) != lowest->count() || lowest->countSelected() > 0 || lowest->bridgesAny())
     return nullptr;
   return keysOffGrid(channel) == 0 ? lowest : nullptr;
 }
@@ -86,29 +83,19 @@ KeyTrack FrameSampler::everyFrame(const Controller& channel) const {
   return sampleWhere(std::vector<bool>(static_cast<size_t>(m_grid.count), true), channel);
 }
 
-std::vector<bool> FrameSampler::framesWithData(const Controller& channel, const Marker* reduced) const {
+std::vector<bool> FrameSampler::framesWithData(const Controller& channel) const {
   std::vector<bool> frames(static_cast<size_t>(m_grid.count), m_clip == nullptr);
-  const KeyTrack* track = lowestKeys(channel);
-  if (!track) return frames;
-  if (reduced && !reduced->getChannel("FillType")) reduced = nullptr;
-  const auto firstAtOrAfter = [&](int64 time) {
-    return time <= m_grid.start() ? 0 : (time - m_grid.start() + m_grid.period - 1) / m_grid.period;
-  };
-  bool bridged = false;
-  int64 next = 0;  // the first frame after the last key
-  track->forEach(0, track->count(), [&](const KeyTrack::Key& key) {
-    const int64 frame = firstAtOrAfter(key.time);
-    if (bridged)
-      for (int64 i = next; i < std::min(frame, m_grid.count); ++i) frames[static_cast<size_t>(i)] = true;
-    if (m_grid.contains(key.time)) frames[static_cast<size_t>(frame)] = true;
-    next = firstAtOrAfter(key.time + 1);
-    bridged = reduced && reduced->isReducedBehind(key.time);
+  const KeyTrack* track = dataTrack(channel);
+  if (!track || m_grid.count == 0) return frames;
+  DataRanges(*track, m_grid.period).visitRanges(m_grid.start(), m_grid.end(), [&](int64 start, int64 end) {
+    std::fill(frames.begin() + (start - m_grid.start()) / m_grid.period,
+              frames.begin() + (end - m_grid.start()) / m_grid.period + 1, true);
   });
   return frames;
 }
 
 int64 FrameSampler::keysOffGrid(const Controller& channel) const {
-  const KeyTrack* track = lowestKeys(channel);
+  const KeyTrack* track = dataTrack(channel);
   if (!track) return 0;
   int64 off = 0;
   track->forEach(0, track->count(), [&](const KeyTrack::Key& key) { off += !m_grid.contains(key.time); });

@@ -52,10 +52,10 @@ class FrameSampler {
   // Whether the channel may change over time: keys in the clip, or an active blend.
   bool mayChange(const Controller&) const;
 
-  // The keys of the lowest layer of the clip that has any; null: none.
-  const KeyTrack* lowestKeys(const Controller&) const;
-  // That track, when it alone makes the channel's values and all its keys are whole ones at frames; else
-  // null.
+  // The keys that tell where a channel has data in the clip; null: none.
+  const KeyTrack* dataTrack(const Controller& channel) const { return channel.findDataTrack(m_clip); }
+  // That track, when it alone makes the channel's values and its keys, all whole and at frames, are all data;
+  // else null.
   const KeyTrack* asItIs(const Controller&) const;
 
   // A value at the frames that have data.
@@ -63,9 +63,8 @@ class FrameSampler {
   // A value at every frame: the channel's own track where that is what it holds.
   KeyTrack everyFrame(const Controller&) const;
 
-  // The frames at which a channel has a key. A marker's frames between two keys have data as well when the
-  // keys between them were taken out by reduction, which the marker's fill type says at the key before.
-  std::vector<bool> framesWithData(const Controller&, const Marker* reduced) const;
+  // The frames at which any component of a channel has data.
+  std::vector<bool> framesWithData(const Controller&) const;
 
   // How many keys lie at no frame of the grid; sampled channels lose them.
   int64 keysOffGrid(const Controller&) const;

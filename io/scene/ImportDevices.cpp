@@ -1,6 +1,7 @@
 #include <algorithm>
 #include <unordered_set>
 
+#include "host/base/Text.h"
 #include "host/scene/Devices.h"
 #include "host/scene/PropertyTable.h"
 #include "io/FileError.h"
@@ -14,7 +15,8 @@ namespace {
 bool isDevice(const Module& module) { return module.isKindOf(&AnalogDevice::staticClass()); }
 
 std::string channelName(const std::string& name, const char* byDefault) {
-  std::string mended = name.empty() ? byDefault : name;
+  std::string mended(withoutOuterBlanks(name));
+  if (mended.empty()) mended = byDefault;
   for (char& c : mended)
     if (c == '.' || c == '\\') c = '_';
   return mended;
@@ -28,7 +30,7 @@ class DeviceImport {
                const std::string& path)
       : m_import(import), m_device(device), m_type(type), m_path(path) {}
 
-  // Answers the channel's name.
+  // Returns the channel's name.
   std::string add(const std::string& name, const char* byDefault, KeyTrack track) {
     const std::string mended = channelName(name, byDefault);
     std::string free = mended;
@@ -45,10 +47,8 @@ class DeviceImport {
 
  private:
   bool isFree(const std::string& name) const {
-    const PropertyTable& table = m_device.getDatabase()->getPropertyTable();
-    const unsigned known = table.findId(name);
-    return !m_used.contains(name) && !m_device.getAttribute(name.c_str()) &&
-           (!known || table.getType(known) == m_type);
+    return !m_used.contains(name) &&
+           m_device.getDatabase()->getPropertyTable().obstacleToChannel(HString(name), m_type).IsEmpty();
   }
 
   TakeImport& m_import;
@@ -78,7 +78,6 @@ void importAnalog(TakeImport& import, Take& take, const std::string& path) {
                        analog.unit, analog.description, fileMetadata::numberText(analog.scale),
                        fileMetadata::numberText(analog.offset)});
   fileMetadata::setRecords(import.clip(), fileMetadata::kAnalogChannels, records);
-  fileMetadata::setNumber(import.clip(), fileMetadata::kAnalogRate, take.analogRate);
 }
 
 }  // namespace

@@ -24,7 +24,9 @@ std::string counted(int64 count, const std::string& noun) {
 
 TakeImport::TakeImport(Database& scene, Clip& clip, const UpAxisConversion& turn, std::string fileName,
                        std::vector<TakeNote>& notes)
-    : m_scene(scene), m_clip(clip), m_turn(turn), m_fileName(std::move(fileName)), m_notes(notes) {}
+    : m_scene(scene), m_clip(clip), m_turn(turn), m_fileName(std::move(fileName)), m_notes(notes) {
+  fileMetadata::reserveNames(m_scene.getPropertyTable());
+}
 
 // What stands below a parent before the import puts anything there.
 TakeImport::Waiting& TakeImport::waitingBelow(Module* parent) {

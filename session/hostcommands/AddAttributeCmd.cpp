@@ -1,3 +1,4 @@
+#include "host/scene/PropertyTable.h"
 #include "session/hostcommands/Arguments.h"
 #include "session/hostcommands/AttributeValues.h"
 
@@ -29,16 +30,8 @@ class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
       logError("%s is not a kind of attribute: %s.", kindText.GetStr(), attributeKindNames().c_str());
       return false;
     }
-    if (!Module::isValidPropertyName(name)) {
-      logError(
-          "\"%s\" cannot be the name of an attribute: it must not be empty nor hold a dot or a backslash.",
-          name.GetStr());
+    if (!isNew(*module, name, "an attribute", PropertyTable::getInstance().obstacleToAttribute(name)))
       return false;
-    }
-    if (module->getProperty(name) || module->getAttribute(name.GetStr())) {
-      logError("Module %s already has a property named %s.", module->getName().GetStr(), name.GetStr());
-      return false;
-    }
     std::unique_ptr<Attribute> attribute = makeAttribute(*kind, name, args, 3, *module);
     if (!attribute) return false;
     Attribute* added = module->addCustomAttribute(std::move(attribute));

@@ -20,6 +20,10 @@ struct ChannelChoice {
 };
 std::optional<ChannelChoice> channelNamed(HString const& name);
 
+// Whether a module has no property of that name, and `obstacle` is empty: why the name cannot be that of
+// `what`.
+bool isNew(Module const& module, HString const& name, char const* what, HString const& obstacle);
+
 // Integers and floats; booleans are none.
 bool isFrameNumber(Variable const& value);
 bool areFrameNumbers(Args const& args);

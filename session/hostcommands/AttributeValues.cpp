@@ -85,25 +85,23 @@ Reading takeVector(Attribute& attribute, Values const& values, Module const& mod
     static_cast<RotationAttribute&>(attribute).setValue(rotationFrom(*vector, module), true, true, true,
                                                         true);
   } else {
-    for (int i = 0; i < 3; ++i)
-      if ((*vector)[i] < 0 || (*vector)[i] > 255) return Reading::Misfit;
-    static_cast<ColorAttribute&>(attribute).setValue(*vector, true, true, true, true);
+    if (!static_cast<ColorAttribute&>(attribute).setValue(*vector, true, true, true, true))
+      return Reading::Misfit;
   }
   return Reading::Taken;
 }
 
 Reading takeTime(TimeAttribute& attribute, Values const& values) {
   if (values.size() != 1) return Reading::Misfit;
-  if (isNumber(values[0])) {
-    const std::optional<int64> time = timeOfFrame(values[0].getFloatValue(-1));
-    if (!time) return Reading::Logged;
-    attribute.setValue(*time, true, true, true, true);
-    return Reading::Taken;
-  }
-  HTimeManager const& times = *HTimeManager::getInstance();
-  int64 frame = 0;
-  if (!times.getFrameRate().frameFromTimecode(values[0].getStringValue(-1), frame)) return Reading::Misfit;
-  attribute.setValue(times.getTimeFromFrameDouble(static_cast<double>(frame)), true, true, true, true);
+  double frame = 0;
+  if (isNumber(values[0]))
+    frame = values[0].getFloatValue(-1);
+  else if (!isString(values[0]) ||
+           !HTimeManager::getInstance()->framesFromString(values[0].getStringValue(-1), false, frame))
+    return Reading::Misfit;
+  const std::optional<int64> time = timeOfFrame(frame);
+  if (!time) return Reading::Logged;
+  attribute.setValue(*time, true, true, true, true);
   return Reading::Taken;
 }
 

@@ -19,7 +19,7 @@ class SetAnimRangeCmd final : public ScriptCommand<SetAnimRangeCmd> {
 
   bool execute(Given const&, Args const& args, Variable&) override {
     const auto range = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
-    if (range) HTimeManager::getInstance()->setAnimRange(*range);
+    if (range) HTimeManager::getInstance()->setAnimRange(*range, true);
     return range.has_value();
   }
 };

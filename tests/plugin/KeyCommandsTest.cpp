@@ -45,7 +45,7 @@ class Stepping : public KeyCommands {
         channel->setTrack(g_db->getActiveClip(), 0, track);
       }
     }
-    manager().setAnimRange(HTimeRange(at(upTo(8)), at(kFrames - 1 - upTo(8))));
+    manager().setAnimRange(HTimeRange(at(upTo(8)), at(kFrames - 1 - upTo(8))), true);
   }
 
   // The frames at which runs of selected keys begin (end), looked for key by key.

@@ -101,18 +101,8 @@ PluginCommands::~PluginCommands() {
   for (Command* command : m_commands) command->deleteThis();
 }
 
-std::vector<std::string> PluginCommands::names() const {
-  std::vector<std::string> all;
-  for (Command const* command : m_commands) all.push_back(command->getName().GetString());
-  return all;
-}
-
-bool accepts(Command const& command, ArgList const& args) {
-  return command.checkArgSyntax(arrayOf(args), {});
-}
-
 std::string run(Command& command, ArgList const& args, std::vector<GivenOption> const& options) {
-  if (!accepts(command, args)) return "refused";
+  if (!command.checkArgSyntax(arrayOf(args), {})) return "refused";
   TArray<CommandOption> givenOptions;
   for (GivenOption const& option : options) givenOptions.add(given(command, option));
   Lines sink;

@@ -29,9 +29,7 @@ class PluginCommands {
   PluginCommands(PluginCommands const&) = delete;
   PluginCommands& operator=(PluginCommands const&) = delete;
 
-  std::vector<Command*> const& inOrder() const { return m_commands; }
   Command& operator[](std::string const& name) const { return *m_byName.at(name); }
-  std::vector<std::string> names() const;
 
  private:
   std::vector<Command*> m_commands;
@@ -57,4 +55,3 @@ struct GivenOption {
 // Runs a command when it accepts the arguments; answers its log lines, then its result or "failed", a line
 // each.
 std::string run(Command& command, ArgList const& args = {}, std::vector<GivenOption> const& options = {});
-bool accepts(Command const& command, ArgList const& args);

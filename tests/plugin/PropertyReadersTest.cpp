@@ -34,7 +34,7 @@ TEST_F(PropertyReaders, NameTheGetterToUseForOtherKinds) {
                         {"bool", {Bool, get, Bool, Bool, Bool, Bool}},
                         {"vector", {Vector, Vector, Vector, Vector, Vector, Vector}},
                         {"bitField", {Bits, "a label", Bits, get, Bits, Bits}},
-                        {"rotation", {Vector, Vector, Vector, Vector, Vector, Vector}},
+                        {"turn", {Vector, Vector, Vector, Vector, Vector, Vector}},
                         {"time", {get, Int, get, Int, Int, Text}},
                         {"color", {Ints, Ints, Ints, Ints, get, Ints}},
                         {"event", {no, no, no, no, no, no}},

@@ -58,13 +58,4 @@ TEST_F(TransformCommands, NumbersThatAreNotFiniteChangeNothing) {
   EXPECT_EQ(grandchild->getPreTranslation(), Vec3(0, 0, 10));
 }
 
-// Another kind of property has the name of the fill type.
-TEST_F(TransformCommands, AMarkerThatCannotHoldAFillTypeIsMovedAllTheSame) {
-  make<Clip>("take");
-  auto* marker = make<Marker>("marker");
-  marker->addCustomAttribute(Attribute::create(Attribute::Integer, "FillType"));
-  EXPECT_EQ(run("setPosition", {"marker", Vec3(1, 2, 3)}), "nothing");
-  EXPECT_EQ(marker->getLocalPos(0), Vec3(1, 2, 3));
-}
-
 }  // namespace

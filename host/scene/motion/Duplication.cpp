@@ -135,14 +135,15 @@ void Duplication::copyNode(Node const& original, Node& copy) const {
   copy.setPreRotation(original.getPreRotation(), false);
   copy.setPreTranslation(original.getPreTranslation());
   for (int i = 0; i < original.getNumConnectingLines(); ++i) {
-    MarkerConnection const& line = original.getConnectingLine(i);
+    const MarkerConnection line = original.getConnectingLine(i);
     MarkerConnection own(static_cast<Node*>(counterpart(line.getTarget())));
     own.setConnectingColor(line.getConnectingColor());
     copy.addConnectingLine(own);
   }
 }
 
-void copyLayers(NLEClip const& original, NLEClip& copy) {
+void copyClip(NLEClip const& original, NLEClip& copy) {
+  if (auto const* clip = objectAs<Clip>(&original)) static_cast<Clip&>(copy).setFileTime(clip->getFileTime());
   while (copy.getNumLayers() < original.getNumLayers()) copy.addLayer();
   for (int layer = 0; layer < original.getNumLayers(); ++layer)
     copy.setLayerLocked(layer, original.isLayerLocked(layer));
@@ -175,7 +176,7 @@ std::vector<Module*> Duplication::make() {
     copyAttributes(*original, *copy);
     copyChannels(*original, *copy);
     if (auto* node = objectAs<Node>(original)) copyNode(*node, *static_cast<Node*>(copy));
-    if (auto* clip = objectAs<NLEClip>(original)) copyLayers(*clip, *static_cast<NLEClip*>(copy));
+    if (auto* clip = objectAs<NLEClip>(original)) copyClip(*clip, *static_cast<NLEClip*>(copy));
     if (auto* camera = objectAs<OpticalCamera>(copy); camera && camera->getDeviceID() != 0) {
       if (!m_deviceNumbers) m_deviceNumbers.emplace(m_scene);
       camera->setDeviceID(m_deviceNumbers->take());

@@ -75,12 +75,12 @@ class KeyReductionTest : public SceneTest {
 
   static KeyTrack reducedBy(KeyTrack const& track, ReductionRule const& rule) {
     KeyTrack reduced = track;
-    eraseComponents(reduced, redundantKeys(track, rule));
+    reduced.thin(redundantKeys(track, rule));
     return reduced;
   }
 };
 
-TEST_F(KeyReductionTest, NoCurveStraysBeyondTheToleranceAndEndsStay) {
+TEST_F(KeyReductionTest, NoCurveDeviatesBeyondTheToleranceAndEndsStay) {
   for (const Shape shape : {Shape::Scalar, Shape::Vector, Shape::Rotation})
     for (const Interpolation kind : {Interpolation::Constant, Interpolation::Linear, Interpolation::Cubic})
       for (const bool partial : {false, true}) {
@@ -100,7 +100,7 @@ TEST_F(KeyReductionTest, NoCurveStraysBeyondTheToleranceAndEndsStay) {
             const int64 next = track.timeAt(i + 1);
             if (track.timeAt(i) >= (next - 1) / kPeriod * kPeriod || next <= 0) continue;
             ASSERT_GE(reduced.find(track.timeAt(i)), 0) << "before a gap";
-            ASSERT_GE(reduced.find(next), 0) << "behind a gap";
+            ASSERT_GE(reduced.find(next), 0) << "after a gap";
           }
         }
         EXPECT_GT(removed, 200) << static_cast<int>(shape) << static_cast<int>(kind) << partial;
@@ -126,7 +126,7 @@ TEST_F(KeyReductionTest, WhatIsSimpleIsFoundOut) {
   EXPECT_EQ(left(steps, Interpolation::Linear, 0), 21);    // its ends, of which the last has one
   EXPECT_EQ(left(arc, Interpolation::Linear, 1e-6), 2);
   EXPECT_LE(left(parabola, Interpolation::Cubic, 0.1), 12);
-  // A line strays by s * s / 8 * 2e-3 from a span of s frames.
+  // A line deviates by s * s / 8 * 2e-3 from a span of s frames.
   EXPECT_NEAR(static_cast<double>(left(parabola, Interpolation::Linear, 0.1)), 1001 / 20.0 + 1, 2);
 }
 
@@ -158,14 +158,12 @@ class ReduceChannelTest : public SceneTest {
     const HTimeRange all[] = {HTimeRange::forever()};
     return channel->reduceKeys(all, by);
   }
-  // The fill types by own key, a blank without one.
-  static std::string fillTypes(Marker const* marker, int frames) {
+  // x: a key, -: a bridge, blank: no data.
+  static std::string data(Controller const* channel, int frames) {
+    KeyTrack const& track = *channel->findActiveTrack();
     std::string text;
-    Controller const* channel = marker->getChannel("FillType");
     for (int i = 0; i < frames; ++i)
-      text += channel && channel->hasKeyAt(i * kFrame)
-                  ? std::to_string(static_cast<int>(marker->getFillType(i * kFrame)))
-                  : " ";
+      text += track.find(i * kFrame) >= 0 ? 'x' : track.bridgedAt(i * kFrame) ? '-' : ' ';
     return text;
   }
   static std::string keys(Controller const* channel, int frames) {
@@ -180,43 +178,16 @@ class ReduceChannelTest : public SceneTest {
   ReductionTolerances m_tolerances{.length = 0.1, .angle = 0.1, .ofRange = 0.001};
 };
 
-TEST_F(ReduceChannelTest, FillTypesOfAMarkerTellWhatWasReduced) {
+TEST_F(ReduceChannelTest, ThinningOpensNoGapAndClosesNone) {
   fill(m_channel, "xxxxxx   xx xxxx");
   m_marker->setFillType(3 * kFrame, Marker::Filled, false);
-  m_marker->setFillType(5 * kFrame, Marker::EditedByHand, false);
   EXPECT_EQ(reduceAll(m_channel, m_tolerances), 6);
-  EXPECT_EQ(keys(m_channel, 16), "x    x   xx x  x");
-  EXPECT_EQ(fillTypes(m_marker, 16), "4    2      4  0");
+  EXPECT_EQ(data(m_channel, 16), "x----x   xx x--x");
+  EXPECT_EQ(m_marker->getFillType(3 * kFrame), Marker::Filled);
   EXPECT_EQ(reduceAll(m_channel, m_tolerances), 0);
-}
-
-// The frames that count as data although they hold no key.
-TEST_F(ReduceChannelTest, EditsInAReducedRunKeepWhatWasSeen) {
-  const auto data = [&] {
-    std::string text;
-    for (int i = 0; i < 16; ++i)
-      text += m_channel->hasKeyAt(i * kFrame) ? 'x' : m_marker->isReducedBehind((i - 1) * kFrame) ? '-' : ' ';
-    return text;
-  };
-  fill(m_channel, "xxxxxxxxxxxx  xx");
-  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 10);
-  EXPECT_EQ(data(), "x----------x  xx");
-  m_channel->setKey(4 * kFrame, {4, 1, 0}, KeyTrack::kAll);
-  EXPECT_EQ(data(), "x---x------x  xx");
-  m_marker->setLocalPos(8 * kFrame, {8, 1, 0});
-  m_marker->setFillType(8 * kFrame, Marker::EditedByHand, true);
-  EXPECT_EQ(data(), "x---x---x--x  xx");
-  EXPECT_EQ(m_marker->getFillType(8 * kFrame), Marker::EditedByHand);
-
-  // What is cut was not seen, up to the keys on either side.
-  m_channel->deleteKeys(HTimeRange(4 * kFrame, 6 * kFrame), KeyTrack::kAll, false);
-  EXPECT_EQ(data(), "x       x--x  xx");
-  EXPECT_EQ(m_marker->getFillType(8 * kFrame), Marker::EditedByHand);
-  m_channel->selectKeys(HTimeRange(11 * kFrame, 14 * kFrame), KeyTrack::kAll);
-  m_channel->deleteSelectedKeys(KeyTrack::kAll);
-  EXPECT_EQ(data(), "x       x      x");
-  m_channel->deleteKeys(HTimeRange::forever(), KeyTrack::kAll, true);
-  EXPECT_EQ(data(), std::string(16, ' '));
+  BoolController const* occluded = m_marker->getOccludedChannel();
+  EXPECT_FALSE(occluded->getValue(3 * kFrame));
+  EXPECT_TRUE(occluded->getValue(7 * kFrame));
 }
 
 TEST_F(ReduceChannelTest, ReducedCurvesCanBeReducedFurther) {
@@ -224,22 +195,16 @@ TEST_F(ReduceChannelTest, ReducedCurvesCanBeReducedFurther) {
   EXPECT_GT(reduceAll(m_channel, m_tolerances), 100);
   const int left = m_channel->getNumKeys();
   EXPECT_GT(reduceAll(m_channel, {.length = 1, .angle = 0, .ofRange = 0}), left / 3);
-  EXPECT_EQ(fillTypes(m_marker, 200).find_first_not_of("4 "), 199u);
+  EXPECT_EQ(data(m_channel, 201).find(' '), 200u);
 }
 
-TEST_F(ReduceChannelTest, LayersAboveTellNothingOfOcclusion) {
+TEST_F(ReduceChannelTest, LayersAboveTellNothingOfGaps) {
   fill(m_channel, "xx   xx");
   m_clip->addLayer();
   g_db->setActiveLayer(1);
-  fill(m_channel, "xxxxxxx");
-  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 5);
-  EXPECT_EQ(m_marker->getChannel("FillType"), nullptr);
-  // A fill type above would hide the one that reduction writes below.
-  m_marker->setFillType(0, Marker::Filled, false);
-  g_db->setActiveLayer(0);
-  fill(m_channel, "xxxx");
-  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 2);
-  EXPECT_EQ(m_marker->getFillType(0), Marker::Reduced);
+  fill(m_channel, "xx  xxx");
+  EXPECT_EQ(reduceAll(m_channel, m_tolerances), 3);
+  EXPECT_FALSE(m_marker->isSeenAt(3 * kFrame));
 }
 
 TEST_F(ReduceChannelTest, RangesThatHoldEveryKeyAndSelectionOfAllAreAll) {

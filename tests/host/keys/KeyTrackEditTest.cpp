@@ -190,6 +190,17 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
     });
   }
 
+  void thin() {
+    std::vector<unsigned char> lost(model.keys.size());
+    const bool much = oneIn(2);
+    for (unsigned char& each : lost)
+      if (oneIn(much ? 3 : 40)) each = static_cast<unsigned char>(model.normal(mask()));
+    for (unsigned c = 1; c < 8; c *= 2)
+      if (const int64 last = model.walk(model.size(), -1, &Key::components, c); last >= 0)
+        lost[static_cast<size_t>(last)] = 0;
+    ASSERT_EQ(track.thin(lost), model.thin(lost));
+  }
+
   void restoreOne() {
     if (model.keys.empty()) return;
     Key& key = model.at(upTo(model.size() - 1));
@@ -222,7 +233,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
     } else if (what < 70) {
       for (int64 i = large ? 20 : 0; i >= 0; --i) eraseOne();
     } else if (what < 72) {
-      restoreOne();
+      oneIn(8) ? thin() : restoreOne();
     } else if (what < 85) {
       setSelected();
     } else {

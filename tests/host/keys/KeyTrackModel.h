@@ -1,4 +1,4 @@
-// A key track as plainly as it can be written: a sorted vector, every question answered by looking at all
+// A key track as plainly as it can be written: a sorted vector, every query looks at all
 // keys.
 #pragma once
 
@@ -37,7 +37,7 @@ class KeyTrackModel {
     mask = normal(mask);
     return std::count_if(keys.begin(), keys.end(), [mask](Key const& k) { return (k.selected & mask) != 0; });
   }
-  // The first key behind `index`, in steps of `step`, whose flags meet the mask.
+  // The first key after `index`, in steps of `step`, whose flags meet the mask.
   int64 walk(int64 index, int step, unsigned char Key::*flags, unsigned mask, bool any = true) const {
     mask = normal(mask);
     for (index = std::clamp<int64>(index, -1, size()) + step; index >= 0 && index < size(); index += step)
@@ -100,6 +100,25 @@ class KeyTrackModel {
       }
       if (holder) holder->bridges &= static_cast<unsigned char>(~c);
     }
+    std::erase_if(keys, [](Key const& k) { return k.components == 0; });
+    return changed;
+  }
+
+  int64 thin(std::vector<unsigned char> const& lost) {
+    for (unsigned c = 1; c < 8; c *= 2) {
+      Key* kept = nullptr;
+      bool loses = false;
+      for (size_t i = 0; i < keys.size(); ++i) {
+        if (!(keys[i].components & c)) continue;
+        loses = loses || (lost[i] & c);
+        if (lost[i] & c) continue;
+        if (kept && loses) kept->bridges |= static_cast<unsigned char>(c);
+        kept = &keys[i];
+        loses = false;
+      }
+    }
+    int64 changed = 0;
+    for (size_t i = 0; i < keys.size(); ++i) changed += lose(keys[i], lost[i] & keys[i].components);
     std::erase_if(keys, [](Key const& k) { return k.components == 0; });
     return changed;
   }

@@ -370,8 +370,7 @@ class NaiveState {
     put(id, own + ".Interpolation", std::to_string(static_cast<int>(channel.getInterpolation())));
     put(id, own + ".Locked", channel.isLocked() ? "true" : "false");
     m_texts[id + " default " + own] = textOfList(channel.getDefaultValues());
-    channel.forEachTrack([&](NLEClip* clip, int layer) {
-      KeyTrack const& track = *channel.findTrack(clip, layer);
+    channel.forEachTrack([&](NLEClip* clip, int layer, KeyTrack const& track) {
       Keys& keys = m_keys[id + " keys " + own + " " + name(clip) + " " + std::to_string(layer)];
       track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
         std::vector<double>& values = keys[key.time];

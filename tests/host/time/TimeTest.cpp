@@ -160,6 +160,7 @@ TEST(TimeManager, RoundsToFrameBoundariesFromAnOrigin) {
     EXPECT_EQ(up, t == down ? down : down + k120);
     EXPECT_EQ(time.frameTime(t, RoundNearest, origin), t - down < k120 - (t - down) ? down : up);
   }
+  EXPECT_EQ(time.frameTime(k120 / 2, RoundNearest, 0), k120) << "half a frame goes up";
   for (const int64 end : {-kForever, kForever})
     for (const int64 origin : {-kForever, int64{0}, kForever})
       for (const auto direction : {RoundDown, RoundNearest, RoundUp})

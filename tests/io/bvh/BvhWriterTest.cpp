@@ -95,7 +95,8 @@ TEST(BvhWriter, UsualChannelsWhereAJointNamesNone) {
 }
 
 TEST(BvhWriter, SiblingsKeepTheirOrderHoweverTheListIsSorted) {
-  const Take take = takeOf({joint("r", -1), joint("s", -1), joint("a", 0), joint("b", 0), joint("aa", 2)});
+  Take take = takeOf({joint("r", -1), joint("s", -1), joint("a", 0), joint("b", 0), joint("aa", 2)});
+  take.joints[2].endSite = true;  // it has a child, so it is written as a joint
   const std::string text = written(take);
   size_t at = 0;
   for (const char* name : {"ROOT r\n", "JOINT a\n", "JOINT aa\n", "JOINT b\n", "ROOT s\n"}) {

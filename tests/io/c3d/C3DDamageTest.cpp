@@ -63,9 +63,9 @@ TEST_F(C3DDamage, SaysWhereParametersLeadAstray) {
   // The first record is the group POINT: two bytes, the name, then the next-record offset.
   const size_t link = 512 + 4 + 2 + 5;
   std::string damaged = bytes;
-  damaged[link] = 1;
+  damaged[link] = 2;
   EXPECT_NE(
-      outcome(damaged).find("offset 523: parameter POINT: the next-record offset 1 does not lead forward"),
+      outcome(damaged).find("offset 523: parameter POINT: the next-record offset 2 does not lead forward"),
       std::string::npos);
   damaged = bytes;
   damaged[link + 1] = 0x7f;

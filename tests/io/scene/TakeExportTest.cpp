@@ -1,7 +1,9 @@
 #include <gmock/gmock.h>
 
+#include "host/keys/KeyReduction.h"
 #include "host/scene/Bones.h"
 #include "host/scene/Character.h"
+#include "host/scene/Devices.h"
 #include "tests/io/TakeTesting.h"
 #include "tests/io/scene/SceneTesting.h"
 
@@ -25,22 +27,6 @@ class TakeExportTest : public SceneTest {
   }
 };
 
-TEST_F(TakeExportTest, ReducedRunsAreDataOtherGapsAreNot) {
-  Take take = smallTake("walk");
-  addPoint(take, "Bob", "M", {0, 0, 0}, "x x x");
-  open(take);
-  auto* marker = at<Marker>("\\Bob\\M");
-  EXPECT_EQ(seen(onlyPoint()), "x x x");
-  marker->setFillType(at100(1), Marker::Reduced, false);
-  marker->setFillType(at100(3), Marker::Recorded, false);
-  EXPECT_EQ(seen(onlyPoint()), "xxx x");
-  EXPECT_EQ(onlyPoint().at(1).values[0], 1);
-  // Behind the last key there is nothing to reduce.
-  marker->setFillType(at100(5), Marker::Reduced, false);
-  marker->getTranslationChannel()->deleteKey(at100(5), KeyTrack::kAll);
-  EXPECT_EQ(seen(onlyPoint()), "xxx  ");
-}
-
 TEST_F(TakeExportTest, LayersAndPartialKeysAreEvaluated) {
   Take take = smallTake("walk");
   addPoint(take, "Bob", "M", {0, 0, 0}, "xx xx");
@@ -59,7 +45,7 @@ TEST_F(TakeExportTest, LayersAndPartialKeysAreEvaluated) {
   EXPECT_EQ(onlyPoint().at(1).components, KeyTrack::kAll);
 }
 
-TEST_F(TakeExportTest, KeysOffTheFramesAreLeftOutWithOneWarning) {
+TEST_F(TakeExportTest, FramesAreThoseOfTheFileAndOfKeysBeyond) {
   Take take = smallTake("walk");
   addPoint(take, "Bob", "M", {0, 0, 0});
   open(take);
@@ -67,8 +53,50 @@ TEST_F(TakeExportTest, KeysOffTheFramesAreLeftOutWithOneWarning) {
   track.set(at100(2) + 5, {});
   track.set(at100(9), {});
   at<Marker>("\\Bob\\M")->getTranslationChannel()->setTrack(g_db->getActiveClip(), 0, track);
-  EXPECT_EQ(onlyPoint().count(), 5);
-  EXPECT_TRUE(warned("2 keys between or outside them were left out"));
+  Take made = save();
+  EXPECT_EQ(made.frameCount, 9);
+  EXPECT_EQ(made.points[0].positions.count(), 6);
+  EXPECT_TRUE(warned("1 key between or outside them was left out"));
+  HTimeManager::getInstance()->setAnimRange(HTimeRange(at100(2), at100(4)), true);
+  made = save();
+  EXPECT_EQ(made.firstFrame, 2);
+  EXPECT_EQ(made.frameCount, 3);
+  EXPECT_TRUE(warned("the animation range leaves out 6 of the clip's 9 frames"));
+}
+
+// A second take at another rate has data at all times between its samples, and is saved as it was read.
+TEST_F(TakeExportTest, AClipKeepsItsOwnFrames) {
+  Take first = smallTake("first", 20), second = smallTake("second", 6, 3);
+  addPoint(first, "Ann", "M", {});
+  second.rate = 50;
+  second.analogRate = 200;
+  addPoint(second, "Bob", "M", {}, "xx  xx");
+  addPoint(second, "Bob", "never seen", {}, "      ");
+  TakeAnalogChannel& analog = second.analog.emplace_back();
+  analog.name = "emg";
+  for (int i = 0; i < 24; ++i)
+    analog.samples.set(3 * ticksPerFrameAt(50) + i * ticksPerFrameAt(200), {i % 5 / 1.0});
+  open(first);
+  open(second);
+  EXPECT_EQ(differenceOf(second, save()), "");
+  const auto* marker = at<Marker>("\\Bob\\M");
+  for (const int frame : {5, 6, 7, 8, 9, 13, 14, 15, 16, 17}) {
+    const bool isSeen = (frame >= 6 && frame <= 8) || (frame >= 14 && frame <= 16);
+    EXPECT_EQ(!marker->getOccludedChannel()->getValue(at100(frame)), isSeen) << frame;
+  }
+
+  g_db->getActiveClip()->setSelected(true);
+  g_db->duplicateSelectedObjects();
+  g_db->setActiveClip(objectAs<NLEClip>(g_db->getSelectedModule(0)));
+  EXPECT_EQ(differenceOf(second, save()), "");
+
+  // Thinned, its samples come back.
+  auto* channel = at<AnalogDevice>("\\Analog")->getChannel("emg");
+  const HTimeRange all[] = {HTimeRange::forever()};
+  EXPECT_EQ(channel->reduceKeys(all, {.length = 0, .angle = 0, .ofRange = 1e-9}), 14);
+  const KeyTrack samples = save().analog.at(0).samples;
+  ASSERT_EQ(samples.count(), 24);
+  for (int64 i = 0; i < 24; ++i) EXPECT_NEAR(samples.at(i).values[0], static_cast<double>(i % 5), 1e-9);
 }
 
 TEST_F(TakeExportTest, OnlyWhatBelongsToTheActiveClipGoesOut) {
@@ -87,7 +115,7 @@ TEST_F(TakeExportTest, OnlyWhatBelongsToTheActiveClipGoesOut) {
 TEST_F(TakeExportTest, WithoutAClipDefaultValuesLastThroughTheRange) {
   auto* bob = g_db->createModule(&Character::staticClass(), "Bob", nullptr);
   static_cast<Node*>(g_db->createModule(&Marker::staticClass(), "M", bob))->setConstLocalPos({1, 2, 3});
-  HTimeManager::getInstance()->setAnimRange(HTimeRange(0, 4 * ticksPerFrameAt(120)));
+  HTimeManager::getInstance()->setAnimRange(HTimeRange(0, 4 * ticksPerFrameAt(120)), true);
   const Take take = save();
   EXPECT_EQ(take.frameCount, 5);
   ASSERT_EQ(take.points.size(), 1u);

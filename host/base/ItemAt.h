@@ -1,0 +1,14 @@
+// Accessors by index return nothing beyond the end: an empty value, or null for what is owned by pointer.
+#pragma once
+
+#include "host/base/Types.h"
+
+template <class Items>
+auto itemAt(Items const& items, int64 i) {
+  const bool exists = i >= 0 && static_cast<uint64>(i) < items.size();
+  const auto at = static_cast<uint64>(i);
+  if constexpr (requires { items[at].get(); })
+    return exists ? items[at].get() : nullptr;
+  else
+    return exists ? items[at] : typename Items::value_type();
+}

@@ -1,0 +1,213 @@
+#include "host/keys/LeafTimes.h"
+
+#include <algorithm>
+#include <limits>
+#include <numeric>
+#include <vector>
+
+// With Even the slot, with Full the time.
+int64 LeafTimes::storedOffset(int slot) const {
+  return m_form == Form::Even    ? slot
+         : m_form == Form::Short ? stored<Short>(slot)
+         : m_form == Form::Long  ? stored<Long>(slot)
+                                 : stored<Full>(slot);
+}
+
+// How many offsets lie before the value. Halves without branches, which could not be predicted.
+template <class T>
+int LeafTimes::countBefore(T value) const {
+  int from = 0, n = m_size;
+  for (; n > 1; n -= n / 2) from += stored<T>(from + n / 2 - 1) < value ? n / 2 : 0;
+  return from + (n == 1 && stored<T>(from) < value);
+}
+
+int LeafTimes::lowerBound(int64 time) const {
+  if (time > back()) return m_size;
+  if (time <= front()) return 0;
+  if (m_form == Form::Full) return countBefore<Full>(time);
+  const int64 units = (time - m_start - 1) / m_unit + 1;
+  return m_form == Form::Even    ? static_cast<int>(units)
+         : m_form == Form::Short ? countBefore(static_cast<Short>(units))
+                                 : countBefore(static_cast<Long>(units));
+}
+
+int LeafTimes::lastAtOrBefore(int64 time) const {
+  if (time >= back()) return m_size - 1;
+  if (m_form == Form::Full) return countBefore<Full>(time + 1) - 1;
+  const int64 units = (time - m_start) / m_unit;  // less than the last offset
+  return m_form == Form::Even    ? static_cast<int>(units)
+         : m_form == Form::Short ? countBefore(static_cast<Short>(units + 1)) - 1
+                                 : countBefore(static_cast<Long>(units + 1)) - 1;
+}
+
+void LeafTimes::read(int slot, int n, int64* out) const {
+  const auto decode = [&](auto offsetAt) {
+    for (int i = 0; i < n; ++i) out[i] = m_start + m_unit * offsetAt(slot + i);
+  };
+  switch (m_form) {
+    case Form::Even:
+      return decode([](int i) { return i; });
+    case Form::Short:
+      return decode([this](int i) { return stored<Short>(i); });
+    case Form::Long:
+      return decode([this](int i) { return stored<Long>(i); });
+    case Form::Full:
+      for (int i = 0; i < n; ++i) out[i] = stored<Full>(slot + i);
+  }
+}
+
+LeafTimes::Form LeafTimes::smallestFor(uint64 units) {
+  return units <= std::numeric_limits<Short>::max()  ? Form::Short
+         : units <= std::numeric_limits<Long>::max() ? Form::Long
+                                                     : Form::Full;
+}
+
+// Takes n times at a slot of even ones when all are even then.
+bool LeafTimes::continueEvenly(int slot, int64 start, int64 period, int n) {
+  if (m_form != Form::Even) return false;
+  if (m_size == 0) {
+    m_start = start;
+    m_unit = n > 1 ? period : 0;
+  } else if (n > 1) {
+    if (slot != m_size || start - back() != period || (m_size > 1 && m_unit != period)) return false;
+    m_unit = period;
+  } else if (m_size == 1) {
+    m_unit = slot == 1 ? start - m_start : m_start - start;
+    m_start = std::min(m_start, start);
+  } else if (slot == m_size) {
+    if (start - back() != m_unit) return false;
+  } else {
+    if (slot != 0 || m_start - start != m_unit) return false;
+    m_start = start;
+  }
+  m_size += n;
+  return true;
+}
+
+// Whether the form, which is not Even, can hold the time.
+bool LeafTimes::holds(int64 time) const {
+  if (m_form == Form::Full) return true;
+  const auto apart = static_cast<uint64>(time - m_start), unit = static_cast<uint64>(m_unit);
+  if (time < m_start || apart % unit != 0) return false;
+  return apart / unit <=
+         (m_form == Form::Short ? std::numeric_limits<Short>::max() : std::numeric_limits<Long>::max());
+}
+
+// Makes the form one that can hold n further times, at either end or, when it is one, between.
+void LeafTimes::makeHold(int64 start, int64 period, int n) {
+  const int64 end = start + period * (n - 1);
+  if (m_form != Form::Even && holds(start) && (n == 1 || (period % unit() == 0 && holds(end)))) return;
+  if (m_form == Form::Full) return;
+  const int64 first = m_size > 0 ? std::min(front(), start) : start,
+              last = m_size > 0 ? std::max(back(), end) : end;
+  int64 divisor = std::gcd(m_unit, n > 1 ? period : 0);
+  if (m_size > 0) divisor = std::gcd(divisor, start - front());
+  convert(smallestFor(static_cast<uint64>(last - first) / static_cast<uint64>(divisor)), first, divisor);
+}
+
+// The new unit must divide the distance of each time from the new start.
+void LeafTimes::convert(Form form, int64 start, int64 unit) {
+  LeafTimes fresh;
+  fresh.m_form = form;
+  fresh.m_start = start;
+  fresh.m_unit = unit;
+  // Offsets in a multiple of the new unit need no division.
+  const bool scales = m_form != Form::Full && form != Form::Full && m_unit % unit == 0;
+  const int64 shift = scales ? (m_start - start) / unit : 0, scale = scales ? m_unit / unit : 0;
+  const auto write = [&]<class T>(T) {
+    const int words = static_cast<int>(sizeof(T) / sizeof(Short));
+    fresh.m_column.open(0, m_size * words, m_size * words);
+    for (int i = 0; i < m_size; ++i) {
+      const int64 offset = form == Form::Full ? (*this)[i]
+                           : scales           ? shift + scale * storedOffset(i)
+                                              : ((*this)[i] - start) / unit;
+      fresh.store(i, static_cast<T>(offset));
+    }
+  };
+  if (form == Form::Short) write(Short{});
+  if (form == Form::Long) write(Long{});
+  if (form == Form::Full) write(Full{});
+  fresh.m_size = m_size;
+  *this = std::move(fresh);
+}
+
+// The form must hold them.
+void LeafTimes::put(int slot, int64 start, int64 period, int n, int limit) {
+  m_column.open(slot * words(), n * words(), limit * words());
+  const int64 first = (start - base()) / unit(), step = period / unit();
+  if (m_form == Form::Short) storeRun<Short>(slot, first, step, n);
+  if (m_form == Form::Long) storeRun<Long>(slot, first, step, n);
+  if (m_form == Form::Full) storeRun<Full>(slot, first, step, n);
+  m_size += n;
+  evenOut();
+}
+
+void LeafTimes::insert(int slot, int64 time, int limit) { add(slot, time, 0, 1, limit); }
+
+void LeafTimes::append(int64 start, int64 period, int n, int limit) { add(m_size, start, period, n, limit); }
+
+void LeafTimes::add(int slot, int64 start, int64 period, int n, int limit) {
+  if (continueEvenly(slot, start, period, n)) return;
+  makeHold(start, period, n);
+  put(slot, start, period, n, limit);
+}
+
+void LeafTimes::append(LeafTimes const& from, int first, int last) {
+  if (first == last) return;
+  const int limit = m_size + last - first;
+  if (from.even()) return append(from[first], from.m_unit, last - first, limit);
+  for (int slot = first; slot < last; ++slot) append(from[slot], 0, 1, limit);
+}
+
+void LeafTimes::erase(int first, int last) {
+  if (even()) {
+    if (last == m_size || first == 0) {
+      if (first == 0) m_start += m_unit * last;
+      m_size -= last - first;
+      if (m_size < 2) m_unit = 0;
+      return;
+    }
+    convert(smallestFor(static_cast<uint64>(m_size - 1)), m_start, m_unit);
+  }
+  m_column.erase(first * words(), last * words());
+  m_size -= last - first;
+  evenOut();
+}
+
+void LeafTimes::keep(const int* slots, int n) {
+  if (even()) convert(smallestFor(static_cast<uint64>(m_size)), m_start, m_unit);
+  m_column.keep(slots, n, words());
+  m_size = n;
+  evenOut();
+}
+
+// The ends tell almost always whether the times are even, so that asking after every edit costs next to
+// nothing.
+void LeafTimes::evenOut() {
+  if (even()) return;
+  const int64 period = m_size > 1 ? (*this)[1] - front() : 0;
+  if (m_size > 1) {
+    if (static_cast<uint64>(back() - front()) !=
+        static_cast<uint64>(period) * static_cast<uint64>(m_size - 1))
+      return;
+    for (int i = 2; i < m_size; ++i)
+      if ((*this)[i] - (*this)[i - 1] != period) return;
+  }
+  m_start = m_size > 0 ? front() : 0;
+  m_unit = period;
+  m_form = Form::Even;
+  m_column.clear();
+}
+
+void LeafTimes::pack() {
+  if (m_form == Form::Long || m_form == Form::Full) {
+    // What offsets have in common besides their unit.
+    int64 common = 0;
+    for (int i = 1; i < m_size && common != 1; ++i)
+      common = std::gcd(common, storedOffset(i) - storedOffset(0));
+    const int64 divisor = unit() * common;
+    const Form form = smallestFor(static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor));
+    if (form < m_form) convert(form, front(), divisor);
+  }
+  m_column.shrink();
+}

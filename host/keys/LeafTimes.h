@@ -1,0 +1,97 @@
+// The ascending times of a leaf's keys, in the smallest of four forms that holds them:
+//  - even: a start and a period;
+//  - short, long: offsets of 16 or 32 bits from a start, in units of a common divisor. Keys that lie on
+//  frames
+//    have the frame as divisor, and then 16 bits reach over minutes and 32 over years;
+//  - full: 64 bits.
+// An edit may leave a larger form than is needed; pack() finds the smallest. Slots count from 0 and must be
+// in range; `limit` bounds the room that is kept for further keys.
+#pragma once
+
+#include <cstdint>
+#include <cstring>
+
+#include "host/keys/KeyColumn.h"
+
+class LeafTimes {
+ public:
+  int size() const { return m_size; }
+  bool even() const { return m_form == Form::Even; }
+  int64 period() const { return m_unit; }  // of even times; 0 with one key
+  int64 operator[](int slot) const {
+    switch (m_form) {
+      case Form::Even:
+        return m_start + m_unit * slot;
+      case Form::Short:
+        return m_start + m_unit * stored<Short>(slot);
+      case Form::Long:
+        return m_start + m_unit * stored<Long>(slot);
+      case Form::Full:
+        break;
+    }
+    return stored<Full>(slot);
+  }
+  int64 front() const { return (*this)[0]; }
+  int64 back() const { return (*this)[m_size - 1]; }
+
+  int lowerBound(int64 time) const;      // the first at or after the time, size() when there is none
+  int lastAtOrBefore(int64 time) const;  // the time must not lie before the first one
+  void read(int slot, int n, int64* out) const;
+
+  void insert(int slot, int64 time, int limit);
+  void append(int64 start, int64 period, int n, int limit);
+  void append(LeafTimes const& from, int first, int last);
+  void erase(int first, int last);
+  // Leaves the n ascending slots.
+  void keep(const int* slots, int n);
+  // The smallest form, and no room for more.
+  void pack();
+
+  int64 bytes() const { return m_column.bytes(); }
+  bool isWhole() const { return m_column.size() == (even() ? 0 : m_size * words()); }
+
+ private:
+  enum class Form : unsigned char { Even, Short, Long, Full };
+  using Short = std::uint16_t;
+  using Long = std::uint32_t;
+  using Full = int64;
+
+  // The offset at a slot, or with Full the time itself. All forms share one column of 16 bit words, so that a
+  // leaf does not carry a column for each.
+  template <class T>
+  T stored(int slot) const {
+    T value;
+    std::memcpy(&value, m_column.data() + slot * static_cast<int>(sizeof(T) / sizeof(Short)), sizeof value);
+    return value;
+  }
+  template <class T>
+  void store(int slot, T value) {
+    std::memcpy(m_column.data() + slot * static_cast<int>(sizeof(T) / sizeof(Short)), &value, sizeof value);
+  }
+  template <class T>
+  int countBefore(T value) const;
+  template <class T>
+  void storeRun(int slot, int64 first, int64 step, int n) {
+    for (int i = 0; i < n; ++i) store(slot + i, static_cast<T>(first + step * i));
+  }
+
+  static Form smallestFor(uint64 units);
+  int words() const { return m_form == Form::Short ? 1 : m_form == Form::Long ? 2 : 4; }
+  // Times are base() + unit() * what is stored.
+  int64 base() const { return m_form == Form::Full ? 0 : m_start; }
+  int64 unit() const { return m_form == Form::Full ? 1 : m_unit; }
+  int64 storedOffset(int slot) const;
+  void add(int slot, int64 start, int64 period, int n, int limit);
+  bool continueEvenly(int slot, int64 start, int64 period, int n);
+  bool holds(int64 time) const;
+  void makeHold(int64 start, int64 period, int n);
+  void convert(Form, int64 start, int64 unit);
+  void put(int slot, int64 start, int64 period, int n, int limit);
+  void evenOut();
+
+  int64 m_start = 0;  // what periods or offsets count from; unused with Full
+  int64 m_unit = 0;   // the period, or what offsets count
+  int m_size = 0;
+  Form m_form = Form::Even;
+  KeyColumn<Short> m_column;
+};
