@@ -66,7 +66,7 @@ std::unique_ptr<Session> makeSession(PluginChoice const& plugin, int& status) {
   }
 }
 
-// Answers `status` once all output is out. Somebody who stops reading is told nothing: he knows.
+// Returns `status` once all output is out. Somebody who stops reading is told nothing: he knows.
 int finished(int status, bool written) {
   if (written) return status;
   if (errno != EPIPE) std::fprintf(stderr, "error: standard output: %s\n", std::strerror(errno));

@@ -1,4 +1,4 @@
-// What the subcommands of the program do. Each answers the program's exit status.
+// What the subcommands of the program do. Each returns the program's exit status.
 #pragma once
 
 #include <string>

@@ -19,7 +19,7 @@ class Candidates {
   Module* getOnMod() const { return m_onMod; }
   // Whether there is any, whatever its class. Without one logs the message for "-all" or for the selection.
   [[nodiscard]] bool exist(char const* noModules, char const* noSelection) const;
-  // Calls work(module) for each candidate of the class until it answers false; answers whether it never did.
+  // Calls work(module) for each candidate of the class until it returns false; returns whether it never did.
   template <class Work>
   bool each(Work work) const {
     // Counted anew each time: the work may change the selection.

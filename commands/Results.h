@@ -1,4 +1,4 @@
-// Results in one line: each sets the value and answers true, as a command that has succeeded does.
+// Results in one line: each sets the value and returns true, as a command that has succeeded does.
 #pragma once
 
 #include <type_traits>

@@ -77,7 +77,7 @@ std::optional<Form> formOf(Command const& command, size_t count) {
 std::string textOf(size_t least, Form form) {
   const bool many = form.size() >= kMany;
   std::string text;
-  // The last place that differs from the next, behind which "..." tells the rest.
+  // The last place that differs from the next, after which "..." stands for the rest.
   size_t shown = form.size();
   while (many && shown > least + 1 && form[shown - 2] == form.back()) --shown;
   for (size_t i = 0; i < shown; ++i) {

@@ -20,7 +20,7 @@ struct Adjusting {
   }
 };
 
-// The module as a node; says that one that is none has nothing to adjust, and answers null.
+// The module as a node; says that one that is none has nothing to adjust, and returns null.
 Node* nodeToAdjust(Module* module);
 // Keeps the motion of a node in the world for a new parent (null: the world), and steps the progress. False
 // when the user cancelled.

@@ -25,7 +25,7 @@ Module* findModule(HString const& name) {
   return module;
 }
 
-// The channel that "module.plug" names. Without one logs why and answers null.
+// The channel that "module.plug" names. Without one logs why and returns null.
 Controller* findPlug(HString const& text) {
   const int dot = text.ReverseFind('.');
   if (dot < 0) {

@@ -1,10 +1,11 @@
+#include <algorithm>
 #include <vector>
 
 #include "commands/Arguments.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
-#include "host/scene/Node.h"
+#include "host/scene/SceneReader.h"
 
 namespace {
 
@@ -42,23 +43,41 @@ Vec3 vectorAt(Args const& args, int i) {
   return {args[i].getFloatValue(-1), args[i + 1].getFloatValue(-1), args[i + 2].getFloatValue(-1)};
 }
 
-// Selects the keys of the selected nodes' frames behind the plane, run by run, and answers their number.
+// Selects the keys of the selected nodes' frames behind the plane, run by run, and returns their number.
+// Before the first and after the last key of all that moves them nothing changes: there one frame on each
+// side tells about all.
 int selectBehind(Plane const& plane) {
   HTimeManager const* time = HTimeManager::getInstance();
-  const HTimeRange play = time->getPlayRange();
-  std::vector<HTimeRange> behind(static_cast<size_t>(g_db->getNumSelectedNodes()));  // empty: in front
+  std::vector<Node*> nodes;
+  for (int i = 0; i < g_db->getNumSelectedNodes(); ++i) nodes.push_back(g_db->getSelectedNode(i));
+  const SceneReader reader(std::vector<Node const*>(nodes.begin(), nodes.end()), g_db->getActiveClip());
+  const int64 period = time->getTicksPerFrame();
+  const HTimeRange play = time->getPlayRange(), motion = reader.getMotionRange();
+  if (motion.isEmpty() || play.isEmpty()) return 0;
+  const int64 most = (play.getEnd() - play.getStart()) / period;
+  const auto frameOf = [&](int64 at) { return std::clamp<int64>((at - play.getStart()) / period, 0, most); };
+  const int64 first = std::max<int64>(frameOf(motion.getStart()) - 1, 0);
+  const int64 last = std::min(frameOf(motion.getEnd()) + 2, most);
+
+  constexpr int64 kBlock = 256;
+  std::vector<HTimeRange> behind(nodes.size());  // empty: in front
+  std::vector<double> positions(3 * nodes.size() * kBlock);
   int selected = 0;
-  // Frame by frame over all nodes, which share the placements of their ancestors.
-  for (int64 t = play.getStart(); t <= play.getEnd(); t += time->getTicksPerFrame())
-    for (size_t i = 0; i < behind.size(); ++i) {
-      Node* node = g_db->getSelectedNode(static_cast<int>(i));
-      if (plane.isBehind(node->getWSPos(t))) {
-        behind[i].include(t);
-      } else if (!behind[i].isEmpty()) {
-        selected += node->getTransformChannel()->selectKeys(behind[i], KeyTrack::kAll);
-        behind[i] = HTimeRange();
-      }
-    }
+  for (int64 frame = first; frame <= last; frame += kBlock) {
+    const int64 start = play.getStart() + frame * period, count = std::min(kBlock, last - frame + 1);
+    SceneReader::Arrays arrays;
+    arrays.positions = positions.data();
+    reader.readWorld(SampleTimes(start, period, count), arrays);
+    double const* position = positions.data();
+    for (int64 t = start; t < start + count * period; t += period)
+      for (size_t i = 0; i < nodes.size(); ++i, position += 3)
+        if (plane.isBehind(Vec3(position))) {
+          behind[i].include(t);
+        } else if (!behind[i].isEmpty()) {
+          selected += nodes[i]->getTransformChannel()->selectKeys(behind[i], KeyTrack::kAll);
+          behind[i] = HTimeRange();
+        }
+  }
   return selected;  // kept: a run that lasts to the end of the play range is not selected
 }
 

@@ -73,7 +73,7 @@ class RunSearch {
     return {node, track->timeAt(found), found == first};
   }
 
-  // The index of the first key beyond a time: before the first or behind the last key when there is none.
+  // The index of the first key beyond a time: before the first or after the last key when there is none.
   int64 firstBeyond(KeyTrack const& track, int64 time) const {
     return m_back ? track.lowerBound(time) - 1 : track.lowerBound(time + 1);
   }

@@ -25,7 +25,7 @@ bool hasKeysToList(KeyQueryTexts const& texts);
 ChannelComponents channelNamed(HString const& name, Given const& given, int onMod,
                                KeyQueryTexts const& texts);
 
-// Answers work(channel, mask) for the channel that a query is about. On the base clip it succeeds without a
+// Returns work(channel, mask) for the channel that a query is about. On the base clip it succeeds without a
 // result.
 template <class Work>
 bool queryKeys(Args const& args, Given const& given, int onMod, KeyQueryTexts const& texts, Work work) {

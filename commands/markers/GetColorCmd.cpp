@@ -9,7 +9,7 @@ class GetColorCmd final : public PendingCommand<GetColorCmd> {
       .displayName = "Get Colors",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose = "Answers a display colour of the scene as red, green and blue, 0 to 255.",
+      .purpose = "A display colour of the scene as red, green and blue, 0 to 255.",
       .args = {"selected | primarySelected | default | markerLines", 1, 1, {Variable::String}},
       .returns = Variable::IntArray,
       .solo = Solo::no};

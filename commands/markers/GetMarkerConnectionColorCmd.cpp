@@ -9,7 +9,7 @@ class GetMarkerConnectionColorCmd final : public PendingCommand<GetMarkerConnect
       .displayName = "Get Marker Connection Color",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose = "Answers the colour of the line between two markers as red, green and blue, 0 to 255.",
+      .purpose = "The colour of the line between two markers as red, green and blue, 0 to 255.",
       .args = {"\"sourceMarker\" \"targetMarker\"", 2, 2, {Variable::String, Variable::String}},
       .returns = Variable::IntArray,
       .solo = Solo::no};

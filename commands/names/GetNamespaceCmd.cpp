@@ -8,7 +8,7 @@ class GetNamespaceCmd final : public ScriptCommand<GetNamespaceCmd> {
   static constexpr CommandInfo info = {.name = "getNamespace",
                                        .displayName = "Get Namespace",
                                        .category = "Namespace",
-                                       .purpose = "Answers the whole namespace of a module.",
+                                       .purpose = "The whole namespace of a module.",
                                        .options = {{"onMod", 1, Variable::String}},
                                        .returns = Variable::String,
                                        .solo = Solo::no};

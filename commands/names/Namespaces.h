@@ -18,7 +18,7 @@
 }
 
 // The module whose namespaces are asked for: that of "-onMod", else the primary selected one. Without one
-// logs so and answers null.
+// logs so and returns null.
 inline Module* moduleToRead(Given const& given, int onMod) {
   Module* module = nullptr;
   if (!readOnMod(given, onMod, module)) return nullptr;
@@ -27,7 +27,7 @@ inline Module* moduleToRead(Given const& given, int onMod) {
   return module;
 }
 
-// Calls change(module), which answers whether the module took it, for each selected module until one did not.
+// Calls change(module), which returns whether the module took it, for each selected module until one did not.
 // kept: a module given by "-onMod" is only looked up, nothing changes.
 template <class Change>
 bool changeNamespaces(Given const& given, int onMod, Change change) {

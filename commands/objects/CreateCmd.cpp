@@ -121,7 +121,7 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
     }
   };
 
-  // The class of modules of that name when the scene takes one more. Without it logs why and answers null.
+  // The class of modules of that name when the scene takes one more. Without it logs why and returns null.
   static HRuntimeClass* typeToCreate(HString const& name) {
     HRuntimeClass* type = HRuntimeClass::findClass(name.GetStr());
     if (!type || !type->isDerivedFrom(&Module::s_classModule) || !type->getCreateFunction()) {

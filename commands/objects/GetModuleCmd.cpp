@@ -10,7 +10,7 @@ class GetModuleCmd final : public ScriptCommand<GetModuleCmd> {
       .displayName = "Get Scene Module",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose = "Answers the path of the primary selected module.",
+      .purpose = "The path of the primary selected module.",
       .options = {{"fullPath", 0, Variable::None, 2}, {"nameOnly", 0, Variable::None, 1}},
       .returns = Variable::String};
 

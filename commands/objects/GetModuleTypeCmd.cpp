@@ -10,7 +10,7 @@ class GetModuleTypeCmd final : public ScriptCommand<GetModuleTypeCmd> {
                                        .displayName = "Get Type of Module",
                                        .category = "Data Editing",
                                        .subCategory = "Data Retrieval",
-                                       .purpose = "Answers the type of a module, such as Marker.",
+                                       .purpose = "The type of a module, such as Marker.",
                                        .args = {"moduleName", 1, 1, {Variable::String}},
                                        .returns = Variable::String,
                                        .solo = Solo::no};

@@ -11,7 +11,7 @@ class GetParentCmd final : public ScriptCommand<GetParentCmd> {
       .displayName = "Get Parent",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose = "Answers the path of the parent of a module; nothing when it has none.",
+      .purpose = "The path of the parent of a module; nothing when it has none.",
       .args = {"module", 1, 1, {Variable::String}},
       .options = {{"fullPath", 0, Variable::None, 2}, {"nameOnly", 0, Variable::None, 1}},
       .returns = Variable::String,

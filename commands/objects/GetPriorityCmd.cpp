@@ -11,7 +11,7 @@ class GetPriorityCmd final : public ScriptCommand<GetPriorityCmd> {
       .displayName = "Get Priority Selection",
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
-      .purpose = "Answers the name of the priority module, below which short paths are looked for first.",
+      .purpose = "The name of the priority module, below which short paths are looked for first.",
       .returns = Variable::String};
 
   bool execute(Given const&, Args const&, Variable& result) override;

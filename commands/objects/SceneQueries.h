@@ -18,7 +18,7 @@ Module::EPathType pathType(Given const& given) {
   return type;
 }
 
-// The module class of that name. Without one logs so and answers null.
+// The module class of that name. Without one logs so and returns null.
 HRuntimeClass const* moduleTypeNamed(HString const& name);
 
 // Calls visit(module) for the selected modules in their order, or for all in order of creation.

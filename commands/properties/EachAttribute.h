@@ -12,7 +12,7 @@ struct AttributeTexts {
 };
 
 // Calls work(attribute) for the attribute of that name, in exact case, of the module of "-onMod", else of
-// each candidate that has one. Stops at the first that answers false; what was changed before stays. False,
+// each candidate that has one. Stops at the first that returns false; what was changed before stays. False,
 // with a message, then and when there is no such attribute.
 bool eachAttribute(Candidates const& candidates, HString const& name, AttributeTexts const& texts,
                    std::function<bool(Attribute&)> const& work);

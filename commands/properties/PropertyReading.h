@@ -9,10 +9,10 @@
 // The getters that send the user elsewhere for kinds of attribute that they do not read.
 enum class Getter { Int, Boolean, String, BooleanArray, IntArray, StringArray };
 
-// Logs what to use instead for this kind of attribute and answers false, as the getter then does.
+// Logs what to use instead for this kind of attribute and returns false, as the getter then does.
 bool redirect(Getter getter, Attribute const& attribute);
 
-// The attribute of that name, in exact case. Without one logs "Unknown property type" and answers null.
+// The attribute of that name, in exact case. Without one logs "Unknown property type" and returns null.
 Attribute const* attributeNamed(Module const& module, HString const& name);
 // The attribute that the first two arguments, a path and a name, stand for. Null, with a message, when there
 // is no such module or attribute.

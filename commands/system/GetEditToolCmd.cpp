@@ -7,7 +7,7 @@ class GetEditToolCmd final : public PendingCommand<GetEditToolCmd> {
   static constexpr CommandInfo info = {.name = "getEditTool",
                                        .displayName = "Get Current Edit Tool",
                                        .category = "Interface",
-                                       .purpose = "Answers the number of the current editing tool.",
+                                       .purpose = "The number of the current editing tool.",
                                        .returns = Variable::Int};
 };
 

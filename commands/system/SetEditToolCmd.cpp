@@ -8,7 +8,7 @@ class SetEditToolCmd final : public PendingCommand<SetEditToolCmd> {
       .name = "setEditTool",
       .displayName = "Set Editing Tool",
       .category = "Interface",
-      .purpose = "Switches to an editing tool by number, 0 to 5, and answers the one before.",
+      .purpose = "Switches to an editing tool by number, 0 to 5, and returns the one before.",
       .args = {"toolId", 1, 1, {Variable::Int}},
       .returns = Variable::Int,
       .solo = Solo::no};

@@ -9,7 +9,7 @@ class GetModuleRangeCmd final : public PendingCommand<GetModuleRangeCmd> {
       .displayName = "Get Module(s) Data Range",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose = "Answers the first and last frame of the keys of one or several modules.",
+      .purpose = "The first and last frame of the keys of one or several modules.",
       .args = {"module or moduleArray"},
       .options = {{"i"}},
       .returns = Variable::IntArray,

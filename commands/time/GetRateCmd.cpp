@@ -8,7 +8,7 @@ class GetRateCmd final : public PendingCommand<GetRateCmd> {
                                        .displayName = "Get Scene Rate",
                                        .category = "Data Editing",
                                        .subCategory = "Data Retrieval",
-                                       .purpose = "Answers the frame rate of the scene in frames a second.",
+                                       .purpose = "The frame rate of the scene in frames a second.",
                                        .returns = Variable::Float};
 };
 

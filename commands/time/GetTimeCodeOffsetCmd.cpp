@@ -7,7 +7,7 @@ class GetTimeCodeOffsetCmd final : public PendingCommand<GetTimeCodeOffsetCmd> {
   static constexpr CommandInfo info = {.name = "getTimeCodeOffset",
                                        .displayName = "Get Time Code Offset",
                                        .category = "Data Editing",
-                                       .purpose = "Answers the timecode offset of the active clip in frames.",
+                                       .purpose = "The timecode offset of the active clip in frames.",
                                        .returns = Variable::Int};
 };
 

@@ -13,7 +13,7 @@ class GetConstraintOffsetCmd final : public ScriptCommand<GetConstraintOffsetCmd
       .displayName = "Get Constraint Offset",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose = "Answers the offset of a constraint in millimetres, in its own space or in the world.",
+      .purpose = "The offset of a constraint in millimetres, in its own space or in the world.",
       .args = {"'constraintName'", 1, 1, {Variable::String}},
       .options = {{"ws"}},
       .returns = Variable::Vector,

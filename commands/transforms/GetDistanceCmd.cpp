@@ -14,7 +14,7 @@ class GetDistanceCmd final : public ScriptCommand<GetDistanceCmd> {
       .displayName = "GetDistance Command",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose = "Answers the distance of two nodes in millimetres, now or as a statistic over time.",
+      .purpose = "The distance of two nodes in millimetres, now or as a statistic over time.",
       .args = {"node1 node2", 0, ArgsInfo::kAny, {}, Variable::String},
       .options = {{"avg", 0, Variable::None, 1},
                   {"min", 0, Variable::None, 2},

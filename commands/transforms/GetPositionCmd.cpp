@@ -10,8 +10,7 @@ class GetPositionCmd final : public ScriptCommand<GetPositionCmd> {
       .displayName = "Get Node Position",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose =
-          "Answers the position of a node in millimetres: local, in the world, or as seen from another node.",
+      .purpose = "The position of a node in millimetres: local, in the world, or as seen from another node.",
       .args = {"\"moduleName\"", 1, 1, {Variable::String}},
       .options = {{"ws", 0, Variable::None, 2},
                   {"inSpaceOf", 1, Variable::String, 1},

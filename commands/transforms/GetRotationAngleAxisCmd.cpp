@@ -10,8 +10,7 @@ class GetRotationAngleAxisCmd final : public ScriptCommand<GetRotationAngleAxisC
       .displayName = "Get Node Rotation",
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
-      .purpose =
-          "Answers the rotation of a node as a vector along its axis, as long as the angle in radians.",
+      .purpose = "The rotation of a node as a vector along its axis, as long as the angle in radians.",
       .args = {"\"moduleName\"", 1, 1, {Variable::String}},
       .options = {{"ws", 0, Variable::None, 2},
                   {"inSpaceOf", 1, Variable::String, 1},

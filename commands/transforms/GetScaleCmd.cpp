@@ -9,7 +9,7 @@ class GetScaleCmd final : public ScriptCommand<GetScaleCmd> {
                                        .displayName = "Get Node Scale",
                                        .category = "Data Editing",
                                        .subCategory = "Data Retrieval",
-                                       .purpose = "Answers the scale of a node along its three axes.",
+                                       .purpose = "The scale of a node along its three axes.",
                                        .args = {"\"moduleName\"", 1, 1, {Variable::String}},
                                        .options = {{"ws"}, {"inSpaceOf", 1, Variable::String, 1}, {"def"}},
                                        .returns = Variable::Vector,

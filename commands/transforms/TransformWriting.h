@@ -36,5 +36,5 @@ struct WriteOptions {
 // Whether the value of a channel can be written; else warns.
 [[nodiscard]] bool isWritable(Controller const& channel, bool byDefault);
 
-// Sets the rotation of the node as asked for. Always answers true.
+// Sets the rotation of the node as asked for. Always returns true.
 bool writeRotation(TransformWrite const& write, TalixRotation const& rotation);

@@ -59,7 +59,7 @@ struct HClassAncestors {
   static constexpr auto value = make();
 };
 
-// In a class: declares its record s_classNAME and the virtual that answers it.
+// In a class: declares its record s_classNAME and the virtual that returns it.
 #define H_DECLARE_CLASS(Name, Base)                                       \
  public:                                                                  \
   using ClassBase = Base;                                                 \

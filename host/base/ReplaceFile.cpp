@@ -87,7 +87,7 @@ struct Fresh : Descriptor {
   Fresh(Fresh const&) = delete;
   Fresh& operator=(Fresh const&) = delete;
 
-  // Gives the file a name that nothing has yet, with take(name), which answers below 0 when it cannot.
+  // Gives the file a name that nothing has yet, with take(name), which returns below 0 when it cannot.
   template <class Take>
   int named(Take take) {
     for (unsigned i = 0;; ++i) {

@@ -1,6 +1,6 @@
 // Base class of every script command.
 //
-// The host checks the arguments first (checkArgSyntax); execute runs only when they are accepted. It answers
+// The host checks the arguments first (checkArgSyntax); execute runs only when they are accepted. It returns
 // true on success and false on failure, after at least one error line; `result` stays unset on failure.
 // Commands are reference-counted and keep no state between runs. Everything happens on the main thread.
 #pragma once
@@ -13,7 +13,7 @@
 #include "host/command/CommandOption.h"
 
 class Command : public HObject {
-  // Every command answers this record: commands declare none of their own.
+  // Every command returns this record: commands declare none of their own.
   H_DECLARE_CLASS(Command, HObject)
 
  public:
@@ -49,7 +49,7 @@ class Command : public HObject {
   CommandOption const& getOption(int i) const;  // one without a name beyond them
 
   void ref() { ++m_references; }
-  // Lets go of one reference; with the last the command is destroyed, and the answer is true.
+  // Lets go of one reference; with the last the command is destroyed, and the result is true.
   bool unref();
 
   // One line to the log; printf-style.

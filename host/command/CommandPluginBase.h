@@ -12,7 +12,7 @@ class ICommandProvider;
 class IEventProvider;
 }  // namespace ControlSystem
 
-// The version of this interface: a library that answers another one from apiVersion() is not loaded.
+// The version of this interface: a library that returns another one from apiVersion() is not loaded.
 inline constexpr int kPluginInterfaceVersion = 0x80000;
 
 class HomCorePluginBase : public HObject {

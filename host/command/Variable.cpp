@@ -12,7 +12,7 @@ inline constexpr bool isVector<std::vector<T>> = true;
 
 Vec3 const kZero;
 
-// Calls read(element) with the single value or element i of the array; answers `otherwise` when there is
+// Calls read(element) with the single value or element i of the array; returns `otherwise` when there is
 // none.
 template <class Value, class Result, class Read>
 Result readElement(Value const& value, int i, Result otherwise, Read read) {

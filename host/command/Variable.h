@@ -49,7 +49,7 @@ class Variable {
 
   int getIntValue(int i) const;
   double getFloatValue(int i) const;
-  // A number truncated, so that 2 is toggle; other numbers are answered as they are.
+  // A number truncated, so that 2 is toggle; other numbers are returned as they are.
   BoolType getBoolValue(int i) const;
   char const* getStringValue(int i) const;
   Vec3 const& getVecValue(int i) const;

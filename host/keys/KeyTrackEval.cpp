@@ -49,7 +49,7 @@ void KeyTrack::evaluateAt(int64 time, Interpolation interpolation, unsigned mask
       if (wanted(c)) values[static_cast<size_t>(c)] = key ? key.value(c) : defaults[static_cast<size_t>(c)];
   };
 
-  // The keys around the time: a at or before it, b behind it.
+  // The keys around the time: a at or before it, b after it.
   Place a = base;
   if (a && !(a.leaf->components(a.slot) & mask)) a = neighbour(a, -1, mask, cursor);
   if (!a) {

@@ -34,7 +34,7 @@ class Vec3 {
   }
   double length() const { return std::hypot(x, y, z); }
 
-  // Gives the vector length 1 and answers its former length. A zero vector becomes not-a-number.
+  // Gives the vector length 1 and returns its former length. A zero vector becomes not-a-number.
   double normalize() {
     const double former = length();
     x /= former, y /= former, z /= former;

@@ -68,7 +68,7 @@ class Vec3Controller : public Controller {
   void setKey(int64 time, Vec3 const& value, unsigned mask);
   void setComponentKey(int64 time, double value, unsigned mask);
   Vec3 getConstValue() const { return Vec3(m_default.data()); }
-  // Answers whether the value was taken: a vector that is not finite is not.
+  // Returns whether the value was taken: a vector that is not finite is not.
   bool setConstValue(Vec3 value, bool notify, bool force);
 };
 

@@ -11,7 +11,7 @@ class ModulePath {
 
   // From the root to the module; null gives the empty path.
   void setFromObject(Module const* module);
-  // Takes the last module off and answers it; null when the path is empty.
+  // Takes the last module off and returns it; null when the path is empty.
   Module* pop();
   // The names from the root, each after a backslash; empty for the empty path.
   HString getFullPathString() const;

@@ -119,7 +119,7 @@ Vec3 Node::getWSScale(int64 time) const { return getWorldTransform(time).scale; 
 
 namespace {
 
-// What `space` (null: the world) sees of a world placement.
+// What `space` (null: the world) sees of a world transform.
 Transform relativeTo(Node const* space, int64 time, Transform const& world) {
   return space ? world.relativeTo(space->getWorldTransform(time)) : world;
 }

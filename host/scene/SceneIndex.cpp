@@ -108,7 +108,7 @@ Module* SceneIndex::findChild(Module const* parent, std::string_view name) const
 }
 
 // Calls visit(module) for the modules to which these names lead from a module (null: the root) down, until it
-// answers false; answers whether it never did.
+// returns false; returns whether it never did.
 template <class Visit>
 bool SceneIndex::forEachBelow(Module* top, std::span<std::string_view const> names, Visit visit) const {
   std::vector<std::pair<Module*, size_t>> open{{top, 0}};
@@ -143,7 +143,7 @@ Module* SceneIndex::findFull(std::string_view path, HRuntimeClass const* filter,
   return first;
 }
 
-// Calls visit(module) for the modules whose path ends in these names, until it answers false. Starts from the
+// Calls visit(module) for the modules whose path ends in these names, until it returns false. Starts from the
 // rarer of the first and the last name.
 template <class Visit>
 void SceneIndex::forEachWithSuffix(std::vector<std::string_view> const& names, Visit visit) const {

@@ -31,7 +31,7 @@ class SceneIndex {
   // A name for a new child of `parent` that its siblings do not have: `wanted`, else wanted_1, wanted_2, the
   // lowest free number.
   HString freeName(Module const* parent, HString const& wanted);
-  // Calls visit(module) for the children of that name, first created first, until it answers false.
+  // Calls visit(module) for the children of that name, first created first, until it returns false.
   template <class Visit>
   void forEachChild(Module const* parent, std::string_view name, Visit visit) const;
 
@@ -59,7 +59,7 @@ class SceneIndex {
     Module* first() const { return m_several ? *m_several->begin() : m_only; }
     void insert(Module* module);
     void erase(Module* module);
-    // Calls visit(module) in order until it answers false; answers whether it never did.
+    // Calls visit(module) in order until it returns false; returns whether it never did.
     template <class Visit>
     bool forEach(Visit visit) const;
 

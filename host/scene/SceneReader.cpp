@@ -92,6 +92,10 @@ class SceneReader::Channel {
   }
 
   bool isConstant() const { return m_constant; }
+  void includeKeys(HTimeRange& range) const {
+    for (KeyTrack const& track : m_keys)
+      if (!track.empty()) range.include(HTimeRange(track.timeAt(0), track.timeAt(track.count() - 1)));
+  }
   KeyTrack::Values const& getDefault() const { return m_default; }
 
   // `weights`: of each clip of a blend at the times; none: a clip by itself.
@@ -317,6 +321,15 @@ void SceneReader::workOutStill() {
     if (joint.stands) std::copy_n(world.data, kWidth, const_cast<Joint&>(joint).world);
   });
   for (Joint& joint : m_joints) joint.still = joint.stands;
+}
+
+HTimeRange SceneReader::getMotionRange() const {
+  HTimeRange range;
+  for (Source const& source : m_sources) source.weight.includeKeys(range);
+  for (Joint const& joint : m_joints)
+    for (Channel const* channel : {&joint.translation, &joint.rotation, &joint.scale})
+      channel->includeKeys(range);
+  return range;
 }
 
 void SceneReader::readWorld(SampleTimes const& times, Arrays const& arrays) const {

@@ -65,6 +65,8 @@ class SceneReader {
   SceneReader(SceneReader&&) noexcept;
 
   int getNumNodes() const { return m_numNodes; }
+  // From the first to the last key of all that is read, outside of which nothing moves; empty without keys.
+  HTimeRange getMotionRange() const;
   // World transforms at ascending times (ticks).
   void readWorld(SampleTimes const& times, Arrays const& arrays) const;
   std::vector<Transform> readWorld(SampleTimes const& times) const;

@@ -25,15 +25,15 @@ int ParameterizedSetup::getNumParameters() const { return static_cast<int>(param
 
 Parameter* ParameterizedSetup::getParameter(int i) {
   Attribute* attribute = itemAt(parameters(), i);
-  m_answered = attribute ? std::make_unique<Parameter>(attribute) : nullptr;
-  return m_answered.get();
+  m_returned = attribute ? std::make_unique<Parameter>(attribute) : nullptr;
+  return m_returned.get();
 }
 
 Parameter* ParameterizedSetup::getParameter(HString name) {
   for (Attribute* attribute : parameters()) {
     if (attribute->getName() != name) continue;
-    m_answered = std::make_unique<Parameter>(attribute);
-    return m_answered.get();
+    m_returned = std::make_unique<Parameter>(attribute);
+    return m_returned.get();
   }
   return nullptr;
 }

@@ -20,14 +20,14 @@ class ParameterizedSetup : public Module {
 
  public:
   // The custom integer, float and boolean attributes, in the order in which they were added. The setup owns
-  // what it answers, until a parameter is next asked for.
+  // what it returns, until a parameter is next asked for.
   int getNumParameters() const;
   Parameter* getParameter(int i);
   Parameter* getParameter(HString name);
 
  private:
   std::vector<Attribute*> parameters() const;
-  std::unique_ptr<Parameter> m_answered;
+  std::unique_ptr<Parameter> m_returned;
 };
 
 class LabelingSetup : public ParameterizedSetup {

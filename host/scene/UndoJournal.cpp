@@ -40,7 +40,7 @@ void UndoJournal::keep(HString const& name) {
   const bool changed =
       std::any_of(m_open.begin(), m_open.end(), [](auto const& change) { return !change->isVoid(); });
   if (!changed) {
-    // What is hidden, as the numbers behind the order of the selection, becomes what earlier steps know.
+    // What is hidden, as the numbers that give the order of the selection, becomes what earlier steps know.
     swapAll(m_open, true);
     m_open.clear();
     return;

@@ -18,7 +18,7 @@ class Profile {
   // break, an empty section or entry, "]" in a section, "=" in an entry or a leading "[", "#" or ";" there.
   [[nodiscard]] bool set(std::string_view section, std::string_view entry, std::string_view value);
 
-  // Both answer what went wrong, "FILE, line N: WHAT" or "FILE: WHAT"; empty: nothing. A file that cannot be
+  // Both return what went wrong, "FILE, line N: WHAT" or "FILE: WHAT"; empty: nothing. A file that cannot be
   // read leaves the values as they were. Comments are not kept.
   [[nodiscard]] std::string read(std::string const& file);
   // A temporary file is renamed over the old one; missing folders are made.

@@ -17,7 +17,7 @@ namespace profile {
 // How much memory undo may hold, in MiB.
 inline constexpr ProfileInt kUndoMemory{"Undo", "MemoryMB", 1024, 0};
 
-// How far a reduced curve may stray from the original one.
+// How far a reduced curve may deviate from the original one.
 inline constexpr ProfileDouble kReductionLength{"Reduction", "LengthMM", 0.1, 0};         // millimetres
 inline constexpr ProfileDouble kReductionAngle{"Reduction", "AngleDegrees", 0.1, 0};      // degrees
 inline constexpr ProfileDouble kReductionPercent{"Reduction", "PercentOfRange", 0.1, 0};  // % of max - min

@@ -35,7 +35,7 @@ struct C3DNumbers {
   }
 
  private:
-  // Sign, 8 bits of exponent with a bias of 129 and 23 bits of fraction behind a hidden one; no infinities,
+  // Sign, 8 bits of exponent with a bias of 129 and 23 bits of fraction after a hidden one; no infinities,
   // no denormals. Exponent 0 is zero, with the sign set it is a reserved operand and comes out as
   // not-a-number.
   static double decReal(std::uint32_t bits) {

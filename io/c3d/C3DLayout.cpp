@@ -178,7 +178,7 @@ class LayoutFinder {
     return cut || (larger - claim.count) % (kMostInWord + 1) == 0;
   }
 
-  // Bytes left in the file behind the data of this fit; below 0: it does not fit.
+  // Bytes left in the file after the data of this fit; below 0: it does not fit.
   int64 excess(const Fit& fit) const {
     C3DLayout layout = m_layout;
     layout.samplesPerFrame = fit.samplesPerFrame;
@@ -262,7 +262,7 @@ class LayoutFinder {
     const int64 left = excess(fit);
     if (left >= static_cast<int64>(kC3DBlock) && m_layout.frameBytes() != 0 &&
         fit.claim->count != kMostInWord)
-      warn(std::to_string(left) + " bytes behind the last frame are left out");
+      warn(std::to_string(left) + " bytes after the last frame are left out");
   }
 
   void checkTime() const {

@@ -24,7 +24,7 @@ class C3DNames {
     std::string subject;
     std::string label;
   };
-  // As the file has it; empty behind the last label.
+  // As the file has it; empty after the last label.
   std::string fullLabel(size_t point) const;
   std::string description(size_t point) const;
   // The full label parted by the SUBJECTS group, else at its colon; no label for those made up for unnamed

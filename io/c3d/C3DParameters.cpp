@@ -89,7 +89,7 @@ class SectionReader {
     return record;
   }
 
-  // Answers the offset behind what it read.
+  // Returns the offset after what it read.
   size_t readGroup(const Record& record) {
     const size_t length = m_bytes.byte(record.content, "a group's description");
     const size_t held = std::min(length, record.end - record.content - 1);

@@ -50,11 +50,11 @@ inline double c3dUnsigned(double value) { return value < 0 && value >= -32768 ? 
 
 struct C3DParameterSection {
   C3DParameters parameters;
-  size_t end = 0;  // offset behind the last record
+  size_t end = 0;  // offset after the last record
 };
 
 // Reads the section at `start`, once the processor is known to `bytes`. Leads back to no record twice: each
-// one lies behind the one before. An array that says to be longer than its record is cut, with a warning.
+// one lies after the one before. An array that says to be longer than its record is cut, with a warning.
 C3DParameterSection readC3DParameters(const C3DBytes& bytes, size_t start, size_t declaredEnd,
                                       std::vector<TakeNote>& notes);
 

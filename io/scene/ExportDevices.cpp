@@ -10,10 +10,10 @@ namespace talix {
 namespace {
 
 // What the clip remembers of its channels, by their name in the scene.
-using Remembered = std::unordered_map<std::string, fileMetadata::Record>;
+using MetadataByChannel = std::unordered_map<std::string, fileMetadata::Record>;
 
-Remembered rememberedOf(const NLEClip* clip, const char* attribute, size_t fields) {
-  Remembered byChannel;
+MetadataByChannel metadataOf(const NLEClip* clip, const char* attribute, size_t fields) {
+  MetadataByChannel byChannel;
   if (!clip) return byChannel;
   for (fileMetadata::Record& record : fileMetadata::records(*clip, attribute, fields)) {
     std::string channel = record[0];
@@ -27,8 +27,8 @@ class DeviceExport {
   explicit DeviceExport(TakeExport& out)
       : m_out(out),
         m_sampler(out.sampler),
-        m_analog(rememberedOf(m_sampler.clip(), fileMetadata::kAnalogChannels, 6)),
-        m_outputs(rememberedOf(m_sampler.clip(), fileMetadata::kOutputs, 4)) {}
+        m_analog(metadataOf(m_sampler.clip(), fileMetadata::kAnalogChannels, 6)),
+        m_outputs(metadataOf(m_sampler.clip(), fileMetadata::kOutputs, 4)) {}
 
   void add(const AnalogDevice& device) {
     for (int i = 0; i < device.getNumChannels(); ++i) {
@@ -133,7 +133,7 @@ class DeviceExport {
 
   TakeExport& m_out;
   const FrameSampler& m_sampler;
-  Remembered m_analog, m_outputs;
+  MetadataByChannel m_analog, m_outputs;
 };
 
 }  // namespace

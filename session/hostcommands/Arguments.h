@@ -1,4 +1,4 @@
-// Arguments that several host commands take: modules, channels, frames. A reader that answers nothing has
+// Arguments that several host commands take: modules, channels, frames. A reader that returns nothing has
 // logged why.
 #pragma once
 

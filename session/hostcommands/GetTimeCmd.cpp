@@ -10,7 +10,7 @@ class GetTimeCmd final : public ScriptCommand<GetTimeCmd> {
   static constexpr CommandInfo info = {.name = "getTime",
                                        .displayName = "Get Current Time",
                                        .category = "Interface",
-                                       .purpose = "Answers the current time in frames.",
+                                       .purpose = "The current time in frames.",
                                        .returns = Variable::Float};
 
   bool execute(Given const&, Args const&, Variable& result) override {

@@ -52,6 +52,6 @@ struct GivenOption {
   ArgList values = {};
 };
 
-// Runs a command when it accepts the arguments; answers its log lines, then its result or "failed", a line
+// Runs a command when it accepts the arguments; returns its log lines, then its result or "failed", a line
 // each.
 std::string run(Command& command, ArgList const& args = {}, std::vector<GivenOption> const& options = {});

@@ -18,7 +18,7 @@ class PropertyWriters : public SceneFixture {
     make<Clip>("take");
     events();
     m_listener = g_eventManager->addListener([this](HEvent const& event) {
-      // The class' name behind the length that the compiler puts before it.
+      // The class' name after the length that the compiler puts before it.
       m_events.push_back(typeid(event).name() + 2);
     });
   }

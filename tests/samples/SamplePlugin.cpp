@@ -26,7 +26,7 @@ class EchoCmd final : public ScriptCommand<EchoCmd> {
                                        .displayName = "Echo",
                                        .category = "Testing",
                                        .subCategory = "Data Retrieval",
-                                       .purpose = "Answers the value, or that of the last option.",
+                                       .purpose = "The value, or that of the last option.",
                                        .args = {"[value]", 0, 1},
                                        .options = {{"int", 1, Variable::Int},
                                                    {"float", 1, Variable::Float},

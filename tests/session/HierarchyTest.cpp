@@ -8,7 +8,7 @@
 
 namespace {
 
-struct Strayed {
+struct Deviation {
   double position = 0, relative = 0, angle = 0;  // mm, parts, degrees
 
   void add(Transform const& was, Transform const& is) {
@@ -61,7 +61,7 @@ TEST_P(SkeletonTest, KeepsItsMotion) {
       for (const int64 at : *times)
         for (Node const* node : nodes) before.push_back(node->getWorldTransform(at));
     run(text.substr(cut + 1));
-    Strayed atKeys, between;
+    Deviation atKeys, between;
     auto was = before.begin();
     for (auto const* times : {&keys, &frames})
       for (const int64 at : *times)

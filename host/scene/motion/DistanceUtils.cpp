@@ -1,10 +1,12 @@
 #include "host/scene/motion/DistanceUtils.h"
 
 #include <algorithm>
+#include <array>
 #include <cmath>
 
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
+#include "host/scene/SceneReader.h"
 
 namespace {
 
@@ -32,20 +34,69 @@ class NodeKeys {
   HTimeRange m_range;
 };
 
-// Takes distances in one by one; the mean and the sum of squares about it are kept current, so that no
-// digits are lost to large sums.
+// Takes distances in; the mean and the sum of squares about it are kept current, so that no digits are lost
+// to large sums.
 struct Statistics {
   int64 count = 0;
   double mean = 0, squares = 0, least = 0, greatest = 0;
 
-  void add(double distance) {
+  void add(double distance, int64 times = 1) {
+    if (times <= 0) return;
     least = count ? std::min(least, distance) : distance;
     greatest = count ? std::max(greatest, distance) : distance;
+    count += times;
     const double off = distance - mean;
-    mean += off / static_cast<double>(++count);
-    squares += off * (distance - mean);
+    mean += off * (static_cast<double>(times) / static_cast<double>(count));
+    squares += off * (distance - mean) * static_cast<double>(times);
   }
   double deviation() const { return count ? std::sqrt(squares / static_cast<double>(count)) : 0; }
+};
+
+// The distances at times that are a whole number of steps from time 0, first to last (steps). Where nothing
+// moves one stands for all.
+class Walk {
+ public:
+  Walk(Node const* a, Node const* b, int64 step)
+      : m_step(step), m_reader(std::array{a, b}, a->getDatabase()->getActiveClip()) {
+    const HTimeRange motion = m_reader.getMotionRange();
+    if (motion.isEmpty()) return;
+    m_firstMoving = frameAtOrBefore(motion.getStart(), step);
+    m_lastMoving = frameAtOrAfter(motion.getEnd(), step);
+  }
+
+  // visit(first step, how many, distance).
+  template <class Visit>
+  void run(int64 first, int64 last, Visit visit) const {
+    constexpr int64 kBlock = 4096;
+    while (first <= last) {
+      const bool moves = first >= m_firstMoving && first < m_lastMoving;
+      if (!moves) {
+        const int64 end = first < m_firstMoving ? std::min(last, m_firstMoving - 1) : last;
+        visit(first, end - first + 1, at(first, 1)[0]);
+        first = end + 1;
+        continue;
+      }
+      const int64 count = std::min({kBlock, last - first + 1, m_lastMoving - first});
+      const std::vector<double> distances = at(first, count);
+      for (int64 i = 0; i < count; ++i) visit(first + i, 1, distances[static_cast<size_t>(i)]);
+      first += count;
+    }
+  }
+
+ private:
+  std::vector<double> at(int64 first, int64 count) const {
+    std::vector<double> positions(static_cast<size_t>(6 * count)), distances;
+    SceneReader::Arrays arrays;
+    arrays.positions = positions.data();
+    m_reader.readWorld(SampleTimes(first * m_step, m_step, count), arrays);
+    for (double const* pair = positions.data(); pair < positions.data() + positions.size(); pair += 6)
+      distances.push_back((Vec3(pair) - Vec3(pair + 3)).length());
+    return distances;
+  }
+
+  int64 m_step;
+  SceneReader m_reader;
+  int64 m_firstMoving = 0, m_lastMoving = 0;  // nothing moves before the one, nor from the other on
 };
 
 Statistics measure(Node const* a, Node const* b, TSimpleArray<HTimeRange> const& ranges, bool mustHaveKeys,
@@ -53,6 +104,7 @@ Statistics measure(Node const* a, Node const* b, TSimpleArray<HTimeRange> const&
   if (step <= 0) step = a->getDatabase()->getTimeManager()->getTicksPerFrame();
   step = std::min(step, kForever);
   const NodeKeys keysOfA(a), keysOfB(b);
+  const Walk walk(a, b, step);
   Statistics found;
   for (HTimeRange range : ranges) {
     if (mustHaveKeys) {
@@ -60,11 +112,12 @@ Statistics measure(Node const* a, Node const* b, TSimpleArray<HTimeRange> const&
       range.intersect(keysOfB.range());
     }
     if (range.isEmpty()) continue;
-    int64 time = range.getStart() / step * step;
-    if (time < range.getStart()) time += step;
-    for (; time <= range.getEnd(); time += step)
-      if (!mustHaveKeys || (keysOfA.at(time) && keysOfB.at(time)))
-        found.add(DistanceUtils::getDistance(a, b, time));
+    walk.run(frameAtOrAfter(range.getStart(), step), frameAtOrBefore(range.getEnd(), step),
+             [&](int64 first, int64 count, double distance) {
+               if (!mustHaveKeys) return found.add(distance, count);
+               for (int64 i = first; i < first + count; ++i)
+                 if (keysOfA.at(i * step) && keysOfB.at(i * step)) found.add(distance);
+             });
   }
   return found;
 }

@@ -4,12 +4,12 @@
 // range, or in one of the ranges; where ranges overlap a time counts once for each. mustHaveKeys: only where
 // both nodes have a key at that very time, on their translation, rotation or scale, in any layer of the
 // active clip.
-// Where nothing is measured the answer is 0. The standard deviation is that of all that was measured
+// Where nothing is measured the result is 0. The standard deviation is that of all that was measured
 // (divided by the count).
 //
 // Times are ticks. The last number is the step; one that is not positive stands for the scene's ticks per
-// frame, which the standard deviation always takes. The cost is linear in the frames; where keys are a
-// must, frames outside the nodes' keys cost nothing.
+// frame, which the standard deviation always takes. The cost is linear in the frames from the first to the
+// last key of the nodes and all above them; frames at which nothing moves cost nothing.
 #pragma once
 
 #include "host/scene/Node.h"

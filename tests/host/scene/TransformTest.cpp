@@ -1,4 +1,4 @@
-// World placements of random hierarchies, and the setters of nodes.
+// World transforms of random hierarchies, and the setters of nodes.
 #include <ImathMatrix.h>
 #include <limits>
 
@@ -141,7 +141,7 @@ class TransformTest : public SceneTest {
   std::vector<Node*> m_nodes;
 };
 
-TEST_F(TransformTest, CachedPlacementsEqualFreshOnesWhateverIsEdited) {
+TEST_F(TransformTest, CachedTransformsEqualFreshOnesWhateverIsEdited) {
   build(60);
   for (int step = 0; step < 3000; ++step) {
     edit();
@@ -162,7 +162,7 @@ TEST_F(TransformTest, CachedPlacementsEqualFreshOnesWhateverIsEdited) {
   }
 }
 
-TEST_F(TransformTest, CachedPlacementsFollowRemovalAndBlends) {
+TEST_F(TransformTest, CachedTransformsFollowRemovalAndBlends) {
   build(30);
   Node* top = create<Node>("top");
   auto* between = create<AnalogDevice>("between", top);

@@ -10,7 +10,7 @@ namespace {
 
 class C3DDamage : public testing::Test {
  protected:
-  // Reads the bytes as a file; what is read must be sound, an error must name the file. Answers the error.
+  // Reads the bytes as a file; what is read must be sound, an error must name the file. Returns the error.
   std::string outcome(const std::string& bytes) {
     folder.file("damaged.c3d", bytes);
     try {

@@ -65,9 +65,9 @@ TEST_F(DistanceTest, StatisticsAreThoseOfTheFramesInTheRanges) {
       greatest = *std::max_element(all.begin(), all.end());
     }
     EXPECT_NEAR(DistanceUtils::getAvgDistance(m_a, m_b, ranges, keysOnly, step), mean, 1e-9);
-    EXPECT_EQ(DistanceUtils::getMinDistance(m_a, m_b, ranges, keysOnly, step), least);
-    EXPECT_EQ(DistanceUtils::getMaxDistance(m_a, m_b, ranges, keysOnly, step), greatest);
-    EXPECT_EQ(DistanceUtils::getDistanceRange(m_a, m_b, ranges, keysOnly, step), greatest - least);
+    EXPECT_NEAR(DistanceUtils::getMinDistance(m_a, m_b, ranges, keysOnly, step), least, 1e-9);
+    EXPECT_NEAR(DistanceUtils::getMaxDistance(m_a, m_b, ranges, keysOnly, step), greatest, 1e-9);
+    EXPECT_NEAR(DistanceUtils::getDistanceRange(m_a, m_b, ranges, keysOnly, step), greatest - least, 1e-9);
     if (step == kFrame) {
       const double deviation = all.empty() ? 0 : std::sqrt(squares / static_cast<double>(all.size()));
       EXPECT_NEAR(DistanceUtils::getDistanceSD(m_a, m_b, ranges, keysOnly), deviation, 1e-9);
