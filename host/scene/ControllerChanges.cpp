@@ -63,7 +63,12 @@ struct Controller::KeyChange : UndoChange {
     std::vector<Slot>().swap(keys);
   }
 
+  // For swapping only: makes a track when there is none, as for a clip that has left the scene.
   KeyTrack& track() const { return channel.clipTrack(clip, layer).track; }
+  int64 memoryNow() const {
+    KeyTrack const* found = channel.findTrack(clip, layer);
+    return found ? found->memoryAlone() : 0;
+  }
 
   void swap() override {
     if (snapshot) return std::swap(*snapshot, track());
@@ -74,13 +79,16 @@ struct Controller::KeyChange : UndoChange {
     }
   }
   bool isVoid() const override {
-    if (snapshot) return snapshot->sharesAll(track()) || *snapshot == track();
+    const KeyTrack none(shapeOf(channel.getPropertyType()));
+    KeyTrack const* found = channel.findTrack(clip, layer);
+    KeyTrack const& present = found ? *found : none;
+    if (snapshot) return snapshot->sharesAll(present) || *snapshot == present;
     return std::all_of(keys.begin(), keys.end(),
-                       [&](Slot const& slot) { return slot == Slot(track(), slot.key.time); });
+                       [&](Slot const& slot) { return slot == Slot(present, slot.key.time); });
   }
   int64 memoryUse() const override {
     return static_cast<int64>(sizeof *this + keys.capacity() * sizeof(Slot)) +
-           (snapshot ? std::max(snapshot->memoryAlone(), track().memoryAlone()) : 0);
+           (snapshot ? std::max(snapshot->memoryAlone(), memoryNow()) : 0);
   }
 
   // A key is its time, its flags and, when it is there, its values.

@@ -371,6 +371,7 @@ class NaiveState {
     put(id, own + ".Locked", channel.isLocked() ? "true" : "false");
     m_texts[id + " default " + own] = textOfList(channel.getDefaultValues());
     channel.forEachTrack([&](NLEClip* clip, int layer, KeyTrack const& track) {
+      if (track.empty()) return;  // its clip may be gone
       Keys& keys = m_keys[id + " keys " + own + " " + name(clip) + " " + std::to_string(layer)];
       track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
         std::vector<double>& values = keys[key.time];
