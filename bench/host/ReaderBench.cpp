@@ -44,7 +44,12 @@ void readWorldPositions(benchmark::State& state) {
   }
   state.SetItemsProcessed(state.iterations() * kReadFrames * static_cast<int64>(bones.size()));
 }
-BENCHMARK(readWorldPositions)->ArgName("threads")->Arg(1)->Arg(2)->UseRealTime()->Unit(benchmark::kMillisecond);
+BENCHMARK(readWorldPositions)
+    ->ArgName("threads")
+    ->Arg(1)
+    ->Arg(2)
+    ->UseRealTime()
+    ->Unit(benchmark::kMillisecond);
 
 void makeReader(benchmark::State& state) {
   const std::vector<Node const*> bones = chainsOfTen();
