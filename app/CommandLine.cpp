@@ -127,7 +127,7 @@ int main(int argc, char** argv) {
   try {
     app.parse(argc, argv);
   } catch (CLI::ParseError const& error) {
-    const int status = app.exit(error);
+    int const status = app.exit(error);
     return status == 0 ? 0 : kBadCommandLine;
   }
   if (infoApp->parsed()) return talix::runInfo(infoFiles, infoJson);

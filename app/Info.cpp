@@ -18,9 +18,9 @@ std::string printable(std::string_view text) {
   return mended;
 }
 
-std::string shortChannel(const std::string& channel) {
+std::string shortChannel(std::string const& channel) {
   if (channel.size() < 2) return printable(channel);
-  const bool isRotation = (channel[1] | 0x20) == 'r';
+  bool const isRotation = (channel[1] | 0x20) == 'r';
   return std::string(1, isRotation ? 'R' : 'T') + static_cast<char>(channel[0] | 0x20);
 }
 
@@ -29,16 +29,16 @@ int runInfo(std::vector<std::string> const& files, bool json) {
   int status = 0;
   boost::json::array all;
   bool first = true;
-  for (const std::string& file : files) {
+  for (std::string const& file : files) {
     try {
-      const Take take = readTake(file);
+      Take const take = readTake(file);
       if (json) {
         all.emplace_back(takeAsJson(take, file));
       } else {
         std::cout << (first ? "" : "\n") << takeAsText(take, file) << std::flush;
         first = false;
       }
-    } catch (const FileError& error) {
+    } catch (FileError const& error) {
       std::cerr << "error: " << printable(error.what()) << std::endl;
       if (json) all.push_back({{"file", printable(file)}, {"error", printable(error.what())}});
       status = kUnreadable;

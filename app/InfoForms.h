@@ -9,13 +9,13 @@
 
 namespace talix {
 
-std::string takeAsText(const Take& take, const std::string& file);
-boost::json::object takeAsJson(const Take& take, const std::string& file);
+std::string takeAsText(Take const& take, std::string const& file);
+boost::json::object takeAsJson(Take const& take, std::string const& file);
 
 // Text of a file as UTF-8 without control characters.
 std::string printable(std::string_view text);
 
 // "Tx", "Rz": a joint's channel in short.
-std::string shortChannel(const std::string& channel);
+std::string shortChannel(std::string const& channel);
 
 }  // namespace talix

@@ -18,15 +18,15 @@ json::value jsonNumber(double value) {
 }
 
 template <class T, class Form>
-json::array listOf(const std::vector<T>& items, Form form) {
+json::array listOf(std::vector<T> const& items, Form form) {
   json::array list;
   list.reserve(items.size());
-  for (const T& item : items) list.emplace_back(form(item));
+  for (T const& item : items) list.emplace_back(form(item));
   return list;
 }
 
-json::object marker(const Take& take, const TakePoint& point) {
-  const TakeGaps gaps = gapsOf(take, point.positions);
+json::object marker(Take const& take, TakePoint const& point) {
+  TakeGaps const gaps = gapsOf(take, point.positions);
   return {{"subject", printable(point.subject)},
           {"label", printable(point.label)},
           {"description", printable(point.description)},
@@ -35,8 +35,8 @@ json::object marker(const Take& take, const TakePoint& point) {
           {"longestGap", gaps.longest}};
 }
 
-json::object joint(const TakeJoint& joint) {
-  constexpr const char* kOrders[] = {"XYZ", "XZY", "YXZ", "YZX", "ZXY", "ZYX"};
+json::object joint(TakeJoint const& joint) {
+  constexpr char const* kOrders[] = {"XYZ", "XZY", "YXZ", "YZX", "ZXY", "ZYX"};
   return {{"name", printable(joint.name)},
           {"parent", joint.parent},
           {"endSite", joint.endSite},
@@ -47,7 +47,7 @@ json::object joint(const TakeJoint& joint) {
 
 }  // namespace
 
-json::object takeAsJson(const Take& take, const std::string& file) {
+json::object takeAsJson(Take const& take, std::string const& file) {
   json::object info;
   info["file"] = printable(file);
   info["format"] = take.format;
@@ -61,13 +61,13 @@ json::object takeAsJson(const Take& take, const std::string& file) {
   info["unitAssumed"] = take.unitAssumed;
   info["upAxis"] = std::string(1, "xyz"[static_cast<int>(take.up)]);
   info["upAxisAssumed"] = take.upAssumed;
-  info["markers"] = listOf(take.points, [&](const TakePoint& point) { return marker(take, point); });
-  info["outputs"] = listOf(take.outputs, [](const ModelOutput& output) -> json::object {
+  info["markers"] = listOf(take.points, [&](TakePoint const& point) { return marker(take, point); });
+  info["outputs"] = listOf(take.outputs, [](ModelOutput const& output) -> json::object {
     return {
         {"name", printable(output.name)}, {"kind", printable(output.kind)}, {"unit", printable(output.unit)}};
   });
   info["analogRate"] = jsonNumber(take.analogRate);
-  info["analog"] = listOf(take.analog, [](const TakeAnalogChannel& channel) -> json::object {
+  info["analog"] = listOf(take.analog, [](TakeAnalogChannel const& channel) -> json::object {
     return {{"name", printable(channel.name)},
             {"unit", printable(channel.unit)},
             {"description", printable(channel.description)},
@@ -75,14 +75,14 @@ json::object takeAsJson(const Take& take, const std::string& file) {
             {"offset", jsonNumber(channel.offset)}};
   });
   info["joints"] = listOf(take.joints, joint);
-  info["events"] = listOf(take.events, [](const TakeEvent& event) -> json::object {
+  info["events"] = listOf(take.events, [](TakeEvent const& event) -> json::object {
     return {{"seconds", jsonNumber(event.seconds)},
             {"label", printable(event.label)},
             {"context", printable(event.context)},
             {"subject", printable(event.subject)},
             {"description", printable(event.description)}};
   });
-  info["notes"] = listOf(take.notes, [](const TakeNote& note) -> json::object {
+  info["notes"] = listOf(take.notes, [](TakeNote const& note) -> json::object {
     return {{"level", note.level == TakeNote::Level::Warning ? "warning" : "info"},
             {"text", printable(note.text)}};
   });

@@ -12,7 +12,7 @@ namespace {
 constexpr size_t kLineWidth = 100;
 constexpr size_t kHeadWidth = 10;  // of the words before the first lines' values
 
-constexpr const char* kAxisNames[] = {"x", "y", "z"};
+constexpr char const* kAxisNames[] = {"x", "y", "z"};
 
 // How many characters a UTF-8 text shows.
 size_t widthOf(std::string_view text) {
@@ -20,8 +20,8 @@ size_t widthOf(std::string_view text) {
       std::count_if(text.begin(), text.end(), [](char c) { return (c & 0xc0) != 0x80; }));
 }
 
-std::string padded(const std::string& text, size_t width, bool toTheRight = false) {
-  const std::string blanks(width - std::min(width, widthOf(text)), ' ');
+std::string padded(std::string const& text, size_t width, bool toTheRight = false) {
+  std::string const blanks(width - std::min(width, widthOf(text)), ' ');
   return toTheRight ? blanks + text : text + blanks;
 }
 
@@ -38,11 +38,11 @@ std::string number(double value, int decimals = 3) {
 
 std::string percent(int64 part, int64 whole) {
   char digits[32];
-  const double value = whole ? 100.0 * static_cast<double>(part) / static_cast<double>(whole) : 0;
+  double const value = whole ? 100.0 * static_cast<double>(part) / static_cast<double>(whole) : 0;
   return {digits, std::to_chars(digits, std::end(digits), value, std::chars_format::fixed, 1).ptr};
 }
 
-std::string counted(size_t count, const std::string& noun) {
+std::string counted(size_t count, std::string const& noun) {
   return std::to_string(count) + " " + noun + (count == 1 ? "" : "s");
 }
 
@@ -57,7 +57,7 @@ class Table {
     m_rows.push_back(std::move(row));
   }
   void appendTo(std::string& text, size_t indent) const {
-    for (const auto& row : m_rows) {
+    for (auto const& row : m_rows) {
       std::string line(indent, ' ');
       for (size_t i = 0; i < row.size(); ++i) {
         if (i > 0) line += m_toTheRight[i] ? "  " : "   ";
@@ -76,9 +76,9 @@ class Table {
 
 class TakeText {
  public:
-  explicit TakeText(const Take& take) : m_take(take) {}
+  explicit TakeText(Take const& take) : m_take(take) {}
 
-  std::string make(const std::string& file) {
+  std::string make(std::string const& file) {
     m_text = printable(file) + "\n";
     addHead();
     addMarkers();
@@ -92,14 +92,14 @@ class TakeText {
   }
 
  private:
-  void head(const char* what, const std::string& value) {
+  void head(char const* what, std::string const& value) {
     m_text += "  " + padded(what, kHeadWidth) + value + "\n";
   }
-  void section(const std::string& title) { m_text += "\n  " + title + "\n"; }
+  void section(std::string const& title) { m_text += "\n  " + title + "\n"; }
 
   void addHead() {
     head("format", m_take.format + (m_take.variant.empty() ? "" : ", " + printable(m_take.variant)));
-    const int64 last = m_take.firstFrame + m_take.frameCount - 1;
+    int64 const last = m_take.firstFrame + m_take.frameCount - 1;
     std::string frames = std::to_string(m_take.frameCount);
     if (m_take.frameCount > 0)
       frames += " (" + std::to_string(m_take.firstFrame) + " to " + std::to_string(last) + ")";
@@ -112,14 +112,14 @@ class TakeText {
   }
 
   std::string markerCounts() const {
-    const auto unlabelled = static_cast<size_t>(std::count_if(
-        m_take.points.begin(), m_take.points.end(), [](const TakePoint& p) { return p.label.empty(); }));
-    const size_t labelled = m_take.points.size() - unlabelled;
+    auto const unlabelled = static_cast<size_t>(std::count_if(
+        m_take.points.begin(), m_take.points.end(), [](TakePoint const& p) { return p.label.empty(); }));
+    size_t const labelled = m_take.points.size() - unlabelled;
     std::string text = std::to_string(labelled) + " labelled";
     if (unlabelled) text += ", " + std::to_string(unlabelled) + " unlabelled";
-    const auto named = subjects();
-    if (const auto count = static_cast<size_t>(
-            std::count_if(named.begin(), named.end(), [](const std::string& name) { return !name.empty(); })))
+    auto const named = subjects();
+    if (auto const count = static_cast<size_t>(
+            std::count_if(named.begin(), named.end(), [](std::string const& name) { return !name.empty(); })))
       text += ", " + counted(count, "subject");
     return text;
   }
@@ -127,17 +127,17 @@ class TakeText {
   // In the order of the file; empty for what has none.
   std::vector<std::string> subjects() const {
     std::vector<std::string> names;
-    for (const TakePoint& point : m_take.points)
+    for (TakePoint const& point : m_take.points)
       if (!point.label.empty() && std::find(names.begin(), names.end(), point.subject) == names.end())
         names.push_back(point.subject);
     return names;
   }
 
   void addMarkers() {
-    const auto names = subjects();
-    for (const std::string& subject : names) {
+    auto const names = subjects();
+    for (std::string const& subject : names) {
       std::vector<std::string> labels;
-      for (const TakePoint& point : m_take.points)
+      for (TakePoint const& point : m_take.points)
         if (!point.label.empty() && point.subject == subject) labels.push_back(printable(point.label));
       std::string title = "markers";
       if (!subject.empty()) title += " of " + printable(subject);
@@ -148,14 +148,14 @@ class TakeText {
   }
 
   // Row by row, as many columns as fit.
-  void addColumns(const std::vector<std::string>& words) {
+  void addColumns(std::vector<std::string> const& words) {
     constexpr size_t kIndent = 4, kBetween = 2;
     size_t widest = 1;
-    for (const std::string& word : words) widest = std::max(widest, widthOf(word));
-    const size_t columns = std::max<size_t>(1, (kLineWidth - kIndent + kBetween) / (widest + kBetween));
+    for (std::string const& word : words) widest = std::max(widest, widthOf(word));
+    size_t const columns = std::max<size_t>(1, (kLineWidth - kIndent + kBetween) / (widest + kBetween));
     for (size_t i = 0; i < words.size(); ++i) {
       if (i % columns == 0) m_text += std::string(kIndent, ' ');
-      const bool ends = i + 1 == words.size() || (i + 1) % columns == 0;
+      bool const ends = i + 1 == words.size() || (i + 1) % columns == 0;
       m_text += ends ? words[i] + "\n" : padded(words[i], widest + kBetween);
     }
   }
@@ -163,14 +163,14 @@ class TakeText {
   void addGaps() {
     if (m_take.points.empty() || m_take.frameCount == 0) return;
     struct Row {
-      const TakePoint* point;
+      TakePoint const* point;
       TakeGaps gaps;
     };
     std::vector<Row> rows;
     size_t complete = 0, unlabelled = 0;
     TakeGaps ofUnlabelled;
-    for (const TakePoint& point : m_take.points) {
-      const TakeGaps gaps = gapsOf(m_take, point.positions);
+    for (TakePoint const& point : m_take.points) {
+      TakeGaps const gaps = gapsOf(m_take, point.positions);
       if (point.label.empty()) {
         ++unlabelled;
         ofUnlabelled.missing += gaps.missing;
@@ -187,16 +187,16 @@ class TakeText {
       return;
     }
     std::stable_sort(rows.begin(), rows.end(),
-                     [](const Row& a, const Row& b) { return a.gaps.missing > b.gaps.missing; });
+                     [](Row const& a, Row const& b) { return a.gaps.missing > b.gaps.missing; });
     section("gaps");
-    const bool withSubject = subjects().size() > 1;
+    bool const withSubject = subjects().size() > 1;
     Table table({false, true, true, true, true});
     table.add({"marker", "frames missing", "%", "gaps", "longest"});
-    const auto addRow = [&](const std::string& name, const TakeGaps& gaps, int64 frames) {
+    auto const addRow = [&](std::string const& name, TakeGaps const& gaps, int64 frames) {
       table.add({name, std::to_string(gaps.missing), percent(gaps.missing, frames),
                  std::to_string(gaps.count), std::to_string(gaps.longest)});
     };
-    for (const Row& row : rows)
+    for (Row const& row : rows)
       addRow(
           printable(withSubject && !row.point->subject.empty() ? row.point->subject + ":" + row.point->label
                                                                : row.point->label),
@@ -212,12 +212,12 @@ class TakeText {
 
   void addOutputs() {
     std::vector<std::string> kinds;
-    for (const ModelOutput& output : m_take.outputs)
+    for (ModelOutput const& output : m_take.outputs)
       if (std::find(kinds.begin(), kinds.end(), output.kind) == kinds.end()) kinds.push_back(output.kind);
-    for (const std::string& kind : kinds) {
+    for (std::string const& kind : kinds) {
       std::vector<std::string> names;
       std::string unit;
-      for (const ModelOutput& output : m_take.outputs)
+      for (ModelOutput const& output : m_take.outputs)
         if (output.kind == kind) names.push_back(printable(output.name)), unit = output.unit;
       std::string title = kind.empty() ? "outputs" : printable(kind);
       std::transform(title.begin(), title.end(), title.begin(),
@@ -231,7 +231,7 @@ class TakeText {
   void addAnalog() {
     if (m_take.analog.empty()) return;
     std::vector<std::string> names;
-    for (const TakeAnalogChannel& channel : m_take.analog)
+    for (TakeAnalogChannel const& channel : m_take.analog)
       names.push_back((channel.name.empty() ? "(no name)" : printable(channel.name)) +
                       (channel.unit.empty() ? "" : " [" + printable(channel.unit) + "]"));
     section("analog channels (" + std::to_string(names.size()) + ") at " + number(m_take.analogRate) +
@@ -243,8 +243,8 @@ class TakeText {
     if (m_take.joints.empty()) return;
     std::vector<size_t> depths, ends(m_take.joints.size());
     size_t endSites = 0, channels = 0;
-    for (const TakeJoint& joint : m_take.joints) {
-      const auto parent = static_cast<size_t>(joint.parent);
+    for (TakeJoint const& joint : m_take.joints) {
+      auto const parent = static_cast<size_t>(joint.parent);
       depths.push_back(joint.parent < 0 ? 0 : depths[parent] + 1);
       channels += joint.channels.size();
       if (!joint.endSite) continue;
@@ -255,10 +255,10 @@ class TakeText {
             counted(endSites, "end site") + ", " + counted(channels, "channel"));
     Table table({false, false, false});
     for (size_t i = 0; i < m_take.joints.size(); ++i) {
-      const TakeJoint& joint = m_take.joints[i];
+      TakeJoint const& joint = m_take.joints[i];
       if (joint.endSite) continue;
       std::string moves;
-      for (const std::string& channel : joint.channels)
+      for (std::string const& channel : joint.channels)
         moves += (moves.empty() ? "" : " ") + shortChannel(channel);
       table.add({std::string(2 * depths[i], ' ') + printable(joint.name), moves,
                  ends[i] == 0   ? ""
@@ -270,15 +270,15 @@ class TakeText {
 
   void addEvents() {
     if (m_take.events.empty()) return;
-    std::vector<const TakeEvent*> events;
-    for (const TakeEvent& event : m_take.events) events.push_back(&event);
+    std::vector<TakeEvent const*> events;
+    for (TakeEvent const& event : m_take.events) events.push_back(&event);
     std::stable_sort(events.begin(), events.end(),
-                     [](const TakeEvent* a, const TakeEvent* b) { return a->seconds < b->seconds; });
+                     [](TakeEvent const* a, TakeEvent const* b) { return a->seconds < b->seconds; });
     section("events (" + std::to_string(events.size()) + ")");
     Table table({true, false, false, false, false});
-    for (const TakeEvent* event : events) {
+    for (TakeEvent const* event : events) {
       char digits[400];
-      const std::string seconds(
+      std::string const seconds(
           digits, std::to_chars(digits, std::end(digits), event->seconds, std::chars_format::fixed, 3).ptr);
       table.add({seconds + " s", printable(event->label), printable(event->context),
                  printable(event->subject), printable(event->description)});
@@ -289,17 +289,17 @@ class TakeText {
   void addNotes() {
     if (m_take.notes.empty()) return;
     section("notes");
-    for (const TakeNote& note : m_take.notes)
+    for (TakeNote const& note : m_take.notes)
       m_text += std::string("    ") + (note.level == TakeNote::Level::Warning ? "warning: " : "") +
                 printable(note.text) + "\n";
   }
 
-  const Take& m_take;
+  Take const& m_take;
   std::string m_text;
 };
 
 }  // namespace
 
-std::string takeAsText(const Take& take, const std::string& file) { return TakeText(take).make(file); }
+std::string takeAsText(Take const& take, std::string const& file) { return TakeText(take).make(file); }
 
 }  // namespace talix

@@ -45,7 +45,7 @@ bool startsCharacter(char c) { return (static_cast<unsigned char>(c) & 0xc0) != 
 // The first so many characters of a UTF-8 text, control characters made harmless.
 std::string clipped(std::string const& text, size_t columns) {
   std::string out;
-  for (const char c : text) {
+  for (char const c : text) {
     if (startsCharacter(c) && columns-- == 0) break;
     out += static_cast<unsigned char>(c) < ' ' || c == 0x7f ? '?' : c;
   }
@@ -57,10 +57,10 @@ size_t columnsOf(std::string const& text) {
 }
 
 std::string barOf(OperationStack::Task const& task) {
-  const double length = static_cast<double>(task.last) - task.first;
-  const double part =
+  double const length = static_cast<double>(task.last) - task.first;
+  double const part =
       length > 0 ? std::clamp((static_cast<double>(task.position) - task.first) / length, 0.0, 1.0) : 1;
-  const auto done = static_cast<size_t>(part * kBarColumns);
+  auto const done = static_cast<size_t>(part * kBarColumns);
   char percent[16];
   std::snprintf(percent, sizeof percent, "] %3d%%  ", static_cast<int>(part * 100));
   return "[" + std::string(done, '#') + std::string(kBarColumns - done, '-') + percent +
@@ -86,7 +86,7 @@ void Progress::show(OperationStack::Task const* task) {
   if (!task) return draw("");
   // A task says what it does once it has begun.
   if (task->caption.IsEmpty()) return;
-  const auto now = std::chrono::steady_clock::now();
+  auto const now = std::chrono::steady_clock::now();
   if (m_width > 0 && now - m_drawn < kRedrawAfter) return;
   m_drawn = now;
   draw(clipped(barOf(*task), terminalColumns() - 1));
@@ -95,8 +95,8 @@ void Progress::show(OperationStack::Task const* task) {
 // Over what stands there; plain blanks, so that every terminal will do.
 void Progress::draw(std::string const& text) {
   if (m_width == 0 && text.empty()) return;
-  const size_t width = columnsOf(text);
-  const std::string rest(m_width > width ? m_width - width : 0, ' ');
+  size_t const width = columnsOf(text);
+  std::string const rest(m_width > width ? m_width - width : 0, ' ');
   std::fprintf(stderr, "\r%s%s%s", text.c_str(), rest.c_str(), text.empty() ? "\r" : "");
   std::fflush(stderr);
   m_width = width;

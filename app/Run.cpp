@@ -31,7 +31,7 @@ constexpr char const* kStandardInput = "-";
 
 std::string programFolder() {
   std::error_code error;
-  const auto program = std::filesystem::read_symlink("/proc/self/exe", error);
+  auto const program = std::filesystem::read_symlink("/proc/self/exe", error);
   return error ? "." : program.parent_path().string();
 }
 
@@ -117,13 +117,13 @@ void runParts(ScriptRunner& runner, std::vector<RunRequest::Part> const& parts,
 int runScripts(RunRequest const& request) {
   loadUserProfile();
   int status = 0;
-  const std::unique_ptr<Session> session = makeSession(request.plugin, status);
+  std::unique_ptr<Session> const session = makeSession(request.plugin, status);
   if (!session) return status;
   if (request.assumeYes)
     session->setAssumeYes(true);
   else if (canAsk())
     g_interface->setAsker([](HString const& question) { return askAtTerminal(question.GetString()); });
-  const Progress progress;
+  Progress const progress;
   RunStyle style{
       .json = request.json, .keepGoing = request.keepGoing, .nameLines = isatty(STDERR_FILENO) != 0};
   for (RunRequest::Part const& part : request.parts) style.flushLines |= isStandardInput(part);
@@ -132,7 +132,7 @@ int runScripts(RunRequest const& request) {
   try {
     // A script that cannot be read and a place that cannot be written are told before anything is run.
     for (std::string const& file : request.saves) checkTakeTarget(file);
-    const std::vector<std::string> texts = readParts(request.parts);
+    std::vector<std::string> const texts = readParts(request.parts);
     // A journal is kept only for scripts that use it, and for what is yet to be read.
     session->setUndo(std::any_of(texts.begin(), texts.end(), usesUndo) ||
                      std::any_of(request.parts.begin(), request.parts.end(), isStandardInput));
@@ -155,21 +155,21 @@ int showRegistryPage(PluginChoice plugin) {
   std::set<std::string> forUsers;
   int status = 0;
   plugin.developer = false;
-  if (const std::unique_ptr<Session> session = makeSession(plugin, status))
+  if (std::unique_ptr<Session> const session = makeSession(plugin, status))
     for (auto const& entry : session->commands().entries())
       forUsers.insert(entry.command->getName().GetString());
   plugin.developer = true;
-  const std::unique_ptr<Session> session = status == 0 ? makeSession(plugin, status) : nullptr;
+  std::unique_ptr<Session> const session = status == 0 ? makeSession(plugin, status) : nullptr;
   if (!session) return status;
-  const std::string page =
+  std::string const page =
       registryPage(session->commands(), [&](std::string const& name) { return !forUsers.contains(name); });
-  const bool written = std::puts(page.c_str()) >= 0 && std::fflush(stdout) == 0;
+  bool const written = std::puts(page.c_str()) >= 0 && std::fflush(stdout) == 0;
   return finished(status, written);
 }
 
 int showCommands(PluginChoice const& plugin, std::string const& name, bool json) {
   int status = 0;
-  const std::unique_ptr<Session> session = makeSession(plugin, status);
+  std::unique_ptr<Session> const session = makeSession(plugin, status);
   if (!session) return status;
   CommandRegistry const& commands = session->commands();
   CommandRegistry::Entry const* entry = nullptr;
@@ -181,7 +181,7 @@ int showCommands(PluginChoice const& plugin, std::string const& name, bool json)
   } else {
     text = entry ? commandPage(*entry) : commandList(commands);
   }
-  const bool written = std::puts(text.c_str()) >= 0 && std::fflush(stdout) == 0;
+  bool const written = std::puts(text.c_str()) >= 0 && std::fflush(stdout) == 0;
   return finished(status, written);
 }
 

@@ -9,7 +9,7 @@ enum class Timed { Edit, WithJournal, Undo, Redo };
 // Starts and ends with the clock stopped.
 template <class Edit, class Undo, class Redo>
 void runTimed(benchmark::State& state, Timed timed, Edit edit, Undo undo, Redo redo) {
-  const auto run = [&](bool isTimed, auto& part) {
+  auto const run = [&](bool isTimed, auto& part) {
     if (isTimed) state.ResumeTiming();
     part();
     if (isTimed) state.PauseTiming();

@@ -4,7 +4,7 @@
 
 bool Candidates::read(Given const& given, Options const& options) {
   for (CommandOption const& option : given) {
-    const int index = option.getIndex();
+    int const index = option.getIndex();
     if (index == options.all) {
       m_all = true;
     } else if (index == options.onMod) {

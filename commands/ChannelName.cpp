@@ -6,7 +6,7 @@ namespace {
 
 // The component that a suffix's first letter names, -1 for other letters.
 int componentOf(char letter) {
-  const int component = (letter | 0x20) - 'x';
+  int const component = (letter | 0x20) - 'x';
   return component >= 0 && component <= 2 ? component : -1;
 }
 
@@ -14,10 +14,10 @@ int componentOf(char letter) {
 
 ChannelName channelNameFrom(HString text, Suffix suffix) {
   Controller::fixChannelStr(text);
-  const int dot = text.ReverseFind('.'), last = text.GetLength() - 1;
+  int const dot = text.ReverseFind('.'), last = text.GetLength() - 1;
   if (dot < 0 || (dot == last && suffix != Suffix::allCut)) return {text, -1};
-  const bool isLetter = dot + 1 == last;
-  const int component = isLetter || suffix == Suffix::anyCut ? componentOf(text[dot + 1]) : -1;
+  bool const isLetter = dot + 1 == last;
+  int const component = isLetter || suffix == Suffix::anyCut ? componentOf(text[dot + 1]) : -1;
   if (suffix == Suffix::componentCut && component < 0) return {text, -1};
   return {text.Left(static_cast<uint64>(dot)), component};
 }

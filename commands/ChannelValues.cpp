@@ -5,7 +5,7 @@
 #include <cmath>
 
 bool readVector(Args const& args, int component, Vec3& value) {
-  const int count = args.getCount();
+  int const count = args.getCount();
   if (component >= 0) {
     if (!isOneNumber(args)) return false;
     value[component] = args[1].getFloatValue(-1);

@@ -27,7 +27,7 @@ struct Descriptor {
 
 }  // namespace
 
-FileBytes::FileBytes(const std::string& path) : m_path(path) {
+FileBytes::FileBytes(std::string const& path) : m_path(path) {
   Descriptor file{::open(path.c_str(), O_RDONLY | O_CLOEXEC)};
   if (file.fd < 0)
     throw FileError(path, errno == ENOENT ? "there is no such file" : "cannot be read: " + systemReason());
@@ -40,7 +40,7 @@ FileBytes::FileBytes(const std::string& path) : m_path(path) {
   void* data = ::mmap(nullptr, m_size, PROT_READ, MAP_PRIVATE, file.fd, 0);
   if (data == MAP_FAILED) throw FileError(path, "cannot be read: " + systemReason());
   ::madvise(data, m_size, MADV_SEQUENTIAL);
-  m_data = static_cast<const char*>(data);
+  m_data = static_cast<char const*>(data);
 }
 
 FileBytes::~FileBytes() {
@@ -48,15 +48,15 @@ FileBytes::~FileBytes() {
 }
 
 void FileBytes::release(size_t offset) const {
-  const size_t page = static_cast<size_t>(::sysconf(_SC_PAGESIZE));
-  const size_t whole = offset / page * page;
+  size_t const page = static_cast<size_t>(::sysconf(_SC_PAGESIZE));
+  size_t const whole = offset / page * page;
   if (whole) ::madvise(const_cast<char*>(m_data), whole, MADV_DONTNEED);
 }
 
-void writeFileAtomically(const std::string& path, const std::function<void(std::ostream&)>& write) {
+void writeFileAtomically(std::string const& path, std::function<void(std::ostream&)> const& write) {
   try {
     replaceFile(path, write);
-  } catch (const std::system_error& error) {
+  } catch (std::system_error const& error) {
     throw FileError(path, "cannot be written: " + error.code().message());
   }
 }

@@ -12,25 +12,25 @@ namespace talix {
 // the file is missing, is a folder, is empty, or cannot be read, each with its own text.
 class FileBytes {
  public:
-  explicit FileBytes(const std::string& path);
+  explicit FileBytes(std::string const& path);
   ~FileBytes();
-  FileBytes(const FileBytes&) = delete;
-  FileBytes& operator=(const FileBytes&) = delete;
+  FileBytes(FileBytes const&) = delete;
+  FileBytes& operator=(FileBytes const&) = delete;
 
   std::string_view view() const { return {m_data, m_size}; }
-  const std::string& path() const { return m_path; }
+  std::string const& path() const { return m_path; }
   // Lets the system take back the pages before `offset`, which will not be read again soon.
   void release(size_t offset) const;
 
  private:
   std::string m_path;
-  const char* m_data = nullptr;
+  char const* m_data = nullptr;
   size_t m_size = 0;
 };
 
 // Writes a file under a temporary name in the same folder and renames it once `write` has returned and all is
 // on disk. Throws FileError, and leaves no temporary file, when anything fails; what stood at `path` is then
 // untouched.
-void writeFileAtomically(const std::string& path, const std::function<void(std::ostream&)>& write);
+void writeFileAtomically(std::string const& path, std::function<void(std::ostream&)> const& write);
 
 }  // namespace talix

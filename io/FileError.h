@@ -11,14 +11,14 @@ namespace talix {
 class FileError : public std::runtime_error {
  public:
   // "FILE: WHAT"
-  FileError(const std::string& file, const std::string& what) : std::runtime_error(file + ": " + what) {}
+  FileError(std::string const& file, std::string const& what) : std::runtime_error(file + ": " + what) {}
 
   // "FILE, offset N: WHAT"
-  static FileError atOffset(const std::string& file, uint64 offset, const std::string& what) {
+  static FileError atOffset(std::string const& file, uint64 offset, std::string const& what) {
     return FileError(file + ", offset " + std::to_string(offset), what);
   }
   // "FILE, line N: WHAT"; lines count from 1
-  static FileError atLine(const std::string& file, int64 line, const std::string& what) {
+  static FileError atLine(std::string const& file, int64 line, std::string const& what) {
     return FileError(file + ", line " + std::to_string(line), what);
   }
 };

@@ -18,10 +18,10 @@ constexpr double kExactBrokenRates[] = {24000 / 1001.0, 30000 / 1001.0,  48000 /
 constexpr double kLargestCorrection = 0.05;
 
 template <int N>
-double nearestUsual(const double (&rates)[N], double frameTime, double tolerance) {
+double nearestUsual(double const (&rates)[N], double frameTime, double tolerance) {
   double best = 0, bestDistance = tolerance;
-  for (const double rate : rates) {
-    const double distance = std::abs(1 / rate - frameTime);
+  for (double const rate : rates) {
+    double const distance = std::abs(1 / rate - frameTime);
     if (distance <= bestDistance) best = rate, bestDistance = distance;
   }
   return best;
@@ -32,13 +32,13 @@ double nearestUsual(const double (&rates)[N], double frameTime, double tolerance
 bool isFrameRate(double rate) { return rate >= 0.001 && rate <= 1e6; }
 
 double rateFromFrameTime(double frameTime, double precision) {
-  const double rate = 1 / frameTime;
+  double const rate = 1 / frameTime;
   if (std::abs(rate - std::round(rate)) <= 1e-9 * rate) return std::round(rate);
   // Frame times of full double precision differ in their last bits.
-  const double tolerance = std::min(precision + 1e-13 * frameTime, kLargestCorrection * frameTime);
-  if (const double whole = nearestUsual(kWholeRates, frameTime, tolerance)) return whole;
-  if (const double broken = nearestUsual(kBrokenRates, frameTime, tolerance)) return broken;
-  if (const double exact = nearestUsual(kExactBrokenRates, frameTime, tolerance)) return exact;
+  double const tolerance = std::min(precision + 1e-13 * frameTime, kLargestCorrection * frameTime);
+  if (double const whole = nearestUsual(kWholeRates, frameTime, tolerance)) return whole;
+  if (double const broken = nearestUsual(kBrokenRates, frameTime, tolerance)) return broken;
+  if (double const exact = nearestUsual(kExactBrokenRates, frameTime, tolerance)) return exact;
   return rate;
 }
 

@@ -9,7 +9,7 @@ namespace talix {
 namespace {
 
 struct UnitSpelling {
-  const char* text;  // lower case, without a plural s
+  char const* text;  // lower case, without a plural s
   double millimetres;
 };
 
@@ -21,13 +21,13 @@ constexpr UnitSpelling kSpellings[] = {
 
 }  // namespace
 
-double millimetresPerUnit(const std::string& unit) {
+double millimetresPerUnit(std::string const& unit) {
   std::string word;
-  for (const unsigned char c : unit)
+  for (unsigned char const c : unit)
     if (!std::isspace(c) && c != 0 && c != '.') word += static_cast<char>(std::tolower(c));
   if (word.size() > 2 && word.back() == 's') word.pop_back();
-  const auto* found = std::find_if(std::begin(kSpellings), std::end(kSpellings),
-                                   [&](const UnitSpelling& spelling) { return word == spelling.text; });
+  auto const* found = std::find_if(std::begin(kSpellings), std::end(kSpellings),
+                                   [&](UnitSpelling const& spelling) { return word == spelling.text; });
   return found == std::end(kSpellings) ? 0 : found->millimetres;
 }
 

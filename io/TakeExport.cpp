@@ -9,7 +9,7 @@ namespace talix {
 namespace {
 
 // The whole frames in a range.
-FrameGrid framesIn(const HTimeRange& range, int64 period) {
+FrameGrid framesIn(HTimeRange const& range, int64 period) {
   FrameGrid grid;
   grid.period = period;
   grid.firstFrame = frameAtOrAfter(range.getStart(), period);
@@ -19,10 +19,10 @@ FrameGrid framesIn(const HTimeRange& range, int64 period) {
 }
 
 // Of what a take can hold.
-HTimeRange keyRangeIn(const Database& scene, const NLEClip& clip) {
+HTimeRange keyRangeIn(Database const& scene, NLEClip const& clip) {
   HTimeRange range;
   for (int i = 0; i < scene.getNumModules(); ++i) {
-    const Module* module = scene.getModule(i);
+    Module const* module = scene.getModule(i);
     if (!module->isKindOf(&Node::staticClass()) && !module->isKindOf(&AnalogDevice::staticClass())) continue;
     for (int k = 0; k < module->getNumChannels(); ++k)
       range.include(module->getChannel(k)->getKeyRangeInClip(&clip));
@@ -32,20 +32,20 @@ HTimeRange keyRangeIn(const Database& scene, const NLEClip& clip) {
 
 // Those of the active clip's file, and of keys beyond, as far as an animation range that the user chose goes;
 // without a file the animation range.
-FrameGrid framesToSave(const Database& scene, std::vector<TakeNote>& notes) {
-  const HTimeManager* time = scene.getTimeManager();
-  const auto* clip = objectAs<Clip>(scene.getActiveClip());
+FrameGrid framesToSave(Database const& scene, std::vector<TakeNote>& notes) {
+  HTimeManager const* time = scene.getTimeManager();
+  auto const* clip = objectAs<Clip>(scene.getActiveClip());
   if (!clip || !(clip->getFileTime().rate > 0))
     return framesIn(time->getAnimRange(), time->getTicksPerFrame());
 
-  const Clip::FileTime& file = clip->getFileTime();
-  const int64 period = clip->getFramePeriod();
+  Clip::FileTime const& file = clip->getFileTime();
+  int64 const period = clip->getFramePeriod();
   HTimeRange range = keyRangeIn(scene, *clip);
   if (file.frameCount > 0)
     range.include(HTimeRange(file.firstFrame * period, (file.firstFrame + file.frameCount - 1) * period));
-  const int64 all = framesIn(range, period).count;
+  int64 const all = framesIn(range, period).count;
   if (time->isAnimRangeChosen()) range.intersect(time->getAnimRange());
-  const FrameGrid grid = framesIn(range, period);
+  FrameGrid const grid = framesIn(range, period);
   if (grid.count < all)
     notes.push_back({TakeNote::Level::Warning, "the animation range leaves out " +
                                                    std::to_string(all - grid.count) + " of the clip's " +
@@ -53,31 +53,31 @@ FrameGrid framesToSave(const Database& scene, std::vector<TakeNote>& notes) {
   return grid;
 }
 
-void recallFile(Take& take, const NLEClip& clip) {
+void recallFile(Take& take, NLEClip const& clip) {
   take.name = fileMetadata::text(clip, fileMetadata::kFileName);
   if (take.name.empty()) take.name = clip.getName().GetString();
   take.format = fileMetadata::text(clip, fileMetadata::kFileFormat);
-  const double unit = fileMetadata::number(clip, fileMetadata::kFileUnitInMillimetres, 0);
+  double const unit = fileMetadata::number(clip, fileMetadata::kFileUnitInMillimetres, 0);
   if (unit > 0) {
     take.unitInMillimetres = unit;
     take.fileUnit = fileMetadata::text(clip, fileMetadata::kFileUnit);
   }
-  for (const fileMetadata::Record& record : fileMetadata::records(clip, fileMetadata::kEvents, 5))
+  for (fileMetadata::Record const& record : fileMetadata::records(clip, fileMetadata::kEvents, 5))
     take.events.push_back({record[1], record[2], record[3], record[4], fileMetadata::textNumber(record[0])});
 }
 
 }  // namespace
 
 Take exportTake(Database& scene, std::vector<TakeNote>& notes) {
-  const FrameGrid grid = framesToSave(scene, notes);
+  FrameGrid const grid = framesToSave(scene, notes);
   Take take;
-  const auto* clip = objectAs<Clip>(scene.getActiveClip());
+  auto const* clip = objectAs<Clip>(scene.getActiveClip());
   take.rate = clip && clip->getFileTime().rate > 0 ? clip->getFileTime().rate
                                                    : scene.getTimeManager()->getFrameRate().getFrameRate();
   take.firstFrame = grid.firstFrame;
   take.frameCount = grid.count;
   if (scene.getUpAxis() >= 0) take.up = static_cast<Axis>(scene.getUpAxis());
-  if (const NLEClip* active = scene.getActiveClip()) recallFile(take, *active);
+  if (NLEClip const* active = scene.getActiveClip()) recallFile(take, *active);
 
   TakeExport out{scene, FrameSampler(scene, grid), take, notes};
   exportPoints(out);

@@ -12,16 +12,16 @@ namespace {
 
 enum class Format : unsigned char { None, C3D, BVH, TRC };
 
-Format formatBySuffix(const std::string& path) {
-  const std::string suffix = std::filesystem::path(path).extension().string();
+Format formatBySuffix(std::string const& path) {
+  std::string const suffix = std::filesystem::path(path).extension().string();
   if (equalsIgnoringCase(suffix, ".c3d")) return Format::C3D;
   if (equalsIgnoringCase(suffix, ".bvh")) return Format::BVH;
   if (equalsIgnoringCase(suffix, ".trc")) return Format::TRC;
   return Format::None;
 }
 
-Format formatByContent(const std::string& path) {
-  const FileBytes bytes(path);
+Format formatByContent(std::string const& path) {
+  FileBytes const bytes(path);
   constexpr char kC3DMark = 0x50;
   if (TextScanner scanner(bytes); scanner.accept("hierarchy")) return Format::BVH;
   if (TextScanner scanner(bytes); scanner.accept("pathfiletype")) return Format::TRC;
@@ -31,7 +31,7 @@ Format formatByContent(const std::string& path) {
 
 }  // namespace
 
-Take readTake(const std::string& path, const ReadOptions& options) {
+Take readTake(std::string const& path, ReadOptions const& options) {
   Format format = formatByContent(path);
   if (format == Format::None) format = formatBySuffix(path);
   switch (format) {
@@ -49,10 +49,10 @@ Take readTake(const std::string& path, const ReadOptions& options) {
 
 namespace {
 
-using Writer = void (*)(const Take&, const std::string&, std::vector<TakeNote>&);
+using Writer = void (*)(Take const&, std::string const&, std::vector<TakeNote>&);
 
-Writer writerFor(const std::string& path) {
-  const Format format = formatBySuffix(path);
+Writer writerFor(std::string const& path) {
+  Format const format = formatBySuffix(path);
   if (format == Format::C3D) return writeC3D;
   if (format == Format::BVH) return writeBVH;
   throw FileError(path, "takes are written as C3D or BVH: a name ending in .c3d or .bvh expected");
@@ -60,15 +60,15 @@ Writer writerFor(const std::string& path) {
 
 }  // namespace
 
-void checkTakeTarget(const std::string& path) {
+void checkTakeTarget(std::string const& path) {
   writerFor(path);
   std::error_code error;
-  const std::filesystem::path folder = std::filesystem::absolute(path, error).parent_path();
+  std::filesystem::path const folder = std::filesystem::absolute(path, error).parent_path();
   if (error || !std::filesystem::is_directory(folder, error))
     throw FileError(path, "cannot be written: there is no such folder");
 }
 
-void writeTake(const Take& take, const std::string& path, std::vector<TakeNote>& notes) {
+void writeTake(Take const& take, std::string const& path, std::vector<TakeNote>& notes) {
   writerFor(path)(take, path, notes);
 }
 

@@ -18,23 +18,23 @@ struct ReadOptions {
                      // as it says
 };
 
-Take readC3D(const std::string& path, const ReadOptions& = {});
-Take readBVH(const std::string& path, const ReadOptions& = {});
-Take readTRC(const std::string& path, const ReadOptions& = {});
+Take readC3D(std::string const& path, ReadOptions const& = {});
+Take readBVH(std::string const& path, ReadOptions const& = {});
+Take readTRC(std::string const& path, ReadOptions const& = {});
 
-void writeC3D(const Take&, const std::string& path, std::vector<TakeNote>& notes);
-void writeBVH(const Take&, const std::string& path, std::vector<TakeNote>& notes);
+void writeC3D(Take const&, std::string const& path, std::vector<TakeNote>& notes);
+void writeBVH(Take const&, std::string const& path, std::vector<TakeNote>& notes);
 
 // By content and suffix. Throws FileError naming the formats when the file is of none.
-Take readTake(const std::string& path, const ReadOptions& = {});
+Take readTake(std::string const& path, ReadOptions const& = {});
 // Throws FileError when a take could not be written there whatever it holds: no such folder, or a name whose
 // suffix is of no format that is written. For asking before long work.
-void checkTakeTarget(const std::string& path);
+void checkTakeTarget(std::string const& path);
 // By suffix (.c3d, .bvh).
-void writeTake(const Take&, const std::string& path, std::vector<TakeNote>& notes);
+void writeTake(Take const&, std::string const& path, std::vector<TakeNote>& notes);
 
 // How many millimetres a length unit is; accepts the usual spellings ("mm", "Meters", "inch"); 0 when
 // unknown.
-double millimetresPerUnit(const std::string& unit);
+double millimetresPerUnit(std::string const& unit);
 
 }  // namespace talix

@@ -6,13 +6,13 @@
 
 namespace talix {
 
-TakeGaps gapsOf(const Take& take, const KeyTrack& positions) {
-  const int64 period = ticksPerFrameAt(take.rate);
+TakeGaps gapsOf(Take const& take, KeyTrack const& positions) {
+  int64 const period = ticksPerFrameAt(take.rate);
   TakeGaps gaps;
   DataRanges(positions, period)
       .visitGaps(take.firstFrame * period, (take.firstFrame + take.frameCount - 1) * period,
                  [&](int64 start, int64 end) {
-                   const int64 run = (end - start) / period + 1;
+                   int64 const run = (end - start) / period + 1;
                    gaps.missing += run;
                    ++gaps.count;
                    gaps.longest = std::max(gaps.longest, run);

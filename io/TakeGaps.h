@@ -12,6 +12,6 @@ struct TakeGaps {
   int64 longest = 0;  // frames of the longest run
 };
 
-TakeGaps gapsOf(const Take&, const KeyTrack& positions);
+TakeGaps gapsOf(Take const&, KeyTrack const& positions);
 
 }  // namespace talix

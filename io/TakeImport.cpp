@@ -11,7 +11,7 @@ namespace talix {
 
 namespace {
 
-constexpr const char* kAxisNames[] = {"x", "y", "z"};
+constexpr char const* kAxisNames[] = {"x", "y", "z"};
 
 // Taken before anything changes: what a failed import goes back to.
 class ImportRollback {
@@ -19,7 +19,7 @@ class ImportRollback {
   explicit ImportRollback(Database& scene)
       : m_scene(scene), m_clip(scene.getActiveClip()), m_layer(scene.getActiveLayer()) {}
 
-  void takeBack(Clip* clip, const std::vector<Module*>& created) const {
+  void takeBack(Clip* clip, std::vector<Module*> const& created) const {
     for (size_t i = created.size(); i-- > 0;) m_scene.removeFromScene(created[i], true, true, true, true);
     m_scene.removeFromScene(clip, true, true, true, true);
     m_scene.setActiveClip(m_clip);
@@ -32,12 +32,12 @@ class ImportRollback {
   int m_layer;
 };
 
-void checkTake(const Take& take, const std::string& path, const Database& scene) {
+void checkTake(Take const& take, std::string const& path, Database const& scene) {
   if (scene.getNumClips() >= NLEClip::kMaximum)
     throw FileError(
         path, "the scene has " + std::to_string(NLEClip::kMaximum) + " clips already and takes no more");
   for (size_t i = 0; i < take.joints.size(); ++i) {
-    const TakeJoint& joint = take.joints[i];
+    TakeJoint const& joint = take.joints[i];
     if (joint.parent >= static_cast<int>(i) || joint.parent < -1)
       throw FileError(path, "the joint \"" + joint.name + "\" stands before its parent");
     if (joint.name.empty()) throw FileError(path, "joint " + std::to_string(i + 1) + " has no name");
@@ -46,7 +46,7 @@ void checkTake(const Take& take, const std::string& path, const Database& scene)
 
 HFrameRate frameRate(double rate) {
   HFrameRate result;
-  for (const ETimecodeStandard standard : {NTSC, PAL, FILM, FILM_NTSC}) {
+  for (ETimecodeStandard const standard : {NTSC, PAL, FILM, FILM_NTSC}) {
     HFrameRate known;
     known.setTimecodeStandard(standard);
     if (known.getFrameRate() == rate) return known;
@@ -56,16 +56,16 @@ HFrameRate frameRate(double rate) {
 }
 
 // Whether the scene can have the take's rate.
-bool takesRate(const Take& take) { return take.rate <= HFrameRate::kMaximum; }
+bool takesRate(Take const& take) { return take.rate <= HFrameRate::kMaximum; }
 
-bool hasSceneRate(const Take& take, const Database& scene) {
+bool hasSceneRate(Take const& take, Database const& scene) {
   return scene.getTimeManager()->getTicksPerFrame() == ticksPerFrameAt(take.rate);
 }
 
 // Between consecutive samples there is data, at the scene's frames as well.
 void bridgeSamples(Take& take) {
-  const auto bridge = [](KeyTrack& track, double rate) {
-    const KeyTrack samples = track;
+  auto const bridge = [](KeyTrack& track, double rate) {
+    KeyTrack const samples = track;
     DataRanges(samples, ticksPerFrameAt(rate)).bridge(track);
   };
   for (TakePoint& point : take.points) {
@@ -80,36 +80,36 @@ void bridgeSamples(Take& take) {
   }
 }
 
-void setSceneTime(TakeImport& import, const Take& take) {
+void setSceneTime(TakeImport& import, Take const& take) {
   HTimeManager* time = import.clip().getDatabase()->getTimeManager();
   if (!takesRate(take))
     import.warn("the scene counts at most " + fileMetadata::numberText(HFrameRate::kMaximum) +
                 " frames a second and keeps its rate; keys lie at their times");
   else
     time->setFrameRate(frameRate(take.rate));
-  const int64 period = ticksPerFrameAt(take.rate);
-  const int64 last = take.firstFrame + std::max<int64>(take.frameCount, 1) - 1;
-  const HTimeRange range(take.firstFrame * period, last * period);
+  int64 const period = ticksPerFrameAt(take.rate);
+  int64 const last = take.firstFrame + std::max<int64>(take.frameCount, 1) - 1;
+  HTimeRange const range(take.firstFrame * period, last * period);
   time->setAnimRange(range, false);
   time->setPlayRange(range, false);
 }
 
-void noteSceneTime(TakeImport& import, const Take& take) {
+void noteSceneTime(TakeImport& import, Take const& take) {
   HTimeManager* time = import.clip().getDatabase()->getTimeManager();
   time->setAnimRange(time->getAnimRange(), false);
-  const HFrameRate& rate = time->getFrameRate();
+  HFrameRate const& rate = time->getFrameRate();
   if (!hasSceneRate(take, *import.clip().getDatabase()))
     import.info("the take has " + fileMetadata::numberText(take.rate) + " frames a second, the scene " +
                 fileMetadata::numberText(rate.getFrameRate()) + "; keys keep their times");
 }
 
 // The scene's up axis, from the user, else as it was, else from the take.
-int sceneUpAxis(const Take& take, int up, const Database& scene) {
+int sceneUpAxis(Take const& take, int up, Database const& scene) {
   if (up >= 0) return up;
   return scene.getUpAxis() >= 0 ? scene.getUpAxis() : static_cast<int>(take.up);
 }
 
-void noteAxes(TakeImport& import, const Take& take, int formerAxis, int axis, bool firstTake) {
+void noteAxes(TakeImport& import, Take const& take, int formerAxis, int axis, bool firstTake) {
   if (formerAxis >= 0 && formerAxis != axis && !firstTake)
     import.warn(std::string("the scene's up axis was ") + kAxisNames[formerAxis] + " and is " +
                 kAxisNames[axis] + " now; what the scene held before was not turned");
@@ -118,14 +118,14 @@ void noteAxes(TakeImport& import, const Take& take, int formerAxis, int axis, bo
                 kAxisNames[axis] + " up");
 }
 
-void rememberFile(Clip& clip, const Take& take) {
+void rememberFile(Clip& clip, Take const& take) {
   fileMetadata::setText(clip, fileMetadata::kFileName, take.name);
   fileMetadata::setText(clip, fileMetadata::kFileFormat, take.format);
   fileMetadata::setText(clip, fileMetadata::kFileUnit, take.fileUnit);
   fileMetadata::setNumber(clip, fileMetadata::kFileUnitInMillimetres, take.unitInMillimetres);
   if (take.events.empty()) return;
   std::vector<fileMetadata::Record> events;
-  for (const TakeEvent& event : take.events)
+  for (TakeEvent const& event : take.events)
     events.push_back({fileMetadata::numberText(event.seconds), event.label, event.context, event.subject,
                       event.description});
   fileMetadata::setRecords(clip, fileMetadata::kEvents, events);
@@ -133,14 +133,14 @@ void rememberFile(Clip& clip, const Take& take) {
 
 }  // namespace
 
-void importTake(Take take, const std::string& path, int up, Database& scene, std::vector<TakeNote>& notes) {
+void importTake(Take take, std::string const& path, int up, Database& scene, std::vector<TakeNote>& notes) {
   checkTake(take, path, scene);
-  const bool firstTake = scene.getNumClips() == 0;
-  const int formerAxis = scene.getUpAxis(), axis = sceneUpAxis(take, up, scene);
-  const ImportRollback undoing(scene);
+  bool const firstTake = scene.getNumClips() == 0;
+  int const formerAxis = scene.getUpAxis(), axis = sceneUpAxis(take, up, scene);
+  ImportRollback const undoing(scene);
   // With its suffix, so that the clip and the character that stands for the file do not share a path.
-  const std::string fileName = std::filesystem::path(path).filename().string();
-  const std::string clipName = moduleName(fileName);
+  std::string const fileName = std::filesystem::path(path).filename().string();
+  std::string const clipName = moduleName(fileName);
   auto* clip = static_cast<Clip*>(scene.createModule(&Clip::staticClass(), clipName.c_str(), nullptr));
   if (!clip) throw FileError(path, "the scene takes no further clip");
   scene.setActiveClip(clip);
@@ -148,7 +148,7 @@ void importTake(Take take, const std::string& path, int up, Database& scene, std
   std::vector<TakeNote> said;
   TakeImport import(scene, *clip, UpAxisConversion(static_cast<int>(take.up), axis), fileName, said);
   if (firstTake ? !takesRate(take) : !hasSceneRate(take, scene)) bridgeSamples(take);
-  for (const TakeNote& note : take.notes)
+  for (TakeNote const& note : take.notes)
     note.level == TakeNote::Level::Warning ? import.warn(note.text) : import.info(note.text);
   try {
     importDevices(import, take, path);

@@ -15,7 +15,7 @@ namespace talix {
 //
 // Every conversion and assumption is a line of `notes`, the take's own included. Throws FileError, with the
 // scene as it was, when the take cannot be added (32nd clip, channel kinds that clash beyond mending).
-void importTake(Take take, const std::string& path, int up, Database& scene, std::vector<TakeNote>& notes);
+void importTake(Take take, std::string const& path, int up, Database& scene, std::vector<TakeNote>& notes);
 
 // The active clip of the scene (the default values when none is active) as a take over the animation range,
 // one value a frame. What a take cannot hold is added to `notes` as a warning.

@@ -20,7 +20,7 @@ constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
 
 }  // namespace
 
-TextScanner::TextScanner(const FileBytes& bytes) : m_bytes(bytes), m_text(bytes.view()) {
+TextScanner::TextScanner(FileBytes const& bytes) : m_bytes(bytes), m_text(bytes.view()) {
   if (m_text.substr(0, kByteOrderMark.size()) == kByteOrderMark) m_at = kByteOrderMark.size();
 }
 
@@ -30,20 +30,20 @@ void TextScanner::skipBlanks() {
 
 void TextScanner::skipWhite() {
   for (; m_at < m_text.size(); ++m_at) {
-    const char c = m_text[m_at];
+    char const c = m_text[m_at];
     if (isBlank(c)) continue;
     if (!isLineEnd(c)) return;
-    const bool halfOfTwo = c == '\r' && m_at + 1 < m_text.size() && m_text[m_at + 1] == '\n';
+    bool const halfOfTwo = c == '\r' && m_at + 1 < m_text.size() && m_text[m_at + 1] == '\n';
     if (!halfOfTwo) ++m_line;
   }
 }
 
 std::string_view TextScanner::takeWord() {
   skipWhite();
-  const size_t start = m_at;
+  size_t const start = m_at;
   if (m_at < m_text.size() && isBrace(m_text[m_at])) return m_text.substr(m_at++, 1);
   while (m_at < m_text.size()) {
-    const char c = m_text[m_at];
+    char const c = m_text[m_at];
     if (isBlank(c) || isLineEnd(c) || isBrace(c)) break;
     ++m_at;
   }
@@ -52,8 +52,8 @@ std::string_view TextScanner::takeWord() {
 
 std::string_view TextScanner::peekWord() {
   skipWhite();
-  const size_t start = m_at;
-  const std::string_view word = takeWord();
+  size_t const start = m_at;
+  std::string_view const word = takeWord();
   m_at = start;
   return word;
 }
@@ -76,14 +76,14 @@ bool TextScanner::accept(std::string_view lowerCase) {
 }
 
 std::string_view TextScanner::takeRestOfLine() {
-  const size_t start = m_at;
+  size_t const start = m_at;
   while (m_at < m_text.size() && !isLineEnd(m_text[m_at]) && !isBrace(m_text[m_at])) ++m_at;
   return trimmed(m_text.substr(start, m_at - start));
 }
 
 bool TextScanner::takeLine(std::string_view& text) {
   if (m_at == m_text.size()) return false;
-  const size_t end = std::min(m_text.find_first_of("\r\n", m_at), m_text.size());
+  size_t const end = std::min(m_text.find_first_of("\r\n", m_at), m_text.size());
   text = m_text.substr(m_at, end - m_at);
   m_at = end;
   if (m_at < m_text.size()) m_at += m_text.substr(m_at, 2) == "\r\n" ? 2 : 1;
@@ -91,26 +91,26 @@ bool TextScanner::takeLine(std::string_view& text) {
   return true;
 }
 
-double TextScanner::takeNumber(const char* expected) {
-  const std::string_view word = takeWord();
-  const auto number = parseNumber(word);
+double TextScanner::takeNumber(char const* expected) {
+  std::string_view const word = takeWord();
+  auto const number = parseNumber(word);
   if (!number || !std::isfinite(*number)) fail(std::string(expected) + " expected, not " + found(word));
   return *number;
 }
 
-void TextScanner::failAt(int64 line, const std::string& what) const {
+void TextScanner::failAt(int64 line, std::string const& what) const {
   throw FileError::atLine(m_bytes.path(), line, what);
 }
 
 std::optional<double> parseNumber(std::string_view word) {
   if (word.size() > 1 && word[0] == '+' && word[1] != '-') word.remove_prefix(1);
   double value = 0;
-  const auto [end, error] = std::from_chars(word.data(), word.data() + word.size(), value);
+  auto const [end, error] = std::from_chars(word.data(), word.data() + word.size(), value);
   if (end != word.data() + word.size() || error == std::errc::invalid_argument) return std::nullopt;
   if (error != std::errc::result_out_of_range) return value;
   // Out of range is too large or too small; only an exponent's sign tells which without parsing again.
-  const size_t exponent = word.find_first_of("eE");
-  const bool tiny = exponent == std::string_view::npos ? word.find_first_of("123456789") > word.find('.')
+  size_t const exponent = word.find_first_of("eE");
+  bool const tiny = exponent == std::string_view::npos ? word.find_first_of("123456789") > word.find('.')
                                                        : word.substr(exponent + 1, 1) == "-";
   return tiny ? 0.0 : std::copysign(std::numeric_limits<double>::infinity(), word[0] == '-' ? -1.0 : 1.0);
 }
@@ -140,8 +140,8 @@ std::string shown(std::string_view text) {
     while (length > 0 && (text[length] & '\xC0') == '\x80') --length;  // not inside a UTF-8 character
   }
   std::string result = "\"";
-  for (const char c : text.substr(0, length)) {
-    const auto byte = static_cast<unsigned char>(c);
+  for (char const c : text.substr(0, length)) {
+    auto const byte = static_cast<unsigned char>(c);
     result += byte < 0x20 || byte == 0x7F ? '?' : c;
   }
   return result + (length < text.size() ? "...\"" : "\"");
@@ -151,7 +151,7 @@ std::string found(std::string_view word) { return word.empty() ? "the end of the
 
 std::string shortNumber(double value) {
   char text[32];
-  const auto end = std::to_chars(text, text + sizeof text, value, std::chars_format::general, 10).ptr;
+  auto const end = std::to_chars(text, text + sizeof text, value, std::chars_format::general, 10).ptr;
   return {text, end};
 }
 

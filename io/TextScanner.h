@@ -15,7 +15,7 @@ namespace talix {
 
 class TextScanner {
  public:
-  explicit TextScanner(const FileBytes& bytes);
+  explicit TextScanner(FileBytes const& bytes);
 
   // The line, from 1, and the place in the file of what is read next.
   int64 line() const { return m_line; }
@@ -34,19 +34,19 @@ class TextScanner {
   // What is left of this line before a brace, without blanks around it; the line's end stays unread.
   std::string_view takeRestOfLine();
   // The next word as a finite number; else throws FileError saying what was expected.
-  double takeNumber(const char* expected);
+  double takeNumber(char const* expected);
   // A whole line without its end; false at the end of the file. Afterwards line() is the line after it.
   bool takeLine(std::string_view& text);
 
   // Throws FileError at the current line, or at a line.
-  [[noreturn]] void fail(const std::string& what) const { failAt(m_line, what); }
-  [[noreturn]] void failAt(int64 line, const std::string& what) const;
+  [[noreturn]] void fail(std::string const& what) const { failAt(m_line, what); }
+  [[noreturn]] void failAt(int64 line, std::string const& what) const;
 
  private:
   void skipWhite();
   void skipBlanks();
 
-  const FileBytes& m_bytes;
+  FileBytes const& m_bytes;
   std::string_view m_text;
   size_t m_at = 0;
   int64 m_line = 1;

@@ -20,7 +20,7 @@ constexpr size_t kMany = 9;
 using Form = std::vector<std::string>;
 
 std::array<Variable, kTypes> const& samples() {
-  static const std::array<Variable, kTypes> values = [] {
+  static std::array<Variable, kTypes> const values = [] {
     std::array<Variable, kTypes> made;
     made[0].setValue(1, -1);
     made[1].setValue(0.5, -1);
@@ -66,7 +66,7 @@ std::string placeText(Command const& command, Args args, size_t place) {
 }
 
 std::optional<Form> formOf(Command const& command, size_t count) {
-  const std::optional<Args> args = count ? acceptedList(command, count) : Args();
+  std::optional<Args> const args = count ? acceptedList(command, count) : Args();
   if (!args || !accepts(command, *args)) return {};
   Form form;
   for (size_t place = 0; place < count; ++place) form.push_back(placeText(command, *args, place));
@@ -75,7 +75,7 @@ std::optional<Form> formOf(Command const& command, size_t count) {
 
 // Of forms that each begin as the one before them.
 std::string textOf(size_t least, Form form) {
-  const bool many = form.size() >= kMany;
+  bool const many = form.size() >= kMany;
   std::string text;
   // The last place that differs from the next, after which "..." stands for the rest.
   size_t shown = form.size();
@@ -95,12 +95,12 @@ std::string acceptedArguments(Command const& command) {
   Form longest;
   size_t least = 0;
   bool open = false;
-  const auto close = [&] {
+  auto const close = [&] {
     if (open) text += (text.empty() ? "" : " or ") + (longest.empty() ? "none" : textOf(least, longest));
     open = false;
   };
   for (size_t count = 0; count <= kMany; ++count) {
-    const std::optional<Form> form = formOf(command, count);
+    std::optional<Form> const form = formOf(command, count);
     if (!form || (open && !std::equal(longest.begin(), longest.end(), form->begin()))) close();
     if (!form) continue;
     if (!open) least = count;

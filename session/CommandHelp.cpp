@@ -55,7 +55,7 @@ std::string optionSyntax(CommandOption const& option) {
 }
 
 bool excludeEachOther(CommandOption const& a, CommandOption const& b) {
-  const auto excludes = [](CommandOption const& option, CommandOption const& other) {
+  auto const excludes = [](CommandOption const& option, CommandOption const& other) {
     return (option.getMask() >> other.getIndex() & 1) != 0;
   };
   return a.getIndex() != b.getIndex() && excludes(a, b) && excludes(b, a);
@@ -65,7 +65,7 @@ std::string commandList(CommandRegistry const& commands) {
   std::vector<std::string> categories;  // in the order of their first commands
   size_t width = 0;
   for (auto const& entry : commands.entries()) {
-    const std::string category = categoryOf(*entry.command);
+    std::string const category = categoryOf(*entry.command);
     if (std::find(categories.begin(), categories.end(), category) == categories.end())
       categories.push_back(category);
     width = std::max(width, entry.command->getName().GetString().size());
@@ -83,9 +83,9 @@ std::string commandList(CommandRegistry const& commands) {
 
 std::string commandPage(CommandRegistry::Entry const& entry) {
   Command& command = *entry.command;
-  const auto options = shownOptions(command);
+  auto const options = shownOptions(command);
   std::string usage = command.getName().GetString();
-  if (const std::string syntax = argSyntax(command); !syntax.empty()) usage += " " + syntax;
+  if (std::string const syntax = argSyntax(command); !syntax.empty()) usage += " " + syntax;
   for (auto const* option : options) usage += " [" + optionSyntax(*option) + "]";
 
   std::string text = command.getName().GetString() + ": " + command.getDisplayName().GetString();

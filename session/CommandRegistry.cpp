@@ -6,7 +6,7 @@ namespace talix {
 
 void CommandRegistry::add(Command* command, std::string const& source) {
   std::string const& name = command->getName().GetString();
-  const auto [place, added] = m_byName.emplace(name, m_entries.size());
+  auto const [place, added] = m_byName.emplace(name, m_entries.size());
   if (!added) {
     throw std::runtime_error("Two commands are named " + name + ": one of " +
                              m_entries[place->second].source + ", one of " + source);
@@ -15,7 +15,7 @@ void CommandRegistry::add(Command* command, std::string const& source) {
 }
 
 CommandRegistry::Entry const* CommandRegistry::find(std::string_view name) const {
-  const auto found = m_byName.find(name);
+  auto const found = m_byName.find(name);
   return found == m_byName.end() ? nullptr : &m_entries[found->second];
 }
 

@@ -24,7 +24,7 @@ json::value elementJson(Variable const& value, Variable::VarType type, int i) {
     case Variable::String:
       return textJson(value.getStringValue(i));
     case Variable::Bool: {
-      const Variable::BoolType boolean = value.getBoolValue(i);
+      Variable::BoolType const boolean = value.getBoolValue(i);
       if (boolean == Variable::Toggle) return "toggle";
       return boolean != Variable::False;
     }
@@ -39,10 +39,10 @@ json::value elementJson(Variable const& value, Variable::VarType type, int i) {
 
 // How many bytes of `text` are one UTF-8 character; 0 when it begins with none.
 size_t characterLength(std::string_view text) {
-  const auto byte = [&](size_t i) { return static_cast<unsigned char>(text[i]); };
-  const unsigned lead = byte(0);
+  auto const byte = [&](size_t i) { return static_cast<unsigned char>(text[i]); };
+  unsigned const lead = byte(0);
   if (lead < 0x80) return 1;
-  const size_t length = lead >= 0xc2 && lead < 0xe0   ? 2
+  size_t const length = lead >= 0xc2 && lead < 0xe0   ? 2
                         : lead >= 0xe0 && lead < 0xf0 ? 3
                         : lead >= 0xf0 && lead < 0xf5 ? 4
                                                       : 0;
@@ -50,7 +50,7 @@ size_t characterLength(std::string_view text) {
   for (size_t i = 1; i < length; ++i)
     if ((byte(i) & 0xc0) != 0x80) return 0;
   // Overlong forms, halves of UTF-16 pairs, numbers beyond U+10FFFF.
-  const unsigned second = byte(1);
+  unsigned const second = byte(1);
   if ((lead == 0xe0 && second < 0xa0) || (lead == 0xed && second > 0x9f)) return 0;
   if ((lead == 0xf0 && second < 0x90) || (lead == 0xf4 && second > 0x8f)) return 0;
   return length;
@@ -70,7 +70,7 @@ std::string mendedUtf8(std::string_view text) {
   std::string mended;
   mended.reserve(text.size());
   while (!text.empty()) {
-    const size_t length = characterLength(text);
+    size_t const length = characterLength(text);
     mended += length > 0 ? text.substr(0, length) : "\xef\xbf\xbd";
     text.remove_prefix(std::max<size_t>(length, 1));
   }
@@ -78,7 +78,7 @@ std::string mendedUtf8(std::string_view text) {
 }
 
 json::value toJson(Variable const& value) {
-  const Variable::VarType type = value.getType();
+  Variable::VarType const type = value.getType();
   if (!value.isArray()) return elementJson(value, type, -1);
   json::array items;
   items.reserve(static_cast<size_t>(value.getNumItems()));
@@ -101,7 +101,7 @@ json::object toJson(CommandRegistry::Entry const& entry) {
   Command& command = *entry.command;
   json::array options;
   for (int i = 0; i < command.getNumOptions(); ++i) options.push_back(optionJson(command.getOption(i)));
-  const std::string syntax = argSyntax(command);
+  std::string const syntax = argSyntax(command);
   return {{"name", textJson(command.getName().GetString())},
           {"displayName", textJson(command.getDisplayName().GetString())},
           {"category", textJson(command.getCategory().GetString())},

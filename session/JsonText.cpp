@@ -9,7 +9,7 @@ namespace talix {
 namespace {
 
 void append(boost::json::value const& value, std::string& out) {
-  const auto appendAll = [&out](auto const& items, char open, char close, auto appendItem) {
+  auto const appendAll = [&out](auto const& items, char open, char close, auto appendItem) {
     out += open;
     bool first = true;
     for (auto const& item : items) {

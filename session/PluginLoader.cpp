@@ -38,7 +38,7 @@ PluginLibrary::PluginLibrary(std::string const& path) : m_path(path) {
   try {
     load();
   } catch (char const* text) {
-    const std::string problem = text;
+    std::string const problem = text;
     unload();
     throw PluginError(path + ": the plug-in could not be made: " + problem);
   } catch (std::bad_alloc const&) {
@@ -55,20 +55,20 @@ PluginLibrary::~PluginLibrary() { unload(); }
 void PluginLibrary::load() {
   m_library = dlopen(m_path.c_str(), RTLD_NOW | RTLD_LOCAL);
   if (!m_library) throw PluginError(m_path + ": not a library that can be loaded: " + loadProblem(m_path));
-  const auto apiVersion = reinterpret_cast<int (*)()>(entryPoint("apiVersion"));
-  const auto getNumPlugins = reinterpret_cast<int (*)()>(entryPoint("getNumPlugins"));
-  const auto getPlugin = reinterpret_cast<CommandPluginBase* (*)(int)>(entryPoint("getPlugin"));
-  const int version = apiVersion();
+  auto const apiVersion = reinterpret_cast<int (*)()>(entryPoint("apiVersion"));
+  auto const getNumPlugins = reinterpret_cast<int (*)()>(entryPoint("getNumPlugins"));
+  auto const getPlugin = reinterpret_cast<CommandPluginBase* (*)(int)>(entryPoint("getPlugin"));
+  int const version = apiVersion();
   if (version != kPluginInterfaceVersion) {
     throw PluginError(m_path + ": made for plug-in interface version " + hex(version) + ", not " +
                       hex(kPluginInterfaceVersion));
   }
-  const int count = getNumPlugins();
+  int const count = getNumPlugins();
   for (int i = 0; i < count; ++i) {
     CommandPluginBase* plugin = getPlugin(i);
     if (!plugin) throw PluginError(m_path + ": plug-in " + std::to_string(i) + " could not be made");
     m_plugins.push_back(plugin);
-    const bool initialised = plugin->initialise();
+    bool const initialised = plugin->initialise();
     collect(*plugin);
     if (!initialised) {
       throw PluginError(m_path + ": the plug-in " + plugin->getName().GetString() +
@@ -79,7 +79,7 @@ void PluginLibrary::load() {
 
 void PluginLibrary::collect(CommandPluginBase const& plugin) {
   // A command or provider that could not be made is null.
-  const std::string name = plugin.getName().GetString();
+  std::string const name = plugin.getName().GetString();
   for (int i = 0; i < plugin.getNumCommands(); ++i)
     if (Command* command = plugin.getCommand(i)) m_commands.push_back({command, name});
   for (int i = 0; i < plugin.getNumControlStreamCommands(); ++i)
@@ -104,7 +104,7 @@ void* PluginLibrary::entryPoint(char const* name) const {
 }
 
 std::string findPlugin(std::string const& programFolder) {
-  const std::filesystem::path folder(programFolder);
+  std::filesystem::path const folder(programFolder);
   std::error_code error;
   for (auto const& place : {folder / kPluginFile, folder.parent_path() / "lib" / "talix" / kPluginFile})
     if (std::filesystem::exists(place, error)) return place.string();

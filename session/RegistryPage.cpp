@@ -28,7 +28,7 @@ std::string optionText(Command const& command, CommandOption const& option) {
 
 void addCommand(CommandRegistry::Entry const& entry, bool forDevelopers, std::string& page) {
   Command& command = *entry.command;
-  const std::string name = command.getName().GetString(), syntax = argSyntax(command);
+  std::string const name = command.getName().GetString(), syntax = argSyntax(command);
   page += "\n\n### " + name + (forDevelopers ? " (for developers)" : "");
   page += "\n\n" + command.getDisplayName().GetString() + ". " + command.getPurpose().GetString();
   page += "\n\n    " + name + (syntax.empty() ? "" : " " + syntax) + "\n";
@@ -54,7 +54,7 @@ std::string registryPage(CommandRegistry const& commands,
   for (auto const& entry : commands.entries()) {
     if (entry.source != source) {
       source = entry.source;
-      const auto count = std::count_if(commands.entries().begin(), commands.entries().end(),
+      auto const count = std::count_if(commands.entries().begin(), commands.entries().end(),
                                        [&](auto const& other) { return other.source == source; });
       page += "\n\n## " + source + ": " + std::to_string(count) + " commands";
     }

@@ -11,8 +11,8 @@ namespace {
 
 // Characters, from 1: bytes that continue a UTF-8 character do not count.
 size_t columnOf(std::string_view line, size_t at) {
-  const auto continues = [](char c) { return (static_cast<unsigned char>(c) & 0xc0) == 0x80; };
-  const std::string_view before = line.substr(0, at);
+  auto const continues = [](char c) { return (static_cast<unsigned char>(c) & 0xc0) == 0x80; };
+  std::string_view const before = line.substr(0, at);
   return before.size() - static_cast<size_t>(std::count_if(before.begin(), before.end(), continues)) + 1;
 }
 
@@ -24,20 +24,20 @@ CommandOption const* findOption(Command const& command, std::string_view name) {
 
 // A value as another type, where nothing is lost.
 bool convert(Variable& value, Variable::VarType type) {
-  const Variable::VarType own = value.getType();
+  Variable::VarType const own = value.getType();
   if (own == type || type == Variable::None) return true;
   if (type == Variable::Float && own == Variable::Int) {
     value.setValue(value.getFloatValue(-1), -1);
     return true;
   }
   if (type == Variable::Int && own == Variable::Float) {
-    const double number = value.getFloatValue(-1);
+    double const number = value.getFloatValue(-1);
     if (number != std::trunc(number) || std::abs(number) > INT32_MAX) return false;
     value.setValue(static_cast<int>(number), -1);
     return true;
   }
   if (type == Variable::Bool && own == Variable::Int) {
-    const int number = value.getIntValue(-1);
+    int const number = value.getIntValue(-1);
     if (number < Variable::False || number > Variable::Toggle) return false;
     value.setValue(static_cast<Variable::BoolType>(number), -1);
     return true;
@@ -47,7 +47,7 @@ bool convert(Variable& value, Variable::VarType type) {
 
 Variable arrayOf(std::vector<Variable> const& elements) {
   if (elements.empty()) return Variable(Variable::StringArray, 0);
-  const Variable::VarType type = elements.front().getType();
+  Variable::VarType const type = elements.front().getType();
   Variable array(static_cast<Variable::VarType>(type + Variable::kArray), static_cast<int>(elements.size()));
   for (int i = 0; i < static_cast<int>(elements.size()); ++i) {
     Variable const& element = elements[static_cast<size_t>(i)];
@@ -72,7 +72,7 @@ ScriptLine::Outcome ScriptLine::read(std::string_view line, CommandRegistry cons
   m_args.clear();
   m_options.clear();
   if (!skipToToken()) return Outcome::Blank;
-  if (const size_t zero = line.find('\0'); zero != std::string_view::npos) {
+  if (size_t const zero = line.find('\0'); zero != std::string_view::npos) {
     refuse(zero, "a zero byte cannot be part of a script");
     return Outcome::Refused;
   }
@@ -105,13 +105,13 @@ bool ScriptLine::startsOption() const {
 }
 
 std::string_view ScriptLine::takeWord(bool inArray) {
-  const size_t start = m_at;
+  size_t const start = m_at;
   while (!atEnd() && !isBlank(m_line[m_at]) && !(inArray && m_line[m_at] == ']')) ++m_at;
   return m_line.substr(start, m_at - start);
 }
 
 bool ScriptLine::readOption() {
-  const std::string_view name = takeWord(false).substr(1);
+  std::string_view const name = takeWord(false).substr(1);
   CommandOption const* declared = findOption(*m_command, name);
   if (!declared) {
     m_problem = "Unknown option -" + std::string(name) + " for " + m_name;
@@ -129,8 +129,8 @@ bool ScriptLine::readOption() {
 
 bool ScriptLine::readOptionValue(CommandOption const& option, Variable& out) {
   if (!skipToToken() || startsOption()) return refuseOptionValue(option);
-  const char first = m_line[m_at];
-  const bool isWord = first != '"' && first != '\'' && first != '<' && first != '[';
+  char const first = m_line[m_at];
+  bool const isWord = first != '"' && first != '\'' && first != '<' && first != '[';
   if (isWord && option.getType() == Variable::String) {
     setText(out, takeWord(false));
     return true;
@@ -154,9 +154,9 @@ bool ScriptLine::readValue(Variable& out, bool inArray) {
 }
 
 bool ScriptLine::readWordValue(Variable& out, bool inArray) {
-  const size_t start = m_at;
-  const std::string_view text = takeWord(inArray);
-  const Word word = readWord(text);
+  size_t const start = m_at;
+  std::string_view const text = takeWord(inArray);
+  Word const word = readWord(text);
   switch (word.kind) {
     case Word::String:
       setText(out, text);
@@ -181,11 +181,11 @@ bool ScriptLine::readWordValue(Variable& out, bool inArray) {
 }
 
 bool ScriptLine::readString(Variable& out, bool inArray) {
-  const size_t start = m_at;
-  const char quote = m_line[m_at++];
+  size_t const start = m_at;
+  char const quote = m_line[m_at++];
   m_text.clear();
   while (true) {
-    const size_t end = m_line.find(quote, m_at);
+    size_t const end = m_line.find(quote, m_at);
     if (end == std::string_view::npos) return refuse(start, "a string without its closing quote");
     m_text.append(m_line, m_at, end - m_at);
     m_at = end + 1;
@@ -198,7 +198,7 @@ bool ScriptLine::readString(Variable& out, bool inArray) {
 }
 
 bool ScriptLine::readVector(Variable& out, bool inArray) {
-  const size_t start = m_at++;
+  size_t const start = m_at++;
   Vec3 vector;
   for (int i = 0; i < 3; ++i) {
     if (i > 0 && skipToToken() && m_line[m_at] == ',') ++m_at;
@@ -213,9 +213,9 @@ bool ScriptLine::readVector(Variable& out, bool inArray) {
 }
 
 bool ScriptLine::readComponent(double& out) {
-  const size_t start = m_at;
+  size_t const start = m_at;
   while (!atEnd() && !isBlank(m_line[m_at]) && m_line[m_at] != ',' && m_line[m_at] != '>') ++m_at;
-  const std::string_view text = m_line.substr(start, m_at - start);
+  std::string_view const text = m_line.substr(start, m_at - start);
   if (text.empty()) return refuse(start, "a number is expected here");
   Word word = readWord(text);
   if (word.kind == Word::IntTooLarge) {
@@ -229,10 +229,10 @@ bool ScriptLine::readComponent(double& out) {
 }
 
 bool ScriptLine::readArray(Variable& out) {
-  const size_t start = m_at++;
+  size_t const start = m_at++;
   m_elements.clear();
   while (skipToToken() && m_line[m_at] != ']') {
-    const size_t place = m_at;
+    size_t const place = m_at;
     Variable element;
     if (!readValue(element, true)) return false;
     if (!m_elements.empty() && element.getType() != m_elements.front().getType()) {

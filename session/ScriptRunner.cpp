@@ -16,7 +16,7 @@ namespace talix {
 
 bool ScriptRunner::runText(std::string_view text, std::string const& file, int firstLine) {
   for (int number = firstLine; !text.empty(); ++number) {
-    const size_t end = text.find('\n');
+    size_t const end = text.find('\n');
     if (!runLine(text.substr(0, end), file, number)) return false;
     text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
   }
@@ -83,10 +83,10 @@ void ScriptRunner::writeLogLines(LineResult const& result, std::string const& wh
 bool usesUndo(std::string_view script) {
   static constexpr std::string_view blanks = " \t\r";
   while (!script.empty()) {
-    const size_t end = std::min(script.find('\n'), script.size());
+    size_t const end = std::min(script.find('\n'), script.size());
     std::string_view line = script.substr(0, end);
     line.remove_prefix(std::min(line.find_first_not_of(blanks), line.size()));
-    const std::string_view name = line.substr(0, line.find_first_of(blanks));
+    std::string_view const name = line.substr(0, line.find_first_of(blanks));
     if (name == "undo" || name == "redo") return true;
     script.remove_prefix(std::min(end + 1, script.size()));
   }

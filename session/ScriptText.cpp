@@ -28,9 +28,9 @@ void appendFloat(double value, std::string& out) {
     out.append(text, std::to_chars(text, text + sizeof text, value, std::chars_format::scientific).ptr);
     return;
   }
-  const size_t start = out.size();
+  size_t const start = out.size();
   appendNumber(value, out);
-  const bool whole = std::string_view(out).substr(start).find_first_of(".e") == std::string_view::npos;
+  bool const whole = std::string_view(out).substr(start).find_first_of(".e") == std::string_view::npos;
   if (whole && std::isfinite(value)) out += ".0";
 }
 
@@ -74,7 +74,7 @@ void appendElement(Variable const& value, Variable::VarType type, int i, std::st
     default:
       return;
   }
-  const std::string_view text = value.getStringValue(i);
+  std::string_view const text = value.getStringValue(i);
   if (value.isArray() && needsQuotes(text)) {
     out += quotedText(text);
   } else {
@@ -91,7 +91,7 @@ bool equalsIgnoringCase(std::string_view word, std::string_view lower) {
 Word readNumber(std::string_view digits) {
   Word word;
   char const* const end = digits.data() + digits.size();
-  const auto [intEnd, intError] = std::from_chars(digits.data(), end, word.integer);
+  auto const [intEnd, intError] = std::from_chars(digits.data(), end, word.integer);
   if (intEnd == end && intError == std::errc()) {
     word.kind = Word::Int;
     return word;
@@ -100,7 +100,7 @@ Word readNumber(std::string_view digits) {
     word.kind = Word::IntTooLarge;
     return word;
   }
-  const auto [floatEnd, floatError] = std::from_chars(digits.data(), end, word.number);
+  auto const [floatEnd, floatError] = std::from_chars(digits.data(), end, word.number);
   if (floatEnd != end) return {};
   if (floatError == std::errc()) word.kind = Word::Float;
   if (floatError == std::errc::result_out_of_range) word.kind = Word::FloatOutOfRange;
@@ -118,10 +118,10 @@ Word booleanWord(Variable::BoolType value) {
 
 Word readWord(std::string_view text) {
   if (text.empty()) return {};
-  const bool sign = text.front() == '-' || text.front() == '+';
-  const std::string_view unsignedText = text.substr(sign ? 1 : 0);
+  bool const sign = text.front() == '-' || text.front() == '+';
+  std::string_view const unsignedText = text.substr(sign ? 1 : 0);
   if (unsignedText.empty()) return {};
-  const char first = unsignedText.front();
+  char const first = unsignedText.front();
   if ((first >= '0' && first <= '9') || first == '.')
     return readNumber(text.front() == '+' ? unsignedText : text);
   switch (first) {
@@ -154,7 +154,7 @@ Word readWord(std::string_view text) {
 }
 
 void appendText(Variable const& value, std::string& out) {
-  const Variable::VarType type = value.getType();
+  Variable::VarType const type = value.getType();
   if (!value.isArray()) return appendElement(value, type, -1, out);
   out += '[';
   for (int i = 0; i < value.getNumItems(); ++i) {
@@ -172,7 +172,7 @@ std::string toText(Variable const& value) {
 
 std::string quotedText(std::string_view text) {
   std::string out = "\"";
-  for (const char c : text) {
+  for (char const c : text) {
     if (c == '"') out += '"';
     out += c;
   }

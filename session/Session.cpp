@@ -33,7 +33,7 @@ class LogCollector : public LogSink {
 }  // namespace
 
 Session::Session(std::string const& plugin, Database& scene) : m_scene(scene) {
-  const SceneScope scope(m_scene);
+  SceneScope const scope(m_scene);
   if (!plugin.empty()) {
     m_plugin = std::make_unique<PluginLibrary>(plugin);
     for (PluginLibrary::Item const& item : m_plugin->commands()) m_registry.add(item.command, item.source);
@@ -48,19 +48,19 @@ Session::~Session() {
 }
 
 void Session::setAssumeYes(bool yes) {
-  const SceneScope scope(m_scene);
+  SceneScope const scope(m_scene);
   g_interface->setAsker([yes](HString const&) { return yes; });
 }
 
 void Session::setUndo(bool on) {
-  const SceneScope scope(m_scene);
+  SceneScope const scope(m_scene);
   m_scene.getUndoJournal().setEnabled(on);
 }
 
 LineResult const& Session::run(std::string_view line) {
-  const SceneScope scope(m_scene);
-  const bool keepsSteps = m_scene.getUndoJournal().isEnabled();
-  const ThrowsBadAlloc throws(keepsSteps);
+  SceneScope const scope(m_scene);
+  bool const keepsSteps = m_scene.getUndoJournal().isEnabled();
+  ThrowsBadAlloc const throws(keepsSteps);
   m_result.log.clear();
   m_result.value = Variable();
   m_result.torn = false;
@@ -77,7 +77,7 @@ LineResult const& Session::run(std::string_view line) {
 
 // The step is closed last: until then everything can be taken back.
 void Session::runStep(std::string_view line) {
-  const LogCollector collector(m_result.log);
+  LogCollector const collector(m_result.log);
   UndoJournal& journal = m_scene.getUndoJournal();
   journal.beginStep();
   m_result.outcome = guarded(line);
@@ -131,12 +131,12 @@ LineResult::Outcome Session::guarded(std::string_view line) {
 LineResult::Outcome Session::execute() {
   Command& command = *m_line.command();
   if (!command.checkArgSyntax(m_line.args(), m_line.options())) {
-    const std::string syntax = argSyntax(command);
+    std::string const syntax = argSyntax(command);
     writeLog(LogLevel::Error, "Usage: " + m_line.name() + (syntax.empty() ? "" : " " + syntax));
     return LineResult::Outcome::Failed;
   }
   warnOfExclusions();
-  const bool done = command.execute(m_line.options(), m_line.args(), m_result.value);
+  bool const done = command.execute(m_line.options(), m_line.args(), m_result.value);
   return done ? LineResult::Outcome::Done : LineResult::Outcome::Failed;
 }
 
@@ -145,7 +145,7 @@ void Session::warnOfExclusions() const {
   std::vector<CommandOption const*> given;  // each once, in the order given
   uint64 seen = 0;
   for (CommandOption const& option : m_line.options()) {
-    const uint64 bit = uint64{1} << option.getIndex();
+    uint64 const bit = uint64{1} << option.getIndex();
     if (option.getMask() != 0 && (seen & bit) == 0) given.push_back(&option);
     seen |= bit;
   }

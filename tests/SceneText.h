@@ -35,7 +35,7 @@ class SceneText {
   void writeSettings() {
     HTimeManager const& time = *m_scene.getTimeManager();
     m_out << "rate " << time.getTicksPerFrame() << " up " << m_scene.getUpAxis() << "\nranges";
-    const auto range = [this](HTimeRange const& each) {
+    auto const range = [this](HTimeRange const& each) {
       m_out << " " << each.getStart() << "-" << each.getEnd();
     };
     range(time.getPlayRange());
@@ -73,7 +73,7 @@ class SceneText {
   }
 
   void writeModule(Module const& module) {
-    const HString path = module.getFullPathString();
+    HString const path = module.getFullPathString();
     m_out << path.GetStr() << " " << name(&module) << " " << module.getRuntimeClass()->getName() << " below "
           << name(module.getParent()) << (module.isSelected() ? " selected" : "")
           << (m_scene.getModuleWithPath(path, nullptr, false) ? "" : " not found by its path")
@@ -97,7 +97,7 @@ class SceneText {
   void write(HString const& text) { m_out << text.GetStr(); }
   void write(Vec3 const& v) { m_out << v.x << " " << v.y << " " << v.z; }
   void write(Attribute::Bits const& bits) {
-    for (const bool bit : bits) m_out << bit;
+    for (bool const bit : bits) m_out << bit;
   }
   void write(TalixRotation const& rotation) {
     double q[4];
@@ -120,7 +120,7 @@ class SceneText {
   void writeChannel(Controller const& channel) {
     m_out << " " << channel.getName().GetStr() << "#" << channel.getID().getNumber() << " "
           << static_cast<int>(channel.getInterpolation()) << (channel.isLocked() ? " locked" : "");
-    for (const double value : channel.getDefaultValues()) m_out << " " << value;
+    for (double const value : channel.getDefaultValues()) m_out << " " << value;
     m_out << "\n";
     for (NLEClip* clip = m_scene.getHeadClip(); clip; clip = clip->getNext())
       for (int layer = 0; layer < clip->getNumLayers(); ++layer)
@@ -158,7 +158,7 @@ class SceneText {
 inline std::string firstDifference(std::string const& expected, std::string const& found) {
   std::istringstream a(expected), b(found);
   for (std::string one, other;;) {
-    const bool more = static_cast<bool>(std::getline(a, one)),
+    bool const more = static_cast<bool>(std::getline(a, one)),
                others = static_cast<bool>(std::getline(b, other));
     if (!more && !others) return "";
     if (!more || !others || one != other)

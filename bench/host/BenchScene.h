@@ -18,8 +18,8 @@ T* create(std::string const& name, Module* parent = nullptr) {
 inline void animate(Node* node, int frames) {
   std::vector<double> positions, rotations;
   for (int i = 0; i < frames; ++i) {
-    const double part = i * 0.01;
-    for (const double v : {part, 2 * part, 100.0}) positions.push_back(v);
+    double const part = i * 0.01;
+    for (double const v : {part, 2 * part, 100.0}) positions.push_back(v);
     double xyzw[4];
     TalixRotation(Vec3(part, 0.2, 0.1)).getQuaternion(xyzw);
     rotations.insert(rotations.end(), xyzw, xyzw + 4);

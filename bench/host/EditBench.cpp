@@ -30,7 +30,7 @@ KeyTrack curveOf(Curve curve, int64 frames) {
   std::normal_distribution<double> noise(0, curve == Curve::Noise ? 5 : 0.05);
   std::vector<double> values;
   for (int64 i = 0; i < frames; ++i) {
-    const double x = static_cast<double>(i);
+    double const x = static_cast<double>(i);
     switch (curve) {
       case Curve::Walk:
       case Curve::Noise:
@@ -96,8 +96,8 @@ void setKey(benchmark::State& state, std::vector<int64> const& order, Timed time
     auto scene = std::make_unique<Scene>(1);
     Vec3Controller* channel = scene->channel(0);
     editTimed(state, timed, [&] {
-      for (const int64 i : order) {
-        const HTimeRange range(i * period(), i * period());
+      for (int64 const i : order) {
+        HTimeRange const range(i * period(), i * period());
         channel->beginDataEdit(range);
         channel->setKey(i * period(), Vec3(static_cast<double>(i), 1, 2), KeyTrack::kAll);
         channel->endDataEdit();
@@ -115,14 +115,14 @@ TIMED_BENCHMARKS(setKeyAtRandom);
 
 // What a step of one new key, or of one that is overwritten, holds beyond the track itself.
 void bytesOfStep(benchmark::State& state, bool overwrite) {
-  const auto held = [] { return static_cast<double>(mallinfo2().uordblks); };
+  auto const held = [] { return static_cast<double>(mallinfo2().uordblks); };
   constexpr int64 kSteps = 100'000;
   for (auto _ : state) {
     double bytes[2];
-    for (const bool kept : {false, true}) {
+    for (bool const kept : {false, true}) {
       Scene scene(1);
       Vec3Controller* channel = scene.channel(0);
-      const auto setAll = [&](double value) {
+      auto const setAll = [&](double value) {
         for (int64 i = 0; i < kSteps; ++i) {
           g_db->getUndoJournal().beginStep();
           channel->setKey(i * period(), Vec3(static_cast<double>(i), value, std::sin(i)), KeyTrack::kAll);
@@ -131,7 +131,7 @@ void bytesOfStep(benchmark::State& state, bool overwrite) {
       };
       if (overwrite) setAll(1);
       g_db->getUndoJournal().setEnabled(kept);
-      const double before = held();
+      double const before = held();
       setAll(2);
       bytes[kept] = held() - before;
       g_db->getUndoJournal().setEnabled(false);
@@ -146,14 +146,14 @@ BENCHMARK_CAPTURE(bytesOfStep, overwritten, true)->Unit(benchmark::kMillisecond)
 // A tenth of the keys of every marker, in 20 ranges.
 void cutKeyRanges(benchmark::State& state, Timed timed) {
   Scene scene(kMarkers);
-  const KeyTrack walk = curveOf(Curve::Walk, kTakeFrames);
+  KeyTrack const walk = curveOf(Curve::Walk, kTakeFrames);
   for (auto _ : state) {
     state.PauseTiming();
     scene.fill(walk);
     editTimed(state, timed, [&] {
       for (int m = 0; m < kMarkers; ++m)
         for (int64 first = 0; first < kTakeFrames; first += 1000) {
-          const HTimeRange range(first * period(), (first + 99) * period());
+          HTimeRange const range(first * period(), (first + 99) * period());
           scene.channel(m)->beginDataEdit(range);
           scene.channel(m)->deleteKeys(range, KeyTrack::kAll, false);
           scene.channel(m)->endDataEdit();
@@ -167,9 +167,9 @@ TIMED_BENCHMARKS(cutKeyRanges);
 
 void reduceTake(benchmark::State& state, Curve curve, Interpolation interpolation) {
   Scene scene(kMarkers);
-  const KeyTrack original = curveOf(curve, kTakeFrames);
+  KeyTrack const original = curveOf(curve, kTakeFrames);
   for (int m = 0; m < kMarkers; ++m) scene.channel(m)->setInterpType(static_cast<int>(interpolation));
-  const HTimeRange all[] = {HTimeRange::forever()};
+  HTimeRange const all[] = {HTimeRange::forever()};
   int64 removed = 0;
   for (auto _ : state) {
     state.PauseTiming();
@@ -189,8 +189,8 @@ BENCHMARK_CAPTURE(reduceTake, rest, Curve::Rest, Interpolation::Linear)->Unit(be
 
 // The decision alone, on long curves: near-linear whatever the curve.
 void redundantKeys(benchmark::State& state, Curve curve, Interpolation interpolation) {
-  const int64 n = state.range(0);
-  const KeyTrack track = curveOf(curve, n);
+  int64 const n = state.range(0);
+  KeyTrack const track = curveOf(curve, n);
   for (auto _ : state)
     benchmark::DoNotOptimize(
         redundantKeys(track, {.interpolation = interpolation, .tolerance = 0.5, .framePeriod = period()}));

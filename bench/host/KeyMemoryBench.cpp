@@ -17,7 +17,7 @@ KeyTrack walkingMarker(unsigned seed) {
   std::uniform_real_distribution<double> any(0.5, 1.5);
   std::normal_distribution<double> noise(0, 0.03);
   double parts[3][3][2];  // by component and part: size and speed
-  const double sizes[] = {1500, 40, 120}, speeds[] = {0.03, 0.4, 6};
+  double const sizes[] = {1500, 40, 120}, speeds[] = {0.03, 0.4, 6};
   for (auto& component : parts)
     for (int i = 0; i < 3; ++i)
       component[i][0] = sizes[i] * any(random), component[i][1] = speeds[i] * any(random);
@@ -25,7 +25,7 @@ KeyTrack walkingMarker(unsigned seed) {
   std::vector<double> values;
   values.reserve(static_cast<size_t>(kHourFrames * 3));
   for (int64 frame = 0; frame < kHourFrames; ++frame) {
-    const double seconds = static_cast<double>(frame) / 120;
+    double const seconds = static_cast<double>(frame) / 120;
     for (auto const& component : parts) {
       double value = noise(random);
       for (auto const& [size, speed] : component) value += size * std::sin(speed * seconds);
@@ -47,7 +47,7 @@ void thinHour(benchmark::State& state, LostOf lostOf) {
       KeyTrack track = walkingMarker(marker);
       bytesBefore += static_cast<double>(track.memoryUse());
       keysBefore += static_cast<double>(track.count());
-      const std::vector<unsigned char> lost = lostOf(track);
+      std::vector<unsigned char> const lost = lostOf(track);
       state.ResumeTiming();
       track.thin(lost);
       bytesAfter += static_cast<double>(track.memoryUse());

@@ -37,11 +37,11 @@ std::vector<double> curveValues() {
 }
 
 KeyTrack makeCurve(Shape shape, Spacing kind) {
-  const std::vector<int64> times = curveTimes(kind);
-  const std::vector<double> values = curveValues();
+  std::vector<int64> const times = curveTimes(kind);
+  std::vector<double> const values = curveValues();
   KeyTrack track(shape);
   for (size_t i = 0; i < times.size(); ++i) {
-    const double v = values[i], half = v / 4000;
+    double const v = values[i], half = v / 4000;
     if (shape == Shape::Rotation) {
       track.set(times[i], {0, 0, std::sin(half), std::cos(half)});
     } else {
@@ -62,13 +62,13 @@ static_assert(sizeof(PlainKey) == 40);
 class PlainCurve {
  public:
   explicit PlainCurve(Spacing kind) {
-    const std::vector<int64> times = curveTimes(kind);
-    const std::vector<double> values = curveValues();
+    std::vector<int64> const times = curveTimes(kind);
+    std::vector<double> const values = curveValues();
     for (size_t i = 0; i < times.size(); ++i)
       m_keys.push_back({times[i], static_cast<float>(values[i]), 0, 0, {}});
     for (size_t i = 1; i + 1 < m_keys.size(); ++i) {
       PlainKey& key = m_keys[i];
-      const PlainKey &before = m_keys[i - 1], &after = m_keys[i + 1];
+      PlainKey const &before = m_keys[i - 1], &after = m_keys[i + 1];
       key.slopeIn = key.slopeOut =
           (after.value - before.value) / static_cast<float>(after.time - before.time);
     }
@@ -79,10 +79,10 @@ class PlainCurve {
     if (time < m_keys[cursor].time) cursor = 0;
     while (cursor + 1 < m_keys.size() && m_keys[cursor + 1].time <= time) ++cursor;
     if (cursor + 1 == m_keys.size()) return m_keys[cursor].value;
-    const PlainKey &a = m_keys[cursor], &b = m_keys[cursor + 1];
-    const auto length = static_cast<float>(b.time - a.time);
-    const float u = static_cast<float>(time - a.time) / length, d = b.value - a.value;
-    const float m0 = a.slopeOut * length, m1 = b.slopeIn * length;
+    PlainKey const &a = m_keys[cursor], &b = m_keys[cursor + 1];
+    auto const length = static_cast<float>(b.time - a.time);
+    float const u = static_cast<float>(time - a.time) / length, d = b.value - a.value;
+    float const m0 = a.slopeOut * length, m1 = b.slopeIn * length;
     return a.value + u * (m0 + u * ((3 * d - 2 * m0 - m1) + u * (m0 + m1 - 2 * d)));
   }
 
@@ -91,7 +91,7 @@ class PlainCurve {
 };
 
 void readPlainArray(benchmark::State& state, Spacing kind, int64 step) {
-  const PlainCurve curve(kind);
+  PlainCurve const curve(kind);
   std::vector<double> out(kReadBlock);
   size_t cursor = 0;
   int64 time = 0;
@@ -107,8 +107,8 @@ void readPlainArray(benchmark::State& state, Spacing kind, int64 step) {
 }
 
 void readSingly(benchmark::State& state, Shape shape, Interpolation interpolation, Spacing kind, int64 step) {
-  const KeyTrack track = makeCurve(shape, kind);
-  const int64 end = track.timeAt(kCurveKeys - 1);
+  KeyTrack const track = makeCurve(shape, kind);
+  int64 const end = track.timeAt(kCurveKeys - 1);
   std::vector<KeyTrack::Values> out(kReadBlock);
   KeyTrack::Cursor cursor;
   int64 time = 0;
@@ -124,8 +124,8 @@ void readSingly(benchmark::State& state, Shape shape, Interpolation interpolatio
 }
 
 void readBlocks(benchmark::State& state, Shape shape, Interpolation interpolation, Spacing kind, int64 step) {
-  const KeyTrack track = makeCurve(shape, kind);
-  const int64 end = track.timeAt(kCurveKeys - 1);
+  KeyTrack const track = makeCurve(shape, kind);
+  int64 const end = track.timeAt(kCurveKeys - 1);
   std::vector<double> out(static_cast<size_t>(kReadBlock * track.width()));
   int64 time = 0;
   for (auto _ : state) {

@@ -28,8 +28,8 @@ KeyTrack makeTrack(int64 keys) {
 }
 
 void appendBulk(benchmark::State& state) {
-  const int64 n = state.range(0);
-  const std::vector<double> values = randomValues(n * 3);
+  int64 const n = state.range(0);
+  std::vector<double> const values = randomValues(n * 3);
   for (auto _ : state) {
     KeyTrack track(KeyTrack::Shape::Vector);
     track.append(0, kPeriod, values.data(), n);
@@ -40,12 +40,12 @@ void appendBulk(benchmark::State& state) {
 BENCHMARK(appendBulk)->Arg(20'000)->Arg(kMillion)->Unit(benchmark::kMillisecond);
 
 void appendSingly(benchmark::State& state) {
-  const int64 n = state.range(0);
+  int64 const n = state.range(0);
   int64 bytes = 0;
   for (auto _ : state) {
     KeyTrack track(KeyTrack::Shape::Vector);
     for (int64 i = 0; i < n; ++i) {
-      const double v = static_cast<double>(i) / 7;
+      double const v = static_cast<double>(i) / 7;
       track.set(i * kPeriod, {v, v + 1, v + 2});
     }
     bytes = track.memoryUse();
@@ -56,12 +56,12 @@ void appendSingly(benchmark::State& state) {
 BENCHMARK(appendSingly)->Arg(20'000)->Arg(kMillion)->Unit(benchmark::kMillisecond);
 
 void insertInRandomOrder(benchmark::State& state) {
-  const std::vector<int64> order = shuffled(state.range(0));
+  std::vector<int64> const order = shuffled(state.range(0));
   int64 bytes = 0;
   for (auto _ : state) {
     KeyTrack track(KeyTrack::Shape::Vector);
-    for (const int64 i : order) {
-      const double v = static_cast<double>(i) / 7;
+    for (int64 const i : order) {
+      double const v = static_cast<double>(i) / 7;
       track.set(i * kPeriod, {v, v + 1, v + 2});
     }
     bytes = track.memoryUse();
@@ -72,8 +72,8 @@ void insertInRandomOrder(benchmark::State& state) {
 BENCHMARK(insertInRandomOrder)->Arg(20'000)->Arg(kMillion)->Unit(benchmark::kMillisecond);
 
 void findAtRandom(benchmark::State& state) {
-  const KeyTrack track = makeTrack(state.range(0));
-  const std::vector<int64> order = shuffled(state.range(0));
+  KeyTrack const track = makeTrack(state.range(0));
+  std::vector<int64> const order = shuffled(state.range(0));
   size_t i = 0;
   for (auto _ : state) {
     benchmark::DoNotOptimize(track.find(order[i] * kPeriod));
@@ -87,17 +87,17 @@ enum class From { Front, Back, Random };
 
 // Deletes all keys by index, one after the other.
 void deleteSingly(benchmark::State& state, From from) {
-  const int64 n = state.range(0);
-  const KeyTrack original = makeTrack(n);
+  int64 const n = state.range(0);
+  KeyTrack const original = makeTrack(n);
   std::vector<int64> indices;  // made beforehand
   std::mt19937_64 random(7);
   for (int64 left = n; left > 0; --left) {
-    const int64 any = static_cast<int64>(random() % static_cast<uint64>(left));
+    int64 const any = static_cast<int64>(random() % static_cast<uint64>(left));
     indices.push_back(from == From::Front ? 0 : from == From::Back ? left - 1 : any);
   }
   for (auto _ : state) {
     KeyTrack track = original;
-    for (const int64 index : indices) track.erase(index);
+    for (int64 const index : indices) track.erase(index);
     benchmark::DoNotOptimize(track.empty());
   }
   state.SetItemsProcessed(state.iterations() * n);
@@ -118,8 +118,8 @@ BENCHMARK(selectAndDeselectAll)->Arg(20'000)->Arg(kMillion)->Unit(benchmark::kMi
 
 // A snapshot and the erasure of the middle half, as an undoable cut does it.
 void eraseHalf(benchmark::State& state) {
-  const int64 n = state.range(0);
-  const KeyTrack original = makeTrack(n);
+  int64 const n = state.range(0);
+  KeyTrack const original = makeTrack(n);
   for (auto _ : state) {
     KeyTrack track = original;
     benchmark::DoNotOptimize(track.eraseRange(n / 4 * kPeriod, n / 4 * 3 * kPeriod));
@@ -129,7 +129,7 @@ BENCHMARK(eraseHalf)->Arg(20'000)->Arg(kMillion)->Unit(benchmark::kMicrosecond);
 
 void evaluateForward(benchmark::State& state, KeyTrack::Shape shape, Interpolation interpolation,
                      int64 step) {
-  const int64 n = state.range(0), end = n * kPeriod;
+  int64 const n = state.range(0), end = n * kPeriod;
   KeyTrack track(shape);
   std::vector<double> values = randomValues(n * track.width());
   if (shape == KeyTrack::Shape::Rotation)
@@ -162,8 +162,8 @@ BENCHMARK_CAPTURE(evaluateForward, slerp, kRotation, Interpolation::Linear, kPer
 BENCHMARK_CAPTURE(evaluateForward, squad, kRotation, Interpolation::Cubic, kPeriod / 3)->Arg(20'000);
 
 void evaluateAtRandom(benchmark::State& state) {
-  const KeyTrack track = makeTrack(state.range(0));
-  const std::vector<int64> order = shuffled(state.range(0));
+  KeyTrack const track = makeTrack(state.range(0));
+  std::vector<int64> const order = shuffled(state.range(0));
   KeyTrack::Values out{};
   size_t i = 0;
   for (auto _ : state) {
@@ -179,7 +179,7 @@ enum class Seen { All, WithGaps, Thinned };
 
 // Going through the runs of frames with data.
 void findData(benchmark::State& state, Seen seen) {
-  const int64 n = state.range(0);
+  int64 const n = state.range(0);
   KeyTrack track = makeTrack(n);
   for (int64 i = 900; seen == Seen::WithGaps && i < n; i += 1000)
     track.eraseRange(i * kPeriod, (i + 9) * kPeriod);

@@ -30,7 +30,7 @@ std::vector<Node*> skeleton(int frames, int period) {
 void parentAdjust(benchmark::State& state) {
   for (auto _ : state) {
     state.PauseTiming();
-    const std::vector<Node*> bones =
+    std::vector<Node*> const bones =
         skeleton(static_cast<int>(state.range(0)), static_cast<int>(state.range(1)));
     state.ResumeTiming();
     for (size_t i = bones.size(); i-- > 1;) {

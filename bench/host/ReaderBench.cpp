@@ -25,14 +25,14 @@ std::vector<Node const*> chainsOfTen() {
 }
 
 void readWorldPositions(benchmark::State& state) {
-  const std::vector<Node const*> bones = chainsOfTen();
-  const SceneReader reader(bones, g_db->getActiveClip());
+  std::vector<Node const*> const bones = chainsOfTen();
+  SceneReader const reader(bones, g_db->getActiveClip());
   std::vector<double> positions(3 * bones.size() * kReadFrames);
-  const auto threads = static_cast<int64>(state.range(0));
+  auto const threads = static_cast<int64>(state.range(0));
   for (auto _ : state) {
     std::vector<std::thread> others;
-    const auto read = [&](int64 part) {
-      const int64 first = kReadFrames * part / threads, last = kReadFrames * (part + 1) / threads;
+    auto const read = [&](int64 part) {
+      int64 const first = kReadFrames * part / threads, last = kReadFrames * (part + 1) / threads;
       SceneReader::Arrays arrays;
       arrays.positions = positions.data() + 3 * bones.size() * static_cast<size_t>(first);
       reader.readWorld(SampleTimes(first * kFrame, kFrame, last - first), arrays);
@@ -52,7 +52,7 @@ BENCHMARK(readWorldPositions)
     ->Unit(benchmark::kMillisecond);
 
 void makeReader(benchmark::State& state) {
-  const std::vector<Node const*> bones = chainsOfTen();
+  std::vector<Node const*> const bones = chainsOfTen();
   for (auto _ : state) benchmark::DoNotOptimize(SceneReader(bones, g_db->getActiveClip()).getNumNodes());
 }
 BENCHMARK(makeReader)->Unit(benchmark::kMicrosecond);

@@ -34,12 +34,12 @@ std::vector<Node*> skeletons(int frames) {
 
 void worldPositions(benchmark::State& state, bool forward) {
   constexpr int kFrames = 300;
-  const std::vector<Node*> bones = skeletons(kFrames);
+  std::vector<Node*> const bones = skeletons(kFrames);
   std::vector<int64> times;
   for (int i = 0; i < kFrames; ++i) times.push_back(i * kFrame);
   if (!forward) std::shuffle(times.begin(), times.end(), std::mt19937(1));
   for (auto _ : state)
-    for (const int64 time : times)
+    for (int64 const time : times)
       for (Node const* bone : bones) benchmark::DoNotOptimize(bone->getWSPos(time));
   state.SetItemsProcessed(state.iterations() * kFrames * static_cast<int64>(bones.size()));
 }
@@ -50,7 +50,7 @@ BENCHMARK(worldPositionsJumping)->Unit(benchmark::kMillisecond);
 
 // Reading again at one time, and after one bone high up has moved.
 void worldPositionsCached(benchmark::State& state) {
-  const std::vector<Node*> bones = skeletons(300);
+  std::vector<Node*> const bones = skeletons(300);
   for (auto _ : state)
     for (Node const* bone : bones) benchmark::DoNotOptimize(bone->getWSPos(0));
   state.SetItemsProcessed(state.iterations() * static_cast<int64>(bones.size()));
@@ -58,7 +58,7 @@ void worldPositionsCached(benchmark::State& state) {
 BENCHMARK(worldPositionsCached);
 
 void worldPositionsAfterAnEdit(benchmark::State& state) {
-  const std::vector<Node*> bones = skeletons(300);
+  std::vector<Node*> const bones = skeletons(300);
   double x = 0;
   for (auto _ : state) {
     bones[0]->setLocalPos(0, {x += 1, 0, 0});
@@ -81,7 +81,7 @@ std::vector<Module*> manyModules(int count) {
   g_db->newScene();
   std::vector<Module*> modules;
   for (Module* subject = nullptr; static_cast<int>(modules.size()) < count;) {
-    const size_t i = modules.size() % 100;
+    size_t const i = modules.size() % 100;
     Module* module = i == 0   ? subject = create<Character>("Subject")
                      : i < 10 ? create<AnalogDevice>("group" + std::to_string(i), subject)
                               : create<AnalogDevice>("part" + std::to_string(i / 10),

@@ -8,13 +8,13 @@ namespace {
 
 // The first of 60 bones is turned at a frame, and the last one's place in the world is asked for.
 void turnAndAsk(benchmark::State& state) {
-  const auto frames = static_cast<int>(state.range(0));
+  auto const frames = static_cast<int>(state.range(0));
   Node const* last = chain(60, frames);
   auto* first = static_cast<Node*>(g_db->getModuleWithPath("bone0", nullptr, false));
   int64 frame = 0;
   for (auto _ : state) {
     frame = (frame + 1) % frames;
-    const int64 time = frame * kFrame;
+    int64 const time = frame * kFrame;
     first->beginDataEdit(HTimeRange(time - 1, time + 1));
     first->setWSRot(time, TalixRotation(Vec3(0, 0.001 * static_cast<double>(frame), 0.1)));
     first->endDataEdit();
@@ -26,7 +26,7 @@ BENCHMARK(turnAndAsk)->Arg(300)->Arg(3000);
 
 // The deviation over all frames, of the two ends of a chain of 60 bones and of two markers.
 void distances(benchmark::State& state, bool deep, bool mustHaveKeys) {
-  const auto frames = static_cast<int>(state.range(0));
+  auto const frames = static_cast<int>(state.range(0));
   Node const* a = chain(deep ? 60 : 1, frames);
   Node* b = deep ? static_cast<Node*>(g_db->getModuleWithPath("bone0", nullptr, false)) : create<Node>("b");
   if (!deep) animate(b, frames);

@@ -19,7 +19,7 @@ constexpr size_t kFileSize = 32 << 20;
 // text.
 class TempFile {
  public:
-  TempFile(const std::string& suffix, const std::string& content)
+  TempFile(std::string const& suffix, std::string const& content)
       : m_path(std::filesystem::temp_directory_path() / ("bench" + std::to_string(::getpid()) + suffix)) {
     std::ofstream(m_path, std::ios::binary) << content;
   }
@@ -30,7 +30,7 @@ class TempFile {
   std::filesystem::path m_path;
 };
 
-std::string row(std::mt19937& random, int values, double range, const char* format) {
+std::string row(std::mt19937& random, int values, double range, char const* format) {
   std::uniform_real_distribution<double> value(-range, range);
   std::string text;
   char number[32];
@@ -68,21 +68,21 @@ std::string trcText() {
   return text;
 }
 
-void countBytes(benchmark::State& state, const std::string& path) {
+void countBytes(benchmark::State& state, std::string const& path) {
   state.SetBytesProcessed(state.iterations() * static_cast<int64>(std::filesystem::file_size(path)));
 }
 
 void readBvh(benchmark::State& state) {
-  static const TempFile file(".bvh", bvhText());
+  static TempFile const file(".bvh", bvhText());
   for (auto _ : state) benchmark::DoNotOptimize(talix::readBVH(file.path()).joints.data());
   countBytes(state, file.path());
 }
 BENCHMARK(readBvh)->Unit(benchmark::kMillisecond);
 
 void writeBvh(benchmark::State& state) {
-  static const TempFile file(".in.bvh", bvhText());
-  static const TempFile out(".out.bvh", "");
-  const Take take = talix::readBVH(file.path());
+  static TempFile const file(".in.bvh", bvhText());
+  static TempFile const out(".out.bvh", "");
+  Take const take = talix::readBVH(file.path());
   for (auto _ : state) {
     std::vector<talix::TakeNote> notes;
     talix::writeBVH(take, out.path(), notes);
@@ -92,7 +92,7 @@ void writeBvh(benchmark::State& state) {
 BENCHMARK(writeBvh)->Unit(benchmark::kMillisecond);
 
 void readTrc(benchmark::State& state) {
-  static const TempFile file(".trc", trcText());
+  static TempFile const file(".trc", trcText());
   for (auto _ : state) benchmark::DoNotOptimize(talix::readTRC(file.path()).points.data());
   countBytes(state, file.path());
 }

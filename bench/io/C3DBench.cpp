@@ -18,14 +18,14 @@ Take longTake() {
   take.rate = 100;
   take.firstFrame = 1;
   take.frameCount = kFrames;
-  const int64 period = ticksPerFrameAt(take.rate);
+  int64 const period = ticksPerFrameAt(take.rate);
   std::vector<double> values(3 * kFrames);
   for (int64 p = 0; p < kPoints; ++p) {
     for (size_t i = 0; i < values.size(); ++i)
       values[i] = 1000 * std::sin(0.001 * static_cast<double>(i) + static_cast<double>(p));
     TakePoint point;
     point.label = "M" + std::to_string(p);
-    const int64 seen = kFrames / 2 - 20;
+    int64 const seen = kFrames / 2 - 20;
     point.positions.append(period, period, values.data(), seen);
     point.positions.append((kFrames / 2 + 1) * period, period, values.data(), kFrames / 2);
     take.points.push_back(std::move(point));
@@ -45,20 +45,20 @@ struct LongFile {
   ~LongFile() { std::filesystem::remove_all(path.parent_path()); }
 };
 
-void readFile(benchmark::State& state, const std::string& path) {
+void readFile(benchmark::State& state, std::string const& path) {
   for (auto _ : state) benchmark::DoNotOptimize(readC3D(path));
   state.SetBytesProcessed(state.iterations() * static_cast<int64>(std::filesystem::file_size(path)));
 }
 
 void readLongC3D(benchmark::State& state) {
-  static const LongFile file;
+  static LongFile const file;
   readFile(state, file.path.string());
 }
 BENCHMARK(readLongC3D)->Unit(benchmark::kMillisecond);
 
 void writeLongC3D(benchmark::State& state) {
-  const LongFile file;
-  const Take take = longTake();
+  LongFile const file;
+  Take const take = longTake();
   for (auto _ : state) {
     std::vector<TakeNote> notes;
     writeC3D(take, file.path.string(), notes);
@@ -67,7 +67,7 @@ void writeLongC3D(benchmark::State& state) {
 }
 BENCHMARK(writeLongC3D)->Unit(benchmark::kMillisecond);
 
-void readTrial(benchmark::State& state, const char* name) {
+void readTrial(benchmark::State& state, char const* name) {
   readFile(state, std::string(TALIX_TEST_DATA) + "/" + name);
 }
 BENCHMARK_CAPTURE(readTrial, IntelInteger, "walkset_a_le_int.c3d")->Unit(benchmark::kMicrosecond);

@@ -9,7 +9,7 @@ namespace {
 
 // As turnAndAsk, by lines: a step of the time, a turn, a question.
 void turnAndAskByLine(benchmark::State& state) {
-  const auto frames = static_cast<int>(state.range(0));
+  auto const frames = static_cast<int>(state.range(0));
   talix::Session session(TALIX_PLUGIN);
   chain(60, frames);
   int frame = 0;

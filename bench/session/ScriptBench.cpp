@@ -39,7 +39,7 @@ class Fixture {
 };
 
 void runLines(benchmark::State& state, std::vector<std::string> const& lines, Timed timed) {
-  const std::string count = " " + std::to_string(lines.size());
+  std::string const count = " " + std::to_string(lines.size());
   for (auto _ : state) {
     state.PauseTiming();
     auto fixture = std::make_unique<Fixture>();
@@ -59,7 +59,7 @@ void runLines(benchmark::State& state, std::vector<std::string> const& lines, Ti
 
 std::vector<std::string> setKeyLines(std::vector<int64> const& order) {
   std::vector<std::string> lines;
-  for (const int64 i : order)
+  for (int64 const i : order)
     lines.push_back("setKey Translation " + std::to_string(i) + ".5 1 2 -t " + std::to_string(i));
   return lines;
 }

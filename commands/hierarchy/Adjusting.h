@@ -13,8 +13,8 @@ struct Adjusting {
   // The options as given to a command.
   template <class Cmd>
   static Adjusting from(Given const& given) {
-    const GivenOptions options(given);
-    const bool only = options.has(Cmd::info.option("adjustOnly"));
+    GivenOptions const options(given);
+    bool const only = options.has(Cmd::info.option("adjustOnly"));
     return {only || options.has(Cmd::info.option("adjust")), !only,
             options.has(Cmd::info.option("showProgress")), options.has(Cmd::info.option("ranges"))};
   }

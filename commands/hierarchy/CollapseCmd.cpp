@@ -57,7 +57,7 @@ void CollapseCmd::copyData(Module const* source, Module* target) {
 void CollapseCmd::copyHierarchy(Module* source, Module* target) {
   std::vector<std::pair<Module*, Module*>> open{{source, target}};
   while (!open.empty()) {
-    const auto [from, to] = open.back();
+    auto const [from, to] = open.back();
     open.pop_back();
     if (from->getName() == to->getName()) copyData(from, to);
 
@@ -69,7 +69,7 @@ void CollapseCmd::copyHierarchy(Module* source, Module* target) {
     }
     for (int i = from->getNumNodeChildren(); i-- > 0;) {
       Module* child = from->getNodeChild(i);
-      const auto partner = partners.find({child->getName().GetString(), child->getRuntimeClass()});
+      auto const partner = partners.find({child->getName().GetString(), child->getRuntimeClass()});
       if (partner != partners.end()) open.emplace_back(child, partner->second);
     }
   }

@@ -27,13 +27,13 @@ Module* findModule(HString const& name) {
 
 // The channel that "module.plug" names. Without one logs why and returns null.
 Controller* findPlug(HString const& text) {
-  const int dot = text.ReverseFind('.');
+  int const dot = text.ReverseFind('.');
   if (dot < 0) {
     Command::logError("No I/O plug specified for module %s", text.GetStr());
     return nullptr;
   }
-  const HString path = text.Left(static_cast<uint64>(dot));
-  const HString plug = text.Right(static_cast<uint64>(text.GetLength() - dot - 1));
+  HString const path = text.Left(static_cast<uint64>(dot));
+  HString const plug = text.Right(static_cast<uint64>(text.GetLength() - dot - 1));
   Module const* module = findModule(path);
   if (!module) {
     Command::logError("Module %s does not exist", path.GetStr());
@@ -45,15 +45,15 @@ Controller* findPlug(HString const& text) {
 }
 
 bool CopyDataCmd::execute(Given const&, Args const& args, Variable&) {
-  const HString from = args[0].getStringValue(-1);
+  HString const from = args[0].getStringValue(-1);
   Controller const* source = findPlug(from);
   if (!source) return false;
   bool copied = false;
   for (int i = 1; i < args.getCount(); ++i) {
-    const HString to = args[i].getStringValue(-1);
+    HString const to = args[i].getStringValue(-1);
     Controller* destination = findPlug(to);
     if (!destination) return false;
-    const DataEdit edit(*destination);
+    DataEdit const edit(*destination);
     if (destination->copyFrom(source, true, false))
       copied = true;
     else

@@ -69,7 +69,7 @@ bool adjust(Adjusting const& adjusting, Module* module, Node* target) {
 }
 
 bool ParentCmd::execute(Given const& given, Args const&, Variable&) {
-  const int count = g_db->getNumSelectedModules();
+  int const count = g_db->getNumSelectedModules();
   if (count < 2) {
     logError("Must have at least 2 Modules selected");
     return false;
@@ -79,7 +79,7 @@ bool ParentCmd::execute(Given const& given, Args const&, Variable&) {
     logError("No primary selected Module.");
     return false;
   }
-  const Adjusting adjusting = Adjusting::from<ParentCmd>(given);
+  Adjusting const adjusting = Adjusting::from<ParentCmd>(given);
   Node* target = objectAs<Node>(parent) ? static_cast<Node*>(parent) : parent->getNodeParent();
 
   // kept: without adjusting no task is pushed, yet one is moved and popped at the end; and whoever returns
@@ -92,7 +92,7 @@ bool ParentCmd::execute(Given const& given, Args const&, Variable&) {
     logWarning("Can't use -showProgress flag without -adjust flag. Ignoring");
   }
 
-  const MotionScope motion(*g_db);
+  MotionScope const motion(*g_db);
   for (int i = 0; i < count; ++i) {
     Module* module = g_db->getSelectedModule(i);
     if (module == parent) continue;

@@ -33,16 +33,16 @@ bool adjust(Adjusting const& adjusting, Module* module) {
 }
 
 bool UnparentCmd::execute(Given const& given, Args const&, Variable&) {
-  const int count = g_db->getNumSelectedModules();
+  int const count = g_db->getNumSelectedModules();
   if (count < 1) {
     logError("No modules selected");
     return false;
   }
-  const Adjusting adjusting = Adjusting::from<UnparentCmd>(given);
+  Adjusting const adjusting = Adjusting::from<UnparentCmd>(given);
   // kept: whoever returns early leaves the task pushed.
   if (adjusting.showProgress) g_theOperationStack.pushTask(0, g_db->getNumSelectedNodes(), 0, 1, true, "");
 
-  const MotionScope motion(*g_db);
+  MotionScope const motion(*g_db);
   for (int i = 0; i < count; ++i) {
     Module* module = g_db->getSelectedModule(i);
     Module* parent = module->getParent();

@@ -49,9 +49,9 @@ class KeyCopy {
     }
     HTimeManager const* time = HTimeManager::getInstance();
     for (int i = 0, ranges = time->getNumSelectedRanges(); i < ranges; ++i) {
-      const HTimeRange range = time->getSelectedTimeRange(i);
-      const int64 last = track->lowerBound(range.getEnd() + 1);
-      const bool goesOn = i + 1 < ranges && last < track->count() &&
+      HTimeRange const range = time->getSelectedTimeRange(i);
+      int64 const last = track->lowerBound(range.getEnd() + 1);
+      bool const goesOn = i + 1 < ranges && last < track->count() &&
                           time->getSelectedTimeRange(i + 1).contains(track->timeAt(last));
       addKeys(*track, track->lowerBound(range.getStart()), last, goesOn);
     }
@@ -63,7 +63,7 @@ class KeyCopy {
   void addKeys(KeyTrack const& track, int64 first, int64 last, bool goesOn) {
     int64 index = first;
     track.forEach(first, last, [&](KeyTrack::Key const& key) {
-      const bool nextToo = index + 1 < last || goesOn;
+      bool const nextToo = index + 1 < last || goesOn;
       if (m_choice != Choice::selected) add(key, nextToo ? dataAfter(track, key) : 0);
       if (m_choice == Choice::selected && key.selected) add(key, bridgesToSelected(track, index, key));
       ++index;
@@ -78,8 +78,8 @@ class KeyCopy {
   }
   static unsigned bridgesToSelected(KeyTrack const& track, int64 index, KeyTrack::Key const& key) {
     unsigned kept = 0;
-    for (const unsigned component : {1u, 2u, 4u})
-      if (const int64 next = key.bridges & component ? track.nextHolding(index, component) : -1; next >= 0)
+    for (unsigned const component : {1u, 2u, 4u})
+      if (int64 const next = key.bridges & component ? track.nextHolding(index, component) : -1; next >= 0)
         kept |= component & track.at(next).selected;
     return kept;
   }
@@ -148,7 +148,7 @@ bool CopyKeysCmd::execute(Given const& given, Args const&, Variable& result) {
   ClipboardManager* clipboard = g_db->getClipboardManager();
   clipboard->startClipboardCopy(ClipboardManager::ControllerData, clipboardTypeOf(channel),
                                 channel ? rotationOrderOf(*channel->getModule()) : TalixRotation::XYZ);
-  const int count = channel ? KeyCopy(*channel, choice).run() : 0;
+  int const count = channel ? KeyCopy(*channel, choice).run() : 0;
   clipboard->finishClipboardCopy(true);
   logInfo("Copied %d keys to clipboard", count);
   return answer(result, count);

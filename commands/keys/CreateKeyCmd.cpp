@@ -20,14 +20,14 @@ class CreateKeyCmd final : public ScriptCommand<CreateKeyCmd> {
 
 // The components that an active property selects: all when it names all, else the first that it names.
 unsigned selectedMask(unsigned id) {
-  const unsigned bits = id >> 28 & 7;
+  unsigned const bits = id >> 28 & 7;
   return bits == 7 ? bits : bits & ~(bits - 1);
 }
 
 // The key is whole; it is left selected on the mask.
 void keyAt(Controller& channel, int64 time, unsigned mask) {
-  const HTimeRange range(time - 1, time + 1);
-  const DataEdit edit(channel, range);
+  HTimeRange const range(time - 1, time + 1);
+  DataEdit const edit(channel, range);
   Controller::Values value;
   channel.evaluateLayer(time, value);  // so that all layers together stay as they are
   channel.writeKeyAt(time, value, 7);
@@ -35,10 +35,10 @@ void keyAt(Controller& channel, int64 time, unsigned mask) {
 }
 
 bool CreateKeyCmd::execute(Given const&, Args const&, Variable&) {
-  const int64 now = HTimeManager::getInstance()->getTime();
+  int64 const now = HTimeManager::getInstance()->getTime();
   for (int i = 0; i < g_db->getNumSelectedModules(); ++i) {
     for (int k = 0; k < g_db->getNumActiveProperties(); ++k) {
-      const unsigned id = g_db->getActiveProperty(k), mask = selectedMask(id);
+      unsigned const id = g_db->getActiveProperty(k), mask = selectedMask(id);
       Controller* channel = g_db->getSelectedModule(i)->getProperty(id);
       if (mask && channel && channel->isEditable() && !channel->hasKeyAt(now)) keyAt(*channel, now, mask);
     }

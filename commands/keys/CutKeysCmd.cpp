@@ -29,12 +29,12 @@ class KeyCut {
 
   void cut(Module const& module) {
     for (int i = 0; i < g_db->getNumActiveProperties(); ++i) {
-      const unsigned id = g_db->getActiveProperty(i);
+      unsigned const id = g_db->getActiveProperty(i);
       Controller* channel = module.getProperty(id);
       if (!channel || channel->getNumKeys() == 0 || !channel->isEditable()) continue;
-      const unsigned mask = componentMask(id);
+      unsigned const mask = componentMask(id);
       // Keys of rotations go whole.
-      const unsigned lost = objectAs<RotController>(channel) ? KeyTrack::kAll : mask;
+      unsigned const lost = objectAs<RotController>(channel) ? KeyTrack::kAll : mask;
       m_all      ? cutAll(*channel, mask, lost)
       : m_ranges ? cutRanges(*channel, lost)
                  : cutSelected(*channel, mask, lost);
@@ -50,7 +50,7 @@ class KeyCut {
   void cutAll(Controller& channel, unsigned mask, unsigned lost) {
     m_keys += channel.getNumKeys();
     KeyTrack const& track = *channel.findActiveTrack();
-    const DataEdit edit(channel, m_allLayers ? channel.getKeyRangeInClip(g_db->getActiveClip())
+    DataEdit const edit(channel, m_allLayers ? channel.getKeyRangeInClip(g_db->getActiveClip())
                                              : rangeBetween(track, track.nextHolding(-1, mask),
                                                             track.previousHolding(track.count(), mask)));
     channel.deleteKeys(HTimeRange::forever(), lost, m_allLayers);
@@ -60,18 +60,18 @@ class KeyCut {
   void cutRanges(Controller& channel, unsigned lost) {
     HTimeManager const* time = HTimeManager::getInstance();
     for (int i = 0; i < time->getNumSelectedRanges(); ++i) {
-      const HTimeRange range = time->getSelectedTimeRange(i);
-      const DataEdit edit(channel, range);
+      HTimeRange const range = time->getSelectedTimeRange(i);
+      DataEdit const edit(channel, range);
       m_keys += channel.deleteKeys(range, lost, m_allLayers);
     }
     if (time->getNumSelectedRanges() > 0) ++m_channels;
   }
 
   void cutSelected(Controller& channel, unsigned mask, unsigned lost) {
-    const int count = channel.getNumSelectedKeys(mask);
+    int const count = channel.getNumSelectedKeys(mask);
     if (count == 0) return;
     KeyTrack const& track = *channel.findActiveTrack();
-    const DataEdit edit(channel, rangeBetween(track, track.nextSelected(-1, mask),
+    DataEdit const edit(channel, rangeBetween(track, track.nextSelected(-1, mask),
                                               track.previousSelected(track.count(), mask)));
     channel.deleteSelectedKeys(lost);
     m_keys += count;
@@ -99,8 +99,8 @@ bool CutKeysCmd::execute(Given const& given, Args const&, Variable&) {
         !(onMod = moduleAt(option.getArg(0).getStringValue(-1),
                            "%s is not a valid path to a module in the scene")))
       return false;
-  const GivenOptions options(given);
-  const bool all = options.has(info.option("all")), ranges = options.has(info.option("ranges")),
+  GivenOptions const options(given);
+  bool const all = options.has(info.option("all")), ranges = options.has(info.option("ranges")),
              allLayers = options.has(info.option("allLayers"));
   if (allLayers && !all && !ranges)
     logWarning("Option -allLayers must be specified with -all or -ranges options. Ignoring");

@@ -50,21 +50,21 @@ int selectBehind(Plane const& plane) {
   HTimeManager const* time = HTimeManager::getInstance();
   std::vector<Node*> nodes;
   for (int i = 0; i < g_db->getNumSelectedNodes(); ++i) nodes.push_back(g_db->getSelectedNode(i));
-  const SceneReader reader(std::vector<Node const*>(nodes.begin(), nodes.end()), g_db->getActiveClip());
-  const int64 period = time->getTicksPerFrame();
-  const HTimeRange play = time->getPlayRange(), motion = reader.getMotionRange();
+  SceneReader const reader(std::vector<Node const*>(nodes.begin(), nodes.end()), g_db->getActiveClip());
+  int64 const period = time->getTicksPerFrame();
+  HTimeRange const play = time->getPlayRange(), motion = reader.getMotionRange();
   if (motion.isEmpty() || play.isEmpty()) return 0;
-  const int64 most = (play.getEnd() - play.getStart()) / period;
-  const auto frameOf = [&](int64 at) { return std::clamp<int64>((at - play.getStart()) / period, 0, most); };
-  const int64 first = std::max<int64>(frameOf(motion.getStart()) - 1, 0);
-  const int64 last = std::min(frameOf(motion.getEnd()) + 2, most);
+  int64 const most = (play.getEnd() - play.getStart()) / period;
+  auto const frameOf = [&](int64 at) { return std::clamp<int64>((at - play.getStart()) / period, 0, most); };
+  int64 const first = std::max<int64>(frameOf(motion.getStart()) - 1, 0);
+  int64 const last = std::min(frameOf(motion.getEnd()) + 2, most);
 
   constexpr int64 kBlock = 256;
   std::vector<HTimeRange> behind(nodes.size());  // empty: in front
   std::vector<double> positions(3 * nodes.size() * kBlock);
   int selected = 0;
   for (int64 frame = first; frame <= last; frame += kBlock) {
-    const int64 start = play.getStart() + frame * period, count = std::min(kBlock, last - frame + 1);
+    int64 const start = play.getStart() + frame * period, count = std::min(kBlock, last - frame + 1);
     SceneReader::Arrays arrays;
     arrays.positions = positions.data();
     reader.readWorld(SampleTimes(start, period, count), arrays);
@@ -95,7 +95,7 @@ bool FindPlaneCrossingCmd::execute(Given const&, Args const& args, Variable&) {
 
   for (int i = 0; i < g_db->getNumSelectedNodes(); ++i)
     g_db->getSelectedNode(i)->getTransformChannel()->deselectKeys(HTimeRange::forever(), KeyTrack::kAll);
-  const int selected = selectBehind(plane);
+  int const selected = selectBehind(plane);
   selected > 0 ? logInfo("Found %d keys that penetrate the plane", selected)
                : logInfo("No plane penetration keys found");
   return true;

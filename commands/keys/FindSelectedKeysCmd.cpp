@@ -41,7 +41,7 @@ class RunSearch {
     RunEnd best;
     for (int i = 0; i < g_db->getNumSelectedNodes(); ++i)
       for (int k = 0; k < g_db->getNumActiveProperties(); ++k) {
-        const RunEnd found = inChannel(g_db->getSelectedNode(i), g_db->getActiveProperty(k), time);
+        RunEnd const found = inChannel(g_db->getSelectedNode(i), g_db->getActiveProperty(k), time);
         if (!found.node) continue;
         if (!best.node || isBeyond(best.time, found.time))
           best = found;
@@ -55,10 +55,10 @@ class RunSearch {
   RunEnd inChannel(Node* node, unsigned id, int64 time) const {
     Controller const* channel = node->getProperty(id);
     KeyTrack const* track = channel ? channel->findActiveTrack() : nullptr;
-    const unsigned mask = componentMask(id);
+    unsigned const mask = componentMask(id);
     if (!track || !track->countSelected(mask)) return {};
 
-    const int64 first = firstBeyond(*track, outset());
+    int64 const first = firstBeyond(*track, outset());
     int64 from = firstBeyond(*track, time);
     if (!isBeyond(from, first)) from = first;
     // A run that the time lies in began before it.
@@ -67,7 +67,7 @@ class RunSearch {
                     : track->nextUnselected(from - m_step, mask);
       if (from < 0) return {};
     }
-    const int64 found =
+    int64 const found =
         m_back ? track->previousSelected(from - m_step, mask) : track->nextSelected(from - m_step, mask);
     if (found < 0 || !m_range.contains(track->timeAt(found))) return {};
     return {node, track->timeAt(found), found == first};
@@ -88,17 +88,17 @@ bool FindSelectedKeysCmd::execute(Given const& given, Args const&, Variable&) {
     logWarning("No nodes selected for searching");
     return true;
   }
-  const RunSearch search(GivenOptions(given).has(info.option("b")));
+  RunSearch const search(GivenOptions(given).has(info.option("b")));
 
   // The second pass begins at the range's end again; a run that opens the range is left to it. So stepping
   // on and on comes to every run once in each round.
-  const RunEnd second = search.nearest(search.outset());
+  RunEnd const second = search.nearest(search.outset());
   if (!second.node) {
     logInfo("No selected keys found");
     return true;
   }
   HTimeManager* time = HTimeManager::getInstance();
-  const bool skips = second.opens && search.isBeyond(second.time, time->getTime());
+  bool const skips = second.opens && search.isBeyond(second.time, time->getTime());
   RunEnd found = search.nearest(skips ? second.time : time->getTime());
   if (!found.node) found = second;
   g_db->setPrimarySelectedModule(found.node);

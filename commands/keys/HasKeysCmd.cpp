@@ -34,10 +34,10 @@ bool HasKeysCmd::timeAsked(Given const& given, int64& time) {
   time = manager->getTime();
   for (CommandOption const& option : given) {
     // kept: "-seconds" counts frames as well, from where the animation range begins.
-    const bool isFrame = option.getIndex() == info.option("frame");
+    bool const isFrame = option.getIndex() == info.option("frame");
     if (!isFrame && option.getIndex() != info.option("seconds")) continue;
-    const int64 start = manager->getAnimRange().getStart();
-    const int64 origin = isFrame ? 0 : manager->frameTime(start, HTimeManager::RoundDown, 0);
+    int64 const start = manager->getAnimRange().getStart();
+    int64 const origin = isFrame ? 0 : manager->frameTime(start, HTimeManager::RoundDown, 0);
     if (!timeOfFrame(option.getArg(0).getIntValue(-1), origin, time)) return false;
   }
   return true;
@@ -46,10 +46,10 @@ bool HasKeysCmd::timeAsked(Given const& given, int64& time) {
 // Whether one of the keys, at whole frames from the first one on, holds the components.
 bool hasKeyOnFrames(KeyTrack const* track, unsigned mask, bool selected) {
   if (!track || track->empty()) return false;
-  const int64 ticks = HTimeManager::getInstance()->getTicksPerFrame(), start = track->timeAt(0);
+  int64 const ticks = HTimeManager::getInstance()->getTicksPerFrame(), start = track->timeAt(0);
   KeyTrack::Reader keys(*track, 0);
   for (int64 left = track->count(); left > 0; --left) {
-    const KeyTrack::Key key = keys.next();
+    KeyTrack::Key const key = keys.next();
     if ((key.components & mask) == mask && (!selected || key.selected & mask) &&
         (key.time - start) % ticks == 0)
       return true;
@@ -66,7 +66,7 @@ bool HasKeysCmd::execute(Given const& given, Args const& args, Variable& result)
   Module const* module = moduleAt(args[0].getStringValue(-1),
                                   "%s  is not a valid unique path to a Module in the scene.");  // kept
   if (!module) return false;
-  const ChannelName wanted = channelNameFrom(args[1].getStringValue(-1), Suffix::allCut);
+  ChannelName const wanted = channelNameFrom(args[1].getStringValue(-1), Suffix::allCut);
   Controller const* channel = module->getProperty(wanted.name);
   if (!channel) {
     // kept: the module's name stands in the channel's place.
@@ -76,9 +76,9 @@ bool HasKeysCmd::execute(Given const& given, Args const& args, Variable& result)
   }
 
   // Step 3: its keys.
-  const GivenOptions options(given);
-  const bool selected = options.has(info.option("selected")), any = options.has(info.option("any"));
-  const unsigned mask = wanted.mask();
+  GivenOptions const options(given);
+  bool const selected = options.has(info.option("selected")), any = options.has(info.option("any"));
+  unsigned const mask = wanted.mask();
   if (!options.has(info.option("allTime"))) {
     if (any)
       return answer(result,

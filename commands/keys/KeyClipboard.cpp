@@ -4,7 +4,7 @@
 #include "host/scene/PropertyTable.h"
 
 bool nameOneChannel() {
-  const auto channelId = [](int i) { return g_db->getActiveProperty(i) & ~PropertyTable::kWhole; };
+  auto const channelId = [](int i) { return g_db->getActiveProperty(i) & ~PropertyTable::kWhole; };
   for (int i = 1; i < g_db->getNumActiveProperties(); ++i)
     if (channelId(i) != channelId(0)) return false;
   return true;

@@ -32,7 +32,7 @@ ChannelComponents channelNamed(HString const& name, Given const& given, int onMo
                                KeyQueryTexts const& texts) {
   Module const* module = onModOrPrimary(given, onMod, texts.badPath);
   if (!module) return {};
-  const ChannelName wanted = channelNameFrom(name, Suffix::componentCut);
+  ChannelName const wanted = channelNameFrom(name, Suffix::componentCut);
   Controller const* channel = module->getProperty(wanted.name);
   if (!channel)
     Command::logError("Cannot find property named %s on module %s", name.GetStr(),
@@ -48,7 +48,7 @@ Variable framesOf(Controller const& channel, unsigned mask,
   if (KeyTrack const* track = channel.findActiveTrack())
     track->forEach(0, track->count(), [&](KeyTrack::Key const& key) {
       if (!wanted(key, mask)) return;
-      const int64 frame = key.time / time->getTicksPerFrame();
+      int64 const frame = key.time / time->getTicksPerFrame();
       frame >= INT_MIN&& frame <= INT_MAX ? frames.add(static_cast<int>(frame)) : static_cast<void>(++beyond);
     });
   if (beyond > 0)
@@ -59,12 +59,12 @@ Variable framesOf(Controller const& channel, unsigned mask,
 }
 
 unsigned componentMask(unsigned id) {
-  const unsigned marked = markedComponents(id);
+  unsigned const marked = markedComponents(id);
   return marked == 3 || marked == 5 || marked == 6 ? 0 : marked;
 }
 
 bool timeOfFrame(int frame, int64 origin, int64& time) {
-  const int64 ticks = HTimeManager::getInstance()->getTicksPerFrame();
+  int64 const ticks = HTimeManager::getInstance()->getTicksPerFrame();
   if (std::abs(int64{frame}) <= kForever / ticks && std::abs(origin + frame * ticks) <= kForever) {
     time = origin + frame * ticks;
     return true;

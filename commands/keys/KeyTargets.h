@@ -30,7 +30,7 @@ ChannelComponents channelNamed(HString const& name, Given const& given, int onMo
 template <class Work>
 bool queryKeys(Args const& args, Given const& given, int onMod, KeyQueryTexts const& texts, Work work) {
   if (!hasKeysToList(texts)) return true;
-  const ChannelComponents target = channelNamed(args[0].getStringValue(-1), given, onMod, texts);
+  ChannelComponents const target = channelNamed(args[0].getStringValue(-1), given, onMod, texts);
   return target.channel && work(*target.channel, target.mask);
 }
 

@@ -21,7 +21,7 @@ class PasteKeysCmd final : public ScriptCommand<PasteKeysCmd> {
 
 // Angles that the record does not hold stay as the layer has them.
 TalixRotation rotationOf(ClipboardManager::tagKey const& record, RotController const& channel, int64 time) {
-  const TalixRotation::RotOrder order = g_db->getClipboardManager()->getRotationOrder();
+  TalixRotation::RotOrder const order = g_db->getClipboardManager()->getRotationOrder();
   TalixRotation rotation;
   Vec3 angles(record.x, record.y, record.z);
   if (record.components != KeyTrack::kAll) {
@@ -42,22 +42,22 @@ void paste(ClipboardManager::tagKey const& record, Controller& channel, int64 ti
     if (record.components) rotations->setKey(time, rotationOf(record, *rotations, time), KeyTrack::kAll);
     return;
   }
-  const unsigned mask = record.components & (isOneValued(channel) ? 1 : KeyTrack::kAll);
+  unsigned const mask = record.components & (isOneValued(channel) ? 1 : KeyTrack::kAll);
   if (mask) channel.writeKeyAt(time, {record.x, record.y, record.z}, mask);
 }
 
 // The data that goes on from record to record does so from key to key, keys that were there before included.
 void pasteBridges(ClipboardManager const& clipboard, Controller& channel, int64 shift) {
-  const bool split = channel.getPropertyType() == DataSource::Vec3Property;
-  for (const unsigned part : {1u, 2u, 4u}) {
+  bool const split = channel.getPropertyType() == DataSource::Vec3Property;
+  for (unsigned const part : {1u, 2u, 4u}) {
     if (!split && part != 1) break;
-    const unsigned mask = split ? part : KeyTrack::kAll;
+    unsigned const mask = split ? part : KeyTrack::kAll;
     int64 start = 0;
     bool goesOn = false;
     for (int i = 0; i < clipboard.getNumControllerKeys(); ++i) {
-      const ClipboardManager::tagKey record = clipboard.getControllerKey(i);
+      ClipboardManager::tagKey const record = clipboard.getControllerKey(i);
       if (!(record.components & mask)) continue;
-      const bool bridges = (record.bridges & mask) != 0;
+      bool const bridges = (record.bridges & mask) != 0;
       if (goesOn && !bridges) channel.bridgeKeys(HTimeRange(start, record.time + shift - 1), mask);
       if (!goesOn && bridges) start = record.time + shift;
       goesOn = bridges;
@@ -67,15 +67,15 @@ void pasteBridges(ClipboardManager const& clipboard, Controller& channel, int64 
 
 // All keys, the first of them at `time`. False, with a message, when they reach beyond the time line.
 bool pasteAll(ClipboardManager const& clipboard, Controller& channel, int64 time) {
-  const HTimeRange source = clipboard.getControllerDataRange();
-  const int64 length = source.getEnd() - source.getStart();
+  HTimeRange const source = clipboard.getControllerDataRange();
+  int64 const length = source.getEnd() - source.getStart();
   if (length > kForever - time) {
     Command::logError("The pasted keys would lie beyond the time line.");
     return false;
   }
-  const DataEdit edit(channel, HTimeRange(time, time + length));
+  DataEdit const edit(channel, HTimeRange(time, time + length));
   for (int i = 0; i < clipboard.getNumControllerKeys(); ++i) {
-    const ClipboardManager::tagKey record = clipboard.getControllerKey(i);
+    ClipboardManager::tagKey const record = clipboard.getControllerKey(i);
     paste(record, channel, time + (record.time - source.getStart()));
   }
   pasteBridges(clipboard, channel, time - source.getStart());
@@ -115,7 +115,7 @@ bool PasteKeysCmd::execute(Given const& given, Args const&, Variable&) {
   }
 
   // Step 4: the keys.
-  const int count = clipboard.getNumControllerKeys();
+  int const count = clipboard.getNumControllerKeys();
   if (count == 0) {
     logInfo("Pasted 0 keys");
     return true;

@@ -36,7 +36,7 @@ class KeyThinning {
       if (!channel || channel->getNumKeys() < kLeastKeys || !channel->isEditable()) continue;
       // A channel that several components name is reduced whole at the first: the tolerance counts from the
       // curve as it was.
-      const bool first = std::find(done.begin(), done.end(), channel) == done.end();
+      bool const first = std::find(done.begin(), done.end(), channel) == done.end();
       done.push_back(channel);
       m_all       ? thin(*channel, first, {HTimeRange::forever()}, channel->getKeyRange())
       : m_byRange ? thin(*channel, first, m_ranges, hull(m_ranges))
@@ -58,21 +58,21 @@ class KeyThinning {
 
   void thin(Controller& channel, bool first, std::vector<HTimeRange> const& ranges, HTimeRange const& hull) {
     if (ranges.empty()) return;
-    const DataEdit edit(channel, hull);
+    DataEdit const edit(channel, hull);
     if (first) m_keys += channel.reduceKeys(ranges, m_tolerances);
     ++m_channels;
   }
 
   void thinSelected(Controller& channel, bool first) {
-    const int selected = channel.getNumSelectedKeys();
+    int const selected = channel.getNumSelectedKeys();
     if (selected == 0) return;
-    const auto timeOf = [&](int i) { return channel.getKeyTime(channel.getSelectedKeyIndex(i)); };
-    const DataEdit edit(channel, HTimeRange(timeOf(0), timeOf(selected - 1)));
+    auto const timeOf = [&](int i) { return channel.getKeyTime(channel.getSelectedKeyIndex(i)); };
+    DataEdit const edit(channel, HTimeRange(timeOf(0), timeOf(selected - 1)));
     if (first) m_keys += channel.reduceSelectedKeys(m_tolerances);
     ++m_channels;
   }
 
-  const ReductionTolerances m_tolerances = ReductionTolerances::fromProfile();
+  ReductionTolerances const m_tolerances = ReductionTolerances::fromProfile();
   bool m_all, m_byRange;
   std::vector<HTimeRange> m_ranges;
   int m_keys = 0, m_channels = 0;
@@ -83,7 +83,7 @@ bool ReduceKeysCmd::execute(Given const& given, Args const&, Variable&) {
     logWarning("No items selected for key reduction");
     return true;
   }
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   KeyThinning thinning(options.has(info.option("all")), options.has(info.option("ranges")));
   for (int i = 0; i < g_db->getNumSelectedModules(); ++i) thinning.thin(*g_db->getSelectedModule(i));
   thinning.report();

@@ -47,7 +47,7 @@ bool SetInterpTypeCmd::execute(Given const& given, Args const& args, Variable&) 
                      "%s is not a valid unique path to a Module in the scene.");
     if (!onMod) return false;
   }
-  const HString name = args[0].getStringValue(-1), type = args[1].getStringValue(-1);
+  HString const name = args[0].getStringValue(-1), type = args[1].getStringValue(-1);
   if (name.IsEmpty()) {
     logError("Cannot pass empty string as property name");
     return false;

@@ -64,14 +64,14 @@ bool NewKey::write(RotController& channel) const {
   TalixRotation current;
   if (change.relative || change.component >= 0) current.setQuaternion(layerValue(channel, time).data());
   // Kept: without "-onMod" three angles count in XYZ, while a component counts in the module's own order.
-  const TalixRotation::RotOrder order =
+  TalixRotation::RotOrder const order =
       change.component < 0 ? givenOrder : rotationOrderOf(*channel.getModule());
   channel.setKey(time, changed(current, value.vector, change, order), 7);
   return true;
 }
 
 bool NewKey::write(FloatController& channel) const {
-  const double wanted =
+  double const wanted =
       changed(change.relative ? layerValue(channel, time)[0] : 0, value.number, change.relative);
   if (!canBeHeld(wanted)) return false;
   channel.setKey(time, wanted, 1);
@@ -79,8 +79,8 @@ bool NewKey::write(FloatController& channel) const {
 }
 
 bool NewKey::write(IntController& channel) const {
-  const int current = change.relative ? nearestInt(layerValue(channel, time)[0]) : 0;
-  const int64 wanted = changed(current, value.integer, change.relative);
+  int const current = change.relative ? nearestInt(layerValue(channel, time)[0]) : 0;
+  int64 const wanted = changed(current, value.integer, change.relative);
   if (!canBeHeld(wanted)) return false;
   channel.setKey(time, static_cast<int>(wanted), 1);
   return true;
@@ -94,7 +94,7 @@ bool NewKey::write(BoolController& channel) const {
 bool NewKey::writeOn(Controller& channel) const {
   bool taken = true;
   {
-    const DataEdit edit(channel, HTimeRange(time - 1, time + 1));
+    DataEdit const edit(channel, HTimeRange(time - 1, time + 1));
     withKind(channel, [&](auto& typed) { taken = write(typed); });
   }
   if (!taken)
@@ -105,7 +105,7 @@ bool NewKey::writeOn(Controller& channel) const {
 
 // Reads the value for a channel of that kind; false, with a message, when it cannot be keyed.
 bool readKeyValue(Args const& args, DataSource::PropertyType kind, NewKey& key) {
-  const bool boolean = kind == DataSource::BoolProperty;
+  bool const boolean = kind == DataSource::BoolProperty;
   if (!readValue(args, kind, key.change.component, key.value) ||
       (boolean && args[1].getType() != Variable::Bool)) {
     if (hasComponents(kind))
@@ -152,17 +152,17 @@ bool writeOnCandidates(NewKey const& key, Candidates const& candidates, unsigned
 }
 
 bool SetKeyCmd::execute(Given const& given, Args const& args, Variable&) {
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   NewKey key;
   Candidates candidates;
   if (!readTime(options, key.time) || !candidates.read(given, kCandidates)) return false;
   key.change.relative = options.has(kRelative);
 
   char const* typed = args[0].getStringValue(-1);
-  const ChannelName channel = channelNameFrom(typed, Suffix::anyCut);
+  ChannelName const channel = channelNameFrom(typed, Suffix::anyCut);
   key.change.component = channel.component;
-  const unsigned id = Controller::mapPropertyName(channel.name);
-  const DataSource::PropertyType kind = Controller::mapToPropertyType(id);
+  unsigned const id = Controller::mapPropertyName(channel.name);
+  DataSource::PropertyType const kind = Controller::mapToPropertyType(id);
   if (kind == DataSource::NoProperty) {
     logError("Unknown property type: %s", channel.name.GetStr());
     return false;

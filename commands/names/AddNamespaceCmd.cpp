@@ -14,7 +14,7 @@ class AddNamespaceCmd final : public ScriptCommand<AddNamespaceCmd> {
   static constexpr int kOnMod = info.option("onMod");
 
   bool execute(Given const& given, Args const& args, Variable&) override {
-    const HString name = args[0].getStringValue(-1);
+    HString const name = args[0].getStringValue(-1);
     return changeNamespaces(given, kOnMod, [&](Module& module) { return module.addNamespace(name); });
   }
 };

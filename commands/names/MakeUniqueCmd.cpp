@@ -24,8 +24,8 @@ constexpr size_t kMostDigits = 18;  // longer numbers belong to the name
 // kept: the mark is looked for one place before the last character that is no digit, so "a_x5" is "a" and 5,
 // while "a_5" is its own base.
 NumberedName split(std::string_view name) {
-  const size_t last = name.find_last_not_of("0123456789");
-  const bool numbered = last != std::string_view::npos && last > 0 && last + 1 < name.size();
+  size_t const last = name.find_last_not_of("0123456789");
+  bool const numbered = last != std::string_view::npos && last > 0 && last + 1 < name.size();
   int64 number = 0;
   if (!numbered || name[last - 1] != '_' || name.size() - last - 1 > kMostDigits) return {name, 0};
   std::from_chars(name.data() + last + 1, name.data() + name.size(), number);
@@ -42,7 +42,7 @@ class PathNumbers {
     for (; known && !m_byModule.contains(known); known = known->getParent()) unknown.push_back(known);
     size_t path = known ? m_byModule.at(known) : 0;
     for (auto next = unknown.rbegin(); next != unknown.rend(); ++next) {
-      const auto [entry, isNew] =
+      auto const [entry, isNew] =
           m_byName.try_emplace({path, (*next)->getName().GetString()}, m_byName.size() + 1);
       m_byModule[*next] = path = entry->second;
     }
@@ -71,8 +71,8 @@ class TakenPaths {
   // The first number above `number` whose path names no module.
   int64 freeNumber(std::string const& text, int64 number) {
     Next& next = m_next[text];
-    const auto isTaken = [&](int64 candidate) {
-      const HString path = text + "_" + std::to_string(candidate);
+    auto const isTaken = [&](int64 candidate) {
+      HString const path = text + "_" + std::to_string(candidate);
       return g_db->getModuleWithPath(path, nullptr, false) != nullptr;
     };
     int64 free = number + 1;
@@ -87,7 +87,7 @@ class TakenPaths {
   void forget(std::string const& path) {
     m_next.erase(m_next.lower_bound(path + "\\"), m_next.lower_bound(path + static_cast<char>('\\' + 1)));
     if (g_db->getModuleWithPath(path, nullptr, false)) return;
-    const size_t mark = path.find_last_not_of("0123456789");
+    size_t const mark = path.find_last_not_of("0123456789");
     if (path[mark] == '_') m_next.erase(path.substr(0, mark));
   }
 
@@ -118,7 +118,7 @@ class MakeUniqueCmd final : public ScriptCommand<MakeUniqueCmd> {
     std::unordered_set<size_t> seen;
     PathNumbers paths;
     TakenPaths taken;
-    const int count = g_db->getNumModules();
+    int const count = g_db->getNumModules();
     for (int i = 0; i < count; ++i) {
       if (g_theOperationStack.isCancelled()) return false;
       Module* module = g_db->getModule(i);
@@ -132,11 +132,11 @@ class MakeUniqueCmd final : public ScriptCommand<MakeUniqueCmd> {
  private:
   // kept: the new path does not count as seen.
   static void rename(Module& module, TakenPaths& taken) {
-    const HString former = module.getFullPathString(), name = module.getName();
-    const auto [base, number] = split(name.GetString());
+    HString const former = module.getFullPathString(), name = module.getName();
+    auto const [base, number] = split(name.GetString());
     ModulePath parent(&module);
     parent.pop();
-    const std::string text = parent.getFullPathString().GetString() + "\\" + std::string(base);
+    std::string const text = parent.getFullPathString().GetString() + "\\" + std::string(base);
     HString candidate;
     candidate.Format("%s_%lld", std::string(base).c_str(),
                      static_cast<long long>(taken.freeNumber(text, number)));

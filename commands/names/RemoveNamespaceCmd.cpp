@@ -14,7 +14,7 @@ class RemoveNamespaceCmd final : public ScriptCommand<RemoveNamespaceCmd> {
   static constexpr int kOnMod = info.option("onMod");
 
   bool execute(Given const& given, Args const& args, Variable&) override {
-    const HString name = args[0].getStringValue(-1);
+    HString const name = args[0].getStringValue(-1);
     return changeNamespaces(given, kOnMod, [&](Module& module) { return module.removeNamespace(name); });
   }
 };

@@ -15,7 +15,7 @@ class ReplaceNamespaceCmd final : public ScriptCommand<ReplaceNamespaceCmd> {
   static constexpr int kOnMod = info.option("onMod");
 
   bool execute(Given const& given, Args const& args, Variable&) override {
-    const HString former = args[0].getStringValue(-1), name = args[1].getStringValue(-1);
+    HString const former = args[0].getStringValue(-1), name = args[1].getStringValue(-1);
     return changeNamespaces(given, kOnMod,
                             [&](Module& module) { return module.replaceNamespace(former, name); });
   }

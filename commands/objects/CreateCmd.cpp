@@ -37,11 +37,11 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
   bool execute(Given const& given, Args const& args, Variable&) override {
     Request request;
     if (!request.read(given)) return false;
-    const HString typeName = args[0].getStringValue(-1);
+    HString const typeName = args[0].getStringValue(-1);
     HRuntimeClass* type = typeToCreate(typeName);
     if (!type) return false;
 
-    const TSimpleArray<Module*> created = makeModules(type, args, request);
+    TSimpleArray<Module*> const created = makeModules(type, args, request);
     if (created.getCount() == 0) {
       logError("Unknown module type name: %s", typeName.GetStr());  // kept: whatever the reason was
       return false;
@@ -143,7 +143,7 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
     TSimpleArray<Module*> created;
     std::optional<FreeDeviceNumbers> deviceNumbers;  // once for all cameras
     // All names once, then the first one again until there are `multiple` of it.
-    const int names = args.getCount() - 1;
+    int const names = args.getCount() - 1;
     for (int64 i = 0; i < names + std::max<int64>(0, int64{request.multiple} - 1); ++i) {
       char const* name = args[i < names ? static_cast<int>(i) + 1 : 1].getStringValue(-1);
       Module* module = g_db->createModule(type, name, request.parent);

@@ -16,14 +16,14 @@ class DeleteCharactersCmd final : public ScriptCommand<DeleteCharactersCmd> {
 
   bool execute(Given const& given, Args const&, Variable&) override {
     SubjectManager* subjects = g_db->getSubjectManager();
-    const GivenOptions options(given);
-    const bool all = options.has(kAll);
+    GivenOptions const options(given);
+    bool const all = options.has(kAll);
     if (subjects->getNumSelectedSubjects() == 0 && !all) {
       logWarning("No Characters selected for deletion");
       return true;
     }
     if (all) {
-      const int count = static_cast<int>(subjects->getNumSubjects());
+      int const count = static_cast<int>(subjects->getNumSubjects());
       subjects->removeAllSubjects(true, true, true);  // kept: labels go even with "-keepLabels"
       logInfo("%d Characters deleted", count);
       return true;

@@ -16,15 +16,15 @@ class DeleteCmd final : public ScriptCommand<DeleteCmd> {
   static constexpr int kAll = info.option("all"), kPrimary = info.option("primary");
 
   bool execute(Given const& given, Args const&, Variable&) override {
-    const GivenOptions options(given);
-    const bool all = options.has(kAll);
+    GivenOptions const options(given);
+    bool const all = options.has(kAll);
     if (g_db->getNumSelectedModules() == 0 && !all) {
       logWarning("No items selected for deletion");
       return true;
     }
-    const TSimpleArray<Module*> modules = modulesToDelete(all, options.has(kPrimary));
+    TSimpleArray<Module*> const modules = modulesToDelete(all, options.has(kPrimary));
 
-    const bool autoUpdate = g_db->getAutoUpdateProperties();
+    bool const autoUpdate = g_db->getAutoUpdateProperties();
     g_db->setAutoUpdateProperties(false);
     // One that went along with its parent is no longer in the scene, which is no matter.
     for (Module* module : modules) g_db->removeFromScene(module, true, true, true, true);
@@ -36,7 +36,7 @@ class DeleteCmd final : public ScriptCommand<DeleteCmd> {
 
  private:
   static TSimpleArray<Module*> modulesToDelete(bool all, bool primary) {
-    const int most = std::max(1, all ? g_db->getNumModules() : g_db->getNumSelectedModules());
+    int const most = std::max(1, all ? g_db->getNumModules() : g_db->getNumSelectedModules());
     TSimpleArray<Module*> modules(most, most);
     if (all) {
       for (int i = 0; i < g_db->getNumModules(); ++i) modules.add(g_db->getModule(i));

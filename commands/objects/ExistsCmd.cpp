@@ -21,17 +21,17 @@ class ExistsCmd final : public ScriptCommand<ExistsCmd> {
 };
 
 bool ExistsCmd::execute(Given const& given, Args const& args, Variable& result) {
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   HRuntimeClass const* type = nullptr;
   if (options.has(kType)) {
-    const HString name = options.textOr(kType, "");
+    HString const name = options.textOr(kType, "");
     type = HRuntimeClass::findClass(name.GetStr());  // kept: any class, though no module has most of them
     if (!type) {
       logError("%s is not a Module type", name.GetStr());
       return false;
     }
   }
-  const HString path = args[0].getStringValue(-1);
+  HString const path = args[0].getStringValue(-1);
   return answer(result, g_db->getModuleWithPath(path, type, options.has(kPriorityOnly)) != nullptr);
 }
 

@@ -33,10 +33,10 @@ char const* componentSuffix(unsigned id) {
 }
 
 bool GetChannelsCmd::execute(Given const&, Args const&, Variable& result) {
-  const int count = g_db->getNumActiveProperties();
+  int const count = g_db->getNumActiveProperties();
   Variable names(Variable::StringArray, count);
   for (int i = 0; i < count; ++i) {
-    const unsigned id = g_db->getActiveProperty(i);
+    unsigned const id = g_db->getActiveProperty(i);
     names.setValue((Controller::mapPropertyId(id) + componentSuffix(id)).GetStr(), i);
   }
   return answer(result, names);

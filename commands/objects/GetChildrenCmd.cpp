@@ -26,8 +26,8 @@ bool GetChildrenCmd::execute(Given const& given, Args const& args, Variable& res
       moduleAt(args[0].getStringValue(-1),
                "%s  is not a valid unique path to a Module in the scene.");  // two spaces: kept
   if (!module) return false;
-  const bool nodesOnly = GivenOptions(given).has(kNodesOnly);
-  const int count = nodesOnly ? module->getNumNodeChildren() : module->getNumChildren();
+  bool const nodesOnly = GivenOptions(given).has(kNodesOnly);
+  int const count = nodesOnly ? module->getNumNodeChildren() : module->getNumChildren();
   std::vector<Module*> children;
   for (int i = 0; i < count; ++i)
     children.push_back(nodesOnly ? module->getNodeChild(i) : module->getChild(i));

@@ -24,7 +24,7 @@ class GetModulesCmd final : public ScriptCommand<GetModulesCmd> {
 };
 
 bool GetModulesCmd::execute(Given const& given, Args const&, Variable& result) {
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   HRuntimeClass const* type = nullptr;
   if (options.has(kType)) {
     type = moduleTypeNamed(options.textOr(kType, ""));
@@ -32,7 +32,7 @@ bool GetModulesCmd::execute(Given const& given, Args const&, Variable& result) {
   }
   // Kept: only modules of exactly this class, whereas getNumModules counts those of its subclasses too.
   std::vector<Module*> found;
-  const auto collect = [&](Module* module) {
+  auto const collect = [&](Module* module) {
     if (!type || module->getRuntimeClass() == type) found.push_back(module);
   };
   if (options.has(kPrimary)) {

@@ -20,7 +20,7 @@ class GetNumModulesCmd final : public ScriptCommand<GetNumModulesCmd> {
 };
 
 bool GetNumModulesCmd::execute(Given const& given, Args const&, Variable& result) {
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   HRuntimeClass const* type = &Module::s_classModule;
   if (options.has(kType)) {
     type = moduleTypeNamed(options.textOr(kType, ""));

@@ -37,7 +37,7 @@ constexpr char const kTooLarge[] = "The value is too large.";
 template <class Integers>
 bool setInteger(Integers& attribute, Args const& args, bool relative) {
   if (!isOneNumber(args)) return false;
-  const int64 value = changed(attribute.getValue(), integerFrom(args[1]), relative);
+  int64 const value = changed(attribute.getValue(), integerFrom(args[1]), relative);
   return canBeHeld(value) ? put(attribute, static_cast<int>(value), kTooLarge) : refuse(kTooLarge);
 }
 
@@ -80,7 +80,7 @@ bool setTime(TimeAttribute& attribute, Args const& args, bool relative) {
   }
   constexpr char const kBeyond[] = "The time lies beyond the time line.";
   if (!times.isOnTimeLine(frames)) return refuse(kBeyond);
-  const int64 ticks = times.getTimeFromFrameDouble(frames);
+  int64 const ticks = times.getTimeFromFrameDouble(frames);
   return put(attribute, relative ? attribute.getTime() + ticks : ticks, kBeyond);
 }
 
@@ -99,7 +99,7 @@ bool setRotation(RotationAttribute& attribute, Args const& args, Change const& c
   Vec3 angles;
   if (!readAngles(args, change.component, angles)) return wrongShape(command);
   // Kept: as for vectors, with a component the whole new rotation is composed.
-  const TalixRotation value = changed(attribute.getValue(), angles, {change.component, false},
+  TalixRotation const value = changed(attribute.getValue(), angles, {change.component, false},
                                       rotationOrderOf(*attribute.getModule()));
   return attribute.setValue(change.relative ? attribute.getValue() * value : value, true, true, true, true);
 }
@@ -128,13 +128,13 @@ bool setColor(ColorAttribute& attribute, Args const& args, bool relative, char c
 
 // Pairs of a label and its state. The pairs before one that does not fit stay written.
 bool setBits(BitFieldAttribute& attribute, Args const& args) {
-  const int count = args.getCount();
+  int const count = args.getCount();
   if (count > 2 * attribute.getNumFields() + 1) return false;
   for (int i = 1; i < count; i += 2) {
     if (i + 1 == count || args[i].getType() != Variable::String || args[i + 1].getType() != Variable::Bool)
       return false;
-    const HString label = args[i].getStringValue(-1);
-    const bool on = changed(attribute.getField(label), args[i + 1].getBoolValue(-1));
+    HString const label = args[i].getStringValue(-1);
+    bool const on = changed(attribute.getField(label), args[i + 1].getBoolValue(-1));
     if (!attribute.setValue(label, on, true, true, true, true)) return false;
   }
   return true;
@@ -142,7 +142,7 @@ bool setBits(BitFieldAttribute& attribute, Args const& args) {
 
 // The largest square matrix that the numbers fill; those beyond it are passed over.
 bool setMatrix(MatrixAttribute& attribute, Args const& args, char const* command) {
-  const int count = args.getCount();
+  int const count = args.getCount();
   if (count < 2 || count > 37) {
     Command::logError("Invalid number of arguments for %s", command);
     return false;
@@ -152,7 +152,7 @@ bool setMatrix(MatrixAttribute& attribute, Args const& args, char const* command
     Command::logError("Invalid type of arguments for %s", command);
     return false;
   }
-  const auto n = static_cast<int>(std::sqrt(count - 1));
+  auto const n = static_cast<int>(std::sqrt(count - 1));
   Matrix matrix(static_cast<uint64>(n));
   for (int i = 0; i < n * n; ++i) matrix[static_cast<uint64>(i / n)][i % n] = args[i + 1].getFloatValue(-1);
   return put(attribute, matrix, kTooLarge);
@@ -162,7 +162,7 @@ bool setMatrix(MatrixAttribute& attribute, Args const& args, char const* command
 
 bool setReference(ModAttribute& attribute, Args const& args) {
   if (!isOne(args, Variable::String)) return false;
-  const HString path = args[1].getStringValue(-1);
+  HString const path = args[1].getStringValue(-1);
   Module* module = nullptr;  // an empty path stands for none
   if (!path.IsEmpty() && !(module = moduleAt(path, "%s does not specify a module in the scene.")))
     return false;

@@ -23,13 +23,13 @@ bool writeDefault(RotController& channel, ChannelWrite const& write) {
 }
 
 bool writeDefault(FloatController& channel, ChannelWrite const& write) {
-  const double value = changed(channel.getConstValue(), write.value.number, write.change.relative);
+  double const value = changed(channel.getConstValue(), write.value.number, write.change.relative);
   if (canBeHeld(value)) channel.setConstValue(value, true);
   return canBeHeld(value);
 }
 
 bool writeDefault(IntController& channel, ChannelWrite const& write) {
-  const int64 value = changed(channel.getConstValue(), write.value.integer, write.change.relative);
+  int64 const value = changed(channel.getConstValue(), write.value.integer, write.change.relative);
   if (canBeHeld(value)) channel.setConstValue(static_cast<int>(value), true);
   return canBeHeld(value);
 }
@@ -43,12 +43,12 @@ bool writeDefault(BoolController& channel, ChannelWrite const& write) {
 
 // A component that the key lacks counts with what it is there between its own keys.
 bool writeKey(Vec3Controller& channel, int i, ChannelWrite const& write) {
-  const int key = channel.getSelectedKeyIndex(i);
+  int const key = channel.getSelectedKeyIndex(i);
   Vec3 value = write.value.vector;
   if (write.change.relative)
     value = changed(Vec3(layerValue(channel, channel.getKeyTime(key)).data()), value, write.change);
   if (!canBeHeld(value)) return false;
-  const int component = write.change.component;
+  int const component = write.change.component;
   if (component >= 0)
     channel.setKeyComponentValue(key, value[component], 1u << component);
   else
@@ -58,27 +58,27 @@ bool writeKey(Vec3Controller& channel, int i, ChannelWrite const& write) {
 
 // Kept: a component goes to the first keys by position, one for each selected key, not to the selected ones.
 bool writeKey(RotController& channel, int i, ChannelWrite const& write) {
-  const int key = write.change.component >= 0 ? i : channel.getSelectedKeyIndex(i);
+  int const key = write.change.component >= 0 ? i : channel.getSelectedKeyIndex(i);
   channel.setKeyValue(key, changedRotation(channel, channel.getKeyValue(key), write), 7);
   return true;
 }
 
 bool writeKey(FloatController& channel, int i, ChannelWrite const& write) {
-  const int key = channel.getSelectedKeyIndex(i);
-  const double value = changed(channel.getKeyValue(key), write.value.number, write.change.relative);
+  int const key = channel.getSelectedKeyIndex(i);
+  double const value = changed(channel.getKeyValue(key), write.value.number, write.change.relative);
   if (canBeHeld(value)) channel.setKeyValue(key, value, 1);
   return canBeHeld(value);
 }
 
 bool writeKey(IntController& channel, int i, ChannelWrite const& write) {
-  const int key = channel.getSelectedKeyIndex(i);
-  const int64 value = changed(channel.getKeyValue(key), write.value.integer, write.change.relative);
+  int const key = channel.getSelectedKeyIndex(i);
+  int64 const value = changed(channel.getKeyValue(key), write.value.integer, write.change.relative);
   if (canBeHeld(value)) channel.setKeyValue(key, static_cast<int>(value), 1);
   return canBeHeld(value);
 }
 
 bool writeKey(BoolController& channel, int i, ChannelWrite const& write) {
-  const int key = channel.getSelectedKeyIndex(i);
+  int const key = channel.getSelectedKeyIndex(i);
   channel.setKeyValue(key, changed(channel.getKeyValue(key), write.value.state), 1);
   return true;
 }
@@ -88,10 +88,10 @@ bool writeKey(BoolController& channel, int i, ChannelWrite const& write) {
 void ChannelWrite::applyTo(Controller& channel) const {
   int left = 0;
   if (byDefault) {
-    const DataEdit edit = DataEdit::ofDefault(channel);
+    DataEdit const edit = DataEdit::ofDefault(channel);
     withKind(channel, [&](auto& typed) { left += !writeDefault(typed, *this); });
   } else {
-    const DataEdit edit(channel, channel.getKeyRange());
+    DataEdit const edit(channel, channel.getKeyRange());
     withKind(channel, [&](auto& typed) {
       for (int i = 0; i < typed.getNumSelectedKeys(); ++i) left += !writeKey(typed, i, *this);
     });

@@ -3,7 +3,7 @@
 bool eachAttribute(Candidates const& candidates, HString const& name, AttributeTexts const& texts,
                    std::function<bool(Attribute&)> const& work) {
   bool found = false;
-  const auto workOn = [&](Module& module) {
+  auto const workOn = [&](Module& module) {
     Attribute* attribute = module.getAttribute(name.GetStr());
     if (!attribute) return true;
     found = true;

@@ -46,7 +46,7 @@ bool readField(BitFieldAttribute const& bits, Args const& args, Variable& result
     Command::logError("Not enough arguments for getBooleanProperty command");  // kept: for too many as well
     return false;
   }
-  const HString label = args[2].getStringValue(-1);
+  HString const label = args[2].getStringValue(-1);
   if (bits.findLabel(label) < 0) {
     Command::logError("\"%s\" is not a field in \"%s\"", label.GetStr(), bits.getName().GetStr());
     return false;
@@ -58,8 +58,8 @@ bool GetBooleanPropertyCmd::execute(Given const& given, Args const& args, Variab
   Module const* module =
       moduleAt(args[0].getStringValue(-1), "%s is not a valid unique path to a Module in the scene.");
   if (!module) return false;
-  const HString name = args[1].getStringValue(-1);
-  const DataSource::PropertyType kind = Controller::mapToPropertyType(name);
+  HString const name = args[1].getStringValue(-1);
+  DataSource::PropertyType const kind = Controller::mapToPropertyType(name);
   if (kind != DataSource::NoProperty)
     return readBoolean(*module, name, kind, isByDefault<GetBooleanPropertyCmd>(given), result);
   Attribute const* attribute = attributeNamed(*module, name);

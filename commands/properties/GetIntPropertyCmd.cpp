@@ -55,8 +55,8 @@ bool GetIntPropertyCmd::execute(Given const& given, Args const& args, Variable& 
       moduleAt(args[0].getStringValue(-1),
                "%s  is not a valid unique path to a Module in the scene.");  // two spaces: kept
   if (!module) return false;
-  const HString name = args[1].getStringValue(-1);
-  const DataSource::PropertyType kind = Controller::mapToPropertyType(name);
+  HString const name = args[1].getStringValue(-1);
+  DataSource::PropertyType const kind = Controller::mapToPropertyType(name);
   if (kind != DataSource::NoProperty)
     return readInteger(*module, name, kind, isByDefault<GetIntPropertyCmd>(given), result);
   Attribute const* attribute = attributeNamed(*module, name);

@@ -32,7 +32,7 @@ bool GetVectorPropertyCmd::execute(Given const& given, Args const& args, Variabl
       moduleAt(args[0].getStringValue(-1),
                "%s  is not a valid unique path to a Module in the scene.");  // two spaces: kept
   if (!module) return false;
-  const HString name = args[1].getStringValue(-1);
+  HString const name = args[1].getStringValue(-1);
   if (Controller const* channel = module->getProperty(name))
     return answer(result, channelVector(*channel, isByDefault<GetVectorPropertyCmd>(given)));
 

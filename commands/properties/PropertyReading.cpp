@@ -41,7 +41,7 @@ constexpr char const* kInstead[][6] = {
 }  // namespace
 
 bool redirect(Getter getter, Attribute const& attribute) {
-  const auto kind = static_cast<size_t>(attribute.getType());
+  auto const kind = static_cast<size_t>(attribute.getType());
   char const* text = kind < std::size(kInstead) ? kInstead[kind][static_cast<size_t>(getter)] : kNone;
   Command::logError("%s", text);
   return false;
@@ -62,7 +62,7 @@ bool readNumber(Args const& args, char const* badPath, bool byDefault, Variable&
   Module const* module = moduleAt(args[0].getStringValue(-1), badPath);
   if (!module) return false;
   double value = 0;
-  const HString problem = module->getPropertyVal(args[1].getStringValue(-1), value, byDefault);
+  HString const problem = module->getPropertyVal(args[1].getStringValue(-1), value, byDefault);
   if (problem.IsEmpty()) return answer(result, value);
   Command::logError("%s", problem.GetStr());
   return false;

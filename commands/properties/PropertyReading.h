@@ -21,7 +21,7 @@ Attribute const* attributeAt(Args const& args, char const* badPath);
 // Whether "-c" or "-d" was given, which mean the same: the default value, not that at the current time.
 template <class Getter>
 bool isByDefault(Given const& given) {
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   return options.has(Getter::info.option("c")) || options.has(Getter::info.option("d"));
 }
 

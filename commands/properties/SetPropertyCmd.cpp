@@ -35,7 +35,7 @@ constexpr char const kNoSelection[] = "No selected modules to set property on.";
 
 bool setAttributes(Candidates const& candidates, HString const& name, Args const& args,
                    Change const& change) {
-  const AttributeTexts texts = {kNoModules, kNoSelection, "Failed to set attribute %s on module %s"};
+  AttributeTexts const texts = {kNoModules, kNoSelection, "Failed to set attribute %s on module %s"};
   if (eachAttribute(candidates, name, texts, [&](Attribute& attribute) {
         return setAttribute(attribute, args, change, SetPropertyCmd::info.name);
       }))
@@ -68,7 +68,7 @@ bool writeChannels(Candidates const& candidates, unsigned id, DataSource::Proper
   return candidates.each([&](Module& module) {
     Controller* channel = module.getProperty(id);
     // Kept: vector channels are written even where they are locked.
-    const bool writable =
+    bool const writable =
         channel && (channel->isKindOf(&Vec3Controller::s_classVec3Controller) || channel->isEditable());
     if (writable) write.applyTo(*channel);
     return true;
@@ -76,13 +76,13 @@ bool writeChannels(Candidates const& candidates, unsigned id, DataSource::Proper
 }
 
 bool SetPropertyCmd::execute(Given const& given, Args const& args, Variable&) {
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   Candidates candidates;
   if (!candidates.read(given, kCandidates)) return false;
-  const ChannelName property = channelNameFrom(args[0].getStringValue(-1), Suffix::anyCut);
-  const unsigned id = Controller::mapPropertyName(property.name);
-  const DataSource::PropertyType kind = Controller::mapToPropertyType(id);
-  const Change change = {property.component, options.has(kRelative)};
+  ChannelName const property = channelNameFrom(args[0].getStringValue(-1), Suffix::anyCut);
+  unsigned const id = Controller::mapPropertyName(property.name);
+  DataSource::PropertyType const kind = Controller::mapToPropertyType(id);
+  Change const change = {property.component, options.has(kRelative)};
   if (kind == DataSource::NoProperty) return setAttributes(candidates, property.name, args, change);
 
   ChannelWrite write = {options.has(kConst) || options.has(kDefault), change, {}};

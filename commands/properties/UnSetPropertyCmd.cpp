@@ -32,7 +32,7 @@ bool unset(Attribute& attribute) {
 bool UnSetPropertyCmd::execute(Given const& given, Args const& args, Variable&) {
   Candidates candidates;
   if (!candidates.read(given, kCandidates)) return false;
-  const HString name = args[0].getStringValue(-1);
+  HString const name = args[0].getStringValue(-1);
   if (Controller::mapToPropertyType(name) != DataSource::NoProperty) {
     g_db->logError("Only attributes can be unset.");
     return false;

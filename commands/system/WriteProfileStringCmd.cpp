@@ -19,7 +19,7 @@ class WriteProfileStringCmd final : public ScriptCommand<WriteProfileStringCmd> 
                                        .solo = Solo::no};
 
   bool execute(Given const& given, Args const& args, Variable& result) override {
-    const HString file = GivenOptions(given).textOr(info.option("file"), "");
+    HString const file = GivenOptions(given).textOr(info.option("file"), "");
     return answer(result,
                   g_interface->writeProfileString(args[0].getStringValue(-1), args[1].getStringValue(-1),
                                                   args[2].getStringValue(-1), file));

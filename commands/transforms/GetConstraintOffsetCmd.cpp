@@ -23,7 +23,7 @@ class GetConstraintOffsetCmd final : public ScriptCommand<GetConstraintOffsetCmd
 };
 
 bool GetConstraintOffsetCmd::execute(Given const& given, Args const& args, Variable& result) {
-  const HString path = args[0].getStringValue(-1);
+  HString const path = args[0].getStringValue(-1);
   Module* module = g_db->getModuleWithPath(path, &SolvingConstraint::s_classSolvingConstraint, false);
   if (!module) module = g_db->getModuleWithPath(path, &LabelingConstraint::s_classLabelingConstraint, false);
   auto const* constraint = objectAs<PositionConstraintBase>(module);
@@ -32,7 +32,7 @@ bool GetConstraintOffsetCmd::execute(Given const& given, Args const& args, Varia
              path.GetStr());
     return false;
   }
-  const bool world = GivenOptions(given).has(info.option("ws"));
+  bool const world = GivenOptions(given).has(info.option("ws"));
   return answer(result, world ? constraint->getConstraintOffsetWS(HTimeManager::getInstance()->getTime())
                               : constraint->getConstraintOffset());
 }

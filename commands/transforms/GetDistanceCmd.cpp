@@ -65,8 +65,8 @@ bool readPair(Args const& args, Pair& pair) {
 // Over one range or a list of ranges.
 template <class Ranges>
 double statistic(int which, Pair const& pair, Ranges const& ranges, bool mustHaveKeys) {
-  const auto& [a, b] = pair;
-  const int64 step = HTimeManager::getInstance()->getTicksPerFrame();
+  auto const& [a, b] = pair;
+  int64 const step = HTimeManager::getInstance()->getTicksPerFrame();
   switch (which) {
     case GetDistanceCmd::info.option("avg"):
       return DistanceUtils::getAvgDistance(a, b, ranges, mustHaveKeys, step);
@@ -82,9 +82,9 @@ double statistic(int which, Pair const& pair, Ranges const& ranges, bool mustHav
 }
 
 bool GetDistanceCmd::execute(Given const& given, Args const& args, Variable& result) {
-  const GivenOptions options(given);
-  const int which = lastStatistic(given);
-  const bool rangesOnly = options.has(kRangesOnly), mustHaveKeys = options.has(kMustHaveKeys);
+  GivenOptions const options(given);
+  int const which = lastStatistic(given);
+  bool const rangesOnly = options.has(kRangesOnly), mustHaveKeys = options.has(kMustHaveKeys);
   // Kept: the texts name three of the five statistics, and call the first option "-ranges".
   if (rangesOnly && which < 0) {
     g_db->logError("getDistance command option -ranges requires -avg, -min, or -max flag.");

@@ -21,7 +21,7 @@ class GetLabelingClusterOffsetCmd final : public ScriptCommand<GetLabelingCluste
 };
 
 bool GetLabelingClusterOffsetCmd::execute(Given const&, Args const& args, Variable& result) {
-  const HString path = args[0].getStringValue(-1);
+  HString const path = args[0].getStringValue(-1);
   auto const* cluster = objectAs<LabelingCluster>(
       g_db->getModuleWithPath(path, &LabelingCluster::s_classLabelingCluster, false));
   if (!cluster) {
@@ -30,7 +30,7 @@ bool GetLabelingClusterOffsetCmd::execute(Given const&, Args const& args, Variab
              path.GetStr());
     return false;
   }
-  const TSimpleArray<Vec3> offsets = cluster->getMarkerOffsets();
+  TSimpleArray<Vec3> const offsets = cluster->getMarkerOffsets();
   Variable list(Variable::VectorArray, offsets.getCount());
   for (int i = 0; i < offsets.getCount(); ++i) list.setValue(offsets[i], i);
   return answer(result, list);

@@ -21,7 +21,7 @@ class GetRotationHingeCmd final : public ScriptCommand<GetRotationHingeCmd> {
 bool GetRotationHingeCmd::execute(Given const&, Args const&, Variable&) {
   LabelingBone const* bone = selectedLabelingBone();
   if (!bone) return false;
-  const TalixRotation rotation = bone->getLocalRot(HTimeManager::getInstance()->getTime());
+  TalixRotation const rotation = bone->getLocalRot(HTimeManager::getInstance()->getTime());
   g_db->logInfo("Major angle: %f", rotation.getAsHingeRotation(bone->getMajorAxisIndex()));
   return true;
 }

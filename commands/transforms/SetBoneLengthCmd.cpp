@@ -35,7 +35,7 @@ std::vector<NewPlace> placesFor(Node const& bone, double length, bool relative, 
   for (int i = 0; i < bone.getNumNodeChildren(); ++i) {
     Node* child = bone.getNodeChild(i);
     Vec3 offset = child->getPreTranslation();
-    const double former = offset.length(), wanted = relative ? former * length : length;
+    double const former = offset.length(), wanted = relative ? former * length : length;
     offset.setLength(wanted);
     places.push_back({child, offset});
     for (int k = 0; adjust && k < child->getNumNodeChildren(); ++k) {
@@ -60,14 +60,14 @@ bool SetBoneLengthCmd::execute(Given const& given, Args const& args, Variable&) 
     logError("Primary selection must have at least one child that is a Node");
     return false;
   }
-  const double length = args[0].getFloatValue(-1);
+  double const length = args[0].getFloatValue(-1);
   if (!areFinite({length, 0, 0}, info.name)) return false;
   if (length < 0) {
     logError("Length parameter must be positive");  // kept: 0 will do
     return false;
   }
-  const GivenOptions options(given);
-  const std::vector<NewPlace> places = placesFor(*bone, length, options.has(info.option("relative")),
+  GivenOptions const options(given);
+  std::vector<NewPlace> const places = placesFor(*bone, length, options.has(info.option("relative")),
                                                  options.has(info.option("adjustChildren")));
   for (NewPlace const& place : places)
     if (!areFinite(place.preTranslation, info.name)) return false;

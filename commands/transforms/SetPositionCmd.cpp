@@ -33,10 +33,10 @@ bool writePosition(TransformWrite const& write) {
   Controller* channel = node.getTranslationChannel();
   if (!isWritable(*channel, write.byDefault)) return false;
   if (write.byDefault) {
-    const DataEdit edit = DataEdit::ofDefault(*channel);
+    DataEdit const edit = DataEdit::ofDefault(*channel);
     write.world ? node.setConstWSPos(write.vector) : node.setConstLocalPos(write.vector);
   } else {
-    const DataEdit edit(*channel, write.edited());
+    DataEdit const edit(*channel, write.edited());
     write.world ? node.setWSPos(write.time, write.vector) : node.setLocalPos(write.time, write.vector);
   }
   return true;

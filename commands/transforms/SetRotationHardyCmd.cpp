@@ -20,7 +20,7 @@ class SetRotationHardyCmd final : public ScriptCommand<SetRotationHardyCmd> {
 
 bool SetRotationHardyCmd::execute(Given const&, Args const& args, Variable&) {
   LabelingBone* bone = selectedLabelingBone();
-  const double major = args[0].getFloatValue(-1), minor = args[1].getFloatValue(-1);
+  double const major = args[0].getFloatValue(-1), minor = args[1].getFloatValue(-1);
   if (!bone || !areFinite({major, minor, 0}, info.name)) return false;
   TalixRotation rotation;
   rotation.setAsHardySpicerRotation(major, minor, bone->getMajorAxisIndex(), bone->getMinorAxisIndex(),

@@ -20,7 +20,7 @@ class SetRotationHingeCmd final : public ScriptCommand<SetRotationHingeCmd> {
 
 bool SetRotationHingeCmd::execute(Given const&, Args const& args, Variable&) {
   LabelingBone* bone = selectedLabelingBone();
-  const double angle = args[0].getFloatValue(-1);
+  double const angle = args[0].getFloatValue(-1);
   if (!bone || !areFinite({angle, 0, 0}, info.name)) return false;
   TalixRotation rotation;
   rotation.setAsHingeRotation(angle, bone->getMajorAxisIndex());

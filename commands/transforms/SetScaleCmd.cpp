@@ -32,7 +32,7 @@ bool SetScaleCmd::execute(Given const& given, Args const& args, Variable&) {
   if (!isWritable(*node.getScaleChannel(), write.byDefault)) return true;
   if (write.byDefault) {
     // Kept: the write of the default value stands in the bracket, the one at a time does not.
-    const DataEdit edit(node, write.edited());
+    DataEdit const edit(node, write.edited());
     node.setConstLocalScale(write.world ? localScale(node, write.vector, write.time) : write.vector);
   } else {
     write.world ? node.setWSScale(write.time, write.vector) : node.setLocalScale(write.time, write.vector);

@@ -8,7 +8,7 @@ bool readQuery(Given const& given, Args const& args, QueryOptions const& which, 
                TransformQuery& query) {
   for (CommandOption const& option : given) {
     if (option.getIndex() != which.inSpaceOf) continue;
-    const HString path = option.getArg(0).getStringValue(-1);
+    HString const path = option.getArg(0).getStringValue(-1);
     // Any module of that path, so that one of another kind is refused rather than passed over.
     query.space = objectAs<Node>(g_db->getModuleWithPath(path, nullptr, false));
     if (!query.space) {
@@ -19,7 +19,7 @@ bool readQuery(Given const& given, Args const& args, QueryOptions const& which, 
   query.node = nodeAt(args[0].getStringValue(-1), texts.badNode);
   if (!query.node) return false;
 
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   query.local = !options.has(which.world) && !query.space;
   if (options.has(which.world)) query.space = nullptr;
   if (options.has(which.byDefault)) query.value = TransformQuery::Default;

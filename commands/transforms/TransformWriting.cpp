@@ -9,7 +9,7 @@
 bool readWrite(Given const& given, Args const& args, WriteOptions const& which, char const* command,
                TransformWrite& write) {
   write.time = HTimeManager::getInstance()->getTime();
-  const GivenOptions options(given);
+  GivenOptions const options(given);
   write.world = options.has(which.world);
   write.byDefault = options.has(which.byDefault);
   write.preTransform = options.has(which.preTransform);
@@ -48,7 +48,7 @@ bool writeRotation(TransformWrite const& write, TalixRotation const& rotation) {
     write.world ? node.setConstWSRot(rotation) : node.setConstLocalRot(rotation, true);
     return true;
   }
-  const DataEdit edit(node, write.edited());
+  DataEdit const edit(node, write.edited());
   write.world ? node.setWSRot(write.time, rotation) : node.setLocalRot(write.time, rotation);
   return true;
 }

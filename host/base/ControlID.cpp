@@ -21,7 +21,7 @@ void ControlID::setCounter(uint64* last) { t_counter = last; }
 
 std::basic_istringstream<wchar_t>& operator>>(std::basic_istringstream<wchar_t>& in, ControlID& id) {
   // Extraction into an unsigned would take "-1" for a large number.
-  const bool negative = (in >> std::ws).peek() == L'-';
+  bool const negative = (in >> std::ws).peek() == L'-';
   uint64 number = 0;
   if (in >> number && !negative) id = ControlID(number);
   return in;

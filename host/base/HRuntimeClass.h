@@ -50,7 +50,7 @@ struct HClassAncestors {
   static constexpr auto make() {
     std::array<HRuntimeClass const*, Base::kClassDepth + 1> all{};
     if constexpr (Base::kClassDepth > 0) {
-      const auto above = HClassAncestors<typename Base::ClassBase>::make();
+      auto const above = HClassAncestors<typename Base::ClassBase>::make();
       for (size_t i = 0; i < above.size(); ++i) all[i] = above[i];
     }
     all.back() = &Base::staticClass();

@@ -8,7 +8,7 @@
 HString const HString::EMPTY_STRING;
 
 int HString::ReverseFind(char c) const {
-  const size_t at = m_text.rfind(c);
+  size_t const at = m_text.rfind(c);
   return at == std::string::npos ? -1 : static_cast<int>(at);
 }
 
@@ -27,7 +27,7 @@ void HString::Format(char const* format, ...) {
 std::string formatted(char const* format, va_list args) {
   va_list again;
   va_copy(again, args);
-  const int length = std::vsnprintf(nullptr, 0, format, args);
+  int const length = std::vsnprintf(nullptr, 0, format, args);
   std::string text;
   if (length > 0) {
     text.resize(static_cast<size_t>(length));

@@ -5,8 +5,8 @@
 
 template <class Items>
 auto itemAt(Items const& items, int64 i) {
-  const bool exists = i >= 0 && static_cast<uint64>(i) < items.size();
-  const auto at = static_cast<uint64>(i);
+  bool const exists = i >= 0 && static_cast<uint64>(i) < items.size();
+  auto const at = static_cast<uint64>(i);
   if constexpr (requires { items[at].get(); })
     return exists ? items[at].get() : nullptr;
   else

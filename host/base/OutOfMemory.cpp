@@ -26,7 +26,7 @@ void onFailure() {
 }
 
 // Installed once, with the engine: whoever puts another handler in place has his reasons.
-const std::new_handler s_former = std::set_new_handler(onFailure);
+std::new_handler const s_former = std::set_new_handler(onFailure);
 
 }  // namespace
 
@@ -35,7 +35,7 @@ void endProgramWhenOutOfMemory() { s_ends = true; }
 void endForLackOfMemory() {
   std::fflush(stdout);
   static constexpr char text[] = "error: Out of memory\n";
-  const ssize_t written = ::write(STDERR_FILENO, text, sizeof text - 1);
+  ssize_t const written = ::write(STDERR_FILENO, text, sizeof text - 1);
   static_cast<void>(written);  // there is nobody else to tell
   ::_exit(kExitStatus);
 }
@@ -54,7 +54,7 @@ bool MemoryReserve::fill() {
 }
 
 bool MemoryReserve::release() {
-  const bool had = m_block != nullptr;
+  bool const had = m_block != nullptr;
   std::free(m_block);
   m_block = nullptr;
   return had;

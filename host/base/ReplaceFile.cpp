@@ -40,7 +40,7 @@ class DescriptorBuffer : public std::streambuf {
   bool flush() {
     char const* from = pbase();
     while (from < pptr()) {
-      const ssize_t written = ::write(m_fd, from, static_cast<size_t>(pptr() - from));
+      ssize_t const written = ::write(m_fd, from, static_cast<size_t>(pptr() - from));
       if (written < 0 && errno == EINTR) continue;
       if (written < 0) {
         m_error = errno;
@@ -69,7 +69,7 @@ std::string targetOf(std::string const& path) {
 }
 
 std::string folderOf(std::string const& path) {
-  const size_t slash = path.rfind('/');
+  size_t const slash = path.rfind('/');
   return slash == std::string::npos ? "." : slash == 0 ? "/" : path.substr(0, slash);
 }
 
@@ -92,7 +92,7 @@ struct Fresh : Descriptor {
   int named(Take take) {
     for (unsigned i = 0;; ++i) {
       std::string free = folder + "/.talix-" + std::to_string(::getpid()) + "-" + std::to_string(i);
-      const int result = take(free.c_str());
+      int const result = take(free.c_str());
       if (result >= 0) name = std::move(free);
       if (result >= 0 || errno != EEXIST) return result >= 0 ? result : (fail(), -1);
     }
@@ -100,7 +100,7 @@ struct Fresh : Descriptor {
 
   void moveTo(std::string const& path) {
     if (name.empty()) {
-      const std::string link = "/proc/self/fd/" + std::to_string(fd);
+      std::string const link = "/proc/self/fd/" + std::to_string(fd);
       named([&](char const* free) {
         return ::linkat(AT_FDCWD, link.c_str(), AT_FDCWD, free, AT_SYMLINK_FOLLOW);
       });
@@ -115,10 +115,10 @@ struct Fresh : Descriptor {
 
 }  // namespace
 
-void replaceFile(const std::string& path, const std::function<void(std::ostream&)>& write) {
-  const std::string target = targetOf(path);
+void replaceFile(std::string const& path, std::function<void(std::ostream&)> const& write) {
+  std::string const target = targetOf(path);
   struct stat former {};
-  const bool exists = ::stat(target.c_str(), &former) == 0;
+  bool const exists = ::stat(target.c_str(), &former) == 0;
   if (exists && ::access(target.c_str(), W_OK) != 0) fail();
   Fresh file(folderOf(target));
   {
@@ -133,7 +133,7 @@ void replaceFile(const std::string& path, const std::function<void(std::ostream&
   file.moveTo(target);
   // The new name lasts once its folder is on disk. It stands already, so that a failure is none of the
   // caller's.
-  if (const Descriptor folder{::open(file.folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC)};
+  if (Descriptor const folder{::open(file.folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC)};
       folder.fd >= 0)
     ::fsync(folder.fd);
 }

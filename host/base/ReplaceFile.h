@@ -9,4 +9,4 @@
 // disk: whatever ends the program meanwhile leaves nothing behind. A symbolic link is followed, the rights of
 // an existing file are kept; one that may not be written is refused. Throws std::system_error, and what
 // `write` throws; then what stood at `path` is untouched. The stream only goes forward.
-void replaceFile(const std::string& path, const std::function<void(std::ostream&)>& write);
+void replaceFile(std::string const& path, std::function<void(std::ostream&)> const& write);

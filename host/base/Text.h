@@ -8,7 +8,7 @@
 // Without the blanks, tabs and line breaks around it.
 inline std::string_view withoutOuterBlanks(std::string_view text) {
   constexpr std::string_view kBlanks = " \t\r\n";
-  const size_t first = text.find_first_not_of(kBlanks);
+  size_t const first = text.find_first_not_of(kBlanks);
   return first == std::string_view::npos ? std::string_view()
                                          : text.substr(first, text.find_last_not_of(kBlanks) - first + 1);
 }

@@ -33,6 +33,6 @@ HRuntimeClass* HRuntimeClass::findClass(char const* name) {
              BitFieldAttribute, RotationAttribute, TimeAttribute, ColorAttribute, EventAttribute,
              ModAttribute, NoneAttribute, MatrixAttribute, MultiModAttribute, TemperatureAttribute, Command,
              HomCorePluginBase, CommandPluginBase>();
-  const auto found = classes.find(name ? name : "");
+  auto const found = classes.find(name ? name : "");
   return found == classes.end() ? nullptr : found->second;
 }

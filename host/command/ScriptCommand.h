@@ -69,10 +69,10 @@ using Args = TArray<Variable>;
 
 // Whether arguments fit their declaration, by number and type.
 inline bool fits(ArgsInfo const& info, Args const& args) {
-  const int count = args.getCount();
+  int const count = args.getCount();
   if (count < info.least || count > info.most) return false;
   for (int i = 0; i < count; ++i) {
-    const Variable::VarType wanted =
+    Variable::VarType const wanted =
         i < static_cast<int>(std::size(info.types)) && info.types[i] != Variable::None ? info.types[i]
                                                                                        : info.others;
     if (wanted != Variable::None && args[i].getType() != wanted) return false;

@@ -48,7 +48,7 @@ std::string numberText(Number value) {
 }  // namespace
 
 Variable::Variable(VarType type, int count) {
-  const size_t n = count > 0 ? static_cast<size_t>(count) : 0;
+  size_t const n = count > 0 ? static_cast<size_t>(count) : 0;
   switch (type) {
     case None:
       break;
@@ -96,7 +96,7 @@ Variable::VarType Variable::getType() const {
 bool Variable::isArray() const { return getType() > kArray; }
 
 bool Variable::isNumber() const {
-  const VarType type = getType();
+  VarType const type = getType();
   return type == Int || type == Float || type == Bool;
 }
 
@@ -221,12 +221,12 @@ void Variable::setValue(Vec3 const& value, int i) {
 }
 
 void Variable::convertToType(VarType type) {
-  const VarType own = getType();
+  VarType const own = getType();
   if (own == type) return;
   if (isArray()) {
     if (type < kArray || own == VectorArray || type == VectorArray) return;
     Variable converted(type, getNumItems());
-    const auto elementType = static_cast<VarType>(type - kArray);
+    auto const elementType = static_cast<VarType>(type - kArray);
     for (int i = 0; i < getNumItems(); ++i) {
       Variable element = getArrayValue(i);
       element.convertToType(elementType);
@@ -244,9 +244,9 @@ void Variable::convertToType(VarType type) {
     setValue(getFloatValue(-1), -1);
   } else if (type == String && isNumber()) {
     static constexpr char const* words[] = {"false", "true", "toggle"};
-    const BoolType value = getBoolValue(-1);
-    const bool word = own == Bool && value >= False && value <= Toggle;
-    const HString number = own == Float ? numberText(getFloatValue(-1)) : numberText(getIntValue(-1));
+    BoolType const value = getBoolValue(-1);
+    bool const word = own == Bool && value >= False && value <= Toggle;
+    HString const number = own == Float ? numberText(getFloatValue(-1)) : numberText(getIntValue(-1));
     setValue(word ? words[value] : number.GetStr(), -1);
   }
 }

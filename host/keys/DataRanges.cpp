@@ -58,7 +58,7 @@ struct DataRanges::Scan {
   void visit(KeyNode const& node) {
     if (stopped) return;
     if (node.counts.bridgesAll() && firstTimeOf(node) >= start) {
-      const int64 first = firstTimeOf(node), last = lastTimeOf(node);
+      int64 const first = firstTimeOf(node), last = lastTimeOf(node);
       reach(first);
       add(frameAtOrAfter(first, ranges.m_period), frameAtOrBefore(last, ranges.m_period));
       return pass(last, KeyTrack::kAll);
@@ -69,8 +69,8 @@ struct DataRanges::Scan {
   }
 
   void visitLeaf(KeyLeaf const& leaf) {
-    const int64 period = ranges.m_period, first = leaf.firstTime();
-    const bool everyFrame = leaf.plain() && leaf.evenTimes() && first >= start && first % period == 0 &&
+    int64 const period = ranges.m_period, first = leaf.firstTime();
+    bool const everyFrame = leaf.plain() && leaf.evenTimes() && first >= start && first % period == 0 &&
                             leaf.lastTime() - first == period * (leaf.size() - 1);
     if (everyFrame) {
       reach(first);
@@ -78,8 +78,8 @@ struct DataRanges::Scan {
       return pass(leaf.lastTime(), 0);
     }
     for (int slot = leaf.lowerBound(start); slot < leaf.size() && !stopped; ++slot) {
-      const int64 time = leaf.time(slot);
-      const unsigned held = leaf.components(slot);
+      int64 const time = leaf.time(slot);
+      unsigned const held = leaf.components(slot);
       reach(time);
       if (time % period == 0 && ranges.counts(bridged | held)) add(time / period, time / period);
       pass(time, (bridged & ~held) | leaf.bridges(slot));
@@ -93,7 +93,7 @@ DataRanges::DataRanges(KeyTrack const& track, int64 framePeriod, unsigned mask, 
 }
 
 bool DataRanges::hasDataAt(int64 time) const {
-  const int64 index = m_track.find(time);
+  int64 const index = m_track.find(time);
   return counts(m_track.bridgedAt(time) | (index < 0 ? 0u : m_track.at(index).components));
 }
 
@@ -117,15 +117,15 @@ HTimeRange DataRanges::nextRange(int64 first, int64 last) const {
 }
 
 HTimeRange DataRanges::nextGap(int64 first, int64 last) const {
-  const int64 end = frameAtOrBefore(last, m_period) * m_period;
-  const int64 start = frameAtOrAfter(first, m_period) * m_period;
+  int64 const end = frameAtOrBefore(last, m_period) * m_period;
+  int64 const start = frameAtOrAfter(first, m_period) * m_period;
   if (start > end) return {};
-  const HTimeRange range = nextRange(start, end);
+  HTimeRange const range = nextRange(start, end);
   if (range.isEmpty()) return {start, end};
   if (range.getStart() > start) return {start, range.getStart() - m_period};
   // Two runs of frames with data do not touch, so that after one there is a gap, or nothing.
   if (range.getEnd() == end) return {};
-  const HTimeRange after = nextRange(range.getEnd() + m_period, end);
+  HTimeRange const after = nextRange(range.getEnd() + m_period, end);
   return {range.getEnd() + m_period, after.isEmpty() ? end : after.getStart() - m_period};
 }
 
@@ -133,10 +133,10 @@ HTimeRange DataRanges::nextGap(int64 first, int64 last) const {
 HTimeRange DataRanges::rangeAround(int64 frameTime) const {
   HTimeRange range = nextRange(frameTime, kForever);
   if (range.isEmpty() || range.getStart() != frameTime) return {};
-  const int64 index = m_track.lowerBound(frameTime);
+  int64 const index = m_track.lowerBound(frameTime);
   for (int64 keys = 64;; keys *= 2) {
-    const int64 from = std::max<int64>(index - keys, 0);
-    const int64 time = m_track.timeAt(from);
+    int64 const from = std::max<int64>(index - keys, 0);
+    int64 const time = m_track.timeAt(from);
     int64 start = frameTime;
     visitRanges(time, frameTime, [&](int64 runStart, int64) { start = runStart; });
     range.setEnds(start, range.getEnd());
@@ -151,6 +151,6 @@ void DataRanges::bridge(KeyTrack& track, unsigned mask) const {
 }
 
 void DataRanges::bridgeAlike(KeyTrack& track, KeyTrack const& data) {
-  for (const unsigned part : KeyParts(data.shape(), KeyTrack::kAll))
+  for (unsigned const part : KeyParts(data.shape(), KeyTrack::kAll))
     if (data.bridgesAny(part)) DataRanges(data, 1, part).bridge(track, part);
 }

@@ -49,7 +49,7 @@ class DataRanges {
       if (start > next) visit(next, start - m_period);
       next = end + m_period;
     });
-    const int64 end = frameAtOrBefore(last, m_period) * m_period;
+    int64 const end = frameAtOrBefore(last, m_period) * m_period;
     if (next <= end) visit(next, end);
   }
 

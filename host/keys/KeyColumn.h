@@ -22,7 +22,7 @@ class KeyColumn {
   int size() const { return m_size; }
   bool empty() const { return m_size == 0; }
   T* data() { return m_data.get() + m_begin; }
-  const T* data() const { return m_data.get() + m_begin; }
+  T const* data() const { return m_data.get() + m_begin; }
   T& operator[](int i) { return data()[i]; }
   T const& operator[](int i) const { return data()[i]; }
   int64 bytes() const { return static_cast<int64>(m_capacity) * static_cast<int64>(sizeof(T)); }
@@ -44,7 +44,7 @@ class KeyColumn {
     return data() + at;
   }
 
-  void insert(int at, const T* from, int n, int limit) {
+  void insert(int at, T const* from, int n, int limit) {
     if (n > 0) move(open(at, n, limit), from, n);
   }
 
@@ -60,7 +60,7 @@ class KeyColumn {
   }
 
   // Leaves n groups of `width` elements, by ascending position.
-  void keep(const int* groups, int n, int width) {
+  void keep(int const* groups, int n, int width) {
     for (int i = 0; i < n; ++i) move(data() + i * width, data() + groups[i] * width, width);
     m_size = n * width;
   }
@@ -73,12 +73,12 @@ class KeyColumn {
   }
 
  private:
-  static void move(T* to, const T* from, int n) {
+  static void move(T* to, T const* from, int n) {
     if (n > 0) std::memmove(to, from, static_cast<size_t>(n) * sizeof(T));
   }
 
   void makeRoom(int n, int limit) {
-    const int needed = m_size + n;
+    int const needed = m_size + n;
     if (needed <= m_capacity) {
       move(m_data.get(), data(), m_size);
       m_begin = 0;

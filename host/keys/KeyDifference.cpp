@@ -74,13 +74,13 @@ double distance(KeyTrack::Shape shape, TreeWalk const& a, TreeWalk const& b) {
   double from[4] = {}, to[4] = {};
   a.leaf().values(a.slot(), from);
   b.leaf().values(b.slot(), to);
-  const int width = static_cast<int>(shape);
+  int const width = static_cast<int>(shape);
   if (shape == KeyTrack::Shape::Rotation) {
     double dot = 0;
     for (int c = 0; c < width; ++c) dot += from[c] * to[c];
     return 2 * std::acos(std::min(1.0, std::abs(dot)));
   }
-  const unsigned both = a.leaf().components(a.slot()) & b.leaf().components(b.slot());
+  unsigned const both = a.leaf().components(a.slot()) & b.leaf().components(b.slot());
   double largest = 0;
   for (int c = 0; c < width; ++c)
     if (both >> c & 1) largest = std::max(largest, std::abs(to[c] - from[c]));
@@ -89,7 +89,7 @@ double distance(KeyTrack::Shape shape, TreeWalk const& a, TreeWalk const& b) {
 
 bool areSame(int width, TreeWalk const& a, TreeWalk const& b) {
   KeyLeaf const &x = a.leaf(), &y = b.leaf();
-  const int i = a.slot(), k = b.slot();
+  int const i = a.slot(), k = b.slot();
   if (x.components(i) != y.components(k) || x.selected(i) != y.selected(k) || x.bridges(i) != y.bridges(k))
     return false;
   for (int c = 0; c < width; ++c)
@@ -102,7 +102,7 @@ bool areSame(int width, TreeWalk const& a, TreeWalk const& b) {
 KeyDifference differenceOf(KeyTrack const& before, KeyTrack const& after) {
   KeyDifference difference;
   bool any = false;
-  const auto note = [&](int64& count, int64 time) {
+  auto const note = [&](int64& count, int64 time) {
     if (!any) difference.first = time;
     any = true;
     difference.last = time;

@@ -16,8 +16,8 @@ KeyNode* KeyNodeRef::clone(KeyNode const& node) {
 }
 
 int KeyInner::childAtTime(int64 time) const {
-  const auto begin = m_firstTimes.begin();
-  const auto found = std::upper_bound(begin + 1, begin + m_size, time);
+  auto const begin = m_firstTimes.begin();
+  auto const found = std::upper_bound(begin + 1, begin + m_size, time);
   return static_cast<int>(found - begin) - 1;
 }
 
@@ -51,7 +51,7 @@ void KeyInner::place(int i, KeyNodeRef child) {
 KeyNodeRef KeyInner::insert(int i, KeyNodeRef child) {
   if (full()) {
     // Keys that arrive in order, from either end, leave full nodes behind; others halve them.
-    const int from = i == m_size ? i : i == 1 ? 1 : m_size / 2;
+    int const from = i == m_size ? i : i == 1 ? 1 : m_size / 2;
     auto* right = new KeyInner(level(), m_fanout);
     KeyNodeRef sibling(right);
     moveTail(from, *right);
@@ -107,7 +107,7 @@ void KeyInner::mend(int first, int last, bool tightly) {
 // Edits of single keys keep some room, so that the next insertion does not split what the last deletion
 // joined. Edits of many keys, which are rarer and whose result mostly stays, fill nodes.
 bool KeyInner::joins(int i, bool tightly) const {
-  const auto room = [tightly](int64 a, int64 b, int64 limit) {
+  auto const room = [tightly](int64 a, int64 b, int64 limit) {
     if (tightly) return a + b <= limit;
     return std::min(a, b) < std::max<int64>(limit / 4, 2) && a + b <= limit * 3 / 4;
   };

@@ -14,7 +14,7 @@ struct Tangent {
 
   static Tangent oneSided() { return {1, 0}; }
   static Tangent between(double ownLength, double otherLength) {
-    const double both = ownLength + otherLength;
+    double const both = ownLength + otherLength;
     return {otherLength / both, ownLength * ownLength / (otherLength * both)};
   }
 
@@ -29,7 +29,7 @@ class CubicSpan {
  public:
   CubicSpan() = default;
   CubicSpan(double p0, double m0, double p1, double m1) : m_value(p0), m_slope(m0) {
-    const double d = p1 - p0;
+    double const d = p1 - p0;
     m_square = 3 * d - 2 * m0 - m1;
     m_cube = m0 + m1 - 2 * d;
   }
@@ -56,7 +56,7 @@ class Arc {
   Arc(Quat const& a, Quat const& b)
       : m_a(a), m_b(b), m_angle(Imath::angle4D(a, b)), m_sinc(Imath::sinx_over_x(m_angle)) {}
   Quat at(double u) const {
-    const double s = 1 - u;
+    double const s = 1 - u;
     return (Imath::sinx_over_x(s * m_angle) / m_sinc * s * m_a +
             Imath::sinx_over_x(u * m_angle) / m_sinc * u * m_b)
         .normalized();
@@ -73,9 +73,9 @@ class SquadSpan {
   SquadSpan(Tangent const& leaving, Tangent const& arriving, Quat const& before, Quat const& a, Quat const& b,
             Quat const& after)
       : m_arc(a, b) {
-    const V3 forth = logBetween(a, b), back = -logBetween(b, a);
-    const V3 start = leaving(forth, -logBetween(a, nearest(before, a)));
-    const V3 end = arriving(back, logBetween(b, nearest(after, b)));
+    V3 const forth = logBetween(a, b), back = -logBetween(b, a);
+    V3 const start = leaving(forth, -logBetween(a, nearest(before, a)));
+    V3 const end = arriving(back, logBetween(b, nearest(after, b)));
     m_near = Arc(turned(a, (start - forth) * 0.5), turned(b, (back - end) * 0.5));
   }
   Quat at(double u) const { return Arc(m_arc.at(u), m_near.at(u)).at(2 * u * (1 - u)); }
@@ -93,8 +93,8 @@ template <class Point, class Wanted>
 void interpolateKeys(KeyTrack::Shape shape, Interpolation kind, int64 time, Point before, Point const& a,
                      Point const& b, Point after, Wanted wanted, KeyTrack::Values& values) {
   using namespace interpolation;
-  const auto length = static_cast<double>(b.time() - a.time());
-  const double u = static_cast<double>(time - a.time()) / length;
+  auto const length = static_cast<double>(b.time() - a.time());
+  double const u = static_cast<double>(time - a.time()) / length;
   Tangent leaving = Tangent::oneSided(), arriving = leaving;
   if (kind == Interpolation::Cubic) {
     if (before) leaving = Tangent::between(length, static_cast<double>(a.time() - before.time()));
@@ -104,11 +104,11 @@ void interpolateKeys(KeyTrack::Shape shape, Interpolation kind, int64 time, Poin
   }
 
   if (shape == KeyTrack::Shape::Rotation) {
-    const auto quatAt = [](Point const& key) {
+    auto const quatAt = [](Point const& key) {
       return Quat(key.value(3), key.value(0), key.value(1), key.value(2));
     };
-    const Quat qa = quatAt(a), qb = nearest(quatAt(b), qa);
-    const Quat q = kind == Interpolation::Linear
+    Quat const qa = quatAt(a), qb = nearest(quatAt(b), qa);
+    Quat const q = kind == Interpolation::Linear
                        ? Arc(qa, qb).at(u)
                        : SquadSpan(leaving, arriving, quatAt(before), qa, qb, quatAt(after)).at(u);
     values = {q.v.x, q.v.y, q.v.z, q.r};
@@ -116,7 +116,7 @@ void interpolateKeys(KeyTrack::Shape shape, Interpolation kind, int64 time, Poin
   }
   for (int c = 0; c < static_cast<int>(shape); ++c) {
     if (!wanted(c)) continue;
-    const double pa = a.value(c), pb = b.value(c), d = pb - pa;
+    double const pa = a.value(c), pb = b.value(c), d = pb - pa;
     double& out = values[static_cast<size_t>(c)];
     if (kind == Interpolation::Linear) {
       out = pa + d * u;

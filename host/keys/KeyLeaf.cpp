@@ -6,15 +6,15 @@
 
 namespace {
 
-bool sameBits(const double* a, const double* b, int n) {
+bool sameBits(double const* a, double const* b, int n) {
   return std::memcmp(a, b, static_cast<size_t>(n) * sizeof(double)) == 0;
 }
 
-bool allEqual(const double* values, int width, int n) {
+bool allEqual(double const* values, int width, int n) {
   return sameBits(values, values + width, width * (n - 1));
 }
 
-bool fitFloats(const double* values, int n) {
+bool fitFloats(double const* values, int n) {
   constexpr double kLargest = std::numeric_limits<float>::max();
   for (int i = 0; i < n; ++i)
     if (!(values[i] >= -kLargest && values[i] <= kLargest) ||
@@ -25,7 +25,7 @@ bool fitFloats(const double* values, int n) {
 
 // Values of every `step`-th key, of keys `width` wide, into a strided array.
 template <class T>
-void spread(const T* from, int width, int step, int n, int first, int end, double* out, ptrdiff_t stride) {
+void spread(T const* from, int width, int step, int n, int first, int end, double* out, ptrdiff_t stride) {
   if (step == 1 && first == 0 && end == width && stride == width) {
     std::copy_n(from, n * width, out);
     return;
@@ -46,20 +46,20 @@ void KeyLeaf::readValues(int slot, int step, int n, int first, int end, double* 
   }
 }
 
-void KeyLeaf::insert(int slot, int64 time, const double* values, KeyFlags const& flags) {
+void KeyLeaf::insert(int slot, int64 time, double const* values, KeyFlags const& flags) {
   insertValues(slot, values, 1);
   insertFlags(slot, flags, 1);
   m_times.insert(slot, time, m_limit);
 }
 
-void KeyLeaf::append(int64 start, int64 period, const double* values, int n) {
+void KeyLeaf::append(int64 start, int64 period, double const* values, int n) {
   insertValues(size(), values, n);
   insertFlags(size(), {}, n);
   m_times.append(start, period, n, m_limit);
 }
 
 void KeyLeaf::append(KeyLeaf const& from, int first, int last) {
-  const int n = last - first;
+  int const n = last - first;
   std::vector<double> values(static_cast<size_t>(n * m_width));
   from.readValues(first, 1, n, 0, m_width, values.data(), m_width);
   insertValues(size(), values.data(), n);
@@ -69,7 +69,7 @@ void KeyLeaf::append(KeyLeaf const& from, int first, int last) {
   m_times.append(from.m_times, first, last);
 }
 
-void KeyLeaf::write(int slot, const double* values, unsigned mask) {
+void KeyLeaf::write(int slot, double const* values, unsigned mask) {
   std::array<double, 4> fresh{};
   this->values(slot, fresh.data());
   for (int c = 0; c < m_width; ++c)
@@ -89,7 +89,7 @@ void KeyLeaf::erase(int first, int last) {
   dropIdleFlags();
 }
 
-void KeyLeaf::keep(const int* slots, int n) {
+void KeyLeaf::keep(int const* slots, int n) {
   KeyCounts left;
   for (int i = 0; i < n; ++i) left.count(flags(slots[i]), 1);
   counts = left;
@@ -110,10 +110,10 @@ void KeyLeaf::pack() {
 }
 
 void KeyLeaf::setFlags(int slot, KeyFlags const& fresh) {
-  const KeyFlags old = flags(slot);
+  KeyFlags const old = flags(slot);
   if (fresh == old) return;
   // Columns that have to be written out come first: there may be no memory for them.
-  const unsigned bits = fresh.components | fresh.bridges << kBridgeShift;
+  unsigned const bits = fresh.components | fresh.bridges << kBridgeShift;
   if (plain() && bits != kWhole) insertBits(m_flags, kWhole, kWhole, 0, 0);
   if (m_selection.empty() && fresh.selected) insertBits(m_selection, 0, 0, 0, 0);
   counts.count(old, -1);
@@ -142,7 +142,7 @@ void KeyLeaf::transform(int first, int last, void (*change)(void*, double*), voi
 }
 
 // Replaces all values, whose number may change.
-void KeyLeaf::setValues(const double* values, int n) {
+void KeyLeaf::setValues(double const* values, int n) {
   m_doubles.clear();
   m_floats.clear();
   m_form = n == 1 || allEqual(values, m_width, n) ? Form::One
@@ -151,7 +151,7 @@ void KeyLeaf::setValues(const double* values, int n) {
   addValues(0, values, n);
 }
 
-void KeyLeaf::insertValues(int slot, const double* values, int n) {
+void KeyLeaf::insertValues(int slot, double const* values, int n) {
   if (size() == 0) return setValues(values, n);
   if (m_form == Form::One) {
     if (sameBits(values, m_doubles.data(), m_width) && allEqual(values, m_width, n)) return;
@@ -163,7 +163,7 @@ void KeyLeaf::insertValues(int slot, const double* values, int n) {
 }
 
 // The form must hold them.
-void KeyLeaf::addValues(int slot, const double* values, int n) {
+void KeyLeaf::addValues(int slot, double const* values, int n) {
   if (m_form == Form::One) n = 1;
   if (m_form == Form::Float) {
     float* gap = m_floats.open(slot * m_width, n * m_width, m_limit * m_width);
@@ -174,7 +174,7 @@ void KeyLeaf::addValues(int slot, const double* values, int n) {
 }
 
 void KeyLeaf::insertFlags(int slot, KeyFlags const& flags, int n) {
-  const unsigned bits = flags.components | flags.bridges << kBridgeShift;
+  unsigned const bits = flags.components | flags.bridges << kBridgeShift;
   if (bits != kWhole || !plain()) insertBits(m_flags, kWhole, bits, slot, n);
   if (flags.selected || !m_selection.empty()) insertBits(m_selection, 0, flags.selected, slot, n);
   for (int i = 0; i < n; ++i) counts.count(flags, 1);
@@ -189,14 +189,14 @@ void KeyLeaf::appendBits(Column& column, Column const& from, unsigned absent, in
 
 // An absent column is written out first: each slot had the bits `absent`.
 void KeyLeaf::insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n) {
-  const auto fill = [&](int at, int count, unsigned with) {
+  auto const fill = [&](int at, int count, unsigned with) {
     std::memset(column.open(at, count, m_limit), static_cast<int>(with), static_cast<size_t>(count));
   };
   if (column.empty() && size() > 0) fill(0, size(), absent);
   if (n > 0) fill(slot, n, bits);
 }
 
-void KeyLeaf::putValues(int slot, const double* values) {
+void KeyLeaf::putValues(int slot, double const* values) {
   if (m_form == Form::One) {
     if (sameBits(values, m_doubles.data(), m_width)) return;
     if (size() > 1) spellOutValues(fitFloats(m_doubles.data(), m_width) && fitFloats(values, m_width));
@@ -214,7 +214,7 @@ void KeyLeaf::spellOutValues(bool asFloats) {
   values(0, one.data());
   m_doubles.clear();
   m_form = asFloats ? Form::Float : Form::Double;
-  const int n = size() * m_width;
+  int const n = size() * m_width;
   if (asFloats) {
     float* gap = m_floats.open(0, n, m_limit * m_width);
     for (int i = 0; i < n; ++i) gap[i] = static_cast<float>(one[static_cast<size_t>(i % m_width)]);
@@ -236,13 +236,13 @@ int64 KeyLeaf::memoryUse() const {
          m_flags.bytes() + m_selection.bytes();
 }
 
-const char* KeyLeaf::checkInvariants() const {
+char const* KeyLeaf::checkInvariants() const {
   if (size() == 0) return "a leaf is empty";
   if (size() > m_limit) return "a leaf is too large";
   for (int slot = 1; slot < size(); ++slot)
     if (time(slot) <= time(slot - 1)) return "key times do not ascend";
 
-  const int stored = m_form == Form::One ? m_width : size() * m_width;
+  int const stored = m_form == Form::One ? m_width : size() * m_width;
   if ((m_form == Form::Float ? m_floats.size() : m_doubles.size()) != stored) return "values are missing";
   if (!m_times.isWhole()) return "times are missing";
   if (!plain() && m_flags.size() != size()) return "flags are missing";

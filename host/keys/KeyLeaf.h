@@ -56,7 +56,7 @@ class KeyLeaf final : public KeyNode {
     if (m_form == Form::Float) {
       for (int c = 0; c < m_width; ++c) out[c] = static_cast<double>(m_floats[slot * m_width + c]);
     } else {
-      const double* from = m_doubles.data() + (m_form == Form::One ? 0 : slot * m_width);
+      double const* from = m_doubles.data() + (m_form == Form::One ? 0 : slot * m_width);
       for (int c = 0; c < m_width; ++c) out[c] = from[c];
     }
   }
@@ -87,14 +87,14 @@ class KeyLeaf final : public KeyNode {
     return scan<-1, false>(m_selection, 0, slot, mask);
   }
 
-  void insert(int slot, int64 time, const double* values, KeyFlags const& flags);
+  void insert(int slot, int64 time, double const* values, KeyFlags const& flags);
   // n whole keys after the last one. The leaf must have room for them.
-  void append(int64 start, int64 period, const double* values, int n);
+  void append(int64 start, int64 period, double const* values, int n);
   void append(KeyLeaf const& from, int first, int last);
-  void write(int slot, const double* values, unsigned mask);
+  void write(int slot, double const* values, unsigned mask);
   void erase(int first, int last);
   // Leaves the n ascending slots; cheaper than erasing the others run by run.
-  void keep(const int* slots, int n);
+  void keep(int const* slots, int n);
   // To be called when an edit of many keys is done: gives back the room that it left.
   void pack();
   void setFlags(int slot, KeyFlags const& flags);
@@ -106,7 +106,7 @@ class KeyLeaf final : public KeyNode {
 
   int64 memoryUse() const;
   // The text of the first broken invariant, null when all hold.
-  const char* checkInvariants() const;
+  char const* checkInvariants() const;
 
  private:
   enum class Form : unsigned char { One, Float, Double };
@@ -123,15 +123,15 @@ class KeyLeaf final : public KeyNode {
     return -1;
   }
 
-  void insertValues(int slot, const double* values, int n);
+  void insertValues(int slot, double const* values, int n);
   void insertFlags(int slot, KeyFlags const& flags, int n);
   void appendBits(Column& column, Column const& from, unsigned absent, int first, int n);
   void insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n);
   void spellOutValues(bool asFloats);
   void widen();
-  void setValues(const double* values, int n);
-  void addValues(int slot, const double* values, int n);
-  void putValues(int slot, const double* values);
+  void setValues(double const* values, int n);
+  void addValues(int slot, double const* values, int n);
+  void putValues(int slot, double const* values);
 
   int m_width;
   int m_limit;

@@ -68,7 +68,7 @@ struct KeyCounts {
   }
 
  private:
-  static bool anyOf(const int64 (&by)[3], unsigned mask) {
+  static bool anyOf(int64 const (&by)[3], unsigned mask) {
     return (mask & 1 && by[0]) || (mask & 2 && by[1]) || (mask & 4 && by[2]);
   }
 };

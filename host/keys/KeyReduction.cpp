@@ -16,8 +16,8 @@ class Curve {
  public:
   Curve(KeyTrack const& track, int component, ReductionRule const& rule)
       : m_shape(component < 0 ? track.shape() : KeyTrack::Shape::Scalar), m_rule(rule) {
-    const bool rotation = m_shape == KeyTrack::Shape::Rotation;
-    const double limit = rotation ? std::sin(std::min(rule.tolerance, M_PI) / 2) : rule.tolerance;
+    bool const rotation = m_shape == KeyTrack::Shape::Rotation;
+    double const limit = rotation ? std::sin(std::min(rule.tolerance, M_PI) / 2) : rule.tolerance;
     m_limit = limit * limit;
     // Two lines are farthest apart where one of them bends, which is at a key; steps change there only.
     m_keysSuffice = rule.interpolation == Interpolation::Constant ||
@@ -32,7 +32,7 @@ class Curve {
     for (int64 anchor = 0; anchor + 1 < size();) {
       for (limit = std::max(limit, anchor + 1); !m_stays[at(limit)]; ++limit) {
       }
-      const int64 next = farthest({beforePrevious, previous, anchor}, limit);
+      int64 const next = farthest({beforePrevious, previous, anchor}, limit);
       for (int64 i = anchor + 1; i < next; ++i) visit(m_index[at(i)]);
       beforePrevious = previous;
       previous = anchor;
@@ -66,14 +66,14 @@ class Curve {
   }
 
   void read(KeyTrack const& track, int component) {
-    const size_t count = at(track.count());
+    size_t const count = at(track.count());
     m_times.reserve(count);
     m_values.reserve(count * at(width()));
     int64 index = 0;
     std::vector<unsigned char> bridged;
-    const unsigned parts = component < 0 ? KeyTrack::kAll : 1u << component;
+    unsigned const parts = component < 0 ? KeyTrack::kAll : 1u << component;
     track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
-      const int64 own = index++;
+      int64 const own = index++;
       if (component >= 0 && !(key.components >> component & 1)) return;
       m_index.push_back(own);
       m_times.push_back(key.time);
@@ -94,7 +94,7 @@ class Curve {
   int64 farthest(Kept const& kept, int64 limit) const {
     int64 good = kept.anchor + 1, bad = limit + 1;
     for (int64 reach = 2; good < limit; reach *= 2) {
-      const int64 next = std::min(kept.anchor + reach, limit);
+      int64 const next = std::min(kept.anchor + reach, limit);
       if (!mayJoin(kept, next)) {
         bad = next;
         break;
@@ -102,7 +102,7 @@ class Curve {
       good = next;
     }
     while (bad - good > 1) {
-      const int64 middle = good + (bad - good) / 2;
+      int64 const middle = good + (bad - good) / 2;
       (mayJoin(kept, middle) ? good : bad) = middle;
     }
     return good;
@@ -110,7 +110,7 @@ class Curve {
 
   // Whether the curve holds when all keys between the anchor and `next` go and all later ones stay for now.
   bool mayJoin(Kept const& kept, int64 next) const {
-    const auto [beforePrevious, previous, anchor] = kept;
+    auto const [beforePrevious, previous, anchor] = kept;
     if (!spanHolds(point(previous), anchor, next, point(next + 1))) return false;
     if (m_rule.interpolation != Interpolation::Cubic) return true;
     return (previous < 0 || spanHolds(point(beforePrevious), previous, anchor, point(next))) &&
@@ -119,12 +119,12 @@ class Curve {
 
   // Whether one span from `first` to `last` holds in place of the spans between them.
   bool spanHolds(Point before, int64 first, int64 last, Point after) const {
-    const Point a = point(first), b = point(last);
-    const auto keyHolds = [&](int64 i) {
+    Point const a = point(first), b = point(last);
+    auto const keyHolds = [&](int64 i) {
       return isNear(between(before, a, b, after, m_times[at(i)]), valuesAt(point(i)));
     };
     // What does not hold mostly deviates most in the middle.
-    const int64 middle = first + (last - first) / 2;
+    int64 const middle = first + (last - first) / 2;
     if (middle > first && !keyHolds(middle)) return false;
     for (int64 i = first; i < last; ++i)
       if ((i > first && !keyHolds(i)) || (m_hasFrames[at(i)] && !framesHold(before, a, b, after, i)))
@@ -135,7 +135,7 @@ class Curve {
   // The same at the frames between the original keys i and i + 1.
   bool framesHold(Point before, Point a, Point b, Point after, int64 i) const {
     if (m_keysSuffice) return true;
-    const int64 end = m_times[at(i + 1)];
+    int64 const end = m_times[at(i + 1)];
     int64 frame = firstFrameAfter(m_times[at(i)]);
     if ((end - frame) / m_rule.framePeriod > kMostFrames) return false;
     for (; frame < end; frame += m_rule.framePeriod)
@@ -163,12 +163,12 @@ class Curve {
   bool isNear(KeyTrack::Values const& a, KeyTrack::Values const& b) const {
     double distance = 0;
     if (m_shape == KeyTrack::Shape::Rotation) {
-      const interpolation::Quat turn =
+      interpolation::Quat const turn =
           ~interpolation::Quat(a[3], a[0], a[1], a[2]) * interpolation::Quat(b[3], b[0], b[1], b[2]);
       distance = turn.v.length2();  // the square of the sine of half the angle
     } else {
       for (int c = 0; c < width(); ++c) {
-        const double d = m_rule.isWhole ? std::round(a[at(c)]) - std::round(b[at(c)]) : a[at(c)] - b[at(c)];
+        double const d = m_rule.isWhole ? std::round(a[at(c)]) - std::round(b[at(c)]) : a[at(c)] - b[at(c)];
         distance += d * d;
       }
     }

@@ -44,7 +44,7 @@ int64 findNext(KeyNode const& node, int64 from, Wanted const& wanted) {
   int i = inner.childAtIndex(from);
   before -= from;
   for (; i < inner.size(); before += inner.keys(i++), from = 0) {
-    const int64 found = findNext(inner.child(i), from, wanted);
+    int64 const found = findNext(inner.child(i), from, wanted);
     if (found >= 0) return before + found;
   }
   return -1;
@@ -60,7 +60,7 @@ int64 findPrevious(KeyNode const& node, int64 from, Wanted const& wanted) {
   int i = inner.childAtIndex(from);
   before -= from;
   for (;;) {
-    const int64 found = findPrevious(inner.child(i), from, wanted);
+    int64 const found = findPrevious(inner.child(i), from, wanted);
     if (found >= 0) return before + found;
     if (--i < 0) return -1;
     before -= inner.keys(i);
@@ -92,7 +92,7 @@ int64 bytesAloneOf(KeyNode const& node) {
   return sum;
 }
 
-const char* brokenInvariant(KeyNode const& node) {
+char const* brokenInvariant(KeyNode const& node) {
   if (node.isLeaf()) return asLeaf(node).checkInvariants();
   auto const& inner = asInner(node);
   if (inner.size() == 0) return "an inner node is empty";
@@ -101,7 +101,7 @@ const char* brokenInvariant(KeyNode const& node) {
   for (int i = 0; i < inner.size(); ++i) {
     KeyNode const& child = inner.child(i);
     if (child.level() != node.level() - 1) return "a child has the wrong level";
-    if (const char* broken = brokenInvariant(child)) return broken;
+    if (char const* broken = brokenInvariant(child)) return broken;
     if (i > 0 && firstTimeOf(child) <= lastTimeOf(inner.child(i - 1))) return "key times do not ascend";
     if (inner.firstTime(i) != firstTimeOf(child)) return "the first time of a child is wrong";
     if (inner.keys(i) != child.counts.keys) return "the number of keys of a child is wrong";
@@ -158,7 +158,7 @@ int64 KeyTrack::countSelected(unsigned mask) const {
 KeyTrack::Place KeyTrack::placeAt(int64 index) const {
   Place place{nullptr, index, 0};
   if (index < 0 || index >= count()) return place;
-  const KeyNode* node = m_root.get();
+  KeyNode const* node = m_root.get();
   while (!node->isLeaf()) node = &asInner(*node).child(asInner(*node).childAtIndex(index));
   place.leaf = &asLeaf(*node);
   place.slot = static_cast<int>(index);
@@ -168,27 +168,27 @@ KeyTrack::Place KeyTrack::placeAt(int64 index) const {
 // No leaf, and index -1, when the time lies before the first key.
 KeyTrack::Place KeyTrack::placeAtOrBefore(int64 time) const {
   if (!m_root || time < firstTimeOf(*m_root.get())) return {};
-  const KeyNode* node = m_root.get();
+  KeyNode const* node = m_root.get();
   int64 before = 0;
   while (!node->isLeaf()) {
     auto const& inner = asInner(*node);
-    const int i = inner.childAtTime(time);
+    int const i = inner.childAtTime(time);
     before += inner.keysBefore(i);
     node = &inner.child(i);
   }
-  const int slot = asLeaf(*node).lastAtOrBefore(time);
+  int const slot = asLeaf(*node).lastAtOrBefore(time);
   return {&asLeaf(*node), before + slot, slot};
 }
 
 KeyTrack::Key KeyTrack::at(int64 index) const {
-  const Place place = placeAt(index);
+  Place const place = placeAt(index);
   return keyIn(*place.leaf, place.slot);
 }
 
 int64 KeyTrack::timeAt(int64 index) const { return placeAt(index).time(); }
 
 int64 KeyTrack::selectedIndex(int64 i) const {
-  const KeyNode* node = m_root.get();
+  KeyNode const* node = m_root.get();
   int64 before = 0;
   while (!node->isLeaf()) {
     auto const& inner = asInner(*node);
@@ -206,22 +206,22 @@ int64 KeyTrack::selectedIndex(int64 i) const {
 }
 
 int64 KeyTrack::find(int64 time) const {
-  const Place place = placeAtOrBefore(time);
+  Place const place = placeAtOrBefore(time);
   return place && place.time() == time ? place.index : -1;
 }
 
 int64 KeyTrack::lowerBound(int64 time) const {
-  const Place place = placeAtOrBefore(time);
+  Place const place = placeAtOrBefore(time);
   return place && place.time() == time ? place.index : place.index + 1;
 }
 
 unsigned KeyTrack::bridgedAt(int64 time, unsigned mask) const {
   unsigned bridged = 0;
   if (!bridgesAny(mask)) return bridged;
-  const int64 index = lowerBound(time);
+  int64 const index = lowerBound(time);
   if (index == count()) return bridged;
-  for (const unsigned part : KeyParts(m_shape, mask)) {
-    const int64 before = previousHolding(index, part);
+  for (unsigned const part : KeyParts(m_shape, mask)) {
+    int64 const before = previousHolding(index, part);
     if (before >= 0) bridged |= placeAt(before).bridges() & part;
   }
   return bridged;
@@ -260,7 +260,7 @@ int64 KeyTrack::previousUnselected(int64 index, unsigned mask) const {
 
 KeyTrack::Key KeyTrack::Reader::next() {
   if (!m_leaf || m_slot == m_leaf->size()) {
-    const Place place = m_track.placeAt(m_index);
+    Place const place = m_track.placeAt(m_index);
     m_leaf = place.leaf;
     m_slot = place.slot;
   }
@@ -274,7 +274,7 @@ bool KeyTrack::operator==(KeyTrack const& o) const {
   if (!(m_root->counts == o.m_root->counts)) return false;
   Reader mine(*this, 0), theirs(o, 0);
   for (int64 i = 0; i < count(); ++i) {
-    const Key a = mine.next(), b = theirs.next();
+    Key const a = mine.next(), b = theirs.next();
     if (a.time != b.time || a.components != b.components || a.selected != b.selected ||
         a.bridges != b.bridges || std::memcmp(a.values.data(), b.values.data(), sizeof(Values)) != 0)
       return false;
@@ -290,10 +290,10 @@ int64 KeyTrack::memoryUse() const {
 
 int64 KeyTrack::memoryAlone() const { return m_root ? bytesAloneOf(*m_root.get()) : 0; }
 
-const char* KeyTrack::checkInvariants() const {
-  const char* broken = m_root ? brokenInvariant(*m_root.get()) : nullptr;
-  for (const unsigned part : KeyParts(m_shape, kAll)) {
-    const Place last = placeAt(broken ? -1 : previousHolding(count(), part));
+char const* KeyTrack::checkInvariants() const {
+  char const* broken = m_root ? brokenInvariant(*m_root.get()) : nullptr;
+  for (unsigned const part : KeyParts(m_shape, kAll)) {
+    Place const last = placeAt(broken ? -1 : previousHolding(count(), part));
     if (last && last.bridges() & part) broken = "the last key that holds a component bridges it";
   }
   return broken ? broken : "";

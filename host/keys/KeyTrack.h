@@ -8,8 +8,8 @@
 //  4. The counts in inner nodes (keys; keys, selected keys and bridges by component) are those of their
 //  leaves.
 //  5. No leaf is empty; what a leaf stores in a compact form has it: even times (a start and a period) or
-//  offsets (LeafTimes.h), no flags (every key whole, nothing bridged), no selection, equal values stored once,
-//  values stored as floats without loss.
+//  offsets (LeafTimes.h), no flags (every key whole, nothing bridged), no selection, equal values stored
+//  once, values stored as floats without loss.
 //
 // Bridges tell where there is data between keys (DataRanges.h): a key that bridges a component goes on to the
 // next key that has it. Values between keys do not depend on them.
@@ -64,8 +64,8 @@ class KeyTrack {
   // Remembers where the last evaluation was, so that playing forward costs constant time. Belongs to the
   // caller; a cursor of another or a changed track only costs a search.
   struct Cursor {
-    const KeyLeaf* leaf = nullptr;  // valid only while the version is the track's
-    const KeyLeaf* next = nullptr;  // the next leaf, null after the last
+    KeyLeaf const* leaf = nullptr;  // valid only while the version is the track's
+    KeyLeaf const* next = nullptr;  // the next leaf, null after the last
     int64 firstIndex = 0;           // of the leaf
     int slot = 0;
     uint64 version = 0;
@@ -114,7 +114,7 @@ class KeyTrack {
   void set(int64 time, Values const& values, unsigned mask = kAll);
   // Appends `n` whole keys at start, start + period, ... (after the last key); `values` holds n * width()
   // doubles.
-  void append(int64 start, int64 period, const double* values, int64 n);
+  void append(int64 start, int64 period, double const* values, int64 n);
 
   // Erasing on a mask removes these components; a key left without any goes, and a bridge that loses one of
   // its two keys goes whole. They return the number of keys that lost something. Ranges include both ends;
@@ -183,7 +183,7 @@ class KeyTrack {
 
    private:
     KeyTrack const& m_track;
-    const KeyLeaf* m_leaf = nullptr;  // of the next key; null: to be searched
+    KeyLeaf const* m_leaf = nullptr;  // of the next key; null: to be searched
     int64 m_index;
     int m_slot = 0;
   };
@@ -208,7 +208,7 @@ class KeyTrack {
   // Bytes held that no other track shares.
   int64 memoryAlone() const;
   // Tests the invariants; the text of the first broken one, empty when all hold.
-  const char* checkInvariants() const;
+  char const* checkInvariants() const;
 
  private:
   friend class DataRanges;
@@ -230,7 +230,7 @@ class KeyTrack {
   void put(Key const& key);
   KeyNodeRef setBelow(KeyNodeRef& node, Key const& key);
   KeyNodeRef setInLeaf(KeyNodeRef& node, Key const& key);
-  KeyNodeRef appendBelow(KeyNodeRef& node, int64 start, int64 period, const double* values, int n);
+  KeyNodeRef appendBelow(KeyNodeRef& node, int64 start, int64 period, double const* values, int n);
   void growRoot(KeyNodeRef sibling);
   int64 edit(int64 firstIndex, int64 lastIndex, LeafEdit&);
   int64 editTimes(int64 first, int64 last, LeafEdit&);

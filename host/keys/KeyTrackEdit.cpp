@@ -26,7 +26,7 @@ struct KeyTrack::LeafEdit {
   void (*change)(void*, double*) = nullptr;  // Transform
   void* context = nullptr;
   // Thin: what each key from the next one to be visited loses, and bridges from now on.
-  const unsigned char *lost = nullptr, *bridged = nullptr;
+  unsigned char const *lost = nullptr, *bridged = nullptr;
 
   bool erases() const { return kind == Kind::Erase || kind == Kind::EraseSelected || kind == Kind::Thin; }
   bool dropsWhole() const { return kind == Kind::Erase && mask == kAll; }
@@ -70,12 +70,12 @@ struct KeyTrack::LeafEdit {
 
  private:
   void changeFlags(KeyLeaf& leaf, int first, int last) {
-    const bool adds = kind == Kind::Select || kind == Kind::Bridge;
-    const bool bridges = kind == Kind::Bridge || kind == Kind::Unbridge;
+    bool const adds = kind == Kind::Select || kind == Kind::Bridge;
+    bool const bridges = kind == Kind::Bridge || kind == Kind::Unbridge;
     for (int slot = first; slot < last; ++slot) {
       KeyFlags flags = leaf.flags(slot);
       unsigned& bits = bridges ? flags.bridges : flags.selected;
-      const unsigned touched = mask & (adds ? flags.components : bits);
+      unsigned const touched = mask & (adds ? flags.components : bits);
       affected += touched != 0;
       bits = adds ? bits | touched : bits & ~touched;
       leaf.setFlags(slot, flags);
@@ -87,8 +87,8 @@ struct KeyTrack::LeafEdit {
   void eraseComponents(KeyLeaf& leaf, int first, int last) {
     int runEnd = last;
     for (int slot = last - 1; slot >= first; --slot) {
-      const KeyFlags now = leaf.flags(slot);
-      const unsigned gone = kind == Kind::Thin    ? lost[slot] & now.components
+      KeyFlags const now = leaf.flags(slot);
+      unsigned const gone = kind == Kind::Thin    ? lost[slot] & now.components
                             : kind == Kind::Erase ? mask & now.components
                                                   : mask & now.selected;
       affected += gone != 0;
@@ -145,31 +145,31 @@ KeyNodeRef KeyTrack::setBelow(KeyNodeRef& node, Key const& key) {
   if (node->isLeaf()) return setInLeaf(node, key);
   node.own();
   auto& inner = asInner(*node.get());
-  const int i = inner.childAtTime(key.time);
+  int const i = inner.childAtTime(key.time);
   KeyNodeRef& child = inner.childRef(i);
-  const KeyCounts before = child->counts;
+  KeyCounts const before = child->counts;
   KeyNodeRef sibling = setBelow(child, key);
   inner.childChanged(i, before);
   return sibling ? inner.insert(i + 1, std::move(sibling)) : KeyNodeRef();
 }
 
 KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key) {
-  const auto insertInto = [&](KeyLeaf& leaf, int slot) {
+  auto const insertInto = [&](KeyLeaf& leaf, int slot) {
     Values held{};
     for (size_t c = 0; c < held.size(); ++c)
       if (m_shape != Shape::Vector || key.components >> c & 1) held[c] = key.values[c];
     leaf.insert(slot, key.time, held.data(), {key.components, key.bridges, key.selected});
   };
 
-  const auto& old = asLeaf(*node.get());
-  const int size = old.size();
-  const int slot = size == 0 ? 0 : old.lowerBound(key.time);
-  const bool present = slot < size && old.time(slot) == key.time;
+  auto const& old = asLeaf(*node.get());
+  int const size = old.size();
+  int const slot = size == 0 ? 0 : old.lowerBound(key.time);
+  bool const present = slot < size && old.time(slot) == key.time;
   if (present || !old.full()) {
     node.own();
     auto& leaf = asLeaf(*node.get());
     if (present) {
-      const KeyFlags held = leaf.flags(slot);
+      KeyFlags const held = leaf.flags(slot);
       leaf.write(slot, key.values.data(), key.components);
       leaf.setFlags(slot, {held.components | key.components, held.bridges | (key.bridges & ~held.components),
                            held.selected | key.selected});
@@ -190,7 +190,7 @@ KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key) {
   }
   node.own();
   auto& left = asLeaf(*node.get());
-  const int half = size / 2;
+  int const half = size / 2;
   fresh->append(left, half, size);
   left.erase(half, size);
   if (slot <= half) {
@@ -201,14 +201,14 @@ KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key) {
   return sibling;
 }
 
-void KeyTrack::append(int64 start, int64 period, const double* values, int64 n) {
+void KeyTrack::append(int64 start, int64 period, double const* values, int64 n) {
   if (n <= 0) return;
   assert((n == 1 || period > 0) && (empty() || start > timeAt(count() - 1)));
   changed();
   while (n > 0) {
-    const Place last = placeAt(count() - 1);
-    const int64 used = last && !last.leaf->full() ? last.leaf->size() : 0;
-    const int some = static_cast<int>(std::min(n, m_limits.leafKeys - used));
+    Place const last = placeAt(count() - 1);
+    int64 const used = last && !last.leaf->full() ? last.leaf->size() : 0;
+    int const some = static_cast<int>(std::min(n, m_limits.leafKeys - used));
     KeyNodeRef sibling;
     if (m_root) {
       sibling = appendBelow(m_root, start, period, values, some);
@@ -225,7 +225,7 @@ void KeyTrack::append(int64 start, int64 period, const double* values, int64 n) 
 }
 
 // Appends n keys, which fit the last leaf or, when that is full, a new one.
-KeyNodeRef KeyTrack::appendBelow(KeyNodeRef& node, int64 start, int64 period, const double* values, int n) {
+KeyNodeRef KeyTrack::appendBelow(KeyNodeRef& node, int64 start, int64 period, double const* values, int n) {
   if (node->isLeaf()) {
     if (asLeaf(*node.get()).full()) {
       auto* fresh = new KeyLeaf(width(), m_limits.leafKeys);
@@ -238,9 +238,9 @@ KeyNodeRef KeyTrack::appendBelow(KeyNodeRef& node, int64 start, int64 period, co
   }
   node.own();
   auto& inner = asInner(*node.get());
-  const int i = inner.size() - 1;
+  int const i = inner.size() - 1;
   KeyNodeRef& child = inner.childRef(i);
-  const KeyCounts before = child->counts;
+  KeyCounts const before = child->counts;
   KeyNodeRef sibling = appendBelow(child, start, period, values, n);
   inner.childChanged(i, before);
   return sibling ? inner.insert(i + 1, std::move(sibling)) : KeyNodeRef();
@@ -282,13 +282,13 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
 
   auto& inner = asInner(*node.get());
   int64 from = first;
-  const int firstChild = inner.childAtIndex(from);
+  int const firstChild = inner.childAtIndex(from);
   int64 before = first - from;
   int i = firstChild;
   for (; i < inner.size() && before < last; ++i) {
-    const int64 keys = inner.keys(i);
+    int64 const keys = inner.keys(i);
     KeyNodeRef& child = inner.childRef(i);
-    const KeyCounts counts = child->counts;
+    KeyCounts const counts = child->counts;
     editBelow(child, std::max<int64>(first - before, 0), std::min(last - before, keys), what);
     inner.childChanged(i, counts);
     before += keys;
@@ -304,7 +304,7 @@ int64 KeyTrack::editTimes(int64 first, int64 last, LeafEdit& what) {
 int64 KeyTrack::erase(int64 index, unsigned mask) {
   if (index < 0 || index >= count()) return 0;
   if (bridgesAny(mask)) {
-    const int64 time = timeAt(index);
+    int64 const time = timeAt(index);
     return eraseRange(time, time, mask);
   }
   LeafEdit what{LeafEdit::Kind::Erase, normal(mask)};
@@ -314,9 +314,9 @@ int64 KeyTrack::erase(int64 index, unsigned mask) {
 int64 KeyTrack::eraseRange(int64 first, int64 last, unsigned mask) {
   if (first > last) return 0;
   // Bridges into the range lose their end.
-  const int64 from = bridgesAny(mask) ? lowerBound(first) : count();
-  for (const unsigned part : KeyParts(m_shape, mask)) {
-    const Place gone = placeAt(nextHolding(from - 1, part));
+  int64 const from = bridgesAny(mask) ? lowerBound(first) : count();
+  for (unsigned const part : KeyParts(m_shape, mask)) {
+    Place const gone = placeAt(nextHolding(from - 1, part));
     if (!gone || gone.time() > last) continue;
     endBridge(previousHolding(from, part), part);
   }
@@ -325,7 +325,7 @@ int64 KeyTrack::eraseRange(int64 first, int64 last, unsigned mask) {
 }
 
 void KeyTrack::endBridge(int64 index, unsigned part) {
-  const Place place = placeAt(index);
+  Place const place = placeAt(index);
   if (!place || !(place.bridges() & part)) return;
   LeafEdit end{LeafEdit::Kind::Unbridge, part};
   edit(index, index + 1, end);
@@ -336,23 +336,23 @@ void KeyTrack::endBridge(int64 index, unsigned part) {
 void KeyTrack::capBridges(int64 first, int64 last, unsigned mask, BridgeEnds const& ends,
                           KeyTrack const& curve) {
   first = std::max(first, -kForever), last = std::min(last, kForever);
-  const int64 firstFrame = frameAtOrAfter(first, ends.framePeriod);
-  const int64 lastFrame = frameAtOrBefore(last, ends.framePeriod);
-  const int64 before = (firstFrame - 1) * ends.framePeriod, after = (lastFrame + 1) * ends.framePeriod;
-  const int64 from = lowerBound(first), to = placeAtOrBefore(last).index + 1;
+  int64 const firstFrame = frameAtOrAfter(first, ends.framePeriod);
+  int64 const lastFrame = frameAtOrBefore(last, ends.framePeriod);
+  int64 const before = (firstFrame - 1) * ends.framePeriod, after = (lastFrame + 1) * ends.framePeriod;
+  int64 const from = lowerBound(first), to = placeAtOrBefore(last).index + 1;
   unsigned endsBefore = 0, beginsAfter = 0, cut = 0;
-  for (const unsigned part : KeyParts(m_shape, mask)) {
-    const Place earlier = placeAt(previousHolding(from, part)), next = placeAt(nextHolding(from - 1, part));
-    const bool holdsKeys = next && next.time() <= last;
+  for (unsigned const part : KeyParts(m_shape, mask)) {
+    Place const earlier = placeAt(previousHolding(from, part)), next = placeAt(nextHolding(from - 1, part));
+    bool const holdsKeys = next && next.time() <= last;
     if (!holdsKeys && firstFrame > lastFrame) continue;
     if (earlier && earlier.bridges() & part) {
       cut |= part;
       if (earlier.time() < before) endsBefore |= part;
     }
-    const Place inner = placeAt(previousHolding(to, part)), later = placeAt(nextHolding(to - 1, part));
+    Place const inner = placeAt(previousHolding(to, part)), later = placeAt(nextHolding(to - 1, part));
     if (inner && later && inner.bridges() & part && later.time() > after) beginsAfter |= part;
   }
-  const auto cap = [&](int64 time, unsigned components) {
+  auto const cap = [&](int64 time, unsigned components) {
     if (!components) return;
     Values values{};
     curve.evaluate(time, ends.interpolation, {}, values);
@@ -360,7 +360,7 @@ void KeyTrack::capBridges(int64 first, int64 last, unsigned mask, BridgeEnds con
   };
   cap(before, endsBefore);
   cap(after, beginsAfter);
-  for (const unsigned part : KeyParts(m_shape, cut))
+  for (unsigned const part : KeyParts(m_shape, cut))
     endBridge(previousHolding(lowerBound(first), part), part);
 }
 
@@ -376,16 +376,16 @@ int64 KeyTrack::deleteSelected(unsigned mask, BridgeEnds const& ends) {
     LeafEdit what{LeafEdit::Kind::EraseSelected, mask};
     return edit(0, count(), what);
   }
-  const int64 affected = countSelected(mask);
-  const KeyTrack before = *this;
-  for (const unsigned part : KeyParts(m_shape, mask)) {
+  int64 const affected = countSelected(mask);
+  KeyTrack const before = *this;
+  for (unsigned const part : KeyParts(m_shape, mask)) {
     for (int64 first = before.nextSelected(-1, part), last; first >= 0;
          first = before.nextSelected(last, part)) {
       last = first;
       for (int64 next;
            (next = before.nextHolding(last, part)) >= 0 && before.placeAt(next).selected() & part;)
         last = next;
-      const int64 start = before.timeAt(first), end = before.timeAt(last);
+      int64 const start = before.timeAt(first), end = before.timeAt(last);
       if (bridgesAny(part)) capBridges(start, end, part, ends, before);
       eraseRange(start, end, part);
     }
@@ -401,7 +401,7 @@ int64 KeyTrack::thin(std::vector<unsigned char> const& lost) {
   forEach(0, count(), [&](Key const& key) { held.push_back(key.components); });
   unsigned nextLoses = 0, laterKeeps = 0;
   for (size_t i = lost.size(); i-- > 0;) {
-    const unsigned gone = lost[i] & held[i], kept = held[i] & ~gone;
+    unsigned const gone = lost[i] & held[i], kept = held[i] & ~gone;
     bridged[i] = static_cast<unsigned char>(kept & nextLoses & laterKeeps);
     nextLoses = (nextLoses & ~kept) | gone;
     laterKeeps |= kept;
@@ -415,7 +415,7 @@ int64 KeyTrack::thin(std::vector<unsigned char> const& lost) {
 void KeyTrack::bridge(int64 first, int64 last, unsigned mask) {
   LeafEdit what{LeafEdit::Kind::Bridge, normal(mask)};
   editTimes(first, last, what);
-  for (const unsigned part : KeyParts(m_shape, mask)) endBridge(previousHolding(count(), part), part);
+  for (unsigned const part : KeyParts(m_shape, mask)) endBridge(previousHolding(count(), part), part);
 }
 
 void KeyTrack::unbridge(int64 first, int64 last, unsigned mask) {
@@ -449,14 +449,14 @@ int64 KeyTrack::deselect(int64 first, int64 last, unsigned mask) {
 }
 
 void KeyTrack::setSelected(int64 index, unsigned flags) {
-  const Place place = placeAt(index);
-  const unsigned wanted = normal(flags) & place.leaf->components(place.slot);
-  const unsigned now = place.leaf->selected(place.slot);
-  if (const unsigned extra = now & ~wanted) {
+  Place const place = placeAt(index);
+  unsigned const wanted = normal(flags) & place.leaf->components(place.slot);
+  unsigned const now = place.leaf->selected(place.slot);
+  if (unsigned const extra = now & ~wanted) {
     LeafEdit what{LeafEdit::Kind::Deselect, extra};
     edit(index, index + 1, what);
   }
-  if (const unsigned missing = wanted & ~now) {
+  if (unsigned const missing = wanted & ~now) {
     LeafEdit what{LeafEdit::Kind::Select, missing};
     edit(index, index + 1, what);
   }

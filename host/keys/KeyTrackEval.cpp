@@ -6,8 +6,8 @@
 // next.
 KeyTrack::Place KeyTrack::placeAtOrBefore(int64 time, Cursor& cursor) const {
   if (!m_root) return {};
-  const auto leafAt = [this](int64 index) { return placeAt(index).leaf; };
-  const bool known = cursor.leaf && cursor.version == m_version && time >= cursor.leaf->firstTime();
+  auto const leafAt = [this](int64 index) { return placeAt(index).leaf; };
+  bool const known = cursor.leaf && cursor.version == m_version && time >= cursor.leaf->firstTime();
   if (known && cursor.next && time >= cursor.next->firstTime()) {
     cursor.firstIndex += cursor.leaf->size();
     cursor.leaf = cursor.next;
@@ -15,9 +15,9 @@ KeyTrack::Place KeyTrack::placeAtOrBefore(int64 time, Cursor& cursor) const {
     cursor.slot = 0;
   }
   if (!known || (cursor.next && time >= cursor.next->firstTime())) {
-    const Place place = placeAtOrBefore(time);
+    Place const place = placeAtOrBefore(time);
     if (!place) return place;
-    const int64 first = place.index - place.slot;
+    int64 const first = place.index - place.slot;
     cursor = {place.leaf, leafAt(first + place.leaf->size()), first, place.slot, m_version};
     return place;
   }
@@ -28,23 +28,23 @@ KeyTrack::Place KeyTrack::placeAtOrBefore(int64 time, Cursor& cursor) const {
 // The next (step 1) or previous (step -1) key that holds a component of the mask.
 KeyTrack::Place KeyTrack::neighbour(Place const& from, int step, unsigned mask, Cursor const* cursor) const {
   KeyLeaf const& leaf = *from.leaf;
-  const int slot = step > 0 ? (from.slot + 1 < leaf.size() ? leaf.nextHolding(from.slot + 1, mask) : -1)
+  int const slot = step > 0 ? (from.slot + 1 < leaf.size() ? leaf.nextHolding(from.slot + 1, mask) : -1)
                             : leaf.previousHolding(from.slot - 1, mask);
   if (slot >= 0) return {&leaf, from.index + slot - from.slot, slot};
   if (step > 0 && cursor && cursor->leaf == &leaf) {
     if (!cursor->next) return {};
-    const int ahead = cursor->next->nextHolding(0, mask);
+    int const ahead = cursor->next->nextHolding(0, mask);
     if (ahead >= 0) return {cursor->next, cursor->firstIndex + leaf.size() + ahead, ahead};
   }
-  const int64 index = step > 0 ? nextHolding(from.index, mask) : previousHolding(from.index, mask);
+  int64 const index = step > 0 ? nextHolding(from.index, mask) : previousHolding(from.index, mask);
   return index < 0 ? Place() : placeAt(index);
 }
 
 void KeyTrack::evaluateAt(int64 time, Interpolation interpolation, unsigned mask, Place const& base,
                           Values const& defaults, Values& values, Cursor const* cursor) const {
-  const bool split = m_shape == Shape::Vector && mask != kAll;
-  const auto wanted = [&](int c) { return !split || (mask >> c & 1); };
-  const auto hold = [&](Place const& key) {
+  bool const split = m_shape == Shape::Vector && mask != kAll;
+  auto const wanted = [&](int c) { return !split || (mask >> c & 1); };
+  auto const hold = [&](Place const& key) {
     for (int c = 0; c < width(); ++c)
       if (wanted(c)) values[static_cast<size_t>(c)] = key ? key.value(c) : defaults[static_cast<size_t>(c)];
   };
@@ -53,11 +53,11 @@ void KeyTrack::evaluateAt(int64 time, Interpolation interpolation, unsigned mask
   Place a = base;
   if (a && !(a.leaf->components(a.slot) & mask)) a = neighbour(a, -1, mask, cursor);
   if (!a) {
-    const int64 first = nextHolding(-1, mask);
+    int64 const first = nextHolding(-1, mask);
     return hold(first < 0 ? Place() : placeAt(first));
   }
   if (interpolation == Interpolation::Constant || a.time() == time) return hold(a);
-  const Place b = neighbour(a, 1, mask, cursor);
+  Place const b = neighbour(a, 1, mask, cursor);
   if (!b) return hold(a);
 
   Place before, after;
@@ -74,10 +74,10 @@ void KeyTrack::evaluate(int64 time, Interpolation interpolation, Values const& d
     values = defaults;
     return;
   }
-  const Place base = cursor ? placeAtOrBefore(time, *cursor) : placeAtOrBefore(time);
+  Place const base = cursor ? placeAtOrBefore(time, *cursor) : placeAtOrBefore(time);
   if (m_root->counts.whole == m_root->counts.keys)
     return evaluateAt(time, interpolation, kAll, base, defaults, values, cursor);
-  for (const unsigned component : {1u, 2u, 4u})
+  for (unsigned const component : {1u, 2u, 4u})
     evaluateAt(time, interpolation, component, base, defaults, values, cursor);
 }
 
@@ -85,8 +85,8 @@ double KeyTrack::evaluateComponent(int64 time, Interpolation interpolation, int 
                                    Cursor* cursor) const {
   Values defaults{}, values{};
   defaults[static_cast<size_t>(component)] = byDefault;
-  const Place base = cursor ? placeAtOrBefore(time, *cursor) : placeAtOrBefore(time);
-  const unsigned mask = m_shape == Shape::Vector ? 1u << component : unsigned{kAll};
+  Place const base = cursor ? placeAtOrBefore(time, *cursor) : placeAtOrBefore(time);
+  unsigned const mask = m_shape == Shape::Vector ? 1u << component : unsigned{kAll};
   evaluateAt(time, interpolation, mask, base, defaults, values, cursor);
   return values[static_cast<size_t>(component)];
 }

@@ -7,7 +7,7 @@
 #include "host/keys/KeyTrack.h"
 
 struct KeyTrack::Place {
-  const KeyLeaf* leaf = nullptr;  // null: there is no such key
+  KeyLeaf const* leaf = nullptr;  // null: there is no such key
   int64 index = -1;
   int slot = 0;
 
@@ -26,11 +26,11 @@ class KeyParts {
       if (mask) m_parts[m_size++] = KeyTrack::kAll;
       return;
     }
-    for (const unsigned component : {1u, 2u, 4u})
+    for (unsigned const component : {1u, 2u, 4u})
       if (mask & component) m_parts[m_size++] = component;
   }
-  const unsigned* begin() const { return m_parts.data(); }
-  const unsigned* end() const { return m_parts.data() + m_size; }
+  unsigned const* begin() const { return m_parts.data(); }
+  unsigned const* end() const { return m_parts.data() + m_size; }
 
  private:
   std::array<unsigned, 3> m_parts{};

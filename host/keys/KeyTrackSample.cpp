@@ -27,7 +27,7 @@ class KeyTrack::Sampler {
         m_stride(stride) {}
 
   void run() {
-    const Place first = m_track.placeAt(m_track.nextHolding(-1, m_holding));
+    Place const first = m_track.placeAt(m_track.nextHolding(-1, m_holding));
     hold(first, m_times.lowerBound(first.time(), 0));
     if (done()) return;
     for (Place a = placeFor(first); !done(); a = placeFor(a))
@@ -55,8 +55,8 @@ class KeyTrack::Sampler {
   // The key at or before the next time; `known` is such a key.
   Place placeFor(Place const& known) const {
     if (done()) return known;
-    const int64 time = m_times[m_next];
-    const int slot = known.leaf->lastAtOrBefore(time, known.slot);
+    int64 const time = m_times[m_next];
+    int const slot = known.leaf->lastAtOrBefore(time, known.slot);
     Place place{known.leaf, known.index + slot - known.slot, slot};
     if (slot + 1 == known.leaf->size()) place = m_track.placeAtOrBefore(time);
     if (place.leaf->components(place.slot) & m_holding) return place;
@@ -66,7 +66,7 @@ class KeyTrack::Sampler {
   // The key's value up to the sample `end`.
   void hold(Place const& key, int64 end) {
     for (int c = m_firstComponent; c < m_endComponent; ++c) {
-      const double value = key.value(c);
+      double const value = key.value(c);
       for (int64 i = m_next; i < end; ++i) out(i)[c] = value;
     }
     m_next = std::max(m_next, end);
@@ -82,12 +82,12 @@ class KeyTrack::Sampler {
   // Samples that are keys of the leaf, at each or each n-th of them.
   bool takeKeys(Place const& a) {
     KeyLeaf const& leaf = *a.leaf;
-    const int64 own = leaf.period(), period = m_times.period();
+    int64 const own = leaf.period(), period = m_times.period();
     if (own == 0 || period % own != 0 || period == 0 || m_times[m_next] != a.time() ||
         !leaf.allHold(m_holding))
       return false;
-    const int64 step = period / own, left = leaf.size() - a.slot;
-    const int64 n = std::min((left - 1) / step + 1, m_times.count() - m_next);
+    int64 const step = period / own, left = leaf.size() - a.slot;
+    int64 const n = std::min((left - 1) / step + 1, m_times.count() - m_next);
     leaf.readValues(a.slot, n > 1 ? static_cast<int>(step) : 1, static_cast<int>(n), m_firstComponent,
                     m_endComponent, out(m_next) + m_firstComponent, m_stride);
     m_next += n;
@@ -101,7 +101,7 @@ class KeyTrack::Sampler {
     int last = leaf.size() - 1;
     if (m_kind == Interpolation::Cubic) {
       if (!sameValue(a, m_track.neighbour(a, -1, m_holding, nullptr))) return false;
-      const Place end{&leaf, a.index + last - a.slot, last};
+      Place const end{&leaf, a.index + last - a.slot, last};
       if (!sameValue(a, m_track.neighbour(end, 1, m_holding, nullptr))) --last;
     }
     if (last < a.slot || m_times[m_next] > leaf.time(last)) return false;
@@ -127,14 +127,14 @@ class KeyTrack::Sampler {
   // The samples in the spans that start at some keys of the leaf. Makes `a` the key that those end at.
   void takeChunk(Place& a) {
     KeyLeaf const& leaf = *a.leaf;
-    const int64 lastTime = m_times[m_times.count() - 1];
-    const int end = std::min(lastTime >= leaf.lastTime() ? leaf.size() : leaf.lastAtOrBefore(lastTime) + 1,
+    int64 const lastTime = m_times[m_times.count() - 1];
+    int const end = std::min(lastTime >= leaf.lastTime() ? leaf.size() : leaf.lastAtOrBefore(lastTime) + 1,
                              a.slot + kChunk);
-    const int64 inside = m_times.lowerBound(leaf.time(end - 1), m_next);
+    int64 const inside = m_times.lowerBound(leaf.time(end - 1), m_next);
     if ((inside - m_next) * kSparse < end - a.slot - 1) return takeSingly(a, std::max(inside, m_next + 1));
 
-    const Place next = fillWindow(a, end);
-    const int64 until = m_times.lowerBound(m_keyTimes[m_ending], m_next);
+    Place const next = fillWindow(a, end);
+    int64 const until = m_times.lowerBound(m_keyTimes[m_ending], m_next);
     while (m_next < until) takeBatch(static_cast<int>(std::min<int64>(until - m_next, kChunk)));
     if (next) {
       a = next;
@@ -157,10 +157,10 @@ class KeyTrack::Sampler {
   // (two). Where there is none to take a slope from, any key does. Returns the first of these last, which may
   // be none.
   Place fillWindow(Place const& a, int end) {
-    const bool cubic = m_kind == Interpolation::Cubic;
+    bool const cubic = m_kind == Interpolation::Cubic;
     Place before;
     if (cubic) {
-      const bool follows = m_previous && m_previous.index + 1 == a.index &&
+      bool const follows = m_previous && m_previous.index + 1 == a.index &&
                            m_previous.leaf->components(m_previous.slot) & m_holding;
       before = follows ? m_previous : m_track.neighbour(a, -1, m_holding, nullptr);
     }
@@ -170,11 +170,11 @@ class KeyTrack::Sampler {
     decode(*a.leaf, a.slot, end);
 
     m_previous = {a.leaf, a.index + end - 1 - a.slot, end - 1};
-    const Place next = m_track.neighbour(m_previous, 1, m_holding, nullptr);
+    Place const next = m_track.neighbour(m_previous, 1, m_holding, nullptr);
     if (next) put(m_size++, next);
     m_ending = m_size - 1;
     if (cubic) {
-      const Place after = next ? m_track.neighbour(next, 1, m_holding, nullptr) : next;
+      Place const after = next ? m_track.neighbour(next, 1, m_holding, nullptr) : next;
       put(m_ending + 1, after ? after : a);
       prepareTangents(static_cast<bool>(before), static_cast<bool>(after));
     }
@@ -194,7 +194,7 @@ class KeyTrack::Sampler {
     }
     leaf.readTimes(slot, end - slot, m_keyTimes + m_size);
     for (int c = 0; c < width(); ++c) {
-      const int own = m_firstComponent + c;
+      int const own = m_firstComponent + c;
       leaf.readValues(slot, 1, end - slot, own, own + 1, m_values[c] + m_size, 1);
     }
     m_size += end - slot;
@@ -223,16 +223,16 @@ class KeyTrack::Sampler {
   // The next n samples, which lie in spans of the window.
   void takeBatch(int n) {
     findSpans(n);
-    const bool rotation = m_track.shape() == Shape::Rotation;
+    bool const rotation = m_track.shape() == Shape::Rotation;
     if (rotation && m_kind != Interpolation::Constant) {
       if (m_kind == Interpolation::Linear) {
         rotations<Arc>(n, [this](int span) {
-          const Quat a = quat(span);
+          Quat const a = quat(span);
           return Arc(a, interpolation::nearest(quat(span + 1), a));
         });
       } else {
         rotations<SquadSpan>(n, [this](int span) {
-          const Quat a = quat(span);
+          Quat const a = quat(span);
           return SquadSpan(m_leaving[span], m_arriving[span], quat(span - 1), a,
                            interpolation::nearest(quat(span + 1), a), quat(span + 2));
         });
@@ -249,7 +249,7 @@ class KeyTrack::Sampler {
     m_times.read(m_next, n, times.data());
     int span = m_span;
     for (int i = 0; i < n; ++i) {
-      const int64 time = times[at(i)];
+      int64 const time = times[at(i)];
       while (m_keyTimes[span + 1] <= time) ++span;
       m_spans[i] = span;
       m_part[i] = static_cast<double>(time - m_keyTimes[span]) /
@@ -259,18 +259,18 @@ class KeyTrack::Sampler {
   }
 
   // A sample at a key is the key, even where what lies around is no number.
-  void component(const double* values, int n, double* to) {
+  void component(double const* values, int n, double* to) {
     if (m_kind == Interpolation::Constant) {
       for (int i = 0; i < n; ++i) to[i * m_stride] = values[m_spans[i]];
     } else if (m_kind == Interpolation::Linear) {
       for (int i = 0; i < n; ++i) {
-        const double a = values[m_spans[i]], b = values[m_spans[i] + 1];
+        double const a = values[m_spans[i]], b = values[m_spans[i] + 1];
         to[i * m_stride] = m_part[i] == 0 ? a : a + (b - a) * m_part[i];
       }
     } else {
-      const int end = m_spans[n - 1] + 1;
+      int const end = m_spans[n - 1] + 1;
       for (int i = m_spans[0]; i < end; ++i) {
-        const double before = values[i - 1], a = values[i], b = values[i + 1], after = values[i + 2];
+        double const before = values[i - 1], a = values[i], b = values[i + 1], after = values[i + 2];
         m_cubics[i] = CubicSpan(a, m_leaving[i](b - a, a - before), b, m_arriving[i](b - a, after - b));
       }
       for (int i = 0; i < n; ++i) {
@@ -291,7 +291,7 @@ class KeyTrack::Sampler {
         continue;
       }
       if (m_spans[i] != known) span = make(known = m_spans[i]);
-      const Quat q = span.at(m_part[i]);
+      Quat const q = span.at(m_part[i]);
       to[0] = q.v.x, to[1] = q.v.y, to[2] = q.v.z, to[3] = q.r;
     }
   }
@@ -326,13 +326,13 @@ void KeyTrack::sample(SampleTimes const& times, Interpolation kind, Values const
                       double* out, ptrdiff_t stride) const {
   mask = normal(mask);
   if (times.count() == 0 || mask == 0) return;
-  const auto sampleCurve = [&](unsigned holding, int first, int end) {
+  auto const sampleCurve = [&](unsigned holding, int first, int end) {
     if (nextHolding(-1, holding) >= 0)
       return Sampler(*this, times, kind, holding, first, end, out, stride).run();
     for (int c = first; c < end; ++c)
       for (int64 i = 0; i < times.count(); ++i) out[i * stride + c] = defaults[static_cast<size_t>(c)];
   };
-  const bool whole = countHolding(kAll) == count();
+  bool const whole = countHolding(kAll) == count();
   if (m_shape != Shape::Vector || (whole && mask == kAll)) return sampleCurve(kAll, 0, width());
   for (int c = 0; c < 3; ++c)
     if (mask >> c & 1) sampleCurve(whole ? unsigned{kAll} : 1u << c, c, c + 1);

@@ -25,7 +25,7 @@ int LeafTimes::lowerBound(int64 time) const {
   if (time > back()) return m_size;
   if (time <= front()) return 0;
   if (m_form == Form::Full) return countBefore<Full>(time);
-  const int64 units = (time - m_start - 1) / m_unit + 1;
+  int64 const units = (time - m_start - 1) / m_unit + 1;
   return m_form == Form::Even    ? static_cast<int>(units)
          : m_form == Form::Short ? countBefore(static_cast<Short>(units))
                                  : countBefore(static_cast<Long>(units));
@@ -34,14 +34,14 @@ int LeafTimes::lowerBound(int64 time) const {
 int LeafTimes::lastAtOrBefore(int64 time) const {
   if (time >= back()) return m_size - 1;
   if (m_form == Form::Full) return countBefore<Full>(time + 1) - 1;
-  const int64 units = (time - m_start) / m_unit;  // less than the last offset
+  int64 const units = (time - m_start) / m_unit;  // less than the last offset
   return m_form == Form::Even    ? static_cast<int>(units)
          : m_form == Form::Short ? countBefore(static_cast<Short>(units + 1)) - 1
                                  : countBefore(static_cast<Long>(units + 1)) - 1;
 }
 
 void LeafTimes::read(int slot, int n, int64* out) const {
-  const auto decode = [&](auto offsetAt) {
+  auto const decode = [&](auto offsetAt) {
     for (int i = 0; i < n; ++i) out[i] = m_start + m_unit * offsetAt(slot + i);
   };
   switch (m_form) {
@@ -87,7 +87,7 @@ bool LeafTimes::continueEvenly(int slot, int64 start, int64 period, int n) {
 // Whether the form, which is not Even, can hold the time.
 bool LeafTimes::holds(int64 time) const {
   if (m_form == Form::Full) return true;
-  const auto apart = static_cast<uint64>(time - m_start), unit = static_cast<uint64>(m_unit);
+  auto const apart = static_cast<uint64>(time - m_start), unit = static_cast<uint64>(m_unit);
   if (time < m_start || apart % unit != 0) return false;
   return apart / unit <=
          (m_form == Form::Short ? std::numeric_limits<Short>::max() : std::numeric_limits<Long>::max());
@@ -95,10 +95,10 @@ bool LeafTimes::holds(int64 time) const {
 
 // Makes the form one that can hold n further times, at either end or, when it is one, between.
 void LeafTimes::makeHold(int64 start, int64 period, int n) {
-  const int64 end = start + period * (n - 1);
+  int64 const end = start + period * (n - 1);
   if (m_form != Form::Even && holds(start) && (n == 1 || (period % unit() == 0 && holds(end)))) return;
   if (m_form == Form::Full) return;
-  const int64 first = m_size > 0 ? std::min(front(), start) : start,
+  int64 const first = m_size > 0 ? std::min(front(), start) : start,
               last = m_size > 0 ? std::max(back(), end) : end;
   int64 divisor = std::gcd(m_unit, n > 1 ? period : 0);
   if (m_size > 0) divisor = std::gcd(divisor, start - front());
@@ -112,13 +112,13 @@ void LeafTimes::convert(Form form, int64 start, int64 unit) {
   fresh.m_start = start;
   fresh.m_unit = unit;
   // Offsets in a multiple of the new unit need no division.
-  const bool scales = m_form != Form::Full && form != Form::Full && m_unit % unit == 0;
-  const int64 shift = scales ? (m_start - start) / unit : 0, scale = scales ? m_unit / unit : 0;
-  const auto write = [&]<class T>(T) {
-    const int words = static_cast<int>(sizeof(T) / sizeof(Short));
+  bool const scales = m_form != Form::Full && form != Form::Full && m_unit % unit == 0;
+  int64 const shift = scales ? (m_start - start) / unit : 0, scale = scales ? m_unit / unit : 0;
+  auto const write = [&]<class T>(T) {
+    int const words = static_cast<int>(sizeof(T) / sizeof(Short));
     fresh.m_column.open(0, m_size * words, m_size * words);
     for (int i = 0; i < m_size; ++i) {
-      const int64 offset = form == Form::Full ? (*this)[i]
+      int64 const offset = form == Form::Full ? (*this)[i]
                            : scales           ? shift + scale * storedOffset(i)
                                               : ((*this)[i] - start) / unit;
       fresh.store(i, static_cast<T>(offset));
@@ -134,7 +134,7 @@ void LeafTimes::convert(Form form, int64 start, int64 unit) {
 // The form must hold them.
 void LeafTimes::put(int slot, int64 start, int64 period, int n, int limit) {
   m_column.open(slot * words(), n * words(), limit * words());
-  const int64 first = (start - base()) / unit(), step = period / unit();
+  int64 const first = (start - base()) / unit(), step = period / unit();
   if (m_form == Form::Short) storeRun<Short>(slot, first, step, n);
   if (m_form == Form::Long) storeRun<Long>(slot, first, step, n);
   if (m_form == Form::Full) storeRun<Full>(slot, first, step, n);
@@ -154,7 +154,7 @@ void LeafTimes::add(int slot, int64 start, int64 period, int n, int limit) {
 
 void LeafTimes::append(LeafTimes const& from, int first, int last) {
   if (first == last) return;
-  const int limit = m_size + last - first;
+  int const limit = m_size + last - first;
   if (from.even()) return append(from[first], from.m_unit, last - first, limit);
   for (int slot = first; slot < last; ++slot) append(from[slot], 0, 1, limit);
 }
@@ -174,7 +174,7 @@ void LeafTimes::erase(int first, int last) {
   evenOut();
 }
 
-void LeafTimes::keep(const int* slots, int n) {
+void LeafTimes::keep(int const* slots, int n) {
   if (even()) convert(smallestFor(static_cast<uint64>(m_size)), m_start, m_unit);
   m_column.keep(slots, n, words());
   m_size = n;
@@ -185,7 +185,7 @@ void LeafTimes::keep(const int* slots, int n) {
 // nothing.
 void LeafTimes::evenOut() {
   if (even()) return;
-  const int64 period = m_size > 1 ? (*this)[1] - front() : 0;
+  int64 const period = m_size > 1 ? (*this)[1] - front() : 0;
   if (m_size > 1) {
     if (static_cast<uint64>(back() - front()) !=
         static_cast<uint64>(period) * static_cast<uint64>(m_size - 1))
@@ -205,8 +205,8 @@ void LeafTimes::pack() {
     int64 common = 0;
     for (int i = 1; i < m_size && common != 1; ++i)
       common = std::gcd(common, storedOffset(i) - storedOffset(0));
-    const int64 divisor = unit() * common;
-    const Form form = smallestFor(static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor));
+    int64 const divisor = unit() * common;
+    Form const form = smallestFor(static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor));
     if (form < m_form) convert(form, front(), divisor);
   }
   m_column.shrink();

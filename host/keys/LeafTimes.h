@@ -43,7 +43,7 @@ class LeafTimes {
   void append(LeafTimes const& from, int first, int last);
   void erase(int first, int last);
   // Leaves the n ascending slots.
-  void keep(const int* slots, int n);
+  void keep(int const* slots, int n);
   // The smallest form, and no room for more.
   void pack();
 

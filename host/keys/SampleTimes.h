@@ -12,7 +12,7 @@ class SampleTimes {
   SampleTimes(int64 start, int64 period, int64 count) : m_start(start), m_period(period), m_count(count) {
     assert(count <= 1 || period > 0);
   }
-  explicit SampleTimes(std::span<const int64> times)
+  explicit SampleTimes(std::span<int64 const> times)
       : m_list(times.data()), m_count(static_cast<int64>(times.size())) {
     assert(std::is_sorted(times.begin(), times.end()));
   }
@@ -26,8 +26,8 @@ class SampleTimes {
     if (m_list) return std::lower_bound(m_list + from, m_list + m_count, time) - m_list;
     if (from >= m_count || (*this)[from] >= time) return from;
     // Times of either end of the time line are farther apart than a signed number holds.
-    const uint64 apart = static_cast<uint64>(time) - static_cast<uint64>((*this)[from]);
-    const uint64 steps = m_period > 0 ? (apart - 1) / static_cast<uint64>(m_period) + 1 : 1;
+    uint64 const apart = static_cast<uint64>(time) - static_cast<uint64>((*this)[from]);
+    uint64 const steps = m_period > 0 ? (apart - 1) / static_cast<uint64>(m_period) + 1 : 1;
     return steps < static_cast<uint64>(m_count - from) ? from + static_cast<int64>(steps) : m_count;
   }
 
@@ -52,7 +52,7 @@ class SampleTimes {
                               static_cast<uint64>(m_period) * static_cast<uint64>(i));
   }
 
-  const int64* m_list = nullptr;
+  int64 const* m_list = nullptr;
   int64 m_start = 0, m_period = 0;
   int64 m_count = 0;
 };

@@ -14,7 +14,7 @@ using Quat = Imath::Quatd;
 constexpr int kAxes[6][3] = {{0, 1, 2}, {0, 2, 1}, {1, 0, 2}, {1, 2, 0}, {2, 0, 1}, {2, 1, 0}};
 
 // +1 when the axes of the order follow each other as x, y, z do.
-constexpr double parity(const int (&axes)[3]) { return (axes[1] - axes[0] + 3) % 3 == 1 ? 1.0 : -1.0; }
+constexpr double parity(int const (&axes)[3]) { return (axes[1] - axes[0] + 3) % 3 == 1 ? 1.0 : -1.0; }
 
 Quat aboutAxis(int axis, double angle) {
   Imath::V3d v(0);
@@ -23,7 +23,7 @@ Quat aboutAxis(int axis, double angle) {
 }
 
 void set(TalixRotation& rotation, Quat const& q) {
-  const double xyzw[4] = {q.v.x, q.v.y, q.v.z, q.r};
+  double const xyzw[4] = {q.v.x, q.v.y, q.v.z, q.r};
   rotation.setQuaternion(xyzw);
 }
 
@@ -44,13 +44,13 @@ TalixRotation TalixRotation::inverse() const {
 }
 
 Vec3 TalixRotation::rotate(Vec3 const& v) const {
-  const Vec3 axis(m_x, m_y, m_z);
-  const Vec3 t = axis.cross(v) * 2.0;
+  Vec3 const axis(m_x, m_y, m_z);
+  Vec3 const t = axis.cross(v) * 2.0;
   return v + t * m_w + axis.cross(t);
 }
 
 void TalixRotation::setAsEuler(RotOrder order, Vec3 const& angles) {
-  const auto& axes = kAxes[order];
+  auto const& axes = kAxes[order];
   set(*this, aboutAxis(axes[2], angles[axes[2]]) * aboutAxis(axes[1], angles[axes[1]]) *
                  aboutAxis(axes[0], angles[axes[0]]));
 }
@@ -60,20 +60,20 @@ void TalixRotation::getAsEuler(RotOrder order, Vec3& angles) const {
   // two angles are R[k][i] = -s sin b, R[k][j] / R[k][k] = s tan a. Near gimbal lock these two shrink and a
   // loses digits, so c is what remains once this very a is undone: R R_i(-a) takes axis j to where R_k(c)
   // does, and the three angles together stay exact.
-  const auto& [i, j, k] = kAxes[order];
-  const double s = parity(kAxes[order]);
+  auto const& [i, j, k] = kAxes[order];
+  double const s = parity(kAxes[order]);
   Vec3 columns[3];
   for (int axis = 0; axis < 3; ++axis) {
     Vec3 unit;
     unit[axis] = 1;
     columns[axis] = rotate(unit);
   }
-  const auto entry = [&](int row, int column) { return columns[column][row]; };
-  const double cosB = std::hypot(entry(i, i), entry(j, i));
+  auto const entry = [&](int row, int column) { return columns[column][row]; };
+  double const cosB = std::hypot(entry(i, i), entry(j, i));
   angles[j] = std::atan2(-s * entry(k, i), cosB);
   if (cosB > 1e-9) {
     angles[i] = std::atan2(s * entry(k, j), entry(k, k));
-    const Vec3 turned = columns[j] * std::cos(angles[i]) + columns[k] * (-s * std::sin(angles[i]));
+    Vec3 const turned = columns[j] * std::cos(angles[i]) + columns[k] * (-s * std::sin(angles[i]));
     angles[k] = std::atan2(-s * turned[i], turned[j]);
   } else {
     angles[i] = std::atan2(-s * entry(j, k), entry(j, j));
@@ -83,19 +83,19 @@ void TalixRotation::getAsEuler(RotOrder order, Vec3& angles) const {
 }
 
 void TalixRotation::setAsVector(Vec3 rotationVector) {
-  const double angle = rotationVector.length();
+  double const angle = rotationVector.length();
   // sin(angle / 2) / angle, by its series where the quotient loses digits.
-  const double factor = angle < 1e-4 ? 0.5 - angle * angle / 48 : std::sin(angle / 2) / angle;
-  const double xyzw[4] = {rotationVector.x * factor, rotationVector.y * factor, rotationVector.z * factor,
+  double const factor = angle < 1e-4 ? 0.5 - angle * angle / 48 : std::sin(angle / 2) / angle;
+  double const xyzw[4] = {rotationVector.x * factor, rotationVector.y * factor, rotationVector.z * factor,
                           std::cos(angle / 2)};
   setQuaternion(xyzw);
 }
 
 void TalixRotation::getAsVector(Vec3& rotationVector) const {
-  const double sign = m_w < 0 ? -1 : 1;
-  const Vec3 axis(m_x * sign, m_y * sign, m_z * sign);
-  const double sine = axis.length();
-  const double angle = 2 * std::atan2(sine, m_w * sign);
+  double const sign = m_w < 0 ? -1 : 1;
+  Vec3 const axis(m_x * sign, m_y * sign, m_z * sign);
+  double const sine = axis.length();
+  double const angle = 2 * std::atan2(sine, m_w * sign);
   rotationVector = axis * (sine < 1e-9 ? 2.0 : angle / sine);
 }
 
@@ -115,10 +115,10 @@ void TalixRotation::getAsHardySpicerRotation(double& major, double& minor, int m
   // (cos A cos B, e_i sin A cos B, e_j cos A sin B, e_k s sin A sin B). Its dot product with (w, x, y, z),
   // written along i, j, k, is a sum of a wave in A + B and one in A - B, each of which is greatest where its
   // own angle is that of its coefficients.
-  const double along[3] = {m_x, m_y, m_z};
-  const double x = along[majorAxis], y = along[minorAxis];
-  const double z = along[3 - majorAxis - minorAxis] * ((minorAxis - majorAxis + 3) % 3 == 1 ? 1 : -1);
-  const double sum = std::atan2(x + y, m_w - z), difference = std::atan2(x - y, m_w + z);
+  double const along[3] = {m_x, m_y, m_z};
+  double const x = along[majorAxis], y = along[minorAxis];
+  double const z = along[3 - majorAxis - minorAxis] * ((minorAxis - majorAxis + 3) % 3 == 1 ? 1 : -1);
+  double const sum = std::atan2(x + y, m_w - z), difference = std::atan2(x - y, m_w + z);
   major = withinHalfTurn(sum + difference);
   minor = withinHalfTurn(sum - difference);
 }
@@ -126,17 +126,17 @@ void TalixRotation::getAsHardySpicerRotation(double& major, double& minor, int m
 void TalixRotation::setAsHingeRotation(double angle, int axis) { set(*this, aboutAxis(axis, angle)); }
 
 double TalixRotation::getAsHingeRotation(int axis) const {
-  const double along[3] = {m_x, m_y, m_z};
+  double const along[3] = {m_x, m_y, m_z};
   return withinHalfTurn(2 * std::atan2(along[axis], m_w));
 }
 
 void TalixRotation::setQuaternion(double const* xyzw) {
-  const double length =
+  double const length =
       std::sqrt(xyzw[0] * xyzw[0] + xyzw[1] * xyzw[1] + xyzw[2] * xyzw[2] + xyzw[3] * xyzw[3]);
   if (!(length > 0) || !std::isfinite(length)) return makeIdentity();
   // A quaternion that is of unit length to the last digits is kept as it is, so that what was stored reads
   // back.
-  const double scale = std::abs(length - 1) < 1e-15 ? 1 : 1 / length;
+  double const scale = std::abs(length - 1) < 1e-15 ? 1 : 1 / length;
   m_x = xyzw[0] * scale, m_y = xyzw[1] * scale, m_z = xyzw[2] * scale, m_w = xyzw[3] * scale;
 }
 
@@ -157,7 +157,7 @@ double unrolled(double angle, double near) {
 }
 
 Vec3 unrolledEuler(TalixRotation::RotOrder order, Vec3 const& angles, Vec3 const& near) {
-  const auto& [i, j, k] = kAxes[order];
+  auto const& [i, j, k] = kAxes[order];
   Vec3 other;  // the second solution turns the outer axes by half a turn and mirrors the middle angle
   other[i] = angles[i] + std::numbers::pi;
   other[j] = std::numbers::pi - angles[j];

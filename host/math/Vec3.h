@@ -36,14 +36,14 @@ class Vec3 {
 
   // Gives the vector length 1 and returns its former length. A zero vector becomes not-a-number.
   double normalize() {
-    const double former = length();
+    double const former = length();
     x /= former, y /= former, z /= former;
     return former;
   }
 
   // Keeps the direction; a zero vector, which has none, stays zero.
   void setLength(double wanted) {
-    const double former = length();
+    double const former = length();
     if (former > 0) *this *= wanted / former;
     *this += Vec3();  // no component is -0
   }

@@ -126,7 +126,7 @@ struct Attribute::Change : UndoChange {
 
   void swap() override {
     Value now = attribute.m_value;
-    const bool wasSet = attribute.m_set;
+    bool const wasSet = attribute.m_set;
     attribute.store(std::move(value), set, false);
     value = std::move(now);
     set = wasSet;
@@ -218,7 +218,7 @@ namespace {
 
 int indexOf(Attribute::Labels const& labels, HString const& label) {
   if (!labels) return -1;
-  const auto found = std::find(labels->begin(), labels->end(), label);
+  auto const found = std::find(labels->begin(), labels->end(), label);
   return found == labels->end() ? -1 : static_cast<int>(found - labels->begin());
 }
 
@@ -258,7 +258,7 @@ int BitFieldAttribute::findLabel(HString const& label) const { return indexOf(m_
 bool BitFieldAttribute::getField(int field) const { return itemAt(valueAs<Bits>(), field); }
 
 bool BitFieldAttribute::setValue(HString const& label, bool on, bool, bool notify, bool react, bool markSet) {
-  const int field = findLabel(label);
+  int const field = findLabel(label);
   if (field < 0) return false;
   Bits bits = valueAs<Bits>();
   bits[static_cast<size_t>(field)] = on;
@@ -279,7 +279,7 @@ double TimeAttribute::getValue() const { return timeOf(*this)->getFrameDouble(ge
 
 HString TimeAttribute::getStringValue() const {
   HTimeManager const* time = timeOf(*this);
-  const HFrameRate rate = m_relative ? time->getFrameRate().withoutDrop() : time->getFrameRate();
+  HFrameRate const rate = m_relative ? time->getFrameRate().withoutDrop() : time->getFrameRate();
   return rate.timecodeFromFrame(getTime() / rate.getTicksPerFrame());
 }
 

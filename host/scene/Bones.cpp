@@ -13,8 +13,8 @@ Attribute::Labels labels(std::vector<HString> texts) {
 }  // namespace
 
 void BaseBone::setUp() {
-  static const Attribute::Labels axes = labels({"X", "Y", "Z"});
-  static const Attribute::Labels dofs = labels({"Tx", "Ty", "Tz", "Rx", "Ry", "Rz"});
+  static Attribute::Labels const axes = labels({"X", "Y", "Z"});
+  static Attribute::Labels const dofs = labels({"Tx", "Ty", "Tz", "Rx", "Ry", "Rz"});
   Node::setUp();
   addChannel("Length", DataSource::FloatProperty);
   m_majorAxis = addBuiltIn<EnumAttribute>("MajorAxis", axes);

@@ -28,6 +28,6 @@ void CalibrationMgr::addToSystemGroup(Module* module) {
   Module* group = findSystemGroup();
   if (!group) group = m_scene.createModule(&SystemGroup::s_classSystemGroup, "System", nullptr);
   if (!group || module->getParent() == group) return;
-  const HString name = m_scene.getIndex().freeName(group, module->getName());
+  HString const name = m_scene.getIndex().freeName(group, module->getName());
   if (group->addChild(module)) module->setName(name);
 }

@@ -32,7 +32,7 @@ struct ValueText {
   std::string operator()(HString const& text) const { return text.GetString(); }
   std::string operator()(Attribute::Bits const& bits) const {
     std::string text;
-    for (const bool bit : bits) text += bit ? '1' : '0';
+    for (bool const bit : bits) text += bit ? '1' : '0';
     return text;
   }
   std::string operator()(Attribute::Modules const& modules) const { return textOfList(modules); }
@@ -58,8 +58,8 @@ void ChangeSetBuilder::tell(Kind kind, Module const* module, std::string const& 
 }
 
 KeyTrack& ChangeSetBuilder::keysBefore(Controller& channel, NLEClip* clip, int layer) {
-  const TrackName name{&channel, clip, layer};
-  const auto known = m_tracks.find(name);
+  TrackName const name{&channel, clip, layer};
+  auto const known = m_tracks.find(name);
   if (known != m_tracks.end()) return known->second;
   KeyTrack const* now = channel.findTrack(clip, layer);
   return m_tracks.emplace(name, now ? *now : KeyTrack(Controller::shapeOf(channel.getPropertyType())))
@@ -77,8 +77,8 @@ void ChangeSetBuilder::tellNoKeys(Controller& channel) {
 HString ChangeSetBuilder::pathBefore(Module const* module) const {
   std::string path;
   while (module) {
-    const auto name = m_names.find(module);
-    const auto parent = m_parents.find(module);
+    auto const name = m_names.find(module);
+    auto const parent = m_parents.find(module);
     path = "\\" + (name == m_names.end() ? module->getName() : name->second).GetString() + path;
     module = parent == m_parents.end() ? module->getParent() : parent->second;
   }
@@ -87,7 +87,7 @@ HString ChangeSetBuilder::pathBefore(Module const* module) const {
 
 // Came or went in this step, so that nothing else is told of it.
 bool ChangeSetBuilder::isNew(Module const* module) const {
-  const auto known = m_inScene.find(module);
+  auto const known = m_inScene.find(module);
   return !module->isInScene() || (known != m_inScene.end() && !known->second);
 }
 
@@ -107,8 +107,8 @@ void ChangeSetBuilder::add(SceneChange change, Module const* module) {
 
 void ChangeSetBuilder::addKeys(TrackName const& track, KeyTrack const& before) {
   KeyTrack const* now = track.channel->findTrack(track.clip, track.layer);
-  const KeyTrack none(before.shape());
-  const KeyDifference difference = differenceOf(before, now ? *now : none);
+  KeyTrack const none(before.shape());
+  KeyDifference const difference = differenceOf(before, now ? *now : none);
   if (difference.added + difference.removed + difference.changed == 0) return;
   add({.kind = Kind::keys,
        .name = track.channel->getName(),

@@ -11,9 +11,9 @@ namespace {
 
 // Hamilton's product of quaternions x y z w, into the first one.
 void multiply(double* a, double const* b) {
-  const double x = a[3] * b[0] + a[0] * b[3] + a[1] * b[2] - a[2] * b[1];
-  const double y = a[3] * b[1] - a[0] * b[2] + a[1] * b[3] + a[2] * b[0];
-  const double z = a[3] * b[2] + a[0] * b[1] - a[1] * b[0] + a[2] * b[3];
+  double const x = a[3] * b[0] + a[0] * b[3] + a[1] * b[2] - a[2] * b[1];
+  double const y = a[3] * b[1] - a[0] * b[2] + a[1] * b[3] + a[2] * b[0];
+  double const z = a[3] * b[2] + a[0] * b[1] - a[1] * b[0] + a[2] * b[3];
   a[3] = a[3] * b[3] - a[0] * b[0] - a[1] * b[1] - a[2] * b[2];
   a[0] = x, a[1] = y, a[2] = z;
 }
@@ -28,7 +28,7 @@ bool LayeredKeys::isConstant() const {
 }
 
 void LayeredKeys::sample(SampleTimes const& times, double* out) const {
-  const auto count = static_cast<size_t>(times.count()), each = static_cast<size_t>(width());
+  auto const count = static_cast<size_t>(times.count()), each = static_cast<size_t>(width());
   KeyTrack const* lowest = layers.empty() ? nullptr : layers[0];
   if (lowest && !lowest->empty()) {
     lowest->sample(times, interpolation, byDefault, KeyTrack::kAll, out, width());
@@ -37,7 +37,7 @@ void LayeredKeys::sample(SampleTimes const& times, double* out) const {
   }
   // Each further layer adds, rotations compose on the right, and switches replace what is below.
   std::vector<double> added;
-  const KeyTrack::Values neutral{0, 0, 0, type == DataSource::RotProperty ? 1.0 : 0.0};
+  KeyTrack::Values const neutral{0, 0, 0, type == DataSource::RotProperty ? 1.0 : 0.0};
   for (size_t layer = 1; layer < layers.size(); ++layer) {
     if (!layers[layer] || layers[layer]->empty()) continue;
     added.resize(count * each);
@@ -53,7 +53,7 @@ void LayeredKeys::sample(SampleTimes const& times, double* out) const {
 }
 
 std::vector<KeyTrack::Values> LayeredKeys::sample(SampleTimes const& times) const {
-  const auto each = static_cast<size_t>(width());
+  auto const each = static_cast<size_t>(width());
   std::vector<double> all(static_cast<size_t>(times.count()) * each);
   sample(times, all.data());
   std::vector<KeyTrack::Values> values(static_cast<size_t>(times.count()));
@@ -64,8 +64,8 @@ std::vector<KeyTrack::Values> LayeredKeys::sample(SampleTimes const& times) cons
 void blendSamples(DataSource::PropertyType type, KeyTrack::Values const& byDefault,
                   std::span<double const* const> parts, std::span<double const* const> weights, size_t count,
                   double* out) {
-  const auto width = static_cast<size_t>(Controller::shapeOf(type));
-  const bool rotation = type == DataSource::RotProperty;
+  auto const width = static_cast<size_t>(Controller::shapeOf(type));
+  bool const rotation = type == DataSource::RotProperty;
   for (size_t i = 0; i < count; ++i) {
     double sum = 0;
     for (double const* weight : weights) sum += std::max(weight[i], 0.0);
@@ -81,7 +81,7 @@ void blendSamples(DataSource::PropertyType type, KeyTrack::Values const& byDefau
     }
     if (!first) mean = byDefault;
     if (rotation) {
-      const double length = std::sqrt(std::inner_product(mean.begin(), mean.end(), mean.begin(), 0.0));
+      double const length = std::sqrt(std::inner_product(mean.begin(), mean.end(), mean.begin(), 0.0));
       for (double& k : mean) k /= length;
     }
     std::copy_n(mean.data(), width, out + i * width);

@@ -68,7 +68,7 @@ struct Clip::FileTimeChange : UndoChange {
   int64 memoryUse() const override { return sizeof *this; }
 
   void tell(ChangeSetBuilder& changes) const override {
-    const auto text = [](FileTime const& of) {
+    auto const text = [](FileTime const& of) {
       return textOf(Attribute::Value(of.rate)) + " " + std::to_string(of.firstFrame) + " " +
              std::to_string(of.frameCount) + " " + textOf(Attribute::Value(of.sampleRate));
     };

@@ -61,7 +61,7 @@ struct ConnectingLines::Change : UndoChange {
 
 void ConnectingLines::store(Node* target, MarkerConnection const* line) {
   if (m_source.isRecorded()) m_source.journal().addOnce<Change>(m_undoMark, *this);
-  const bool known = leadTo(target);
+  bool const known = leadTo(target);
   if (line && known) {
     *findLine(m_lines, target) = *line;
   } else if (line) {

@@ -38,7 +38,7 @@ void PositionConstraintBase::setUp() {
 Vec3 PositionConstraintBase::getConstraintOffsetWS(int64 time) const {
   BaseBone const* target = getTarget();
   if (!target) return getConstraintOffset();
-  const Transform frame = target->getWorldTransform(time);
+  Transform const frame = target->getWorldTransform(time);
   return frame.position + frame.rotation.rotate(scaled(getConstraintOffset(), frame.scale));
 }
 

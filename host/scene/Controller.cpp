@@ -61,7 +61,7 @@ void Controller::changed() {
 }
 
 bool Controller::areFinite(Values const& values, unsigned mask) const {
-  const bool split = getPropertyType() == Vec3Property;
+  bool const split = getPropertyType() == Vec3Property;
   for (int i = 0; i < static_cast<int>(shapeOf(getPropertyType())); ++i)
     if ((!split || mask >> i & 1) && !std::isfinite(values[static_cast<size_t>(i)])) return false;
   return true;
@@ -76,7 +76,7 @@ void Controller::setDefaultValues(Values const& values) {
 
 void Controller::writeKeyAt(int64 time, Values const& values, unsigned mask) {
   if (!areFinite(values, mask)) return;
-  const OwnEdit edit(*this, HTimeRange(time, time));
+  OwnEdit const edit(*this, HTimeRange(time, time));
   KeyTrack* track = editTrack(time, time);
   if (!track) return;
   // A new key of a one-valued or rotation channel is whole whatever the mask.
@@ -95,25 +95,25 @@ void Controller::readKey(int key, Values& values) const {
 
 int Controller::selectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  const OwnEdit edit(*this, range);
+  OwnEdit const edit(*this, range);
   return static_cast<int>(
       editTrack(range.getStart(), range.getEnd())->select(range.getStart(), range.getEnd(), mask));
 }
 
 int Controller::deselectKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return 0;
-  const OwnEdit edit(*this, range);
+  OwnEdit const edit(*this, range);
   return static_cast<int>(
       editTrack(range.getStart(), range.getEnd())->deselect(range.getStart(), range.getEnd(), mask));
 }
 
 int64 Controller::getDataPeriod(NLEClip const& clip) const {
-  const int64 frame = clip.getFramePeriod();
+  int64 const frame = clip.getFramePeriod();
   auto const* taken = objectAs<Clip>(&clip);
-  const double rate = taken ? taken->getFileTime().sampleRate : 0;
+  double const rate = taken ? taken->getFileTime().sampleRate : 0;
   if (!(rate > 0) || getPropertyType() != FloatProperty || !objectAs<AnalogDevice>(m_module)) return frame;
   // Samples that do not go with the frames are not at multiples of their period.
-  const int64 sample = ticksPerFrameAt(rate);
+  int64 const sample = ticksPerFrameAt(rate);
   return frame % sample == 0 ? sample : frame;
 }
 
@@ -126,11 +126,11 @@ int Controller::deleteKey(int64 time, unsigned mask) {
 }
 
 int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayers) {
-  const OwnEdit edit(*this, range);
+  OwnEdit const edit(*this, range);
   int64 deleted = 0;
   Database const& scene = *getDatabase();
   NLEClip* clip = scene.getActiveClip();
-  const int64 first = range.getStart(), last = range.getEnd();
+  int64 const first = range.getStart(), last = range.getEnd();
   bool bridged = false;  // data may go without a key
   for (ClipTrack const& track : m_tracks) {
     if (track.clip != clip || (track.layer != scene.getActiveLayer() &&
@@ -147,20 +147,20 @@ int Controller::deleteKeys(HTimeRange const& range, unsigned mask, bool allLayer
 int Controller::deleteSelectedKeys(unsigned mask) {
   KeyTrack const* track = findActiveTrack();
   if (!track || track->countSelected() == 0) return 0;
-  const int64 first = track->timeAt(track->selectedIndex(0));
-  const int64 last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
-  const OwnEdit edit(*this, HTimeRange(first, last));
+  int64 const first = track->timeAt(track->selectedIndex(0));
+  int64 const last = track->timeAt(track->selectedIndex(track->countSelected() - 1));
+  OwnEdit const edit(*this, HTimeRange(first, last));
   NLEClip* clip = getDatabase()->getActiveClip();
-  const int layer = getDatabase()->getActiveLayer();
+  int const layer = getDatabase()->getActiveLayer();
   KeyTrack* edited = track->bridgesAny() ? &replaceTrack(clip, layer) : editTrack(first, last);
-  const int64 deleted = edited->deleteSelected(mask, bridgeEnds());
+  int64 const deleted = edited->deleteSelected(mask, bridgeEnds());
   if (deleted) changed();
   return static_cast<int>(deleted);
 }
 
 void Controller::bridgeKeys(HTimeRange const& range, unsigned mask) {
   if (!findActiveTrack()) return;
-  const OwnEdit edit(*this, range);
+  OwnEdit const edit(*this, range);
   editTrack(range.getStart(), range.getEnd())->bridge(range.getStart(), range.getEnd(), mask);
   changed();
 }
@@ -168,8 +168,8 @@ void Controller::bridgeKeys(HTimeRange const& range, unsigned mask) {
 bool Controller::copyFrom(Controller const* source, bool keys, bool selectionToo) {
   if (source->getPropertyType() != getPropertyType()) return false;
   NLEClip* clip = getDatabase()->getActiveClip();
-  const int layers = clip ? clip->getNumLayers() : 0;
-  const auto isFree = [&](int layer) { return obstacleToKeys(*this, clip, layer) == Obstacle::none; };
+  int const layers = clip ? clip->getNumLayers() : 0;
+  auto const isFree = [&](int layer) { return obstacleToKeys(*this, clip, layer) == Obstacle::none; };
   int layer = 0;
   while (layer < layers && !isFree(layer)) ++layer;
   if (layer == layers) return false;
@@ -259,7 +259,7 @@ int Controller::getSelectedKeyIndex(int i) const {
 }
 
 unsigned Controller::getSelectedKeyFlags(int i) const {
-  const int key = getSelectedKeyIndex(i);
+  int const key = getSelectedKeyIndex(i);
   return key < 0 ? 0 : findActiveTrack()->at(key).selected;
 }
 
@@ -280,13 +280,13 @@ bool Controller::hasKeyAt(int64 time) const {
 
 bool Controller::hasKeyAt(int64 time, unsigned mask) const {
   KeyTrack const* track = findActiveTrack();
-  const int64 key = track ? track->find(time) : -1;
+  int64 const key = track ? track->find(time) : -1;
   return key >= 0 && (track->at(key).components & mask) == mask;
 }
 
 bool Controller::isKeySelectedAt(int64 time, unsigned mask) const {
   KeyTrack const* track = findActiveTrack();
-  const int64 key = track ? track->find(time) : -1;
+  int64 const key = track ? track->find(time) : -1;
   return key >= 0 && (track->at(key).selected & mask) != 0;
 }
 
@@ -328,7 +328,7 @@ void Controller::evaluate(int64 time, Values& values) const {
 
 bool Controller::evaluateLayer(NLEClip const* clip, int layer, int64 time, Values& values) const {
   ClipTrack const* track = find(clip, layer);
-  const Values otherwise = layer == 0 ? m_default : neutral();
+  Values const otherwise = layer == 0 ? m_default : neutral();
   if (!track || track->track.empty()) {
     values = otherwise;
     return layer == 0;
@@ -339,7 +339,7 @@ bool Controller::evaluateLayer(NLEClip const* clip, int layer, int64 time, Value
 
 void Controller::evaluateInClip(NLEClip const* clip, int64 time, Values& values) const {
   evaluateLayer(clip, 0, time, values);
-  const int layers = clip->getNumLayers();
+  int const layers = clip->getNumLayers();
   Values added;
   for (int layer = 1; layer < layers; ++layer)
     if (evaluateLayer(clip, layer, time, added)) compose(values, added);
@@ -356,7 +356,7 @@ void Controller::evaluateLayer(int64 time, Values& values) const {
 Controller::Values Controller::solveLayer(int64 time, Values const& wanted) const {
   // A clip of one layer takes the value as it is, without the rounding of a sum.
   NLEClip const* clip = getDatabase()->getActiveClip();
-  const bool single = !clip || clip->getNumLayers() == 1;
+  bool const single = !clip || clip->getNumLayers() == 1;
   Values all, own;
   evaluate(time, all);
   evaluateLayer(time, own);
@@ -393,7 +393,7 @@ void Controller::setInterpType(int i) {
 // --- clips and layers ---
 
 void Controller::setTrack(NLEClip* clip, int layer, KeyTrack track) {
-  const OwnEdit edit(*this);
+  OwnEdit const edit(*this);
   assert(track.shape() == shapeOf(getPropertyType()));
   replaceTrack(clip, layer) = std::move(track);
   changed();
@@ -418,12 +418,12 @@ void Controller::forgetClip(NLEClip const* clip) {
   std::copy_if(m_tracks.begin(), m_tracks.end(), std::back_inserter(others),
                [&](ClipTrack const& track) { return track.clip != clip; });
   if (others.size() == m_tracks.size()) return;
-  const OwnEdit edit(*this);
+  OwnEdit const edit(*this);
   storeTracks(std::move(others));
 }
 
 void Controller::restore(State const& state) {
-  const OwnEdit edit(*this);
+  OwnEdit const edit(*this);
   storeTracks(state.tracks);
   setDefaultValues(state.byDefault);
   setInterpType(static_cast<int>(state.interpolation));

@@ -24,7 +24,7 @@ struct Controller::KeyChange : UndoChange {
     Slot() = default;
     Slot(KeyTrack const& track, int64 time) {
       key.time = time;
-      const int64 index = track.find(time);
+      int64 const index = track.find(time);
       present = index >= 0;
       if (present) key = track.at(index);
     }
@@ -45,8 +45,8 @@ struct Controller::KeyChange : UndoChange {
   void note(KeyTrack const& track, int64 first, int64 last) {
     if (snapshot) return;
     if (first == last) return noteKey(track, first);
-    const int64 from = track.lowerBound(first);
-    const int64 to = last >= kForever ? track.count() : track.lowerBound(last + 1);
+    int64 const from = track.lowerBound(first);
+    int64 const to = last >= kForever ? track.count() : track.lowerBound(last + 1);
     if (to - from > static_cast<int64>(kKeysBeforeSnapshot)) return takeSnapshot(track);
     for (int64 i = from; i < to && !snapshot; ++i) noteKey(track, track.timeAt(i));
   }
@@ -73,13 +73,13 @@ struct Controller::KeyChange : UndoChange {
   void swap() override {
     if (snapshot) return std::swap(*snapshot, track());
     for (Slot& slot : keys) {
-      const Slot now(track(), slot.key.time);
+      Slot const now(track(), slot.key.time);
       slot.putInto(track());
       slot = now;
     }
   }
   bool isVoid() const override {
-    const KeyTrack none(shapeOf(channel.getPropertyType()));
+    KeyTrack const none(shapeOf(channel.getPropertyType()));
     KeyTrack const* found = channel.findTrack(clip, layer);
     KeyTrack const& present = found ? *found : none;
     if (snapshot) return snapshot->sharesAll(present) || *snapshot == present;
@@ -109,7 +109,7 @@ struct Controller::KeyChange : UndoChange {
     for (; left > 0; --left) {
       Slot slot;
       slot.key.time = step.take<int64>();
-      const auto flags = step.take<unsigned short>();
+      auto const flags = step.take<unsigned short>();
       slot.key.components = flags & 7;
       slot.key.selected = flags >> 3 & 7;
       slot.key.bridges = flags >> 6 & 7;
@@ -164,11 +164,11 @@ KeyTrack* Controller::trackToDelete(NLEClip* clip, int layer, int64 first, int64
   KeyTrack* track = editTrack(clip, layer, first, last);
   if (!track->bridgesAny()) return track;
   // Bridges into the range end at a key before it or at the frame before it, and begin likewise after it.
-  const int64 period = bridgeEnds().framePeriod;
-  for (const int64 frame : {frameAtOrAfter(first, period) - 1, frameAtOrBefore(last, period) + 1})
+  int64 const period = bridgeEnds().framePeriod;
+  for (int64 const frame : {frameAtOrAfter(first, period) - 1, frameAtOrBefore(last, period) + 1})
     editTrack(clip, layer, frame * period, frame * period);
-  for (const unsigned component : {1u, 2u, 4u}) {
-    const int64 before = track->previousHolding(track->lowerBound(first), component);
+  for (unsigned const component : {1u, 2u, 4u}) {
+    int64 const before = track->previousHolding(track->lowerBound(first), component);
     if (before >= 0) editTrack(clip, layer, track->timeAt(before), track->timeAt(before));
   }
   return track;
@@ -247,11 +247,11 @@ struct Controller::SettingsChange : UndoChange {
 
   void tell(ChangeSetBuilder& changes) const override {
     Module const* module = channel.m_module;
-    const std::string name = channel.getName().GetString();
-    const auto values = [this](Values const& all) {
+    std::string const name = channel.getName().GetString();
+    auto const values = [this](Values const& all) {
       return textOfList(std::span(all).first(static_cast<size_t>(shapeOf(channel.getPropertyType()))));
     };
-    const auto setting = [&](char const* which, std::string const& before, std::string const& after) {
+    auto const setting = [&](char const* which, std::string const& before, std::string const& after) {
       changes.tell(SceneChange::Kind::attribute, module, name + which, before, after);
     };
     changes.tell(SceneChange::Kind::byDefault, module, name, values(byDefault), values(channel.m_default));

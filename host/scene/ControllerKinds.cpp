@@ -157,7 +157,7 @@ void RotController::blend(Values const* values, double const* weights, int count
   for (int i = 0; i < count; ++i) {
     double dot = 0;
     for (size_t k = 0; k < 4; ++k) dot += values[i][k] * values[0][k];
-    const double weight = dot < 0 ? -weights[i] : weights[i];
+    double const weight = dot < 0 ? -weights[i] : weights[i];
     for (size_t k = 0; k < 4; ++k) sum[k] += weight * values[i][k];
   }
   out = rawValues(rotationOf(sum));

@@ -11,7 +11,7 @@
 namespace {
 
 bool isLength(Controller const& channel) {
-  const HString name = channel.getName();
+  HString const name = channel.getName();
   return name == "Translation" || name == "Length" || name == "Residual";
 }
 
@@ -31,7 +31,7 @@ ReductionTolerances ReductionTolerances::fromProfile() {
 int Controller::reduceKeys(std::span<HTimeRange const> ranges, ReductionTolerances const& tolerances) {
   return reduce(
       [&](KeyTrack::Key const& key) {
-        const auto range = std::partition_point(
+        auto const range = std::partition_point(
             ranges.begin(), ranges.end(), [&](HTimeRange const& each) { return each.getEnd() < key.time; });
         return range != ranges.end() && range->contains(key.time);
       },
@@ -46,19 +46,19 @@ int Controller::reduce(std::function<bool(KeyTrack::Key const&)> mayGo,
                        ReductionTolerances const& tolerances) {
   Database const& scene = *getDatabase();
   NLEClip* clip = scene.getActiveClip();
-  const int layer = scene.getActiveLayer();
+  int const layer = scene.getActiveLayer();
   KeyTrack const* active = findActiveTrack();
   if (!active || !clip->holdsKeys()) return 0;
 
-  const KeyTrack original = *active;
-  const ReductionRule rule{.interpolation = m_interpolation,
+  KeyTrack const original = *active;
+  ReductionRule const rule{.interpolation = m_interpolation,
                            .tolerance = toleranceFor(*this, original, tolerances),
                            .framePeriod = bridgeEnds().framePeriod,
                            .isWhole = getPropertyType() == IntProperty,
                            .mayGo = std::move(mayGo),
                            .hasGaps = isMeasured() && findDataTrack(clip) == active};
   KeyTrack reduced = original;
-  const int64 removed = reduced.thin(redundantKeys(original, rule));
+  int64 const removed = reduced.thin(redundantKeys(original, rule));
   if (removed == 0) return 0;
   setTrack(clip, layer, std::move(reduced));
   return static_cast<int>(removed);

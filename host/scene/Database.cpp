@@ -83,7 +83,7 @@ bool Database::mayJoin(Module const* module) const {
 Module* Database::createModule(HRuntimeClass* type, char const* name, Module* parent) {
   if (!type || !type->isDerivedFrom(&Module::s_classModule) || !type->getCreateFunction()) return nullptr;
   checkThread();
-  const HString wanted = name && *name ? name : type->getName();
+  HString const wanted = name && *name ? name : type->getName();
   if (!Module::isValidName(wanted) || (parent && !contains(parent))) return nullptr;
   if (parent && type->isDerivedFrom(&Character::s_classCharacter)) return nullptr;
   std::unique_ptr<Module> module(static_cast<Module*>(type->getCreateFunction()()));
@@ -115,7 +115,7 @@ bool Database::addToScene(Module* module, bool uniqueName, Character const* char
 void Database::releaseRemoved() { m_removed.clear(); }
 
 Module* Database::getModule(ControlID& id) const {
-  const auto found = m_byId.find(id);
+  auto const found = m_byId.find(id);
   return found == m_byId.end() ? nullptr : found->second;
 }
 
@@ -168,7 +168,7 @@ void Database::selectAllModules(bool select) {
 
 NLEClip* Database::getClipAfter(NLEClip const* clip) const {
   if (!contains(clip)) return nullptr;
-  const int next = m_clips.indexOf(clip) + 1;
+  int const next = m_clips.indexOf(clip) + 1;
   return next < getNumClips() ? m_clips.at(next) : nullptr;
 }
 
@@ -190,7 +190,7 @@ void Database::syncActiveProperties(bool) {
     for (int k = 0; k < getModule(i)->getNumChannels(); ++k)
       held[getModule(i)->getChannel(k)->getPropertyId()] = true;
   std::vector<unsigned> kept;
-  for (const unsigned id : m_activeProperties)
+  for (unsigned const id : m_activeProperties)
     if (held[id & PropertyTable::kIdMask]) kept.push_back(id);
   setActiveProperties(std::move(kept));
 }

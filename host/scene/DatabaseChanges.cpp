@@ -16,7 +16,7 @@ struct Database::Membership : UndoChange {
   explicit Membership(Module& concerned)
       : UndoChange(&concerned), module(concerned), inScene(concerned.isInScene()) {}
   void swap() override {
-    const bool now = module.isInScene();
+    bool const now = module.isInScene();
     Database& scene = *module.getDatabase();
     if (now != inScene) inScene ? scene.index(&module) : scene.unindex(&module);
     inScene = now;
@@ -134,12 +134,12 @@ struct Database::SettingsChange : UndoChange {
   }
 
   void tell(ChangeSetBuilder& changes) const override {
-    const auto setting = [&](char const* name, std::string const& before, std::string const& after) {
+    auto const setting = [&](char const* name, std::string const& before, std::string const& after) {
       changes.tell(SceneChange::Kind::attribute, nullptr, name, before, after);
     };
-    const auto names = [this](std::vector<unsigned> const& ids) {
+    auto const names = [this](std::vector<unsigned> const& ids) {
       std::string text;
-      for (const unsigned id : ids)
+      for (unsigned const id : ids)
         text += (text.empty() ? "" : " ") + scene.getPropertyTable().getName(id).GetString() +
                 textOfBits(id >> 28 & 7);
       return text;
@@ -149,11 +149,11 @@ struct Database::SettingsChange : UndoChange {
     setting("ActiveLayer", std::to_string(clip ? layer : -1), std::to_string(scene.getActiveLayer()));
     setting("ActiveProperties", names(properties), names(scene.m_activeProperties));
     setting("UpAxis", std::to_string(upAxis), std::to_string(scene.m_upAxis));
-    const HTimeManager::Settings now = scene.m_time->getSettings();
+    HTimeManager::Settings const now = scene.m_time->getSettings();
     setting("FrameRate", textOf(time.rate.getFrameRate()), textOf(now.rate.getFrameRate()));
     setting("AnimRange", textOfRange(time.animRange), textOfRange(now.animRange));
     setting("PlayRange", textOfRange(time.playRange), textOfRange(now.playRange));
-    const auto ranges = [](std::vector<HTimeRange> const& all) {
+    auto const ranges = [](std::vector<HTimeRange> const& all) {
       std::string text;
       for (HTimeRange const& range : all) text += (text.empty() ? "" : " ") + textOfRange(range);
       return text;
@@ -185,7 +185,7 @@ void Database::recordSettings() {
 
 void Database::storeActive(NLEClip* clip, int layer) {
   recordSettings();
-  const bool switched = clip != m_activeClip;
+  bool const switched = clip != m_activeClip;
   m_activeClip = clip;
   m_activeLayer = layer;
   if (switched) forgetWorldCache();
@@ -215,7 +215,7 @@ void Database::putBack(SceneAside& aside) noexcept {
 
 void Database::restoreOrder() {
   if (m_unsorted) {
-    const auto earlier = [](Module const* a, Module const* b) { return a->m_order < b->m_order; };
+    auto const earlier = [](Module const* a, Module const* b) { return a->m_order < b->m_order; };
     m_modules.sort(earlier);
     m_nodes.sort(earlier);
     m_clips.sort(earlier);

@@ -46,7 +46,7 @@ void HTimeManager::setTime(int64 time, bool) {
 }
 
 int64 HTimeManager::getTime(int frame) const {
-  const int64 ticks = getTicksPerFrame();
+  int64 const ticks = getTicksPerFrame();
   if (std::abs(int64{frame}) > kForever / ticks) return frame < 0 ? -kForever : kForever;
   return frame * ticks;
 }
@@ -57,14 +57,14 @@ int HTimeManager::getFrame(int64 time) const {
 
 double HTimeManager::getFrameDouble(int64 time) const {
   // Whole frames apart, so that times far from 0 keep their fraction.
-  const int64 ticks = getTicksPerFrame();
+  int64 const ticks = getTicksPerFrame();
   return static_cast<double>(time / ticks) + static_cast<double>(time % ticks) / static_cast<double>(ticks);
 }
 
 int64 HTimeManager::getTimeFromFrameDouble(double frame) const {
   if (std::isnan(frame)) return 0;
-  const int64 ticks = getTicksPerFrame();
-  const double whole = std::trunc(frame);
+  int64 const ticks = getTicksPerFrame();
+  double const whole = std::trunc(frame);
   if (!isOnTimeLine(frame)) return frame < 0 ? -kForever : kForever;
   return static_cast<int64>(whole) * ticks + std::llround((frame - whole) * static_cast<double>(ticks));
 }
@@ -74,10 +74,10 @@ bool HTimeManager::isOnTimeLine(double frame) const {
 }
 
 int64 HTimeManager::frameTime(int64 time, ERoundDirection direction, int64 origin) const {
-  const int64 ticks = getTicksPerFrame();
+  int64 const ticks = getTicksPerFrame();
   int64 past = (time - origin) % ticks;  // the last boundary
   if (past < 0) past += ticks;
-  const bool up = past > 0 && (direction == RoundUp || (direction == RoundNearest && past >= ticks - past));
+  bool const up = past > 0 && (direction == RoundUp || (direction == RoundNearest && past >= ticks - past));
   return std::clamp(time + (up ? ticks - past : -past), -kForever, kForever);
 }
 
@@ -94,9 +94,9 @@ double HTimeManager::stringToFrameDouble(HString const& text, bool relative) con
 
 bool HTimeManager::framesFromString(HString const& text, bool relative, double& frames) const {
   std::string const& s = text.GetString();
-  const auto [end, error] = std::from_chars(s.data(), s.data() + s.size(), frames);
+  auto const [end, error] = std::from_chars(s.data(), s.data() + s.size(), frames);
   if (error == std::errc() && end == s.data() + s.size() && std::isfinite(frames)) return true;
-  const HFrameRate rate = relative ? m_rate.withoutDrop() : m_rate;
+  HFrameRate const rate = relative ? m_rate.withoutDrop() : m_rate;
   int64 frame = 0;
   if (!rate.frameFromTimecode(text, frame)) return false;
   frames = static_cast<double>(frame);
@@ -125,9 +125,9 @@ void HTimeManager::clearSelectedTimeRanges() {
 void HTimeManager::addSelectedTimeRange(HTimeRange range) {
   if (range.isEmpty()) return;
   record();
-  const auto before = [](HTimeRange const& a, HTimeRange const& b) { return a.getEnd() < b.getStart(); };
+  auto const before = [](HTimeRange const& a, HTimeRange const& b) { return a.getEnd() < b.getStart(); };
   // All ranges that meet the new one grow into it.
-  const auto [first, last] = std::equal_range(m_selected.begin(), m_selected.end(), range, before);
+  auto const [first, last] = std::equal_range(m_selected.begin(), m_selected.end(), range, before);
   for (auto met = first; met != last; ++met) range.include(*met);
   m_selected.insert(m_selected.erase(first, last), range);
 }

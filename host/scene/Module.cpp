@@ -30,7 +30,7 @@ void ModuleReferrer::refer(Module* module) {
 
 void ModuleReferrer::release(Module* module) {
   if (!module) return;
-  const auto found = module->m_referrers->find(this);
+  auto const found = module->m_referrers->find(this);
   if (--found->second == 0) module->m_referrers->erase(found);
 }
 
@@ -96,7 +96,7 @@ HString Module::getFullPathString() const { return HString("\\" + suffixText(INT
 HString Module::getMinimumPathString(bool withinPriority) const {
   Module const* priority = withinPriority ? m_database->getPriorityModule() : nullptr;
   if (priority && priority != this && !isDescendedFrom(priority)) priority = nullptr;
-  const int levels = m_database->getIndex().levelsToTell(this, priority);
+  int const levels = m_database->getIndex().levelsToTell(this, priority);
   return levels == 0 ? getFullPathString() : HString(suffixText(levels));
 }
 
@@ -125,9 +125,9 @@ Marker* Module::getMarkerChild(int i) const {
 
 int Module::findMarkerChild(HString const& name) const {
   int found = -1;
-  const auto visit = [&](Module* child) {
+  auto const visit = [&](Module* child) {
     if (!child->isKindOf(&Marker::s_classMarker)) return true;
-    const int index = m_children->markers.indexOf(child);
+    int const index = m_children->markers.indexOf(child);
     if (found < 0 || index < found) found = index;
     return true;
   };
@@ -193,7 +193,7 @@ Attribute* Module::getAttribute(ControlID id) const {
 
 Attribute* Module::addAttribute(std::unique_ptr<Attribute> attribute, Attribute::Reaction reaction) {
   assert(attribute->m_custom || PropertyTable::isBuiltInAttribute(attribute->getName()));
-  const Attribute::Type type = attribute->getType();
+  Attribute::Type const type = attribute->getType();
   attribute->m_module = this;
   attribute->m_id = ControlID(++m_database->m_lastID);
   attribute->m_reaction = reaction;
@@ -270,7 +270,7 @@ void Module::discardDataEdit() {
   for (OpenEdit::Before const& before : m_dataEdit->before) before.channel->restore(before.state);
   // Channels that were added meanwhile held no keys.
   for (size_t i = m_dataEdit->before.size(); i < m_channels.size(); ++i) {
-    const DataEdit edit(*m_channels[i]);
+    DataEdit const edit(*m_channels[i]);
     m_channels[i]->storeTracks({});
   }
   endDataEdit();

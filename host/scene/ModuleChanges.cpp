@@ -27,7 +27,7 @@ struct Module::NameChange : UndoChange {
 
 void Module::storeName(HString const& name) {
   if (isRecorded()) journal().add(std::make_unique<NameChange>(*this));
-  const bool indexed = isInScene();
+  bool const indexed = isInScene();
   HString given = name;
   if (indexed) m_database->getIndex().remove(this);
   m_name = std::move(given);
@@ -41,7 +41,7 @@ struct Module::ParentChange : UndoChange {
       : UndoChange(&concerned), module(concerned), parent(module.m_parent), order(module.m_childOrder) {}
   void swap() override {
     Module* now = module.m_parent;
-    const uint64 orderNow = module.m_childOrder;
+    uint64 const orderNow = module.m_childOrder;
     module.moveTo(parent, order);
     parent = now;
     order = orderNow;
@@ -60,7 +60,7 @@ void Module::storeParent(Module* parent) {
 }
 
 void Module::moveTo(Module* parent, uint64 order) {
-  const bool indexed = isInScene();
+  bool const indexed = isInScene();
   if (indexed) m_database->getIndex().remove(this);
   unlinkFromParent();
   m_parent = parent;
@@ -73,7 +73,7 @@ void Module::moveTo(Module* parent, uint64 order) {
 void Module::linkToParent() {
   if (!m_parent || m_childSlot != kNoSlot) return;
   auto const& siblings = m_parent->children().all;
-  const int count = siblings.getCount();
+  int const count = siblings.getCount();
   if (count > 0 && siblings.at(count - 1)->m_childOrder > m_childOrder) m_database->needsSorting(m_parent);
   m_parent->children().editFor(this, [this](auto& list) { list.append(this); });
 }
@@ -84,7 +84,7 @@ void Module::unlinkFromParent() {
 }
 
 void Module::sortChildren() {
-  const auto earlier = [](Module const* a, Module const* b) { return a->m_childOrder < b->m_childOrder; };
+  auto const earlier = [](Module const* a, Module const* b) { return a->m_childOrder < b->m_childOrder; };
   children().all.sort(earlier);
   children().nodes.sort(earlier);
   children().markers.sort(earlier);

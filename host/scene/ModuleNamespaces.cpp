@@ -18,37 +18,37 @@ bool isValidNamespace(HString const& name) {
 // nowhere.
 size_t findParts(std::string_view prefix, std::string_view parts) {
   for (size_t at = prefix.find(parts); at != std::string_view::npos; at = prefix.find(parts, at + 1)) {
-    const size_t end = at + parts.size();
+    size_t const end = at + parts.size();
     if ((at == 0 || prefix[at - 1] == kJoint) && (end == prefix.size() || prefix[end] == kJoint)) return at;
   }
   return std::string_view::npos;
 }
 
 std::string_view prefixOf(std::string_view name) {
-  const size_t joint = name.rfind(kJoint);
+  size_t const joint = name.rfind(kJoint);
   return joint == std::string_view::npos ? std::string_view() : name.substr(0, joint);
 }
 
 }  // namespace
 
 void Module::getNamespace(HString& out) const {
-  const HString name = getName();
+  HString const name = getName();
   out = HString(prefixOf(name.GetString()));
 }
 
 void Module::getNamespaces(TArray<HString>& out) const {
   out.clear();
-  const HString name = getName();
+  HString const name = getName();
   std::string_view prefix = prefixOf(name.GetString());
   while (!prefix.empty()) {
-    const size_t joint = prefix.find(kJoint);
+    size_t const joint = prefix.find(kJoint);
     out.add(HString(prefix.substr(0, joint)));
     prefix.remove_prefix(joint == std::string_view::npos ? prefix.size() : joint + 1);
   }
 }
 
 bool Module::addNamespace(HString const& name) {
-  const HString own = getName();
+  HString const own = getName();
   if (!isValidNamespace(name) ||
       findParts(prefixOf(own.GetString()), name.GetString()) != std::string_view::npos)
     return false;
@@ -56,8 +56,8 @@ bool Module::addNamespace(HString const& name) {
 }
 
 bool Module::removeNamespace(HString const& name) {
-  const HString own = getName();
-  const size_t at = isValidNamespace(name) ? findParts(prefixOf(own.GetString()), name.GetString())
+  HString const own = getName();
+  size_t const at = isValidNamespace(name) ? findParts(prefixOf(own.GetString()), name.GetString())
                                            : std::string_view::npos;
   if (at == std::string_view::npos) return false;
   std::string text = own.GetString();
@@ -65,13 +65,13 @@ bool Module::removeNamespace(HString const& name) {
 }
 
 bool Module::replaceNamespace(HString const& former, HString const& name) {
-  const HString own = getName();
-  const size_t at = isValidNamespace(name) ? findParts(prefixOf(own.GetString()), former.GetString())
+  HString const own = getName();
+  size_t const at = isValidNamespace(name) ? findParts(prefixOf(own.GetString()), former.GetString())
                                            : std::string_view::npos;
   if (former.IsEmpty() || at == std::string_view::npos) return false;
   // What addNamespace refuses cannot come in this way: one that the other parts hold.
   std::string text = own.GetString();
-  const std::string before = text.substr(0, at), after = text.substr(at + former.GetString().size());
+  std::string const before = text.substr(0, at), after = text.substr(at + former.GetString().size());
   if (former != name && (findParts(before, name.GetString()) != std::string_view::npos ||
                          findParts(prefixOf(after), name.GetString()) != std::string_view::npos))
     return false;

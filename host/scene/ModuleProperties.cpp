@@ -11,9 +11,9 @@ constexpr double kDegrees = 57.29577951308232;
 
 // Splits "Translation.y" into the channel name and 1; -1 without a component.
 int splitComponent(HString& name) {
-  const int dot = name.ReverseFind('.');
+  int const dot = name.ReverseFind('.');
   if (dot < 0 || dot != name.GetLength() - 2) return -1;
-  const char letter = static_cast<char>(name[dot + 1] | 0x20);
+  char const letter = static_cast<char>(name[dot + 1] | 0x20);
   if (letter < 'x' || letter > 'z') return -1;
   name = name.Left(static_cast<uint64>(dot));
   return letter - 'x';
@@ -88,8 +88,8 @@ Controller* Module::addChannel(HString const& name, DataSource::PropertyType typ
 }
 
 Controller* Module::addChannel(HString const& name, std::unique_ptr<Controller> channel) {
-  const DataSource::PropertyType type = channel ? channel->getPropertyType() : DataSource::NoProperty;
-  const unsigned id = m_database->getPropertyTable().add(name, type);
+  DataSource::PropertyType const type = channel ? channel->getPropertyType() : DataSource::NoProperty;
+  unsigned const id = m_database->getPropertyTable().add(name, type);
   if (id == 0) return nullptr;
   if (Controller* existing = getProperty(id)) return existing;
   channel->m_module = this;
@@ -101,11 +101,11 @@ Controller* Module::addChannel(HString const& name, std::unique_ptr<Controller> 
 
 HString Module::getPropertyVal(HString const& name, double& value, bool byDefault) const {
   HString channelName = name;
-  const int component = splitComponent(channelName);
+  int const component = splitComponent(channelName);
   PropertyTable const& table = m_database->getPropertyTable();
-  const unsigned id = table.findId(channelName);
-  const DataSource::PropertyType type = table.getType(id);
-  const bool several = type == DataSource::Vec3Property || type == DataSource::RotProperty;
+  unsigned const id = table.findId(channelName);
+  DataSource::PropertyType const type = table.getType(id);
+  bool const several = type == DataSource::Vec3Property || type == DataSource::RotProperty;
   if (id != 0 && (several || component < 0)) {
     Controller const* channel = getProperty(id);
     HString text;
@@ -113,7 +113,7 @@ HString Module::getPropertyVal(HString const& name, double& value, bool byDefaul
       text.Format("Cannot find property named %s on module %s", name.GetStr(), getName().GetStr());
       return text;
     }
-    const int64 now = m_database->getTimeManager()->getTime();
+    int64 const now = m_database->getTimeManager()->getTime();
     if (several && component < 0) return "Use getVectorProperty for this type of property";
     value =
         several ? componentValue(*channel, component, byDefault, now) : scalarValue(*channel, byDefault, now);

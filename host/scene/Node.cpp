@@ -23,7 +23,7 @@ int64 now(Node const& node) { return node.getDatabase()->getTimeManager()->getTi
 }  // namespace
 
 void Node::markMoved(Module* module) noexcept {
-  const uint64 epoch = module->getDatabase()->m_worldCache.epoch;
+  uint64 const epoch = module->getDatabase()->m_worldCache.epoch;
   auto const* top = objectAs<Node>(module);
   if (top && top->m_worldEpoch != epoch) return;
   try {
@@ -64,7 +64,7 @@ Transform Node::getWorldTransform(int64 time) const {
 }
 
 Transform const& Node::cacheBelow(Node const* parent, int64 time) const {
-  const Transform own = inParent(time);
+  Transform const own = inParent(time);
   m_world = parent ? parent->m_world * own : own;
   m_worldEpoch = getDatabase()->m_worldCache.epoch;
   return m_world;
@@ -76,7 +76,7 @@ Node::~Node() = default;
 
 void Node::setUp() {
   Module::setUp();
-  static const Attribute::Labels orders = std::make_shared<std::vector<HString> const>(
+  static Attribute::Labels const orders = std::make_shared<std::vector<HString> const>(
       std::vector<HString>{"XYZ", "XZY", "YXZ", "YZX", "ZXY", "ZYX"});
   m_translation = static_cast<Vec3Controller*>(addChannel("Translation", DataSource::Vec3Property));
   m_rotation = static_cast<RotController*>(addChannel("Rotation", DataSource::RotProperty));
@@ -203,10 +203,10 @@ Vec3 Node::translationFor(Vec3 const& inParent) const {
 void Node::writeAt(Controller* channel, int64 time, Controller::Values const& values) {
   if (obstacleToValue(*channel) != Obstacle::none) return;
   if (getDatabase()->getActiveClip()) {
-    const DataEdit edit(*channel, HTimeRange(time, time));
+    DataEdit const edit(*channel, HTimeRange(time, time));
     channel->writeKeyAt(time, channel->solveLayer(time, values), KeyTrack::kAll);
   } else {
-    const DataEdit edit = DataEdit::ofDefault(*channel);
+    DataEdit const edit = DataEdit::ofDefault(*channel);
     channel->setDefaultValues(values);
   }
 }
@@ -289,7 +289,7 @@ void Node::storePreTransform(Vec3 const& translation, TalixRotation const& rotat
 }
 
 bool Node::setPreRotation(TalixRotation const& rotation, bool keepWorld) {
-  const TalixRotation former = getConstLocalRot(false);
+  TalixRotation const former = getConstLocalRot(false);
   storePreTransform(m_preTranslation, rotation);
   if (keepWorld) setConstLocalRot(former, false);
   return true;

@@ -46,7 +46,7 @@ class OrderedList {
   // Nothing when the object is not in the list.
   void remove(T* object) noexcept {
     if (!contains(object)) return;
-    const uint32 slot = object->*Slot;
+    uint32 const slot = object->*Slot;
     object->*Slot = kNoSlot;
     --m_count;
     if (slot + 1 == m_objects.size()) {
@@ -109,7 +109,7 @@ class OrderedList {
     for (size_t i = 0; i < m_objects.size(); ++i) appendSum();
   }
   void appendSum() {
-    const size_t i = m_sums.size();
+    size_t const i = m_sums.size();
     int sum = m_objects[i - 1] ? 1 : 0;
     for (size_t k = 1; k < (i & -i); k *= 2) sum += m_sums[i - k];
     m_sums.push_back(sum);

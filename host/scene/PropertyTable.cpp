@@ -16,7 +16,7 @@ std::string lowerCase(HString name) {
 // "ty" is short for "Translation.y". Empty for other texts.
 std::string longForm(std::string_view name) {
   if (name.size() != 2) return {};
-  const char channel = static_cast<char>(name[0] | 0x20), component = static_cast<char>(name[1] | 0x20);
+  char const channel = static_cast<char>(name[0] | 0x20), component = static_cast<char>(name[1] | 0x20);
   char const* whole = channel == 't'   ? "Translation"
                       : channel == 'r' ? "Rotation"
                       : channel == 's' ? "Scale"
@@ -52,7 +52,7 @@ void PropertyTable::reset() {
 }
 
 unsigned PropertyTable::findId(HString const& name) const {
-  const auto found = m_ids.find(name.GetString());
+  auto const found = m_ids.find(name.GetString());
   return found == m_ids.end() ? 0 : found->second;
 }
 
@@ -71,7 +71,7 @@ struct PropertyTable::Addition : UndoChange {
   Addition(PropertyTable& concerned, HString const& text, DataSource::PropertyType kind)
       : UndoChange(nullptr), table(concerned), name(text), type(kind) {}
   void swap() override {
-    const bool now = table.findId(name) != 0;
+    bool const now = table.findId(name) != 0;
     if (now != isThere) isThere ? static_cast<void>(table.store(name, type)) : table.removeLast();
     isThere = now;
   }
@@ -90,7 +90,7 @@ struct PropertyTable::AttributeAddition : UndoChange {
   AttributeAddition(PropertyTable& concerned, std::string lowerName)
       : UndoChange(nullptr), table(concerned), name(std::move(lowerName)) {}
   void swap() override {
-    const bool now = table.m_attributes.contains(name);
+    bool const now = table.m_attributes.contains(name);
     if (now != isThere)
       isThere ? static_cast<void>(table.m_attributes.insert(name))
               : static_cast<void>(table.m_attributes.erase(name));
@@ -114,7 +114,7 @@ HString PropertyTable::obstacleTo(HString const& name) const {
 HString PropertyTable::obstacleToChannel(HString const& name, DataSource::PropertyType type) const {
   HString text = obstacleTo(name);
   if (!text.IsEmpty()) return text;
-  const unsigned known = findId(name);
+  unsigned const known = findId(name);
   if (known && getType(known) != type)
     text.Format("it is the name of %s channels", getTypeName(getType(known)));
   else if (isBuiltInAttribute(name) || m_attributes.contains(lowerCase(name)))
@@ -127,7 +127,7 @@ HString PropertyTable::obstacleToAttribute(HString const& name) const {
   if (!text.IsEmpty()) return text;
   if (m_idsByLowerName.contains(lowerCase(name)))
     text = "it is the name of a channel";
-  else if (const std::string whole = longForm(name.GetString()); !whole.empty())
+  else if (std::string const whole = longForm(name.GetString()); !whole.empty())
     text.Format("it is short for %s", whole.c_str());
   return text;
 }
@@ -156,7 +156,7 @@ char const* PropertyTable::getTypeName(DataSource::PropertyType type) {
 
 unsigned PropertyTable::add(HString const& name, DataSource::PropertyType type) {
   if (!obstacleToChannel(name, type).IsEmpty()) return 0;
-  if (const unsigned known = findId(name)) return known;
+  if (unsigned const known = findId(name)) return known;
   if (m_entries.size() == kIdMask) return 0;
   if (m_journal.isRecording()) m_journal.add(std::make_unique<Addition>(*this, name, type));
   return store(name, type);
@@ -164,7 +164,7 @@ unsigned PropertyTable::add(HString const& name, DataSource::PropertyType type) 
 
 bool PropertyTable::addAttribute(HString const& name) {
   if (!obstacleToAttribute(name).IsEmpty()) return false;
-  const std::string lower = lowerCase(name);
+  std::string const lower = lowerCase(name);
   if (m_attributes.contains(lower)) return true;
   if (m_journal.isRecording()) m_journal.add(std::make_unique<AttributeAddition>(*this, lower));
   m_attributes.insert(lower);
@@ -176,7 +176,7 @@ unsigned PropertyTable::store(HString const& name, DataSource::PropertyType type
   sameButCase.reserve(sameButCase.size() + 1);
   if (m_entries.size() == m_entries.capacity()) m_entries.reserve(2 * m_entries.size() + 16);
   Entry entry{name, type};
-  const auto id = static_cast<unsigned>(m_entries.size() + 1);
+  auto const id = static_cast<unsigned>(m_entries.size() + 1);
   m_ids.emplace(name.GetString(), id);
   // What may fail has been done.
   sameButCase.push_back(id);
@@ -187,7 +187,7 @@ unsigned PropertyTable::store(HString const& name, DataSource::PropertyType type
 void PropertyTable::removeLast() {
   HString const& name = m_entries.back().name;
   m_ids.erase(name.GetString());
-  const auto known = m_idsByLowerName.find(lowerCase(name));
+  auto const known = m_idsByLowerName.find(lowerCase(name));
   known->second.pop_back();
   if (known->second.empty()) m_idsByLowerName.erase(known);
   m_entries.pop_back();
@@ -195,7 +195,7 @@ void PropertyTable::removeLast() {
 
 HString PropertyTable::restoreCase(HString const& name) const {
   if (findId(name)) return name;
-  const auto found = m_idsByLowerName.find(lowerCase(name));
+  auto const found = m_idsByLowerName.find(lowerCase(name));
   return found == m_idsByLowerName.end() || found->second.size() != 1 ? HString()
                                                                       : getName(found->second.front());
 }
@@ -221,13 +221,13 @@ unsigned Controller::mapPropertyName(HString const& name) {
 void Controller::fixChannelStr(HString& text) {
   std::string name(withoutOuterBlanks(text.GetString()));
   // A channel that really has such a name is meant itself.
-  if (const std::string whole = longForm(name); !whole.empty() && !mapPropertyName(HString(name))) {
+  if (std::string const whole = longForm(name); !whole.empty() && !mapPropertyName(HString(name))) {
     text = whole;
     return;
   }
   PropertyTable const& table = PropertyTable::getInstance();
   HString known = table.restoreCase(HString(name));
-  const size_t dot = name.rfind('.');
+  size_t const dot = name.rfind('.');
   if (known.IsEmpty() && dot != std::string::npos) {
     known = table.restoreCase(HString(name.substr(0, dot)));
     if (!known.IsEmpty()) known += HString(name.substr(dot));

@@ -8,7 +8,7 @@ namespace {
 std::vector<std::string_view> splitPath(std::string_view path) {
   std::vector<std::string_view> names;
   while (true) {
-    const size_t end = path.find('\\');
+    size_t const end = path.find('\\');
     names.push_back(path.substr(0, end));
     if (end == std::string_view::npos) return names;
     path.remove_prefix(end + 1);
@@ -23,11 +23,11 @@ bool passes(Module const* module, HRuntimeClass const* filter) { return !filter 
 
 // Splits "name_12" into "name" and 12; 0 when the name does not end so.
 int trailingNumber(std::string_view name, std::string_view& base) {
-  const size_t mark = name.rfind('_');
+  size_t const mark = name.rfind('_');
   if (mark == std::string_view::npos || mark == 0 || mark + 1 == name.size() || name[mark + 1] == '0')
     return 0;
   int number = 0;
-  const auto [end, error] = std::from_chars(name.data() + mark + 1, name.data() + name.size(), number);
+  auto const [end, error] = std::from_chars(name.data() + mark + 1, name.data() + name.size(), number);
   if (error != std::errc() || end != name.data() + name.size() || number < 1) return 0;
   base = name.substr(0, mark);
   return number;
@@ -61,11 +61,11 @@ void SceneIndex::ByAge::erase(Module* module) {
 }
 
 void SceneIndex::add(Module* module) {
-  const auto insert = [&](auto& map, auto makeKey) {
+  auto const insert = [&](auto& map, auto makeKey) {
     auto found = map.find(makeKey(std::string_view(module->m_name.GetString())));
     if (found == map.end()) {
       auto name = std::make_unique<std::string>(module->m_name.GetString());
-      const std::string_view text = *name;
+      std::string_view const text = *name;
       found = map.emplace(makeKey(text), Bucket{std::move(name), {}}).first;
     }
     found->second.modules.insert(module);
@@ -80,25 +80,25 @@ void SceneIndex::add(Module* module) {
 }
 
 void SceneIndex::remove(Module* module) noexcept {
-  const auto erase = [&](auto& map, auto const& key) {
-    const auto found = map.find(key);
+  auto const erase = [&](auto& map, auto const& key) {
+    auto const found = map.find(key);
     if (found == map.end()) return;
     found->second.modules.erase(module);
     if (found->second.modules.empty()) map.erase(found);
   };
-  const std::string_view name = module->m_name.GetString();
+  std::string_view const name = module->m_name.GetString();
   erase(m_byName, name);
   erase(m_byParent, ChildKey{module->m_parent, name});
   freeNumber(module->m_parent, name);
 }
 
 SceneIndex::ByAge const* SceneIndex::modulesNamed(std::string_view name) const {
-  const auto found = m_byName.find(name);
+  auto const found = m_byName.find(name);
   return found == m_byName.end() ? nullptr : &found->second.modules;
 }
 
 SceneIndex::ByAge const* SceneIndex::childrenNamed(Module const* parent, std::string_view name) const {
-  const auto found = m_byParent.find(ChildKey{parent, name});
+  auto const found = m_byParent.find(ChildKey{parent, name});
   return found == m_byParent.end() ? nullptr : &found->second.modules;
 }
 
@@ -113,7 +113,7 @@ template <class Visit>
 bool SceneIndex::forEachBelow(Module* top, std::span<std::string_view const> names, Visit visit) const {
   std::vector<std::pair<Module*, size_t>> open{{top, 0}};
   while (!open.empty()) {
-    const auto [module, depth] = open.back();
+    auto const [module, depth] = open.back();
     open.pop_back();
     if (depth == names.size()) {
       if (!visit(module)) return false;
@@ -129,7 +129,7 @@ bool SceneIndex::forEachBelow(Module* top, std::span<std::string_view const> nam
 
 Module* SceneIndex::findFull(std::string_view path, HRuntimeClass const* filter, Module const* below) const {
   if (path.empty() || path.front() != '\\') return nullptr;
-  const std::vector<std::string_view> names = splitPath(path.substr(1));
+  std::vector<std::string_view> const names = splitPath(path.substr(1));
   // Siblings may share a name, so several modules may have the path.
   Module* first = nullptr;
   forEachBelow(nullptr, std::span(names).first(names.size() - 1), [&](Module* parent) {
@@ -151,7 +151,7 @@ void SceneIndex::forEachWithSuffix(std::vector<std::string_view> const& names, V
   ByAge const* ends = modulesNamed(names.back());
   if (!tops || !ends) return;
   if (ends->size() > tops->size()) {
-    const std::span<std::string_view const> rest = std::span(names).subspan(1);
+    std::span<std::string_view const> const rest = std::span(names).subspan(1);
     tops->forEach([&](Module* top) { return forEachBelow(top, rest, visit); });
     return;
   }
@@ -169,7 +169,7 @@ Module* SceneIndex::findSuffix(std::string_view path, HRuntimeClass const* filte
   Module* only = nullptr;
   forEachWithSuffix(splitPath(path), [&](Module* module) {
     if (!passes(module, filter) || !isBelow(module, below)) return true;
-    const bool second = only != nullptr;
+    bool const second = only != nullptr;
     only = second ? nullptr : module;
     return !second;
   });
@@ -192,7 +192,7 @@ int SceneIndex::levelsToTell(Module const* module, Module const* below) const {
 HString SceneIndex::freeName(Module const* parent, HString const& wanted) {
   if (!findChild(parent, wanted.GetString())) return wanted;
   Numbers& numbers = m_numbers[parent][wanted.GetString()];
-  const auto isFree = [&](int number, HString& name) {
+  auto const isFree = [&](int number, HString& name) {
     name = HString(wanted.GetString() + "_" + std::to_string(number));
     return !findChild(parent, name.GetString());
   };
@@ -207,13 +207,13 @@ HString SceneIndex::freeName(Module const* parent, HString const& wanted) {
 
 // A name has become free below a parent.
 void SceneIndex::freeNumber(Module const* parent, std::string_view name) noexcept {
-  const auto numbers = m_numbers.find(parent);
+  auto const numbers = m_numbers.find(parent);
   if (numbers == m_numbers.end()) return;
   std::string_view base;
-  const int number = trailingNumber(name, base);
+  int const number = trailingNumber(name, base);
   if (number == 0) return;
   try {
-    const auto known = numbers->second.find(std::string(base));
+    auto const known = numbers->second.find(std::string(base));
     if (known != numbers->second.end() && number < known->second.next) known->second.freed.insert(number);
   } catch (std::bad_alloc const&) {
     m_numbers.erase(numbers);  // they are counted anew

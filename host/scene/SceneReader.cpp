@@ -47,7 +47,7 @@ constexpr size_t kPosition = 0, kRotation = 3, kScale = 7, kWidth = 10;  // of a
 
 // A rotated vector, by the quaternion x y z w.
 inline void rotate(double const* q, double x, double y, double z, double* out) {
-  const double tx = 2 * (q[1] * z - q[2] * y), ty = 2 * (q[2] * x - q[0] * z), tz = 2 * (q[0] * y - q[1] * x);
+  double const tx = 2 * (q[1] * z - q[2] * y), ty = 2 * (q[2] * x - q[0] * z), tz = 2 * (q[0] * y - q[1] * x);
   out[0] = x + q[3] * tx + q[1] * tz - q[2] * ty;
   out[1] = y + q[3] * ty + q[2] * tx - q[0] * tz;
   out[2] = z + q[3] * tz + q[0] * ty - q[1] * tx;
@@ -82,7 +82,7 @@ class SceneReader::Channel {
     for (NLEClip const* clip : clips) {
       for (int layer = 0; layer < clip->getNumLayers(); ++layer) {
         KeyTrack const* track = state.find(clip, layer);
-        const bool keyed = track && !track->empty();
+        bool const keyed = track && !track->empty();
         m_constant = m_constant && !keyed;
         m_keys.push_back(keyed ? *track : KeyTrack(Controller::shapeOf(m_type)));
       }
@@ -101,7 +101,7 @@ class SceneReader::Channel {
   // `weights`: of each clip of a blend at the times; none: a clip by itself.
   void sample(SampleTimes const& times, std::span<double const* const> weights,
               std::vector<double>& out) const {
-    const auto each = static_cast<size_t>(Controller::shapeOf(m_type)) * static_cast<size_t>(times.count());
+    auto const each = static_cast<size_t>(Controller::shapeOf(m_type)) * static_cast<size_t>(times.count());
     out.resize(each);
     if (weights.empty()) return keysOf(0).sample(times, out.data());
     std::vector<double> values(each * m_ends.size());
@@ -177,7 +177,7 @@ SceneReader::SceneReader(std::span<Node const* const> nodes, NLEClip const* clip
   std::unordered_map<Node const*, Entry> entries;
   std::unordered_map<Node const*, NodeState> states;
   std::vector<Node const*> roots;
-  const auto stateOf = [&](Node const* node) -> NodeState const& {
+  auto const stateOf = [&](Node const* node) -> NodeState const& {
     NodeState const* other = former ? former(node) : nullptr;
     return other ? *other : states.try_emplace(node, *node).first->second;
   };
@@ -196,7 +196,7 @@ SceneReader::SceneReader(std::span<Node const* const> nodes, NLEClip const* clip
   for (auto root = roots.rbegin(); root != roots.rend(); ++root) open.emplace_back(*root, 0);
   m_joints.reserve(entries.size());
   while (!open.empty()) {
-    const auto [node, depth] = open.back();
+    auto const [node, depth] = open.back();
     open.pop_back();
     NodeState const& state = stateOf(node);
     Entry& entry = entries[node];
@@ -266,15 +266,15 @@ class SceneReader::Pass {
   }
 
   Run compose(Joint const& joint) {
-    const Run translation = read(joint.translation, 3, m_translations);
-    const Run rotation = read(joint.rotation, 4, m_rotations);
-    const Run scale = read(joint.scale, 3, m_scales);
+    Run const translation = read(joint.translation, 3, m_translations);
+    Run const rotation = read(joint.rotation, 4, m_rotations);
+    Run const scale = read(joint.scale, 3, m_scales);
     double preRotation[4];
     joint.preRotation.getQuaternion(preRotation);
     Vec3 const& pre = joint.preTranslation;
     Run const& above = m_above[static_cast<size_t>(joint.depth)];
     double* out = m_worlds.data() + static_cast<size_t>(joint.depth) * kBlock * kWidth;
-    const Run result{out, kWidth};
+    Run const result{out, kWidth};
     for (size_t i = 0; i < m_count; ++i, out += kWidth) {
       double const *t = translation.at(i), *q = rotation.at(i), *s = scale.at(i);
       double position[3], turned[4];
@@ -284,7 +284,7 @@ class SceneReader::Pass {
         t = position;
         q = turned;
       }
-      const double x = pre.x + t[0], y = pre.y + t[1], z = pre.z + t[2];
+      double const x = pre.x + t[0], y = pre.y + t[1], z = pre.z + t[2];
       if (joint.depth == 0) {
         out[0] = x, out[1] = y, out[2] = z;
         std::copy_n(q, 4, out + kRotation);
@@ -333,14 +333,14 @@ HTimeRange SceneReader::getMotionRange() const {
 }
 
 void SceneReader::readWorld(SampleTimes const& times, Arrays const& arrays) const {
-  const auto nodes = static_cast<size_t>(m_numNodes);
+  auto const nodes = static_cast<size_t>(m_numNodes);
   Pass pass(*this);
-  const auto all = static_cast<size_t>(times.count());
+  auto const all = static_cast<size_t>(times.count());
   for (size_t first = 0; first < all; first += kBlock) {
-    const size_t count = std::min(kBlock, all - first);
+    size_t const count = std::min(kBlock, all - first);
     pass.run(times.part(static_cast<int64>(first), static_cast<int64>(count)),
              [&](Joint const& joint, Run const& world) {
-               for (const int result : joint.results) {
+               for (int const result : joint.results) {
                  size_t place = first * nodes + static_cast<size_t>(result);
                  for (size_t i = 0; i < count; ++i, place += nodes) {
                    double const* one = world.at(i);
@@ -355,7 +355,7 @@ void SceneReader::readWorld(SampleTimes const& times, Arrays const& arrays) cons
 }
 
 std::vector<Transform> SceneReader::readWorld(SampleTimes const& times) const {
-  const size_t count = static_cast<size_t>(times.count() * m_numNodes);
+  size_t const count = static_cast<size_t>(times.count() * m_numNodes);
   std::vector<double> positions(3 * count), rotations(4 * count), scales(3 * count);
   readWorld(times, {positions.data(), rotations.data(), scales.data(), nullptr});
   std::vector<Transform> transforms(count);

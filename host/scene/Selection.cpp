@@ -8,7 +8,7 @@ struct Selection::Change : UndoChange {
       : UndoChange(nullptr), selection(concerned), primary(concerned.m_primary) {}
 
   void swap() override {
-    const auto put = [this](Entry& entry, bool selected) {
+    auto const put = [this](Entry& entry, bool selected) {
       if (!selected) return selection.take(entry.module);
       if (entry.module->isSelected()) return;
       entry.module->m_selectionOrder = entry.order;
@@ -25,7 +25,7 @@ struct Selection::Change : UndoChange {
   // Nothing, or a selection replaced by itself.
   bool isVoid() const override {
     if (primary != selection.m_primary) return false;
-    const size_t half = entries.size() / 2;
+    size_t const half = entries.size() / 2;
     if (entries.size() % 2 != 0 || (half > 0 && selection.getCount() != static_cast<int>(half))) return false;
     for (size_t i = 0; i < half; ++i)
       if (entries[i].module != entries[half + i].module || entries[i].order >= entries[half + i].order)
@@ -38,7 +38,7 @@ struct Selection::Change : UndoChange {
 
   void tell(ChangeSetBuilder& changes) const override {
     constexpr auto kind = SceneChange::Kind::selection;
-    const auto text = [](bool selected) { return selected ? "true" : "false"; };
+    auto const text = [](bool selected) { return selected ? "true" : "false"; };
     for (auto entry = entries.rbegin(); entry != entries.rend(); ++entry)
       changes.tell(kind, entry->module, "", text(entry->was), text(entry->module->isSelected()));
     changes.tell(kind, nullptr, "Primary", textOf(primary), textOf(selection.m_primary),
@@ -63,7 +63,7 @@ void Selection::record(Module* module) {
 }
 
 void Selection::insert(Module* module) {
-  const int count = getCount();
+  int const count = getCount();
   m_unsorted |= count > 0 && at(count - 1)->m_selectionOrder > module->m_selectionOrder;
   try {
     m_modules.append(module);
@@ -121,7 +121,7 @@ void Selection::setPrimary(Module* module) {
 
 void Selection::restoreOrder() {
   if (!m_unsorted) return;
-  const auto earlier = [](Module const* a, Module const* b) {
+  auto const earlier = [](Module const* a, Module const* b) {
     return a->m_selectionOrder < b->m_selectionOrder;
   };
   m_modules.sort(earlier);

@@ -14,8 +14,8 @@ std::vector<Attribute*> ParameterizedSetup::parameters() const {
   std::vector<Attribute*> found;
   for (int i = 0; i < getNumAttributes(); ++i) {
     Attribute* attribute = getAttribute(i);
-    const Attribute::Type type = attribute->getType();
-    const bool number = type == Attribute::Integer || type == Attribute::Float || type == Attribute::Boolean;
+    Attribute::Type const type = attribute->getType();
+    bool const number = type == Attribute::Integer || type == Attribute::Float || type == Attribute::Boolean;
     if (number && attribute->isCustom()) found.push_back(attribute);
   }
   return found;

@@ -27,9 +27,9 @@ bool SubjectManager::removeSubject(Character* subject, bool removeLabels, bool u
     if (auto* marker = objectAs<Marker>(module)) markers.push_back(marker);
 
   // They become roots, and go on moving in the world as before.
-  const MotionScope motion(m_scene);
+  MotionScope const motion(m_scene);
   for (Marker* marker : markers) marker->parentAdjust(nullptr, HTimeRange::forever());
-  const HString name = subject->getName();
+  HString const name = subject->getName();
   for (Marker* marker : markers) {
     marker->getParent()->removeChild(marker, false);
     // A namespace that the marker has already, or a name that can be none, is not put in front.

@@ -37,7 +37,7 @@ void UndoJournal::endStep(HString const& name) {
 }
 
 void UndoJournal::keep(HString const& name) {
-  const bool changed =
+  bool const changed =
       std::any_of(m_open.begin(), m_open.end(), [](auto const& change) { return !change->isVoid(); });
   if (!changed) {
     // What is hidden, as the numbers that give the order of the selection, becomes what earlier steps know.
@@ -47,7 +47,7 @@ void UndoJournal::keep(HString const& name) {
   }
 
   m_done.push(m_open, name.GetString());
-  const MustFinish mustFinish(m_reserve);
+  MustFinish const mustFinish(m_reserve);
   m_undone.clear();
   if (m_done.getMemory() > m_memoryLimit && m_done.getLastMemory() > m_memoryLimit) {
     writeLog(LogLevel::Warning, name.GetString() + " needs more memory to be undone (" +
@@ -59,7 +59,7 @@ void UndoJournal::keep(HString const& name) {
 }
 
 bool UndoJournal::discardStep() {
-  const bool open = m_step != 0, known = open || m_depth == 0;
+  bool const open = m_step != 0, known = open || m_depth == 0;
   m_depth = 0;
   swapAll(m_open, true);
   m_step = 0;
@@ -72,8 +72,8 @@ bool UndoJournal::discardStep() {
 }
 
 void UndoJournal::swapAll(UndoChanges& changes, bool backward) noexcept {
-  const uint64 step = std::exchange(m_step, 0);
-  const MustFinish mustFinish(m_reserve);
+  uint64 const step = std::exchange(m_step, 0);
+  MustFinish const mustFinish(m_reserve);
   if (backward) {
     for (auto change = changes.rbegin(); change != changes.rend(); ++change) (*change)->swap();
   } else {
@@ -89,7 +89,7 @@ bool UndoJournal::redo(HString& name) { return move(m_undone, m_done, false, nam
 
 bool UndoJournal::move(UndoSteps& from, UndoSteps& to, bool backward, HString& name) {
   if (from.getCount() == 0 || !m_open.empty()) return false;
-  const MustFinish mustFinish(m_reserve);
+  MustFinish const mustFinish(m_reserve);
   std::string text;
   UndoChanges changes = from.pop(text);
   swapAll(changes, backward);
@@ -109,7 +109,7 @@ ChangeSet UndoJournal::getChanges() const {
 }
 
 void UndoJournal::clear() {
-  const MustFinish mustFinish(m_reserve);
+  MustFinish const mustFinish(m_reserve);
   m_step = 0;
   m_undone.clear();
   m_open.clear();

@@ -53,9 +53,9 @@ void UndoSteps::push(UndoChanges& changes, std::string const& name) {
 
 void UndoSteps::append(std::vector<unsigned char> const& bytes) {
   unsigned char size[sizeof(Length)];
-  const auto length = static_cast<Length>(bytes.size());
+  auto const length = static_cast<Length>(bytes.size());
   std::memcpy(size, &length, sizeof size);
-  const size_t before = m_bytes.size();
+  size_t const before = m_bytes.size();
   try {
     m_bytes.insert(m_bytes.end(), size, size + sizeof size);
     m_bytes.insert(m_bytes.end(), bytes.begin(), bytes.end());
@@ -72,19 +72,19 @@ std::vector<unsigned char> UndoSteps::bytesOf(bool last) const {
   std::copy_n(last ? m_bytes.end() - sizeof length : m_bytes.begin(), sizeof length, length);
   Length size;
   std::memcpy(&size, length, sizeof size);
-  const auto from = last ? m_bytes.end() - static_cast<std::ptrdiff_t>(sizeof size + size)
+  auto const from = last ? m_bytes.end() - static_cast<std::ptrdiff_t>(sizeof size + size)
                          : m_bytes.begin() + static_cast<std::ptrdiff_t>(sizeof size);
   return {from, from + size};
 }
 
 int64 UndoSteps::getLastMemory() const {
-  const std::vector<unsigned char> bytes = bytesOf(true);
+  std::vector<unsigned char> const bytes = bytesOf(true);
   Object const* object = objectIn(bytes);
   return object ? object->memory : static_cast<int64>(bytes.size() + kFrame);
 }
 
 void UndoSteps::erase(bool last, size_t size) {
-  const auto whole = static_cast<std::ptrdiff_t>(size + kFrame);
+  auto const whole = static_cast<std::ptrdiff_t>(size + kFrame);
   last ? m_bytes.erase(m_bytes.end() - whole, m_bytes.end())
        : m_bytes.erase(m_bytes.begin(), m_bytes.begin() + whole);
   --m_count;
@@ -105,9 +105,9 @@ UndoChanges UndoSteps::unpack(PackedStep& step, bool toStay) const {
 
 UndoChanges UndoSteps::pop(std::string& name) {
   std::vector<unsigned char> bytes = bytesOf(true);
-  const size_t size = bytes.size();
+  size_t const size = bytes.size();
   if (Object* object = objectIn(bytes)) {
-    const std::unique_ptr<Object> owned(object);
+    std::unique_ptr<Object> const owned(object);
     erase(true, size);
     m_memory -= owned->memory;
     name = std::move(owned->name);
@@ -124,7 +124,7 @@ UndoChanges UndoSteps::pop(std::string& name) {
 
 void UndoSteps::dropFirst() {
   std::vector<unsigned char> bytes = bytesOf(false);
-  const size_t size = bytes.size();
+  size_t const size = bytes.size();
   if (Object* object = objectIn(bytes)) {
     m_memory -= object->memory;
     delete object;

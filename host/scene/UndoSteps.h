@@ -46,7 +46,7 @@ template <class T, class Entry, class Hash>
 class SharedTable {
  public:
   uint32 use(T const& value) {
-    const auto [found, fresh] = m_numbers.try_emplace(value, static_cast<uint32>(m_slots.size()));
+    auto const [found, fresh] = m_numbers.try_emplace(value, static_cast<uint32>(m_slots.size()));
     if (!fresh) {
       ++m_slots[found->second].uses;
       return found->second;
@@ -72,7 +72,7 @@ class SharedTable {
     if (--m_slots[number].uses > 0) return;
     m_free.push_back(number);
     m_numbers.erase(m_slots[number].entry->value);
-    const std::unique_ptr<Entry> last = std::move(m_slots[number].entry);
+    std::unique_ptr<Entry> const last = std::move(m_slots[number].entry);
   }
 
  private:
@@ -115,7 +115,7 @@ class PackedStep {
   // What was used is released unless it was kept.
   ~PackedStep() {
     if (m_hasName) m_tables.names.release(m_name);
-    for (const uint32 track : m_tracks) m_tables.tracks.release(track);
+    for (uint32 const track : m_tracks) m_tables.tracks.release(track);
   }
   PackedStep(PackedStep const&) = delete;
   PackedStep& operator=(PackedStep const&) = delete;
@@ -155,7 +155,7 @@ class PackedStep {
     return m_tables.names.at(m_name).value;
   }
   TrackName const& takeTrack(bool toStay) {
-    const auto track = take<uint32>();
+    auto const track = take<uint32>();
     if (!toStay) m_tracks.push_back(track);
     return m_tables.tracks.at(track).value;
   }

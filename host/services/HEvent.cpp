@@ -22,7 +22,7 @@ void HEventManager::submit(HEvent const& event) {
 
 bool HEventManager::submitImmediate(HEvent const& event) {
   // A listener may add or remove listeners.
-  const auto listeners = m_listeners;
+  auto const listeners = m_listeners;
   for (auto const& [number, listener] : listeners) listener(event);
   return !listeners.empty();
 }

@@ -18,15 +18,15 @@ bool warned(std::string const& problem) {
 template <class Number>
 std::string textOf(Number value) {
   char digits[40];
-  const auto end = std::to_chars(digits, digits + sizeof digits, value);
+  auto const end = std::to_chars(digits, digits + sizeof digits, value);
   return std::string(digits, end.ptr);
 }
 
 template <class Number>
 std::optional<Number> numberIn(std::string const& text) {
   Number value{};
-  const char* end = text.data() + text.size();
-  const auto read = std::from_chars(text.data(), end, value);
+  char const* end = text.data() + text.size();
+  auto const read = std::from_chars(text.data(), end, value);
   if (text.empty() || read.ec != std::errc() || read.ptr != end) return std::nullopt;
   if constexpr (std::is_floating_point_v<Number>)
     if (!std::isfinite(value)) return std::nullopt;
@@ -41,7 +41,7 @@ std::string atEntry(char const* section, char const* entry, std::string const& t
 template <class Number>
 Number numberOr(std::string const& text, char const* section, char const* entry, Number byDefault,
                 std::optional<Number> least = std::nullopt) {
-  const std::optional<Number> number = numberIn<Number>(text);
+  std::optional<Number> const number = numberIn<Number>(text);
   if (number && (!least || *number >= *least)) return *number;
   std::string wanted = std::is_integral_v<Number> ? "not a whole number" : "not a number";
   if (least) wanted += " of at least " + textOf(*least);
@@ -66,7 +66,7 @@ std::optional<std::string> defaultIn(Known const& table, HString const& section,
 
 std::optional<std::string> HInterface::findProfileText(HString const& section, HString const& entry,
                                                        HString const& file) const {
-  const HLock lock(m_section);
+  HLock const lock(m_section);
   if (!file.IsEmpty()) {
     Profile other;
     // Without a file there is no entry, which is no reason to complain.
@@ -82,19 +82,19 @@ std::optional<std::string> HInterface::findProfileText(HString const& section, H
 
 int HInterface::getProfileInt(HString const& section, HString const& entry, int byDefault,
                               HString const& file) const {
-  const auto text = findProfileText(section, entry, file);
+  auto const text = findProfileText(section, entry, file);
   return text ? numberOr(*text, section, entry, byDefault) : byDefault;
 }
 
 double HInterface::getProfileDouble(HString const& section, HString const& entry, double byDefault,
                                     HString const& file) const {
-  const auto text = findProfileText(section, entry, file);
+  auto const text = findProfileText(section, entry, file);
   return text ? numberOr(*text, section, entry, byDefault) : byDefault;
 }
 
 bool HInterface::getProfileBool(HString const& section, HString const& entry, bool byDefault,
                                 HString const& file) const {
-  const auto text = findProfileText(section, entry, file);
+  auto const text = findProfileText(section, entry, file);
   if (!text) return byDefault;
   for (char const* yes : {"true", "on", "yes", "1"})
     if (*text == yes) return true;
@@ -107,17 +107,17 @@ bool HInterface::getProfileBool(HString const& section, HString const& entry, bo
 
 HString HInterface::getProfileString(HString const& section, HString const& entry, HString const& byDefault,
                                      HString const& file) const {
-  const auto text = findProfileText(section, entry, file);
+  auto const text = findProfileText(section, entry, file);
   return text ? HString(*text) : byDefault;
 }
 
 int HInterface::getProfile(ProfileInt const& known) const {
-  const HLock lock(m_section);
+  HLock const lock(m_section);
   return knownNumber(m_profile.find(known.section, known.entry), known);
 }
 
 double HInterface::getProfile(ProfileDouble const& known) const {
-  const HLock lock(m_section);
+  HLock const lock(m_section);
   return knownNumber(m_profile.find(known.section, known.entry), known);
 }
 
@@ -138,8 +138,8 @@ bool HInterface::writeProfileBool(HString const& section, HString const& entry, 
 
 bool HInterface::writeProfileString(HString const& section, HString const& entry, HString const& value,
                                     HString const& file) {
-  const HLock lock(m_section);
-  const auto setIn = [&](Profile& profile) {
+  HLock const lock(m_section);
+  auto const setIn = [&](Profile& profile) {
     if (profile.set(section.GetString(), entry.GetString(), value.GetString())) return true;
     warned("A profile cannot hold the entry \"" + entry.GetString() + "\" in the section \"" +
            section.GetString() + "\" with this value");
@@ -157,7 +157,7 @@ bool HInterface::writeProfileString(HString const& section, HString const& entry
 }
 
 bool HInterface::loadProfile(HString const& path) {
-  const HLock lock(m_section);
+  HLock const lock(m_section);
   m_profileFile.clear();
   std::error_code error;
   if (std::filesystem::exists(path.GetString(), error) && warned(m_profile.read(path.GetString())))
@@ -167,6 +167,6 @@ bool HInterface::loadProfile(HString const& path) {
 }
 
 bool HInterface::saveProfile(HString const& path) const {
-  const HLock lock(m_section);
+  HLock const lock(m_section);
   return !warned(m_profile.write(path.GetString()));
 }

@@ -69,7 +69,7 @@ void OperationStack::cancel() { state().cancelled = true; }
 
 void OperationStack::reset() {
   State& own = state();
-  const bool shown = !own.tasks.empty();
+  bool const shown = !own.tasks.empty();
   own.tasks.clear();
   own.cancelled = false;
   if (shown) own.show();

@@ -15,7 +15,7 @@ using boost::property_tree::ptree;
 
 std::string_view trimmed(std::string_view text) {
   constexpr std::string_view kBlanks = " \t\v\f";
-  const size_t first = text.find_first_not_of(kBlanks);
+  size_t const first = text.find_first_not_of(kBlanks);
   if (first == std::string_view::npos) return {};
   return text.substr(first, text.find_last_not_of(kBlanks) - first + 1);
 }
@@ -26,8 +26,8 @@ bool isOneLine(std::string_view text) {
 
 // A child by its whole name, in which dots have no meaning; made when there is none.
 ptree& childNamed(ptree& parent, std::string_view name) {
-  const std::string key(name);
-  const auto child = parent.find(key);
+  std::string const key(name);
+  auto const child = parent.find(key);
   return child != parent.not_found() ? child->second : parent.push_back({key, ptree()})->second;
 }
 
@@ -44,9 +44,9 @@ Profile::~Profile() = default;
 
 std::optional<std::string> Profile::find(std::string_view section, std::string_view entry) const {
   ptree const& sections = m_tree->sections;
-  const auto inside = sections.find(std::string(trimmed(section)));
+  auto const inside = sections.find(std::string(trimmed(section)));
   if (inside == sections.not_found()) return std::nullopt;
-  const auto found = inside->second.find(std::string(trimmed(entry)));
+  auto const found = inside->second.find(std::string(trimmed(entry)));
   if (found == inside->second.not_found()) return std::nullopt;
   return found->second.data();
 }
@@ -79,7 +79,7 @@ std::string Profile::read(std::string const& file) {
 }
 
 std::string Profile::write(std::string const& file) const {
-  const std::filesystem::path folder = std::filesystem::path(file).parent_path();
+  std::filesystem::path const folder = std::filesystem::path(file).parent_path();
   try {
     if (!folder.empty()) std::filesystem::create_directories(folder);
     replaceFile(file, [this](std::ostream& out) { boost::property_tree::write_ini(out, m_tree->sections); });

@@ -30,8 +30,8 @@ struct DropCount {
         perTenMinutes(counted * 600 - 9 * dropped) {}
   // The number that a frame carries when nothing is left out.
   int64 numberOf(int64 frame) const {
-    const int64 tens = frame / perTenMinutes, rest = frame % perTenMinutes;
-    const int64 minutes = rest < perMinute + dropped ? 0 : (rest - dropped) / perMinute;
+    int64 const tens = frame / perTenMinutes, rest = frame % perTenMinutes;
+    int64 const minutes = rest < perMinute + dropped ? 0 : (rest - dropped) / perMinute;
     return frame + tens * 9 * dropped + minutes * dropped;
   }
 };
@@ -72,12 +72,12 @@ int64 HFrameRate::countedFrames() const {
 }
 
 HString HFrameRate::timecodeFromFrame(int64 frame) const {
-  const int64 counted = countedFrames();
-  const bool drop = m_standard == NTSC_DROP;
-  const char* sign = frame < 0 ? "-" : "";
+  int64 const counted = countedFrames();
+  bool const drop = m_standard == NTSC_DROP;
+  char const* sign = frame < 0 ? "-" : "";
   int64 number = std::abs(std::clamp(frame, -kForever, kForever));
   if (drop) number = DropCount(counted).numberOf(number);
-  const int64 seconds = number / counted;
+  int64 const seconds = number / counted;
   HString text;
   text.Format("%s%02lld:%02lld:%02lld%c%02lld", sign, static_cast<long long>(seconds / 3600),
               static_cast<long long>(seconds / 60 % 60), static_cast<long long>(seconds % 60),
@@ -87,7 +87,7 @@ HString HFrameRate::timecodeFromFrame(int64 frame) const {
 
 bool HFrameRate::frameFromTimecode(HString const& text, int64& frame) const {
   std::string_view rest = text.GetString();
-  const bool negative = !rest.empty() && rest.front() == '-';
+  bool const negative = !rest.empty() && rest.front() == '-';
   if (negative) rest.remove_prefix(1);
   int64 fields[4];
   for (int i = 0; i < 4; ++i) {
@@ -101,12 +101,12 @@ bool HFrameRate::frameFromTimecode(HString const& text, int64& frame) const {
     if (rest.empty() || !(rest.front() == ':' || (i == 2 && rest.front() == ';'))) return false;
     rest.remove_prefix(1);
   }
-  const int64 counted = countedFrames();
+  int64 const counted = countedFrames();
   if (!rest.empty() || fields[1] > 59 || fields[2] > 59 || fields[3] >= counted) return false;
-  const int64 minutes = fields[0] * 60 + fields[1];
+  int64 const minutes = fields[0] * 60 + fields[1];
   int64 number = (minutes * 60 + fields[2]) * counted + fields[3];
   if (m_standard == NTSC_DROP) {
-    const int64 dropped = DropCount(counted).dropped;
+    int64 const dropped = DropCount(counted).dropped;
     if (minutes % 10 != 0 && fields[2] == 0 && fields[3] < dropped) return false;
     number -= (minutes - minutes / 10) * dropped;
   }

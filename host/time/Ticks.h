@@ -17,7 +17,7 @@ inline int64 frameAtOrAfter(int64 time, int64 period) { return time / period + (
 
 // Ticks per frame at a rate in frames per second (above 0): the nearest whole number, within the time line.
 inline int64 ticksPerFrameAt(double rate) {
-  const double ticks = static_cast<double>(kTicksPerSecond) / rate;
+  double const ticks = static_cast<double>(kTicksPerSecond) / rate;
   if (ticks >= static_cast<double>(kForever)) return kForever;
   return ticks < 1 ? 1 : std::llround(ticks);
 }

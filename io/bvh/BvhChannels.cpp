@@ -9,8 +9,8 @@ namespace talix {
 
 std::optional<BvhChannel> bvhChannel(std::string_view name) {
   if (name.empty()) return std::nullopt;
-  const std::string_view kind = name.substr(1);
-  const bool isRotation = equalsIgnoringCase(kind, "rotation");
+  std::string_view const kind = name.substr(1);
+  bool const isRotation = equalsIgnoringCase(kind, "rotation");
   if (!isRotation && !equalsIgnoringCase(kind, "position")) return std::nullopt;
   switch (name[0]) {
     case 'X':
@@ -31,23 +31,23 @@ std::string bvhChannelName(BvhChannel channel) {
   return std::string(1, "XYZ"[channel.axis]) + (channel.isRotation ? "rotation" : "position");
 }
 
-std::vector<int> rotationAxes(const std::vector<BvhChannel>& channels) {
+std::vector<int> rotationAxes(std::vector<BvhChannel> const& channels) {
   std::vector<int> axes;
-  for (const BvhChannel& channel : channels)
+  for (BvhChannel const& channel : channels)
     if (channel.isRotation) axes.push_back(channel.axis);
   return axes;
 }
 
-int rotationOrderOf(const std::vector<int>& channelAxes) {
+int rotationOrderOf(std::vector<int> const& channelAxes) {
   std::vector<int> axes;
-  const auto add = [&](int axis) {
+  auto const add = [&](int axis) {
     if (std::find(axes.begin(), axes.end(), axis) == axes.end()) axes.push_back(axis);
   };
   std::for_each(channelAxes.rbegin(), channelAxes.rend(), add);
-  const bool twoGiven = axes.size() == 2;
+  bool const twoGiven = axes.size() == 2;
   for (int axis = 0; axis < 3; ++axis) add(axis);
   if (twoGiven) std::swap(axes[1], axes[2]);
-  const auto order = std::find_if(std::begin(kOrderAxes), std::end(kOrderAxes), [&](const int(&of)[3]) {
+  auto const order = std::find_if(std::begin(kOrderAxes), std::end(kOrderAxes), [&](int const(&of)[3]) {
     return std::equal(axes.begin(), axes.end(), of);
   });
   return static_cast<int>(order - std::begin(kOrderAxes));

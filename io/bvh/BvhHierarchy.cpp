@@ -31,9 +31,9 @@ class HierarchyReader {
 
   // False once MOTION is read.
   bool readStatement() {
-    const std::string_view word = m_scanner.takeWord();
+    std::string_view const word = m_scanner.takeWord();
     if (m_open.empty()) return readTopLevel(word);
-    const bool inEndSite = joint(m_open.back()).endSite;
+    bool const inEndSite = joint(m_open.back()).endSite;
     if (equalsIgnoringCase(word, "offset")) {
       readOffset();
     } else if (equalsIgnoringCase(word, "channels") && !inEndSite) {
@@ -63,14 +63,14 @@ class HierarchyReader {
   }
 
   [[noreturn]] void failInside(std::string_view word, bool inEndSite) {
-    const Open& open = m_open.back();
-    const std::string expected = inEndSite ? "OFFSET or \"}\"" : "OFFSET, CHANNELS, JOINT, End Site or \"}\"";
+    Open const& open = m_open.back();
+    std::string const expected = inEndSite ? "OFFSET or \"}\"" : "OFFSET, CHANNELS, JOINT, End Site or \"}\"";
     m_scanner.fail(expected + " expected, not " + found(word) + "; " + shown(joint(open).name) + " of line " +
                    std::to_string(open.line) + " is still open");
   }
 
   void openJoint(int parent) {
-    const int64 line = m_scanner.line();
+    int64 const line = m_scanner.line();
     TakeJoint added;
     added.name = m_scanner.takeRestOfLine();
     if (added.name.empty()) m_scanner.failAt(line, "a joint name expected");
@@ -80,7 +80,7 @@ class HierarchyReader {
 
   void openEndSite() {
     Open& parent = m_open.back();
-    const int64 line = m_scanner.line();
+    int64 const line = m_scanner.line();
     m_scanner.takeRestOfLine();  // "Site"
     TakeJoint added;
     added.name = joint(parent).name + "_end";
@@ -91,7 +91,7 @@ class HierarchyReader {
   }
 
   void open(TakeJoint added, int64 line) {
-    if (const auto word = m_scanner.takeWord(); word != "{")
+    if (auto const word = m_scanner.takeWord(); word != "{")
       m_scanner.fail("\"{\" expected after " + shown(added.name) + ", not " + found(word));
     if (m_open.size() == kDeepestBvhNesting)
       m_scanner.failAt(line, "joints nested deeper than " + std::to_string(kDeepestBvhNesting));
@@ -101,7 +101,7 @@ class HierarchyReader {
   }
 
   void close() {
-    const Open& closed = m_open.back();
+    Open const& closed = m_open.back();
     if (!closed.hasOffset)
       m_result.notes.push_back({TakeNote::Level::Warning, "line " + std::to_string(closed.line) + ": " +
                                                               shown(joint(closed).name) +
@@ -118,20 +118,20 @@ class HierarchyReader {
   void readChannels() {
     if (std::exchange(m_open.back().hasChannels, true))
       m_scanner.fail("CHANNELS a second time for one joint");
-    const double count = m_scanner.takeNumber("the number of channels");
+    double const count = m_scanner.takeNumber("the number of channels");
     if (count < 0 || count != std::floor(count))
       m_scanner.fail("the number of channels expected after CHANNELS");
     auto& channels = m_result.channels[static_cast<size_t>(m_open.back().joint)];
     for (double i = 0; i < count; ++i) channels.push_back(takeChannel(channels));
     m_result.channelCount += channels.size();
     TakeJoint& of = joint(m_open.back());
-    for (const BvhChannel& channel : channels) of.channels.push_back(bvhChannelName(channel));
+    for (BvhChannel const& channel : channels) of.channels.push_back(bvhChannelName(channel));
     of.rotationOrder = rotationOrderOf(rotationAxes(channels));
   }
 
-  BvhChannel takeChannel(const std::vector<BvhChannel>& before) {
-    const std::string_view name = m_scanner.takeWord();
-    const auto channel = bvhChannel(name);
+  BvhChannel takeChannel(std::vector<BvhChannel> const& before) {
+    std::string_view const name = m_scanner.takeWord();
+    auto const channel = bvhChannel(name);
     if (!channel)
       m_scanner.fail(
           "a channel expected (Xposition, Yposition, Zposition, Xrotation, Yrotation, Zrotation), not " +
@@ -142,7 +142,7 @@ class HierarchyReader {
     return *channel;
   }
 
-  TakeJoint& joint(const Open& open) { return m_result.joints[static_cast<size_t>(open.joint)]; }
+  TakeJoint& joint(Open const& open) { return m_result.joints[static_cast<size_t>(open.joint)]; }
 
   TextScanner& m_scanner;
   BvhHierarchy m_result;

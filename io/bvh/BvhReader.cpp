@@ -21,9 +21,9 @@ constexpr int64 kBlockFrames = 256;
 using Quaternion = std::array<double, 4>;  // x y z w
 
 // first * (a turn about an axis): the axis turns before `first`.
-Quaternion timesTurn(const Quaternion& first, int axis, double radians) {
-  const double s = std::sin(radians / 2), c = std::cos(radians / 2);
-  const size_t i = static_cast<size_t>(axis), j = (i + 1) % 3, k = (i + 2) % 3;
+Quaternion timesTurn(Quaternion const& first, int axis, double radians) {
+  double const s = std::sin(radians / 2), c = std::cos(radians / 2);
+  size_t const i = static_cast<size_t>(axis), j = (i + 1) % 3, k = (i + 2) % 3;
   Quaternion result;
   result[i] = first[i] * c + first[3] * s;
   result[j] = first[j] * c + first[k] * s;
@@ -37,16 +37,16 @@ class JointMotion {
  public:
   JointMotion(TakeJoint& joint, std::vector<BvhChannel> channels, double millimetres)
       : m_joint(joint), m_channels(std::move(channels)), m_millimetres(millimetres) {
-    for (const BvhChannel& channel : m_channels) (channel.isRotation ? m_turns : m_moves) = true;
+    for (BvhChannel const& channel : m_channels) (channel.isRotation ? m_turns : m_moves) = true;
   }
 
   size_t channelCount() const { return m_channels.size(); }
 
-  void add(const double* values) {
+  void add(double const* values) {
     Vec3 place = m_joint.offset;  // what has no channel stays at the offset
     Quaternion turned{0, 0, 0, 1};
-    for (const BvhChannel& channel : m_channels) {
-      const double value = *values++;
+    for (BvhChannel const& channel : m_channels) {
+      double const value = *values++;
       if (channel.isRotation)
         turned = timesTurn(turned, channel.axis, value * (std::numbers::pi / 180));
       else
@@ -87,14 +87,14 @@ class JointMotion {
 
 class MotionReader {
  public:
-  MotionReader(const FileBytes& bytes, TextScanner& scanner, size_t channelCount)
+  MotionReader(FileBytes const& bytes, TextScanner& scanner, size_t channelCount)
       : m_bytes(bytes), m_scanner(scanner), m_channelCount(channelCount) {}
 
   // "Frames:" and "Frame Time:"
   void readHead(Take& take) {
     if (!m_scanner.accept("frames")) failExpecting("Frames: after MOTION");
     m_scanner.accept(":");
-    const double frames = m_scanner.takeNumber("the number of frames");
+    double const frames = m_scanner.takeNumber("the number of frames");
     if (frames < 0 || frames != std::floor(frames))
       m_scanner.fail("the number of frames expected after Frames:");
     if (!m_scanner.accept("frame") || !m_scanner.accept("time")) failExpecting("Frame Time: after Frames:");
@@ -102,7 +102,7 @@ class MotionReader {
     take.rate = takeRate(take.notes);
 
     // A frame takes at least a digit and a blank for each value, or an empty line.
-    const double fewestBytes = frames * static_cast<double>(std::max<size_t>(1, 2 * m_channelCount)) - 1;
+    double const fewestBytes = frames * static_cast<double>(std::max<size_t>(1, 2 * m_channelCount)) - 1;
     if (fewestBytes > static_cast<double>(m_scanner.remaining()))
       m_scanner.fail(announced(frames) + ", but only " + std::to_string(m_scanner.remaining()) +
                      " bytes follow");
@@ -114,10 +114,10 @@ class MotionReader {
   void readFrames(std::vector<JointMotion>& joints, int64 ticksPerFrame, double millimetres) {
     std::vector<double> row(m_channelCount);
     for (int64 first = 0; first < m_frameCount; first += kBlockFrames) {
-      const int64 end = std::min(first + kBlockFrames, m_frameCount);
+      int64 const end = std::min(first + kBlockFrames, m_frameCount);
       for (int64 frame = first; frame < end; ++frame) {
         readRow(row, frame, millimetres);
-        const double* values = row.data();
+        double const* values = row.data();
         for (JointMotion& joint : joints) {
           joint.add(values);
           values += joint.channelCount();
@@ -134,9 +134,9 @@ class MotionReader {
   void readRow(std::vector<double>& row, int64 frame, double millimetres) {
     int64 firstLine = 0;
     for (double& value : row) {
-      const std::string_view word = m_scanner.takeWord();
+      std::string_view const word = m_scanner.takeWord();
       if (firstLine == 0) firstLine = m_scanner.line();
-      const auto number = parseNumber(word);
+      auto const number = parseNumber(word);
       if (!number) {
         if (m_oddLine == 0 && &value != row.data()) m_oddLine = firstLine;
         if (word.empty()) failCount("the motion ends in frame " + std::to_string(frame + 1));
@@ -151,7 +151,7 @@ class MotionReader {
   }
 
   // Where the counts do not agree, the first line that was no whole frame is the likely culprit.
-  [[noreturn]] void failCount(const std::string& what) {
+  [[noreturn]] void failCount(std::string const& what) {
     std::string text = announced(static_cast<double>(m_frameCount)) + "; " + what;
     if (m_oddLine)
       text += "; line " + std::to_string(m_oddLine) + " is the first that does not hold one whole frame";
@@ -163,12 +163,12 @@ class MotionReader {
   }
 
   double takeRate(std::vector<TakeNote>& notes) {
-    const std::string word(m_scanner.takeWord());
-    const auto frameTime = parseNumber(word);
+    std::string const word(m_scanner.takeWord());
+    auto const frameTime = parseNumber(word);
     if (!frameTime || !std::isfinite(*frameTime) || *frameTime <= 0)
       m_scanner.fail("a frame time above 0 in seconds expected, not " + found(word));
-    const double asPrinted = 1 / *frameTime;
-    const double rate = rateFromFrameTime(*frameTime, printedPrecision(word));
+    double const asPrinted = 1 / *frameTime;
+    double const rate = rateFromFrameTime(*frameTime, printedPrecision(word));
     if (!isFrameRate(rate))
       m_scanner.fail("a frame time that makes " + std::string(kFrameRateExpected) + " expected, not " +
                      shown(word));
@@ -181,20 +181,20 @@ class MotionReader {
   // How far a printed number may be from what was meant: half its last digit, or the whole of it where the
   // digits are so many that one was more likely cut than rounded. Zeros at the end tell nothing.
   static double printedPrecision(std::string_view word) {
-    const size_t exponent = std::min(word.find_first_of("eE"), word.size());
-    const size_t point = std::min(word.find('.'), exponent);
-    const size_t last = word.substr(0, exponent).find_last_not_of('0');
-    const int digits = last == std::string_view::npos || last < point ? 0 : static_cast<int>(last - point);
-    const double power = exponent < word.size() ? parseNumber(word.substr(exponent + 1)).value_or(0) : 0;
+    size_t const exponent = std::min(word.find_first_of("eE"), word.size());
+    size_t const point = std::min(word.find('.'), exponent);
+    size_t const last = word.substr(0, exponent).find_last_not_of('0');
+    int const digits = last == std::string_view::npos || last < point ? 0 : static_cast<int>(last - point);
+    double const power = exponent < word.size() ? parseNumber(word.substr(exponent + 1)).value_or(0) : 0;
     return (digits >= 5 ? 1.0 : 0.5) * std::pow(10.0, power - digits);
   }
 
-  [[noreturn]] void failExpecting(const std::string& expected) {
-    const std::string_view word = m_scanner.peekWord();
+  [[noreturn]] void failExpecting(std::string const& expected) {
+    std::string_view const word = m_scanner.peekWord();
     m_scanner.fail(expected + " expected, not " + found(word));
   }
 
-  const FileBytes& m_bytes;
+  FileBytes const& m_bytes;
   TextScanner& m_scanner;
   size_t m_channelCount;
   int64 m_frameCount = 0;
@@ -202,7 +202,7 @@ class MotionReader {
 };
 
 // BVH has no place for a unit.
-void setUnit(Take& take, const std::string& path, const ReadOptions& options) {
+void setUnit(Take& take, std::string const& path, ReadOptions const& options) {
   take.unitAssumed = options.unit.empty();
   take.fileUnit = take.unitAssumed ? "cm" : options.unit;
   take.unitInMillimetres = millimetresPerUnit(take.fileUnit);
@@ -214,8 +214,8 @@ void setUnit(Take& take, const std::string& path, const ReadOptions& options) {
 
 }  // namespace
 
-Take readBVH(const std::string& path, const ReadOptions& options) {
-  const FileBytes bytes(path);
+Take readBVH(std::string const& path, ReadOptions const& options) {
+  FileBytes const bytes(path);
   TextScanner scanner(bytes);
   Take take;
   take.format = "BVH";

@@ -27,19 +27,19 @@ void appendNumber(std::string& text, double value) {
     while (end[-1] == '0') --end;
     if (end[-1] == '.') --end;
   }
-  const std::string_view written(digits, static_cast<size_t>(end - digits));
+  std::string_view const written(digits, static_cast<size_t>(end - digits));
   text += written == "-0" ? "0" : written;
 }
 
 // Names stand on one line before a brace.
-std::string fileName(const std::string& name) {
+std::string fileName(std::string const& name) {
   std::string result(trimmed(name));
   for (char& c : result)
     if (c == '{' || c == '}' || c == '\n' || c == '\r') c = '_';
   return result.empty() ? "joint" : result;
 }
 
-std::vector<BvhChannel> usualChannels(const TakeJoint& joint) {
+std::vector<BvhChannel> usualChannels(TakeJoint const& joint) {
   std::vector<BvhChannel> channels;
   if (joint.parent < 0 || !joint.translations.empty())
     for (int axis = 0; axis < 3; ++axis) channels.push_back({false, axis});
@@ -48,10 +48,10 @@ std::vector<BvhChannel> usualChannels(const TakeJoint& joint) {
 }
 
 // The channels that the joint names; empty when it names none, or some that cannot be written.
-std::vector<BvhChannel> namedChannels(const TakeJoint& joint) {
+std::vector<BvhChannel> namedChannels(TakeJoint const& joint) {
   std::vector<BvhChannel> channels;
-  for (const std::string& name : joint.channels) {
-    const auto channel = bvhChannel(name);
+  for (std::string const& name : joint.channels) {
+    auto const channel = bvhChannel(name);
     // Angles about an axis that turns twice would not be unique.
     if (!channel || std::find(channels.begin(), channels.end(), *channel) != channels.end()) return {};
     channels.push_back(*channel);
@@ -62,17 +62,17 @@ std::vector<BvhChannel> namedChannels(const TakeJoint& joint) {
 // One joint of the file: its channels and where its values come from.
 class JointWriter {
  public:
-  JointWriter(const TakeJoint& joint, std::vector<BvhChannel> channels, double millimetres)
+  JointWriter(TakeJoint const& joint, std::vector<BvhChannel> channels, double millimetres)
       : m_joint(joint),
         m_channels(std::move(channels)),
         m_millimetres(millimetres),
         m_unroller(rotationOrderOf(rotationAxes(m_channels)), rotationAxes(m_channels).size() == 3) {
-    for (const BvhChannel& channel : m_channels)
+    for (BvhChannel const& channel : m_channels)
       (channel.isRotation ? m_written[channel.axis] : m_moves) = true;
   }
 
-  const TakeJoint& joint() const { return m_joint; }
-  const std::vector<BvhChannel>& channels() const { return m_channels; }
+  TakeJoint const& joint() const { return m_joint; }
+  std::vector<BvhChannel> const& channels() const { return m_channels; }
   bool moves() const { return m_moves; }
   bool turns() const { return m_written[0] || m_written[1] || m_written[2]; }
   // The largest angle, in radians, about an axis that has no channel.
@@ -85,10 +85,10 @@ class JointWriter {
                                     {m_joint.offset.x, m_joint.offset.y, m_joint.offset.z}, place,
                                     &m_placeCursor);
     m_joint.rotations.evaluate(time, Interpolation::Linear, {0, 0, 0, 1}, turn, &m_turnCursor);
-    const Vec3 angles = turns() ? m_unroller.next(turn.data()) : Vec3();
+    Vec3 const angles = turns() ? m_unroller.next(turn.data()) : Vec3();
     for (int axis = 0; axis < 3; ++axis)
       if (!m_written[axis]) m_lostTurn = std::max(m_lostTurn, std::abs(angles[axis]));
-    for (const BvhChannel& channel : m_channels) {
+    for (BvhChannel const& channel : m_channels) {
       if (!row.empty()) row += ' ';
       appendNumber(row, channel.isRotation ? angles[channel.axis] * (180 / std::numbers::pi)
                                            : place[static_cast<size_t>(channel.axis)] / m_millimetres);
@@ -96,7 +96,7 @@ class JointWriter {
   }
 
  private:
-  const TakeJoint& m_joint;
+  TakeJoint const& m_joint;
   std::vector<BvhChannel> m_channels;
   double m_millimetres;
   bool m_written[3] = {};  // rotation channels, by axis
@@ -108,7 +108,7 @@ class JointWriter {
 
 class BvhWriter {
  public:
-  BvhWriter(const Take& take, const std::string& path, std::vector<TakeNote>& notes)
+  BvhWriter(Take const& take, std::string const& path, std::vector<TakeNote>& notes)
       : m_take(take), m_path(path), m_notes(notes) {
     if (take.joints.empty()) throw FileError(path, "BVH holds joints only, and the take has none");
     if (!(take.rate > 0) || !(take.unitInMillimetres > 0))
@@ -116,7 +116,7 @@ class BvhWriter {
     m_period = ticksPerFrameAt(take.rate);
     m_children.resize(take.joints.size());
     for (size_t i = 0; i < take.joints.size(); ++i) {
-      const int parent = take.joints[i].parent;
+      int const parent = take.joints[i].parent;
       if (parent >= static_cast<int>(i))
         throw FileError(path, "joint " + shown(take.joints[i].name) + " comes before its parent");
       if (parent >= 0) m_children[static_cast<size_t>(parent)].push_back(i);
@@ -132,7 +132,7 @@ class BvhWriter {
 
  private:
   bool isEndSite(size_t i) const {
-    const TakeJoint& joint = m_take.joints[i];
+    TakeJoint const& joint = m_take.joints[i];
     return joint.endSite && joint.parent >= 0 && m_children[i].empty() && joint.translations.empty() &&
            joint.rotations.empty();
   }
@@ -149,25 +149,25 @@ class BvhWriter {
     for (size_t i = m_take.joints.size(); i-- > 0;)
       if (m_take.joints[i].parent < 0) steps.push_back({i, 0, false});
     while (!steps.empty()) {
-      const Step step = steps.back();
+      Step const step = steps.back();
       steps.pop_back();
-      const std::string indent(step.depth, '\t');
+      std::string const indent(step.depth, '\t');
       if (step.closing) {
         m_hierarchy += indent + "}\n";
         continue;
       }
       openJoint(step.joint, indent);
       steps.push_back({step.joint, step.depth, true});
-      const auto& children = m_children[step.joint];
+      auto const& children = m_children[step.joint];
       for (auto child = children.rbegin(); child != children.rend(); ++child)
         steps.push_back({*child, step.depth + 1, false});
     }
   }
 
-  void openJoint(size_t index, const std::string& indent) {
-    const TakeJoint& joint = m_take.joints[index];
-    const bool endSite = isEndSite(index);
-    const std::string name = fileName(joint.name);
+  void openJoint(size_t index, std::string const& indent) {
+    TakeJoint const& joint = m_take.joints[index];
+    bool const endSite = isEndSite(index);
+    std::string const name = fileName(joint.name);
     if (!endSite && name != joint.name)
       warn("the name " + shown(joint.name) + " was written as " + shown(name));
     if (endSite && joint.name.rfind(m_take.joints[static_cast<size_t>(joint.parent)].name + "_end", 0) != 0)
@@ -181,14 +181,14 @@ class BvhWriter {
     }
     m_hierarchy += '\n';
     if (endSite) return;
-    const auto channels = channelsOf(joint);
+    auto const channels = channelsOf(joint);
     m_hierarchy += indent + "\tCHANNELS " + std::to_string(channels.size());
-    for (const BvhChannel& channel : channels) m_hierarchy += ' ' + bvhChannelName(channel);
+    for (BvhChannel const& channel : channels) m_hierarchy += ' ' + bvhChannelName(channel);
     m_hierarchy += '\n';
     m_joints.emplace_back(joint, channels, m_take.unitInMillimetres);
   }
 
-  std::vector<BvhChannel> channelsOf(const TakeJoint& joint) {
+  std::vector<BvhChannel> channelsOf(TakeJoint const& joint) {
     auto channels = namedChannels(joint);
     if (!channels.empty()) return channels;
     if (!joint.channels.empty())
@@ -208,8 +208,8 @@ class BvhWriter {
     }
   }
 
-  void warn(const std::string& text) { m_notes.push_back({TakeNote::Level::Warning, text}); }
-  void warnOfCount(size_t count, const char* what) {
+  void warn(std::string const& text) { m_notes.push_back({TakeNote::Level::Warning, text}); }
+  void warnOfCount(size_t count, char const* what) {
     if (count) warn("BVH holds no " + std::string(what) + "; " + std::to_string(count) + " left out");
   }
 
@@ -227,7 +227,7 @@ class BvhWriter {
     if (m_take.up != Axis::Y)
       warn(std::string("BVH names no up axis; up is ") + (m_take.up == Axis::Z ? "z" : "x"));
     size_t leftOut = 0, tracks = 0;
-    for (const JointWriter& joint : m_joints) {
+    for (JointWriter const& joint : m_joints) {
       leftOut += keysOffFrames(joint.joint().translations) + keysOffFrames(joint.joint().rotations);
       tracks += (!joint.moves() && !joint.joint().translations.empty());
     }
@@ -239,11 +239,11 @@ class BvhWriter {
            " joints move but have no position channels; their translations were left out");
   }
 
-  size_t keysOffFrames(const KeyTrack& track) const {
-    const int64 first = m_take.firstFrame * m_period,
+  size_t keysOffFrames(KeyTrack const& track) const {
+    int64 const first = m_take.firstFrame * m_period,
                 last = (m_take.firstFrame + m_take.frameCount - 1) * m_period;
     size_t count = 0;
-    track.forEach(0, track.count(), [&](const KeyTrack::Key& key) {
+    track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
       count += key.time < first || key.time > last || key.time % m_period != 0;
     });
     return count;
@@ -251,14 +251,14 @@ class BvhWriter {
 
   void warnOfLostTurns() {
     constexpr double kVisible = 1e-6;
-    for (const JointWriter& joint : m_joints)
+    for (JointWriter const& joint : m_joints)
       if ((joint.turns() && joint.lostTurn() > kVisible) ||
           (!joint.turns() && !joint.joint().rotations.empty()))
         warn(shown(joint.joint().name) + " turns about an axis that has no channel; that turn was left out");
   }
 
-  const Take& m_take;
-  const std::string& m_path;
+  Take const& m_take;
+  std::string const& m_path;
   std::vector<TakeNote>& m_notes;
   int64 m_period = 0;
   std::vector<std::vector<size_t>> m_children;  // by joint
@@ -269,7 +269,7 @@ class BvhWriter {
 
 }  // namespace
 
-void writeBVH(const Take& take, const std::string& path, std::vector<TakeNote>& notes) {
+void writeBVH(Take const& take, std::string const& path, std::vector<TakeNote>& notes) {
   BvhWriter(take, path, notes).write();
 }
 

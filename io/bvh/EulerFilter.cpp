@@ -19,8 +19,8 @@ Vec3 unit(int axis) {
 
 }  // namespace
 
-Vec3 EulerFilter::next(const double* quaternion) {
-  const auto order = static_cast<TalixRotation::RotOrder>(m_order);
+Vec3 EulerFilter::next(double const* quaternion) {
+  auto const order = static_cast<TalixRotation::RotOrder>(m_order);
   TalixRotation rotation;
   rotation.setQuaternion(quaternion);
   Vec3 angles;
@@ -33,12 +33,12 @@ Vec3 EulerFilter::next(const double* quaternion) {
 
 // In gimbal lock the first angle is free: it stays as it was, and the last one makes up the rotation. It
 // shows in where the middle axis goes once the first turn is taken back.
-void EulerFilter::keepFirstAngle(const TalixRotation& rotation, Vec3& angles) const {
-  const auto [first, middle, last] = kOrderAxes[m_order];
-  const double parity = unit(first).cross(unit(middle)).dot(unit(last));
+void EulerFilter::keepFirstAngle(TalixRotation const& rotation, Vec3& angles) const {
+  auto const [first, middle, last] = kOrderAxes[m_order];
+  double const parity = unit(first).cross(unit(middle)).dot(unit(last));
   angles[first] = m_last[first];
-  const Vec3 back = unit(middle) * std::cos(angles[first]) - unit(last) * (parity * std::sin(angles[first]));
-  const Vec3 image = rotation.rotate(back);
+  Vec3 const back = unit(middle) * std::cos(angles[first]) - unit(last) * (parity * std::sin(angles[first]));
+  Vec3 const image = rotation.rotate(back);
   angles[last] = std::atan2(-parity * image[first], image[middle]);
 }
 

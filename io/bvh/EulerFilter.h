@@ -14,10 +14,10 @@ class EulerFilter {
 
   // The angles in radians, by axis, that make the rotation and lie nearest to those of the frame before;
   // before the first frame these are 0.
-  Vec3 next(const double* quaternion);
+  Vec3 next(double const* quaternion);
 
  private:
-  void keepFirstAngle(const TalixRotation&, Vec3& angles) const;
+  void keepFirstAngle(TalixRotation const&, Vec3& angles) const;
 
   int m_order;
   bool m_keepsAll;

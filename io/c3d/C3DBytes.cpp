@@ -22,7 +22,7 @@ auto withNumbers(C3DProcessor processor, Visit visit) {
 
 }  // namespace
 
-const char* c3dProcessorName(C3DProcessor processor) {
+char const* c3dProcessorName(C3DProcessor processor) {
   switch (processor) {
     case C3DProcessor::DEC:
       return "DEC";
@@ -34,36 +34,36 @@ const char* c3dProcessorName(C3DProcessor processor) {
   return "Intel";
 }
 
-void C3DBytes::fail(size_t offset, const std::string& text) const {
+void C3DBytes::fail(size_t offset, std::string const& text) const {
   throw FileError::atOffset(path(), offset, text);
 }
 
-const char* C3DBytes::need(size_t offset, size_t length, const char* what) const {
+char const* C3DBytes::need(size_t offset, size_t length, char const* what) const {
   if (offset > size() || length > size() - offset)
     fail(offset, std::string("the file ends inside ") + what + " (" + std::to_string(length) +
                      " bytes expected, file size " + std::to_string(size()) + ")");
   return m_file.view().data() + offset;
 }
 
-unsigned C3DBytes::byte(size_t offset, const char* what) const {
+unsigned C3DBytes::byte(size_t offset, char const* what) const {
   return static_cast<unsigned char>(*need(offset, 1, what));
 }
 
-unsigned C3DBytes::word(size_t offset, const char* what) const {
-  const char* at = need(offset, 2, what);
+unsigned C3DBytes::word(size_t offset, char const* what) const {
+  char const* at = need(offset, 2, what);
   return withNumbers(m_processor, [at](auto numbers) { return numbers.word(at); });
 }
 
-int C3DBytes::integer(size_t offset, const char* what) const {
+int C3DBytes::integer(size_t offset, char const* what) const {
   return static_cast<std::int16_t>(word(offset, what));
 }
 
-double C3DBytes::real(size_t offset, const char* what) const {
-  const char* at = need(offset, 4, what);
+double C3DBytes::real(size_t offset, char const* what) const {
+  char const* at = need(offset, 4, what);
   return withNumbers(m_processor, [at](auto numbers) { return numbers.real(at); });
 }
 
-std::string_view C3DBytes::text(size_t offset, size_t length, const char* what) const {
+std::string_view C3DBytes::text(size_t offset, size_t length, char const* what) const {
   return {need(offset, length, what), length};
 }
 

@@ -17,17 +17,17 @@ inline constexpr size_t kC3DBlock = 512;
 // The values are those in the file.
 enum class C3DProcessor : unsigned char { Intel = 84, DEC = 85, MIPS = 86 };
 
-const char* c3dProcessorName(C3DProcessor);
+char const* c3dProcessorName(C3DProcessor);
 
 // The numbers of one processor at a place that is known to hold them.
 template <C3DProcessor processor>
 struct C3DNumbers {
-  static unsigned word(const char* at) {
-    const unsigned first = static_cast<unsigned char>(at[0]), second = static_cast<unsigned char>(at[1]);
+  static unsigned word(char const* at) {
+    unsigned const first = static_cast<unsigned char>(at[0]), second = static_cast<unsigned char>(at[1]);
     return processor == C3DProcessor::MIPS ? first << 8 | second : second << 8 | first;
   }
-  static int integer(const char* at) { return static_cast<std::int16_t>(word(at)); }
-  static double real(const char* at) {
+  static int integer(char const* at) { return static_cast<std::int16_t>(word(at)); }
+  static double real(char const* at) {
     if constexpr (processor == C3DProcessor::MIPS) return std::bit_cast<float>(word(at) << 16 | word(at + 2));
     if constexpr (processor == C3DProcessor::Intel)
       return std::bit_cast<float>(word(at + 2) << 16 | word(at));
@@ -39,7 +39,7 @@ struct C3DNumbers {
   // no denormals. Exponent 0 is zero, with the sign set it is a reserved operand and comes out as
   // not-a-number.
   static double decReal(std::uint32_t bits) {
-    const std::uint64_t sign = bits >> 31, exponent = bits >> 23 & 0xff, fraction = bits & 0x7fffff;
+    std::uint64_t const sign = bits >> 31, exponent = bits >> 23 & 0xff, fraction = bits & 0x7fffff;
     if (exponent == 0) return sign ? std::bit_cast<double>(std::uint64_t{0x7ff8} << 48) : 0.0;
     return std::bit_cast<double>(sign << 63 | (exponent + 1023 - 129) << 52 | fraction << 29);
   }
@@ -49,25 +49,25 @@ struct C3DNumbers {
 // first.
 class C3DBytes {
  public:
-  explicit C3DBytes(const FileBytes& file) : m_file(file) {}
+  explicit C3DBytes(FileBytes const& file) : m_file(file) {}
 
   void setProcessor(C3DProcessor processor) { m_processor = processor; }
   C3DProcessor processor() const { return m_processor; }
   size_t size() const { return m_file.view().size(); }
-  const std::string& path() const { return m_file.path(); }
+  std::string const& path() const { return m_file.path(); }
 
-  unsigned byte(size_t offset, const char* what) const;
-  unsigned word(size_t offset, const char* what) const;  // unsigned
-  int integer(size_t offset, const char* what) const;    // signed, two bytes
-  double real(size_t offset, const char* what) const;
-  std::string_view text(size_t offset, size_t length, const char* what) const;
+  unsigned byte(size_t offset, char const* what) const;
+  unsigned word(size_t offset, char const* what) const;  // unsigned
+  int integer(size_t offset, char const* what) const;    // signed, two bytes
+  double real(size_t offset, char const* what) const;
+  std::string_view text(size_t offset, size_t length, char const* what) const;
 
-  [[noreturn]] void fail(size_t offset, const std::string& text) const;
+  [[noreturn]] void fail(size_t offset, std::string const& text) const;
 
  private:
-  const char* need(size_t offset, size_t length, const char* what) const;
+  char const* need(size_t offset, size_t length, char const* what) const;
 
-  const FileBytes& m_file;
+  FileBytes const& m_file;
   C3DProcessor m_processor = C3DProcessor::Intel;
 };
 

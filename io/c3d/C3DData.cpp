@@ -16,15 +16,15 @@ constexpr int64 kMostFramesInBlock = 256;
 template <C3DProcessor processor>
 struct RealValues {
   static constexpr size_t kBytes = 4;
-  static double value(const char* at) { return C3DNumbers<processor>::real(at); }
-  static double unsignedValue(const char* at) { return value(at); }
+  static double value(char const* at) { return C3DNumbers<processor>::real(at); }
+  static double unsignedValue(char const* at) { return value(at); }
 };
 
 template <C3DProcessor processor>
 struct IntegerValues {
   static constexpr size_t kBytes = 2;
-  static double value(const char* at) { return C3DNumbers<processor>::integer(at); }
-  static double unsignedValue(const char* at) { return C3DNumbers<processor>::word(at); }
+  static double value(char const* at) { return C3DNumbers<processor>::integer(at); }
+  static double unsignedValue(char const* at) { return C3DNumbers<processor>::word(at); }
 };
 
 // A run of frames in which a point is seen, gathered for one append.
@@ -40,7 +40,7 @@ struct Run {
 template <class Values>
 class DataReader {
  public:
-  DataReader(const FileBytes& file, const C3DLayout& layout, double analogRate)
+  DataReader(FileBytes const& file, C3DLayout const& layout, double analogRate)
       : m_file(file),
         m_layout(layout),
         m_framesInBlock(
@@ -51,15 +51,15 @@ class DataReader {
         m_run(m_framesInBlock),
         m_samples(static_cast<size_t>(m_framesInBlock * layout.samplesPerFrame)) {}
 
-  C3DDataCounts read(const std::vector<C3DPointTarget>& points, const std::vector<C3DAnalogTarget>& analog) {
-    const size_t frameBytes = m_layout.frameBytes();
+  C3DDataCounts read(std::vector<C3DPointTarget> const& points, std::vector<C3DAnalogTarget> const& analog) {
+    size_t const frameBytes = m_layout.frameBytes();
     for (int64 first = 0; first < m_layout.frameCount; first += m_framesInBlock) {
-      const int64 frames = std::min(m_framesInBlock, m_layout.frameCount - first);
-      const size_t offset = m_layout.dataStart + static_cast<size_t>(first) * frameBytes;
-      const char* at = m_file.view().data() + offset;
+      int64 const frames = std::min(m_framesInBlock, m_layout.frameCount - first);
+      size_t const offset = m_layout.dataStart + static_cast<size_t>(first) * frameBytes;
+      char const* at = m_file.view().data() + offset;
       for (size_t i = 0; i < points.size(); ++i)
         readPoint(at + i * 4 * Values::kBytes, first, frames, points[i]);
-      const char* samples = at + points.size() * 4 * Values::kBytes;
+      char const* samples = at + points.size() * 4 * Values::kBytes;
       for (size_t i = 0; i < analog.size(); ++i)
         readChannel(samples + i * Values::kBytes, first, frames, analog[i]);
       m_file.release(offset);
@@ -68,14 +68,14 @@ class DataReader {
   }
 
  private:
-  void readPoint(const char* at, int64 first, int64 frames, const C3DPointTarget& target) {
-    const double factor = target.factor;
+  void readPoint(char const* at, int64 first, int64 frames, C3DPointTarget const& target) {
+    double const factor = target.factor;
     m_run.length = 0;
     for (int64 i = 0; i < frames; ++i, at += m_layout.frameBytes()) {
-      const double fourth = Values::value(at + 3 * Values::kBytes);
-      const double xyz[] = {Values::value(at), Values::value(at + Values::kBytes),
+      double const fourth = Values::value(at + 3 * Values::kBytes);
+      double const xyz[] = {Values::value(at), Values::value(at + Values::kBytes),
                             Values::value(at + 2 * Values::kBytes)};
-      const bool finite = std::isfinite(xyz[0] + xyz[1] + xyz[2]);
+      bool const finite = std::isfinite(xyz[0] + xyz[1] + xyz[2]);
       if (!(fourth >= 0) || !finite) {
         if (fourth >= 0 && target.point) ++m_counts.notFinite;
         endRun(target);
@@ -93,20 +93,20 @@ class DataReader {
 
   // The fourth value holds the residual in its low and the cameras in its high byte, reals after cutting
   // them.
-  void readFourth(double fourth, int64 frame, const C3DPointTarget& target) {
-    const int word = static_cast<int>(std::min(fourth, 32767.0));
+  void readFourth(double fourth, int64 frame, C3DPointTarget const& target) {
+    int const word = static_cast<int>(std::min(fourth, 32767.0));
     m_run.residuals[static_cast<size_t>(m_run.length)] = (word & 0xff) * target.residualStep;
     if (word & 0xff) m_run.residual = true;
-    const auto cameras = static_cast<unsigned char>(word >> 8);
+    auto const cameras = static_cast<unsigned char>(word >> 8);
     if (cameras == 0) return;
     auto& masks = target.point->cameras;
     if (masks.empty()) masks.resize(static_cast<size_t>(m_layout.frameCount));
     masks[static_cast<size_t>(frame)] = cameras;
   }
 
-  void endRun(const C3DPointTarget& target) {
+  void endRun(C3DPointTarget const& target) {
     if (m_run.length == 0) return;
-    const int64 time = m_start + m_run.start * m_period;
+    int64 const time = m_start + m_run.start * m_period;
     KeyTrack& positions = target.point ? target.point->positions : target.output->values;
     if (target.point) {
       KeyTrack& residuals = target.point->residuals;
@@ -121,39 +121,39 @@ class DataReader {
   }
 
   // Most files without residuals have none at all, so a track is made at the first that is not 0.
-  static void fillWithZeros(const KeyTrack& positions, KeyTrack& residuals) {
-    positions.forEach(0, positions.count(), [&](const KeyTrack::Key& key) { residuals.set(key.time, {}); });
+  static void fillWithZeros(KeyTrack const& positions, KeyTrack& residuals) {
+    positions.forEach(0, positions.count(), [&](KeyTrack::Key const& key) { residuals.set(key.time, {}); });
   }
 
-  void readChannel(const char* at, int64 first, int64 frames, const C3DAnalogTarget& target) {
-    const size_t step = static_cast<size_t>(m_layout.channelCount) * Values::kBytes;
-    const double scale = target.channel->scale, offset = target.channel->offset;
+  void readChannel(char const* at, int64 first, int64 frames, C3DAnalogTarget const& target) {
+    size_t const step = static_cast<size_t>(m_layout.channelCount) * Values::kBytes;
+    double const scale = target.channel->scale, offset = target.channel->offset;
     double* sample = m_samples.data();
     for (int64 i = 0; i < frames; ++i, at += m_layout.frameBytes()) {
-      const char* value = at;
+      char const* value = at;
       for (int64 j = 0; j < m_layout.samplesPerFrame; ++j, value += step)
         *sample++ =
             ((target.isUnsigned ? Values::unsignedValue(value) : Values::value(value)) - offset) * scale;
     }
-    const int64 time = m_start + first * m_layout.samplesPerFrame * m_samplePeriod;
+    int64 const time = m_start + first * m_layout.samplesPerFrame * m_samplePeriod;
     appendSamples(time, frames * m_layout.samplesPerFrame, target.channel->samples);
   }
 
   void appendSamples(int64 time, int64 count, KeyTrack& track) {
-    const double *begin = m_samples.data(), *end = begin + count;
-    for (const double* from = begin; from != end;) {
-      const double* to = std::find_if(from, end, [](double value) { return !std::isfinite(value); });
+    double const *begin = m_samples.data(), *end = begin + count;
+    for (double const* from = begin; from != end;) {
+      double const* to = std::find_if(from, end, [](double value) { return !std::isfinite(value); });
       if (to != from) track.append(time + (from - begin) * m_samplePeriod, m_samplePeriod, from, to - from);
       from = std::find_if(to, end, [](double value) { return std::isfinite(value); });
       m_counts.badSamples += from - to;
     }
   }
 
-  const FileBytes& m_file;
-  const C3DLayout& m_layout;
-  const int64 m_framesInBlock;
-  const int64 m_period, m_start;  // ticks
-  const int64 m_samplePeriod;     // ticks
+  FileBytes const& m_file;
+  C3DLayout const& m_layout;
+  int64 const m_framesInBlock;
+  int64 const m_period, m_start;  // ticks
+  int64 const m_samplePeriod;     // ticks
   Run m_run;
   std::vector<double> m_samples;
   C3DDataCounts m_counts;
@@ -161,11 +161,11 @@ class DataReader {
 
 }  // namespace
 
-C3DDataCounts readC3DData(const FileBytes& file, C3DProcessor processor, const C3DLayout& layout,
-                          const std::vector<C3DPointTarget>& points,
-                          const std::vector<C3DAnalogTarget>& analog, double analogRate) {
+C3DDataCounts readC3DData(FileBytes const& file, C3DProcessor processor, C3DLayout const& layout,
+                          std::vector<C3DPointTarget> const& points,
+                          std::vector<C3DAnalogTarget> const& analog, double analogRate) {
   if (layout.frameBytes() == 0) return {};
-  const auto read = [&](auto real, auto integer) {
+  auto const read = [&](auto real, auto integer) {
     if (layout.real) return DataReader<decltype(real)>(file, layout, analogRate).read(points, analog);
     return DataReader<decltype(integer)>(file, layout, analogRate).read(points, analog);
   };

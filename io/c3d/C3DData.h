@@ -32,8 +32,8 @@ struct C3DDataCounts {
 
 // There is one target for each point and channel of the layout. Holds no more memory than the tracks take and
 // gives the file's pages back as it goes.
-C3DDataCounts readC3DData(const FileBytes& file, C3DProcessor processor, const C3DLayout& layout,
-                          const std::vector<C3DPointTarget>& points,
-                          const std::vector<C3DAnalogTarget>& analog, double analogRate);
+C3DDataCounts readC3DData(FileBytes const& file, C3DProcessor processor, C3DLayout const& layout,
+                          std::vector<C3DPointTarget> const& points,
+                          std::vector<C3DAnalogTarget> const& analog, double analogRate);
 
 }  // namespace talix

@@ -20,20 +20,20 @@ bool fitsReal(double value) { return std::isfinite(static_cast<float>(value)); }
 
 class DataWriter {
  public:
-  DataWriter(const Take& take, const C3DDataPlan& plan, std::ostream& out)
+  DataWriter(Take const& take, C3DDataPlan const& plan, std::ostream& out)
       : m_take(take), m_plan(plan), m_out(out) {
-    for (const TakePoint& point : take.points) {
+    for (TakePoint const& point : take.points) {
       m_positions.emplace_back(point.positions, plan.frames);
       m_residuals.emplace_back(point.residuals, plan.frames);
     }
-    for (const ModelOutput& output : take.outputs) m_outputs.emplace_back(output.values, plan.frames);
+    for (ModelOutput const& output : take.outputs) m_outputs.emplace_back(output.values, plan.frames);
     if (!plan.withAnalog) return;
-    for (const TakeAnalogChannel& channel : take.analog) m_analog.emplace_back(channel.samples, plan.samples);
+    for (TakeAnalogChannel const& channel : take.analog) m_analog.emplace_back(channel.samples, plan.samples);
   }
 
   C3DDataLosses write() {
-    const int64 frames = m_plan.frames.count;
-    const bool anything = !m_positions.empty() || !m_outputs.empty() || !m_analog.empty();
+    int64 const frames = m_plan.frames.count;
+    bool const anything = !m_positions.empty() || !m_outputs.empty() || !m_analog.empty();
     for (int64 frame = 0; anything && frame < frames; ++frame) {
       for (size_t i = 0; i < m_positions.size(); ++i) writePoint(i, frame);
       for (C3DGridReader& output : m_outputs) writeVector(output.next(), 1, 0);
@@ -41,7 +41,7 @@ class DataWriter {
       if (m_bytes.size() >= kFlushBytes) flush();
     }
     flush();
-    const size_t used = m_written % kC3DBlock;
+    size_t const used = m_written % kC3DBlock;
     if (used) m_out << std::string(kC3DBlock - used, '\0');
     return m_losses;
   }
@@ -54,16 +54,16 @@ class DataWriter {
   }
 
   void writePoint(size_t index, int64 frame) {
-    const TakePoint& point = m_take.points[index];
-    const KeyTrack::Key* residual = m_residuals[index].next();
-    const double steps = residual ? std::round(residual->values[0] / m_plan.residualStep) : 0;
-    const auto at = static_cast<size_t>(frame);
-    const unsigned cameras = at < point.cameras.size() ? point.cameras[at] & kCameras : 0;
+    TakePoint const& point = m_take.points[index];
+    KeyTrack::Key const* residual = m_residuals[index].next();
+    double const steps = residual ? std::round(residual->values[0] / m_plan.residualStep) : 0;
+    auto const at = static_cast<size_t>(frame);
+    unsigned const cameras = at < point.cameras.size() ? point.cameras[at] & kCameras : 0;
     writeVector(m_positions[index].next(), m_plan.unit,
                 std::clamp(steps, 0.0, kMostResidual) + 256.0 * cameras);
   }
 
-  void writeVector(const KeyTrack::Key* key, double unit, double fourth) {
+  void writeVector(KeyTrack::Key const* key, double unit, double fourth) {
     double values[] = {0, 0, 0, -1};
     if (key) {
       for (size_t axis = 0; axis < 3; ++axis) values[axis] = key->values[axis] / unit;
@@ -74,20 +74,20 @@ class DataWriter {
       std::fill_n(values, 3, 0.0);
       values[3] = -1;
     }
-    for (const double value : values) appendC3DReal(m_bytes, value);
+    for (double const value : values) appendC3DReal(m_bytes, value);
   }
 
   void writeSamples() {
     for (C3DGridReader& channel : m_analog) {
-      const KeyTrack::Key* key = channel.next();
-      const bool usable = key && fitsReal(key->values[0]);
+      KeyTrack::Key const* key = channel.next();
+      bool const usable = key && fitsReal(key->values[0]);
       if (!usable) ++m_losses.samples;
       appendC3DReal(m_bytes, usable ? key->values[0] : 0);
     }
   }
 
-  const Take& m_take;
-  const C3DDataPlan& m_plan;
+  Take const& m_take;
+  C3DDataPlan const& m_plan;
   std::ostream& m_out;
   std::deque<C3DGridReader> m_positions, m_residuals, m_outputs, m_analog;
   std::string m_bytes;
@@ -97,9 +97,9 @@ class DataWriter {
 
 // Euclid's algorithm on numbers that went through a few roundings.
 double commonStep(double a, double b) {
-  const double tolerance = 1e-6 * std::min(a, b);
+  double const tolerance = 1e-6 * std::min(a, b);
   while (b > tolerance) {
-    const double rest = std::abs(std::remainder(a, b));
+    double const rest = std::abs(std::remainder(a, b));
     a = b;
     b = rest;
   }
@@ -108,12 +108,12 @@ double commonStep(double a, double b) {
 
 }  // namespace
 
-double c3dResidualStep(const Take& take, bool& exact) {
+double c3dResidualStep(Take const& take, bool& exact) {
   double step = 0, largest = 0;
   exact = true;
-  for (const TakePoint& point : take.points)
-    point.residuals.forEach(0, point.residuals.count(), [&](const KeyTrack::Key& key) {
-      const double residual = key.values[0];
+  for (TakePoint const& point : take.points)
+    point.residuals.forEach(0, point.residuals.count(), [&](KeyTrack::Key const& key) {
+      double const residual = key.values[0];
       if (!(residual > kLeastResidual) || !fitsReal(residual)) return;
       largest = std::max(largest, residual);
       if (exact) step = step == 0 ? residual : commonStep(step, residual);
@@ -123,7 +123,7 @@ double c3dResidualStep(const Take& take, bool& exact) {
   return exact ? step : largest / kMostResidual;
 }
 
-C3DDataLosses writeC3DData(const Take& take, const C3DDataPlan& plan, std::ostream& out) {
+C3DDataLosses writeC3DData(Take const& take, C3DDataPlan const& plan, std::ostream& out) {
   return DataWriter(take, plan, out).write();
 }
 

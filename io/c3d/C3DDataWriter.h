@@ -22,10 +22,10 @@ struct C3DDataLosses {
 };
 
 // Points first, then outputs.
-C3DDataLosses writeC3DData(const Take& take, const C3DDataPlan& plan, std::ostream& out);
+C3DDataLosses writeC3DData(Take const& take, C3DDataPlan const& plan, std::ostream& out);
 
 // The largest step in mm that makes every residual of the take a multiple of it up to 255; when there is
 // none, the 255th part of the largest, and `exact` is false. 1 without residuals.
-double c3dResidualStep(const Take& take, bool& exact);
+double c3dResidualStep(Take const& take, bool& exact);
 
 }  // namespace talix

@@ -14,29 +14,29 @@ constexpr unsigned kTableKey = 12345;
 constexpr size_t kKeyOffset = 298, kCountOffset = 300, kTimesOffset = 304, kLabelsOffset = 396;
 constexpr size_t kMostInHeader = 18, kHeaderLabel = 4;
 
-std::string textOr(const std::vector<std::string>& texts, size_t index) {
+std::string textOr(std::vector<std::string> const& texts, size_t index) {
   return index < texts.size() ? texts[index] : std::string();
 }
 
-std::vector<TakeEvent> groupEvents(const C3DParameters& parameters, std::vector<TakeNote>& notes) {
-  const auto warn = [&](const std::string& text) { notes.push_back({TakeNote::Level::Warning, text}); };
-  const C3DParameter* first = parameters.find("EVENT", "TIMES");
+std::vector<TakeEvent> groupEvents(C3DParameters const& parameters, std::vector<TakeNote>& notes) {
+  auto const warn = [&](std::string const& text) { notes.push_back({TakeNote::Level::Warning, text}); };
+  C3DParameter const* first = parameters.find("EVENT", "TIMES");
   if (!first) return {};
   if (first->dimensions.empty() || first->dimensions[0] != 2) {
     warn("EVENT:TIMES does not hold minutes and seconds by event; its events are left out");
     return {};
   }
-  const std::vector<double> times = parameters.numbers("EVENT", "TIMES");
-  const auto labels = parameters.texts("EVENT", "LABELS"), contexts = parameters.texts("EVENT", "CONTEXTS"),
+  std::vector<double> const times = parameters.numbers("EVENT", "TIMES");
+  auto const labels = parameters.texts("EVENT", "LABELS"), contexts = parameters.texts("EVENT", "CONTEXTS"),
              subjects = parameters.texts("EVENT", "SUBJECTS"),
              descriptions = parameters.texts("EVENT", "DESCRIPTIONS");
-  const double used = c3dUnsigned(parameters.number("EVENT", "USED", static_cast<double>(times.size() / 2)));
+  double const used = c3dUnsigned(parameters.number("EVENT", "USED", static_cast<double>(times.size() / 2)));
   if (used > static_cast<double>(times.size() / 2))
     warn("EVENT:USED says " + std::to_string(used) + " events, EVENT:TIMES holds " +
          std::to_string(times.size() / 2));
   std::vector<TakeEvent> events;
   for (size_t i = 0; i < times.size() / 2 && static_cast<double>(i) < used; ++i) {
-    const double seconds = 60 * times[2 * i] + times[2 * i + 1];
+    double const seconds = 60 * times[2 * i] + times[2 * i + 1];
     if (std::isfinite(seconds))
       events.push_back(
           {textOr(labels, i), textOr(contexts, i), textOr(subjects, i), textOr(descriptions, i), seconds});
@@ -46,10 +46,10 @@ std::vector<TakeEvent> groupEvents(const C3DParameters& parameters, std::vector<
   return events;
 }
 
-std::vector<TakeEvent> headerEvents(const C3DBytes& bytes) {
-  const char* what = "the header's events";
+std::vector<TakeEvent> headerEvents(C3DBytes const& bytes) {
+  char const* what = "the header's events";
   if (bytes.word(kKeyOffset, what) != kTableKey) return {};
-  const size_t count = std::min<size_t>(bytes.word(kCountOffset, what), kMostInHeader);
+  size_t const count = std::min<size_t>(bytes.word(kCountOffset, what), kMostInHeader);
   std::vector<TakeEvent> events;
   for (size_t i = 0; i < count; ++i) {
     TakeEvent event;
@@ -63,35 +63,35 @@ std::vector<TakeEvent> headerEvents(const C3DBytes& bytes) {
   return events;
 }
 
-bool sameEvent(const TakeEvent& a, const TakeEvent& b) {
+bool sameEvent(TakeEvent const& a, TakeEvent const& b) {
   return std::abs(a.seconds - b.seconds) < 1e-4 &&
          a.label.substr(0, kHeaderLabel) == b.label.substr(0, kHeaderLabel);
 }
 
 }  // namespace
 
-std::vector<TakeEvent> readC3DEvents(const C3DBytes& bytes, const C3DParameters& parameters,
+std::vector<TakeEvent> readC3DEvents(C3DBytes const& bytes, C3DParameters const& parameters,
                                      std::vector<TakeNote>& notes) {
   std::vector<TakeEvent> events = groupEvents(parameters, notes);
-  const size_t inGroup = events.size();
-  for (const TakeEvent& event : headerEvents(bytes))
+  size_t const inGroup = events.size();
+  for (TakeEvent const& event : headerEvents(bytes))
     if (std::none_of(events.begin(), events.begin() + static_cast<std::ptrdiff_t>(inGroup),
-                     [&](const TakeEvent& other) { return sameEvent(event, other); }))
+                     [&](TakeEvent const& other) { return sameEvent(event, other); }))
       events.push_back(event);
   return events;
 }
 
-void addC3DEvents(const std::vector<TakeEvent>& events, C3DParameters& parameters,
+void addC3DEvents(std::vector<TakeEvent> const& events, C3DParameters& parameters,
                   std::vector<TakeNote>& notes) {
   if (events.empty()) return;
   std::vector<std::string> labels, contexts, subjects, descriptions;
   std::vector<double> times;
-  for (const TakeEvent& event : events) {
+  for (TakeEvent const& event : events) {
     labels.push_back(event.label);
     contexts.push_back(event.context);
     subjects.push_back(event.subject);
     descriptions.push_back(event.description);
-    const double minutes = std::floor(event.seconds / 60);
+    double const minutes = std::floor(event.seconds / 60);
     times.insert(times.end(), {minutes, event.seconds - 60 * minutes});
   }
   C3DGroupWriter group(parameters, "EVENT", "Events of the take", notes);

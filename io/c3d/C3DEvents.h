@@ -11,11 +11,11 @@
 namespace talix {
 
 // An event of the header that the group has too (same label, same time) comes once.
-std::vector<TakeEvent> readC3DEvents(const C3DBytes& bytes, const C3DParameters& parameters,
+std::vector<TakeEvent> readC3DEvents(C3DBytes const& bytes, C3DParameters const& parameters,
                                      std::vector<TakeNote>& notes);
 
 // Adds the EVENT group; none without events.
-void addC3DEvents(const std::vector<TakeEvent>& events, C3DParameters& parameters,
+void addC3DEvents(std::vector<TakeEvent> const& events, C3DParameters& parameters,
                   std::vector<TakeNote>& notes);
 
 }  // namespace talix

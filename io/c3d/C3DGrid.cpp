@@ -4,14 +4,14 @@ namespace talix {
 
 namespace {
 
-bool whole(const KeyTrack::Key& key) { return key.components == KeyTrack::kAll; }
+bool whole(KeyTrack::Key const& key) { return key.components == KeyTrack::kAll; }
 
 }  // namespace
 
-C3DLeftOver c3dLeftOver(const KeyTrack& track, const C3DGrid& grid) {
+C3DLeftOver c3dLeftOver(KeyTrack const& track, C3DGrid const& grid) {
   C3DLeftOver left;
-  track.forEach(0, track.count(), [&](const KeyTrack::Key& key) {
-    const int64 fromStart = key.time - grid.start;
+  track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
+    int64 const fromStart = key.time - grid.start;
     if (fromStart % grid.period != 0)
       ++left.between;
     else if (fromStart < 0 || fromStart / grid.period >= grid.count)
@@ -22,7 +22,7 @@ C3DLeftOver c3dLeftOver(const KeyTrack& track, const C3DGrid& grid) {
   return left;
 }
 
-C3DGridReader::C3DGridReader(const KeyTrack& track, const C3DGrid& grid)
+C3DGridReader::C3DGridReader(KeyTrack const& track, C3DGrid const& grid)
     : m_reader(track, track.lowerBound(grid.start)),
       m_left(track.count() - track.lowerBound(grid.start)),
       m_time(grid.start),
@@ -37,9 +37,9 @@ void C3DGridReader::advance() {
   m_key = m_reader.next();
 }
 
-const KeyTrack::Key* C3DGridReader::next() {
+KeyTrack::Key const* C3DGridReader::next() {
   while (m_hasKey && m_key.time < m_time) advance();
-  const bool found = m_hasKey && m_key.time == m_time && whole(m_key);
+  bool const found = m_hasKey && m_key.time == m_time && whole(m_key);
   m_time += m_period;
   return found ? &m_key : nullptr;
 }

@@ -18,15 +18,15 @@ struct C3DLeftOver {
   int64 partial = 0;  // at a time of the grid, without a value on every axis
 };
 
-C3DLeftOver c3dLeftOver(const KeyTrack& track, const C3DGrid& grid);
+C3DLeftOver c3dLeftOver(KeyTrack const& track, C3DGrid const& grid);
 
 // Walks along the grid. The track must outlive it and stay as it is.
 class C3DGridReader {
  public:
-  C3DGridReader(const KeyTrack& track, const C3DGrid& grid);
+  C3DGridReader(KeyTrack const& track, C3DGrid const& grid);
 
   // The whole key at the next time of the grid; null: there is none. Valid until the next call.
-  const KeyTrack::Key* next();
+  KeyTrack::Key const* next();
 
  private:
   void advance();

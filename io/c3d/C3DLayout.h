@@ -48,7 +48,7 @@ struct C3DLayout {
 C3DHeader readC3DHeader(C3DBytes& bytes, std::vector<TakeNote>& notes);
 
 // The whole data section lies within the file. Throws FileError when it cannot.
-C3DLayout findC3DLayout(const C3DBytes& bytes, const C3DHeader& header, const C3DParameterSection& section,
+C3DLayout findC3DLayout(C3DBytes const& bytes, C3DHeader const& header, C3DParameterSection const& section,
                         std::vector<TakeNote>& notes);
 
 }  // namespace talix

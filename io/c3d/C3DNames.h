@@ -18,7 +18,7 @@ struct C3DOutputKind {
 
 class C3DNames {
  public:
-  explicit C3DNames(const C3DParameters& parameters);
+  explicit C3DNames(C3DParameters const& parameters);
 
   struct Name {
     std::string subject;
@@ -30,16 +30,16 @@ class C3DNames {
   // The full label parted by the SUBJECTS group, else at its colon; no label for those made up for unnamed
   // points.
   Name name(size_t point) const;
-  const C3DOutputKind* outputKind(size_t point) const;  // null: the point is a position
+  C3DOutputKind const* outputKind(size_t point) const;  // null: the point is a position
 
  private:
   struct Subject {
     std::string name;
     std::string prefix;  // empty: its labels have none
   };
-  void findSubjects(const C3DParameters& parameters);
-  void findOutputs(const C3DParameters& parameters);
-  void addOutputKind(const C3DParameters& parameters, const std::string& kind, const std::string& singular);
+  void findSubjects(C3DParameters const& parameters);
+  void findOutputs(C3DParameters const& parameters);
+  void addOutputKind(C3DParameters const& parameters, std::string const& kind, std::string const& singular);
 
   std::vector<std::string> m_labels, m_descriptions;
   std::vector<Subject> m_subjects;

@@ -13,21 +13,21 @@ constexpr size_t kLongestText = 127;   // with 255 of them a parameter stays bel
 constexpr size_t kMostBytes = 32'500;  // of values in a record, whose length has to fit 15 bits
 constexpr unsigned kMark = 0x50;
 
-std::string continued(const std::string& name, size_t part) {
+std::string continued(std::string const& name, size_t part) {
   return part == 0 ? name : name + std::to_string(part + 1);
 }
 
-void appendTexts(std::string& characters, const std::vector<std::string>& values, size_t first, size_t count,
+void appendTexts(std::string& characters, std::vector<std::string> const& values, size_t first, size_t count,
                  size_t length) {
   for (size_t i = first; i < first + count; ++i) {
-    const std::string value = values[i].substr(0, length);
+    std::string const value = values[i].substr(0, length);
     characters += value + std::string(length - value.size(), ' ');
   }
 }
 
-void appendValues(std::string& bytes, const C3DParameter& parameter) {
+void appendValues(std::string& bytes, C3DParameter const& parameter) {
   bytes += parameter.characters;
-  for (const double value : parameter.numbers) {
+  for (double const value : parameter.numbers) {
     if (parameter.type == C3DParameter::Type::Real)
       appendC3DReal(bytes, value);
     else if (parameter.type == C3DParameter::Type::Integer)
@@ -38,7 +38,7 @@ void appendValues(std::string& bytes, const C3DParameter& parameter) {
 }
 
 // Number, name, length and content of a record.
-void appendRecord(std::string& bytes, int id, const std::string& name, const std::string& content) {
+void appendRecord(std::string& bytes, int id, std::string const& name, std::string const& content) {
   bytes += static_cast<char>(name.size());
   bytes += static_cast<char>(id);
   bytes += name;
@@ -46,11 +46,11 @@ void appendRecord(std::string& bytes, int id, const std::string& name, const std
   bytes += content;
 }
 
-void appendParameter(std::string& bytes, int id, const C3DParameter& parameter) {
+void appendParameter(std::string& bytes, int id, C3DParameter const& parameter) {
   std::string content;
   content += static_cast<char>(parameter.type);
   content += static_cast<char>(parameter.dimensions.size());
-  for (const int dimension : parameter.dimensions) content += static_cast<char>(dimension);
+  for (int const dimension : parameter.dimensions) content += static_cast<char>(dimension);
   appendValues(content, parameter);
   content += '\0';  // no description
   appendRecord(bytes, id, parameter.name, content);
@@ -59,26 +59,26 @@ void appendParameter(std::string& bytes, int id, const C3DParameter& parameter) 
 }  // namespace
 
 void appendC3DWord(std::string& bytes, unsigned value) {
-  const char word[] = {static_cast<char>(value & 0xff), static_cast<char>(value >> 8 & 0xff)};
+  char const word[] = {static_cast<char>(value & 0xff), static_cast<char>(value >> 8 & 0xff)};
   bytes.append(word, sizeof word);
 }
 
 void appendC3DReal(std::string& bytes, double value) {
-  const auto bits = std::bit_cast<std::uint32_t>(static_cast<float>(value));
-  const char real[] = {static_cast<char>(bits & 0xff), static_cast<char>(bits >> 8 & 0xff),
+  auto const bits = std::bit_cast<std::uint32_t>(static_cast<float>(value));
+  char const real[] = {static_cast<char>(bits & 0xff), static_cast<char>(bits >> 8 & 0xff),
                        static_cast<char>(bits >> 16 & 0xff), static_cast<char>(bits >> 24)};
   bytes.append(real, sizeof real);
 }
 
-C3DGroupWriter::C3DGroupWriter(C3DParameters& parameters, const std::string& name,
-                               const std::string& description, std::vector<TakeNote>& notes)
+C3DGroupWriter::C3DGroupWriter(C3DParameters& parameters, std::string const& name,
+                               std::string const& description, std::vector<TakeNote>& notes)
     : m_parameters(parameters), m_group(parameters.groups.size()), m_notes(notes) {
   parameters.groups.push_back({name, description, {}});
 }
 
-size_t C3DGroupWriter::longest(const std::string& name, const std::vector<std::string>& values) {
+size_t C3DGroupWriter::longest(std::string const& name, std::vector<std::string> const& values) {
   size_t length = 1;
-  for (const std::string& value : values) length = std::max(length, value.size());
+  for (std::string const& value : values) length = std::max(length, value.size());
   if (length <= kLongestText) return length;
   m_notes.push_back({TakeNote::Level::Warning, group().name + ":" + name + " holds texts of more than " +
                                                    std::to_string(kLongestText) +
@@ -86,17 +86,17 @@ size_t C3DGroupWriter::longest(const std::string& name, const std::vector<std::s
   return kLongestText;
 }
 
-void C3DGroupWriter::text(const std::string& name, const std::string& value) {
-  const size_t length = longest(name, {value});
+void C3DGroupWriter::text(std::string const& name, std::string const& value) {
+  size_t const length = longest(name, {value});
   C3DParameter parameter{name, C3DParameter::Type::Text, {static_cast<int>(length)}, {}, {}};
   appendTexts(parameter.characters, {value}, 0, 1, length);
   group().parameters.push_back(std::move(parameter));
 }
 
-void C3DGroupWriter::texts(const std::string& name, const std::vector<std::string>& values) {
-  const size_t length = longest(name, values);
+void C3DGroupWriter::texts(std::string const& name, std::vector<std::string> const& values) {
+  size_t const length = longest(name, values);
   for (size_t first = 0; first < values.size(); first += kMostInDimension) {
-    const size_t count = std::min(kMostInDimension, values.size() - first);
+    size_t const count = std::min(kMostInDimension, values.size() - first);
     C3DParameter parameter{continued(name, first / kMostInDimension),
                            C3DParameter::Type::Text,
                            {static_cast<int>(length), static_cast<int>(count)},
@@ -107,24 +107,24 @@ void C3DGroupWriter::texts(const std::string& name, const std::vector<std::strin
   }
 }
 
-void C3DGroupWriter::pairs(const std::string& name, const std::vector<std::string>& values) {
-  const size_t length = longest(name, values);
-  const size_t count = std::min(values.size() / 2, std::min(kMostInDimension, kMostBytes / (2 * length)));
+void C3DGroupWriter::pairs(std::string const& name, std::vector<std::string> const& values) {
+  size_t const length = longest(name, values);
+  size_t const count = std::min(values.size() / 2, std::min(kMostInDimension, kMostBytes / (2 * length)));
   C3DParameter parameter{
       name, C3DParameter::Type::Text, {static_cast<int>(length), 2, static_cast<int>(count)}, {}, {}};
   appendTexts(parameter.characters, values, 0, 2 * count, length);
   group().parameters.push_back(std::move(parameter));
 }
 
-void C3DGroupWriter::number(const std::string& name, C3DParameter::Type type, double value) {
+void C3DGroupWriter::number(std::string const& name, C3DParameter::Type type, double value) {
   group().parameters.push_back({name, type, {}, {}, {value}});
 }
 
-void C3DGroupWriter::numbers(const std::string& name, C3DParameter::Type type,
-                             const std::vector<double>& values, size_t width) {
-  const size_t most = kMostInDimension * width;
+void C3DGroupWriter::numbers(std::string const& name, C3DParameter::Type type,
+                             std::vector<double> const& values, size_t width) {
+  size_t const most = kMostInDimension * width;
   for (size_t first = 0; first < values.size(); first += most) {
-    const size_t count = std::min(most, values.size() - first);
+    size_t const count = std::min(most, values.size() - first);
     C3DParameter parameter{continued(name, first / most), type, {static_cast<int>(count / width)}, {}, {}};
     if (width > 1) parameter.dimensions.insert(parameter.dimensions.begin(), static_cast<int>(width));
     parameter.numbers.assign(values.begin() + static_cast<std::ptrdiff_t>(first),
@@ -133,14 +133,14 @@ void C3DGroupWriter::numbers(const std::string& name, C3DParameter::Type type,
   }
 }
 
-std::string c3dParameterSection(const C3DParameters& parameters) {
+std::string c3dParameterSection(C3DParameters const& parameters) {
   std::string bytes(4, '\0');
   int id = 0;
-  for (const C3DGroup& group : parameters.groups) {
+  for (C3DGroup const& group : parameters.groups) {
     ++id;
-    const std::string description = group.description.substr(0, kMostInDimension);
+    std::string const description = group.description.substr(0, kMostInDimension);
     appendRecord(bytes, -id, group.name, static_cast<char>(description.size()) + description);
-    for (const C3DParameter& parameter : group.parameters) appendParameter(bytes, id, parameter);
+    for (C3DParameter const& parameter : group.parameters) appendParameter(bytes, id, parameter);
   }
   bytes += std::string(2, '\0');  // end mark
   bytes.resize((bytes.size() + kC3DBlock - 1) / kC3DBlock * kC3DBlock, '\0');

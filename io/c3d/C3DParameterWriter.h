@@ -13,21 +13,21 @@ namespace talix {
 // A text that is too long is cut, with a warning.
 class C3DGroupWriter {
  public:
-  C3DGroupWriter(C3DParameters& parameters, const std::string& name, const std::string& description,
+  C3DGroupWriter(C3DParameters& parameters, std::string const& name, std::string const& description,
                  std::vector<TakeNote>& notes);
 
-  void text(const std::string& name, const std::string& value);
-  void texts(const std::string& name, const std::vector<std::string>& values);
+  void text(std::string const& name, std::string const& value);
+  void texts(std::string const& name, std::vector<std::string> const& values);
   // A list of pairs of texts, as one parameter.
-  void pairs(const std::string& name, const std::vector<std::string>& values);
-  void number(const std::string& name, C3DParameter::Type type, double value);
+  void pairs(std::string const& name, std::vector<std::string> const& values);
+  void number(std::string const& name, C3DParameter::Type type, double value);
   // `width` numbers belong together, as a first dimension of their own when there are several.
-  void numbers(const std::string& name, C3DParameter::Type type, const std::vector<double>& values,
+  void numbers(std::string const& name, C3DParameter::Type type, std::vector<double> const& values,
                size_t width = 1);
 
  private:
   C3DGroup& group() { return m_parameters.groups[m_group]; }
-  size_t longest(const std::string& name, const std::vector<std::string>& values);
+  size_t longest(std::string const& name, std::vector<std::string> const& values);
 
   C3DParameters& m_parameters;
   size_t m_group;
@@ -35,7 +35,7 @@ class C3DGroupWriter {
 };
 
 // The section's bytes: whole blocks, its header first.
-std::string c3dParameterSection(const C3DParameters& parameters);
+std::string c3dParameterSection(C3DParameters const& parameters);
 
 // Numbers as Intel processors store them.
 void appendC3DWord(std::string& bytes, unsigned value);

@@ -26,9 +26,9 @@ std::string trimmed(std::string_view text) {
 
 // Calls visit(parameter) for NAME, NAME2, NAME3, ...
 template <class Visit>
-void eachContinued(const C3DParameters& parameters, std::string_view group, std::string_view name,
+void eachContinued(C3DParameters const& parameters, std::string_view group, std::string_view name,
                    Visit visit) {
-  const C3DParameter* parameter = parameters.find(group, name);
+  C3DParameter const* parameter = parameters.find(group, name);
   for (int next = 2; parameter; ++next) {
     visit(*parameter);
     parameter = parameters.find(group, std::string(name) + std::to_string(next));
@@ -47,7 +47,7 @@ struct Record {
 
 class SectionReader {
  public:
-  SectionReader(const C3DBytes& bytes, std::vector<TakeNote>& notes) : m_bytes(bytes), m_notes(notes) {}
+  SectionReader(C3DBytes const& bytes, std::vector<TakeNote>& notes) : m_bytes(bytes), m_notes(notes) {}
 
   C3DParameterSection read(size_t start, size_t declaredEnd) {
     size_t offset = start;
@@ -57,7 +57,7 @@ class SectionReader {
         break;
       }
       if (m_bytes.byte(offset, "a parameter's name length") == 0) break;
-      const Record record = readRecord(offset);
+      Record const record = readRecord(offset);
       offset = record.id < 0 ? readGroup(record) : readParameter(record);
       if (record.last) break;
       offset = record.end;
@@ -66,17 +66,17 @@ class SectionReader {
   }
 
  private:
-  void warn(const std::string& text) { m_notes.push_back({TakeNote::Level::Warning, text}); }
+  void warn(std::string const& text) { m_notes.push_back({TakeNote::Level::Warning, text}); }
 
   Record readRecord(size_t offset) const {
     Record record;
     record.offset = offset;
-    const auto length = static_cast<signed char>(m_bytes.byte(offset, "a parameter's name length"));
+    auto const length = static_cast<signed char>(m_bytes.byte(offset, "a parameter's name length"));
     record.id = static_cast<signed char>(m_bytes.byte(offset + 1, "a group number"));
-    const size_t nameLength = static_cast<size_t>(std::abs(int{length}));  // negative marks a locked record
+    size_t const nameLength = static_cast<size_t>(std::abs(int{length}));  // negative marks a locked record
     record.name = upperCase(trimmed(m_bytes.text(offset + 2, nameLength, "a parameter's name")));
-    const size_t link = offset + 2 + nameLength;
-    const size_t step = m_bytes.word(link, "a parameter's next-record offset");
+    size_t const link = offset + 2 + nameLength;
+    size_t const step = m_bytes.word(link, "a parameter's next-record offset");
     record.content = link + 2;
     record.last = step == 0;
     record.end = record.last ? m_bytes.size() : link + step;
@@ -90,21 +90,21 @@ class SectionReader {
   }
 
   // Returns the offset after what it read.
-  size_t readGroup(const Record& record) {
-    const size_t length = m_bytes.byte(record.content, "a group's description");
-    const size_t held = std::min(length, record.end - record.content - 1);
+  size_t readGroup(Record const& record) {
+    size_t const length = m_bytes.byte(record.content, "a group's description");
+    size_t const held = std::min(length, record.end - record.content - 1);
     C3DGroup& group = m_groups[-record.id];
     group.name = record.name;
     group.description = trimmed(m_bytes.text(record.content + 1, held, "a group's description"));
     return record.content + 1 + held;
   }
 
-  size_t readParameter(const Record& record) {
+  size_t readParameter(Record const& record) {
     C3DParameter parameter;
     parameter.name = record.name;
     size_t offset = record.content;
-    const int type = static_cast<signed char>(m_bytes.byte(offset, "a parameter's type"));
-    const int dimensions = static_cast<int>(m_bytes.byte(offset + 1, "a parameter's dimensions"));
+    int const type = static_cast<signed char>(m_bytes.byte(offset, "a parameter's type"));
+    int const dimensions = static_cast<int>(m_bytes.byte(offset + 1, "a parameter's dimensions"));
     if (type != -1 && type != 1 && type != 2 && type != 4) {
       warn("parameter " + record.name + " is of no known type (" + std::to_string(type) + ") and left out");
       return offset;
@@ -124,9 +124,9 @@ class SectionReader {
     return offset;
   }
 
-  size_t readValues(const Record& record, size_t offset, size_t values, C3DParameter& parameter) {
-    const size_t width = static_cast<size_t>(std::abs(static_cast<int>(parameter.type)));
-    const size_t room = (record.end - std::min(offset, record.end)) / width;
+  size_t readValues(Record const& record, size_t offset, size_t values, C3DParameter& parameter) {
+    size_t const width = static_cast<size_t>(std::abs(static_cast<int>(parameter.type)));
+    size_t const room = (record.end - std::min(offset, record.end)) / width;
     if (values > room) {
       if (record.last)
         m_bytes.fail(offset, "parameter " + record.name + ": its " + std::to_string(values) +
@@ -163,7 +163,7 @@ class SectionReader {
     return parameters;
   }
 
-  const C3DBytes& m_bytes;
+  C3DBytes const& m_bytes;
   std::vector<TakeNote>& m_notes;
   std::map<int, C3DGroup> m_groups;
 };
@@ -171,19 +171,19 @@ class SectionReader {
 }  // namespace
 
 size_t C3DParameter::textCount() const {
-  const size_t length = dimensions.empty() ? 1 : static_cast<size_t>(dimensions[0]);
+  size_t const length = dimensions.empty() ? 1 : static_cast<size_t>(dimensions[0]);
   return length ? characters.size() / length : 0;
 }
 
 std::string C3DParameter::text(size_t index) const {
-  const size_t length = dimensions.empty() ? 1 : static_cast<size_t>(dimensions[0]);
+  size_t const length = dimensions.empty() ? 1 : static_cast<size_t>(dimensions[0]);
   return trimmed(std::string_view(characters).substr(index * length, length));
 }
 
-const C3DParameter* C3DParameters::find(std::string_view group, std::string_view name) const {
-  for (const C3DGroup& candidate : groups) {
+C3DParameter const* C3DParameters::find(std::string_view group, std::string_view name) const {
+  for (C3DGroup const& candidate : groups) {
     if (candidate.name != group) continue;
-    for (const C3DParameter& parameter : candidate.parameters)
+    for (C3DParameter const& parameter : candidate.parameters)
       if (parameter.name == name) return &parameter;
   }
   return nullptr;
@@ -191,7 +191,7 @@ const C3DParameter* C3DParameters::find(std::string_view group, std::string_view
 
 std::vector<std::string> C3DParameters::texts(std::string_view group, std::string_view name) const {
   std::vector<std::string> all;
-  eachContinued(*this, group, name, [&](const C3DParameter& parameter) {
+  eachContinued(*this, group, name, [&](C3DParameter const& parameter) {
     for (size_t i = 0; i < parameter.textCount(); ++i) all.push_back(parameter.text(i));
   });
   return all;
@@ -199,23 +199,23 @@ std::vector<std::string> C3DParameters::texts(std::string_view group, std::strin
 
 std::vector<double> C3DParameters::numbers(std::string_view group, std::string_view name) const {
   std::vector<double> all;
-  eachContinued(*this, group, name, [&](const C3DParameter& parameter) {
+  eachContinued(*this, group, name, [&](C3DParameter const& parameter) {
     all.insert(all.end(), parameter.numbers.begin(), parameter.numbers.end());
   });
   return all;
 }
 
 double C3DParameters::number(std::string_view group, std::string_view name, double fallback) const {
-  const C3DParameter* parameter = find(group, name);
+  C3DParameter const* parameter = find(group, name);
   return parameter && !parameter->numbers.empty() ? parameter->numbers[0] : fallback;
 }
 
 std::string C3DParameters::text(std::string_view group, std::string_view name) const {
-  const C3DParameter* parameter = find(group, name);
+  C3DParameter const* parameter = find(group, name);
   return parameter && parameter->textCount() ? parameter->text(0) : std::string();
 }
 
-C3DParameterSection readC3DParameters(const C3DBytes& bytes, size_t start, size_t declaredEnd,
+C3DParameterSection readC3DParameters(C3DBytes const& bytes, size_t start, size_t declaredEnd,
                                       std::vector<TakeNote>& notes) {
   return SectionReader(bytes, notes).read(start, declaredEnd);
 }

@@ -36,7 +36,7 @@ class C3DParameters {
  public:
   std::vector<C3DGroup> groups;
 
-  const C3DParameter* find(std::string_view group, std::string_view name) const;  // null: none
+  C3DParameter const* find(std::string_view group, std::string_view name) const;  // null: none
   // Of the parameter and those that go on with it; empty when there is none.
   std::vector<std::string> texts(std::string_view group, std::string_view name) const;
   std::vector<double> numbers(std::string_view group, std::string_view name) const;
@@ -55,7 +55,7 @@ struct C3DParameterSection {
 
 // Reads the section at `start`, once the processor is known to `bytes`. Leads back to no record twice: each
 // one lies after the one before. An array that says to be longer than its record is cut, with a warning.
-C3DParameterSection readC3DParameters(const C3DBytes& bytes, size_t start, size_t declaredEnd,
+C3DParameterSection readC3DParameters(C3DBytes const& bytes, size_t start, size_t declaredEnd,
                                       std::vector<TakeNote>& notes);
 
 }  // namespace talix

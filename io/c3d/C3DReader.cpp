@@ -19,7 +19,7 @@ constexpr double kFrequentOrigin = 0.01;  // share of the point-frames at 0, 0, 
 
 class Reader {
  public:
-  Reader(const std::string& path, const ReadOptions& options)
+  Reader(std::string const& path, ReadOptions const& options)
       : m_file(path),
         m_bytes(m_file),
         m_header(readC3DHeader(m_bytes, m_take.notes)),
@@ -42,7 +42,7 @@ class Reader {
     makePoints();
     makeAnalogChannels();
     tellOtherGroups();
-    const C3DDataCounts counts = readC3DData(m_file, m_bytes.processor(), m_layout, pointTargets(),
+    C3DDataCounts const counts = readC3DData(m_file, m_bytes.processor(), m_layout, pointTargets(),
                                              analogTargets(), m_take.analogRate);
     tellCounts(counts);
     m_take.events = readC3DEvents(m_bytes, parameters(), m_take.notes);
@@ -50,14 +50,14 @@ class Reader {
   }
 
  private:
-  const C3DParameters& parameters() const { return m_section.parameters; }
-  void info(const std::string& text) { m_take.notes.push_back({TakeNote::Level::Info, text}); }
-  void warn(const std::string& text) { m_take.notes.push_back({TakeNote::Level::Warning, text}); }
+  C3DParameters const& parameters() const { return m_section.parameters; }
+  void info(std::string const& text) { m_take.notes.push_back({TakeNote::Level::Info, text}); }
+  void warn(std::string const& text) { m_take.notes.push_back({TakeNote::Level::Warning, text}); }
 
-  void findUnit(const std::string& asked) {
-    const std::string inFile = parameters().text("POINT", "UNITS");
-    const std::string unit = asked.empty() ? inFile : asked;
-    const double size = millimetresPerUnit(unit);
+  void findUnit(std::string const& asked) {
+    std::string const inFile = parameters().text("POINT", "UNITS");
+    std::string const unit = asked.empty() ? inFile : asked;
+    double const size = millimetresPerUnit(unit);
     if (!asked.empty() && size == 0)
       throw FileError(m_file.path(),
                       "the length unit \"" + asked + "\" is unknown; mm, cm, m, in and ft are known");
@@ -77,9 +77,9 @@ class Reader {
 
   // The screen's upward axis is the world's.
   void findUpAxis() {
-    const std::string screen = parameters().text("POINT", "Y_SCREEN");
-    for (const char c : screen) {
-      const int axis = std::toupper(static_cast<unsigned char>(c)) - 'X';
+    std::string const screen = parameters().text("POINT", "Y_SCREEN");
+    for (char const c : screen) {
+      int const axis = std::toupper(static_cast<unsigned char>(c)) - 'X';
       if (axis < 0 || axis > 2) continue;
       m_take.up = static_cast<Axis>(axis);
       return;
@@ -91,12 +91,12 @@ class Reader {
   void makePoints() {
     size_t unnamed = 0;
     for (size_t i = 0; i < pointCount(); ++i) {
-      if (const C3DOutputKind* kind = m_names.outputKind(i)) {
+      if (C3DOutputKind const* kind = m_names.outputKind(i)) {
         m_take.outputs.push_back(
             {m_names.fullLabel(i), kind->unit, kind->kind, KeyTrack(KeyTrack::Shape::Vector)});
         continue;
       }
-      const C3DNames::Name name = m_names.name(i);
+      C3DNames::Name const name = m_names.name(i);
       TakePoint point;
       point.subject = name.subject;
       point.label = name.label;
@@ -111,7 +111,7 @@ class Reader {
   void tellOtherGroups() {
     static constexpr std::string_view kRead[] = {"POINT", "ANALOG", "EVENT", "TRIAL", "SUBJECTS"};
     std::string names;
-    for (const C3DGroup& group : parameters().groups) {
+    for (C3DGroup const& group : parameters().groups) {
       if (group.parameters.empty() ||
           std::find(std::begin(kRead), std::end(kRead), group.name) != std::end(kRead))
         continue;
@@ -124,7 +124,7 @@ class Reader {
 
   // In the order of the file. The take's lists are complete by now, so their items stay where they are.
   std::vector<C3DPointTarget> pointTargets() {
-    const double fileScale = m_layout.real ? 1 : m_layout.scale;
+    double const fileScale = m_layout.real ? 1 : m_layout.scale;
     std::vector<C3DPointTarget> targets;
     size_t point = 0, output = 0;
     for (size_t i = 0; i < pointCount(); ++i) {
@@ -146,16 +146,16 @@ class Reader {
   void makeAnalogChannels() {
     if (m_layout.channelCount == 0 || m_layout.samplesPerFrame == 0) return;
     m_take.analogRate = m_layout.rate * static_cast<double>(m_layout.samplesPerFrame);
-    const double rate = parameters().number("ANALOG", "RATE", m_take.analogRate);
+    double const rate = parameters().number("ANALOG", "RATE", m_take.analogRate);
     if (std::abs(rate - m_take.analogRate) > 1e-6 * m_take.analogRate)
       info("ANALOG:RATE " + shortNumber(rate) + " Hz is not " + std::to_string(m_layout.samplesPerFrame) +
            " samples per frame; " + shortNumber(m_take.analogRate) + " Hz is taken");
-    const auto labels = parameters().texts("ANALOG", "LABELS"), units = parameters().texts("ANALOG", "UNITS"),
+    auto const labels = parameters().texts("ANALOG", "LABELS"), units = parameters().texts("ANALOG", "UNITS"),
                descriptions = parameters().texts("ANALOG", "DESCRIPTIONS");
-    const auto scales = parameters().numbers("ANALOG", "SCALE"),
+    auto const scales = parameters().numbers("ANALOG", "SCALE"),
                offsets = parameters().numbers("ANALOG", "OFFSET");
-    const double general = finiteOr(parameters().number("ANALOG", "GEN_SCALE", 1), 1);
-    const auto textAt = [](const std::vector<std::string>& texts, size_t i) {
+    double const general = finiteOr(parameters().number("ANALOG", "GEN_SCALE", 1), 1);
+    auto const textAt = [](std::vector<std::string> const& texts, size_t i) {
       return i < texts.size() ? texts[i] : std::string();
     };
     for (size_t i = 0; i < static_cast<size_t>(m_layout.channelCount); ++i) {
@@ -177,13 +177,13 @@ class Reader {
   }
 
   std::vector<C3DAnalogTarget> analogTargets() {
-    const bool isUnsigned = unsignedAnalog();
+    bool const isUnsigned = unsignedAnalog();
     std::vector<C3DAnalogTarget> targets;
     for (TakeAnalogChannel& channel : m_take.analog) targets.push_back({&channel, isUnsigned});
     return targets;
   }
 
-  void tellCounts(const C3DDataCounts& counts) {
+  void tellCounts(C3DDataCounts const& counts) {
     if (counts.notFinite)
       info(std::to_string(counts.notFinite) + " point-frames hold no numbers and are read as not seen");
     if (counts.badSamples)
@@ -204,6 +204,6 @@ class Reader {
 
 }  // namespace
 
-Take readC3D(const std::string& path, const ReadOptions& options) { return Reader(path, options).read(); }
+Take readC3D(std::string const& path, ReadOptions const& options) { return Reader(path, options).read(); }
 
 }  // namespace talix

@@ -20,7 +20,7 @@ using Type = C3DParameter::Type;
 constexpr int64 kMostInWord = 65535;
 constexpr int64 kMostFrameNumber = 4294967295;
 
-std::string fullLabel(const std::string& subject, const std::string& label) {
+std::string fullLabel(std::string const& subject, std::string const& label) {
   return subject.empty() ? label : subject + ":" + label;
 }
 
@@ -28,7 +28,7 @@ double asReal(double value) { return static_cast<float>(value); }
 
 class Writer {
  public:
-  Writer(const Take& take, const std::string& path, std::vector<TakeNote>& notes)
+  Writer(Take const& take, std::string const& path, std::vector<TakeNote>& notes)
       : m_take(take), m_path(path), m_notes(notes) {}
 
   void write() {
@@ -42,7 +42,7 @@ class Writer {
     makeTrial();
     makeSubjects();
     addC3DEvents(m_take.events, m_parameters, m_notes);
-    const std::string head = headAndParameters();
+    std::string const head = headAndParameters();
     C3DDataLosses losses;
     writeFileAtomically(m_path, [&](std::ostream& out) {
       out << head;
@@ -52,8 +52,8 @@ class Writer {
   }
 
  private:
-  void note(TakeNote::Level level, const std::string& text) { m_notes.push_back({level, text}); }
-  void warn(const std::string& text) { note(TakeNote::Level::Warning, text); }
+  void note(TakeNote::Level level, std::string const& text) { m_notes.push_back({level, text}); }
+  void warn(std::string const& text) { note(TakeNote::Level::Warning, text); }
   size_t pointCount() const { return m_take.points.size() + m_take.outputs.size(); }
   size_t channelCount() const { return m_plan.withAnalog ? m_take.analog.size() : 0; }
 
@@ -72,7 +72,7 @@ class Writer {
   }
 
   void planFrames() {
-    const int64 period = ticksPerFrameAt(m_take.rate);
+    int64 const period = ticksPerFrameAt(m_take.rate);
     m_plan.frames = {m_take.firstFrame * period, period, m_take.frameCount};
     m_first = m_take.firstFrame;
     if (m_first >= 0) return;
@@ -83,8 +83,8 @@ class Writer {
 
   void planAnalog() {
     if (m_take.analog.empty()) return;
-    const double ratio = m_take.analogRate / m_take.rate;
-    const bool whole =
+    double const ratio = m_take.analogRate / m_take.rate;
+    bool const whole =
         ratio > 0.5 && ratio <= kMostInWord && std::abs(ratio - std::round(ratio)) < 1e-6 * ratio;
     if (!whole) {
       warn("C3D cannot hold an analog rate that is no multiple of the frame rate: " +
@@ -98,7 +98,7 @@ class Writer {
   }
 
   void planScale() {
-    const double unit = millimetresPerUnit(m_take.fileUnit);
+    double const unit = millimetresPerUnit(m_take.fileUnit);
     m_unitName = unit > 0 ? m_take.fileUnit : "mm";
     m_plan.unit = unit > 0 ? unit : 1;
     bool exact = true;
@@ -112,23 +112,23 @@ class Writer {
     if (!m_take.joints.empty())
       warn("C3D cannot hold skeletons: " + std::to_string(m_take.joints.size()) + " joints are not written");
     for (size_t i = 0; i < m_take.points.size(); ++i) {
-      const TakePoint& point = m_take.points[i];
+      TakePoint const& point = m_take.points[i];
       tellLeftOver(point.positions, m_plan.frames, "keys of " + labelOf(i));
       tellLeftOver(point.residuals, m_plan.frames, "residuals of " + labelOf(i));
       if (std::any_of(point.cameras.begin(), point.cameras.end(),
                       [](unsigned char mask) { return mask > 0x7f; }))
         warn("C3D holds seven cameras: the eighth of " + labelOf(i) + " is not written");
     }
-    for (const ModelOutput& output : m_take.outputs)
+    for (ModelOutput const& output : m_take.outputs)
       tellLeftOver(output.values, m_plan.frames, "keys of " + output.name);
     if (!m_plan.withAnalog) return;
-    for (const TakeAnalogChannel& channel : m_take.analog)
+    for (TakeAnalogChannel const& channel : m_take.analog)
       tellLeftOver(channel.samples, m_plan.samples, "samples of " + channel.name);
   }
 
-  void tellLeftOver(const KeyTrack& track, const C3DGrid& grid, const std::string& what) {
-    const C3DLeftOver left = c3dLeftOver(track, grid);
-    const auto tell = [&](int64 count, const char* why) {
+  void tellLeftOver(KeyTrack const& track, C3DGrid const& grid, std::string const& what) {
+    C3DLeftOver const left = c3dLeftOver(track, grid);
+    auto const tell = [&](int64 count, char const* why) {
       if (count) warn(std::to_string(count) + " " + what + " " + why + " and are not written");
     };
     tell(left.between, "lie between frames");
@@ -136,7 +136,7 @@ class Writer {
     tell(left.partial, "have no value on some axes");
   }
 
-  void tellLosses(const C3DDataLosses& losses) {
+  void tellLosses(C3DDataLosses const& losses) {
     if (losses.positions)
       warn(std::to_string(losses.positions) +
            " positions are no numbers that C3D can hold; written as not seen");
@@ -145,7 +145,7 @@ class Writer {
 
   // An unlabelled point gets a label that is read back as none.
   std::string labelOf(size_t point) const {
-    const TakePoint& p = m_take.points[point];
+    TakePoint const& p = m_take.points[point];
     return p.label.empty() ? "*" + std::to_string(point + 1) : fullLabel(p.subject, p.label);
   }
 
@@ -155,7 +155,7 @@ class Writer {
       labels.push_back(labelOf(i));
       descriptions.push_back(m_take.points[i].description);
     }
-    for (const ModelOutput& output : m_take.outputs) {
+    for (ModelOutput const& output : m_take.outputs) {
       labels.push_back(output.name);
       descriptions.emplace_back();
     }
@@ -169,7 +169,7 @@ class Writer {
     group.number("FRAMES", m_take.frameCount <= kMostInWord ? Type::Integer : Type::Real,
                  static_cast<double>(m_take.frameCount));
     group.text("UNITS", m_unitName);
-    static const std::map<Axis, std::pair<const char*, const char*>> kScreens = {
+    static std::map<Axis, std::pair<char const*, char const*>> const kScreens = {
         {Axis::X, {"+Y", "+X"}}, {Axis::Y, {"+X", "+Y"}}, {Axis::Z, {"+X", "+Z"}}};
     group.text("X_SCREEN", kScreens.at(m_take.up).first);
     group.text("Y_SCREEN", kScreens.at(m_take.up).second);
@@ -181,17 +181,17 @@ class Writer {
   void addOutputs(C3DGroupWriter& group) {
     std::map<std::string, std::vector<std::string>> labels;
     std::map<std::string, std::string> units;
-    for (const ModelOutput& output : m_take.outputs) {
-      const std::string kind = output.kind.empty() ? "SCALARS" : output.kind;
+    for (ModelOutput const& output : m_take.outputs) {
+      std::string const kind = output.kind.empty() ? "SCALARS" : output.kind;
       labels[kind].push_back(output.name);
-      const auto [unit, first] = units.emplace(kind, output.unit);
+      auto const [unit, first] = units.emplace(kind, output.unit);
       if (!first && unit->second != output.unit)
         warn("C3D holds one unit for all " + kind + ": that of " + output.name + ", " + output.unit +
              ", is not written");
     }
     std::vector<std::string> pairs;
-    for (const auto& [kind, names] : labels) {
-      const std::string singular = kind.ends_with('S') ? kind.substr(0, kind.size() - 1) : kind;
+    for (auto const& [kind, names] : labels) {
+      std::string const singular = kind.ends_with('S') ? kind.substr(0, kind.size() - 1) : kind;
       group.texts(kind, names);
       group.text(singular + "_UNITS", units[kind]);
       pairs.insert(pairs.end(), {kind, singular});
@@ -206,7 +206,7 @@ class Writer {
     group.number("RATE", Type::Real, m_take.rate * static_cast<double>(m_samplesPerFrame));
     if (channelCount() == 0) return;
     std::vector<std::string> names, units, descriptions;
-    for (const TakeAnalogChannel& channel : m_take.analog) {
+    for (TakeAnalogChannel const& channel : m_take.analog) {
       names.push_back(channel.name);
       units.push_back(channel.unit);
       descriptions.push_back(channel.description);
@@ -222,7 +222,7 @@ class Writer {
   void makeTrial() {
     if (m_take.frameCount == 0) return;
     C3DGroupWriter group(m_parameters, "TRIAL", "First and last frame", m_notes);
-    const auto words = [](int64 frame) {
+    auto const words = [](int64 frame) {
       return std::vector<double>{static_cast<double>(frame & kMostInWord), static_cast<double>(frame >> 16)};
     };
     group.numbers("ACTUAL_START_FIELD", Type::Integer, words(m_first));
@@ -231,7 +231,7 @@ class Writer {
 
   void makeSubjects() {
     std::vector<std::string> names, prefixes;
-    for (const TakePoint& point : m_take.points)
+    for (TakePoint const& point : m_take.points)
       if (!point.subject.empty() && std::find(names.begin(), names.end(), point.subject) == names.end()) {
         names.push_back(point.subject);
         prefixes.push_back(point.subject + ":");
@@ -245,7 +245,7 @@ class Writer {
   }
 
   std::string headAndParameters() {
-    const size_t dataBlock = 2 + c3dParameterSection(m_parameters).size() / kC3DBlock;
+    size_t const dataBlock = 2 + c3dParameterSection(m_parameters).size() / kC3DBlock;
     if (dataBlock > kMostInWord)
       throw FileError(m_path, "the labels and descriptions take more room than a C3D file has for them");
     if (dataBlock > 255 + 2)
@@ -259,7 +259,7 @@ class Writer {
   static unsigned word(int64 value) { return static_cast<unsigned>(std::min(value, kMostInWord)); }
 
   std::string header(size_t dataBlock) const {
-    const int64 first = m_take.frameCount ? m_first : 1;
+    int64 const first = m_take.frameCount ? m_first : 1;
     std::string bytes = "\x02\x50";
     appendC3DWord(bytes, word(static_cast<int64>(pointCount())));
     appendC3DWord(bytes, word(static_cast<int64>(channelCount()) * m_samplesPerFrame));
@@ -274,8 +274,8 @@ class Writer {
     return bytes;
   }
 
-  const Take& m_take;
-  const std::string& m_path;
+  Take const& m_take;
+  std::string const& m_path;
   std::vector<TakeNote>& m_notes;
   C3DDataPlan m_plan;
   int64 m_first = 1;            // frame number in the file
@@ -286,7 +286,7 @@ class Writer {
 
 }  // namespace
 
-void writeC3D(const Take& take, const std::string& path, std::vector<TakeNote>& notes) {
+void writeC3D(Take const& take, std::string const& path, std::vector<TakeNote>& notes) {
   Writer(take, path, notes).write();
 }
 

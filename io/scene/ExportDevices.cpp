@@ -12,7 +12,7 @@ namespace {
 // What the clip remembers of its channels, by their name in the scene.
 using MetadataByChannel = std::unordered_map<std::string, fileMetadata::Record>;
 
-MetadataByChannel metadataOf(const NLEClip* clip, const char* attribute, size_t fields) {
+MetadataByChannel metadataOf(NLEClip const* clip, char const* attribute, size_t fields) {
   MetadataByChannel byChannel;
   if (!clip) return byChannel;
   for (fileMetadata::Record& record : fileMetadata::records(*clip, attribute, fields)) {
@@ -30,9 +30,9 @@ class DeviceExport {
         m_analog(metadataOf(m_sampler.clip(), fileMetadata::kAnalogChannels, 6)),
         m_outputs(metadataOf(m_sampler.clip(), fileMetadata::kOutputs, 4)) {}
 
-  void add(const AnalogDevice& device) {
+  void add(AnalogDevice const& device) {
     for (int i = 0; i < device.getNumChannels(); ++i) {
-      const Controller& channel = *device.getChannel(i);
+      Controller const& channel = *device.getChannel(i);
       if (!m_sampler.belongsToClip(channel)) continue;
       if (channel.getPropertyType() == DataSource::Vec3Property)
         addOutput(channel);
@@ -50,26 +50,26 @@ class DeviceExport {
   }
 
  private:
-  void addOutput(const Controller& channel) {
+  void addOutput(Controller const& channel) {
     ModelOutput output;
     output.name = channel.getName().GetString();
     output.kind = "SCALARS";
-    if (const auto known = m_outputs.find(output.name); known != m_outputs.end()) {
+    if (auto const known = m_outputs.find(output.name); known != m_outputs.end()) {
       output.unit = known->second[2];
       output.kind = known->second[3];
       output.name = known->second[1];
     }
     m_out.keysLeftOut += m_sampler.keysOffGrid(channel);
-    const KeyTrack* track = m_sampler.asItIs(channel);
+    KeyTrack const* track = m_sampler.asItIs(channel);
     output.values = track ? *track : m_sampler.sampleWhere(m_sampler.framesWithData(channel), channel);
     m_out.take.outputs.push_back(std::move(output));
   }
 
-  void addAnalog(const Controller& channel) {
+  void addAnalog(Controller const& channel) {
     TakeAnalogChannel analog;
     analog.name = channel.getName().GetString();
-    if (const auto known = m_analog.find(analog.name); known != m_analog.end()) {
-      const fileMetadata::Record& record = known->second;
+    if (auto const known = m_analog.find(analog.name); known != m_analog.end()) {
+      fileMetadata::Record const& record = known->second;
       analog.unit = record[2];
       analog.description = record[3];
       analog.scale = fileMetadata::textNumber(record[4]);
@@ -82,12 +82,12 @@ class DeviceExport {
 
   // The keys inside the range, wherever they lie: devices sample faster than cameras. Where keys were taken
   // out of a track that bridges over them, its samples.
-  KeyTrack samples(const Controller& channel) {
-    const KeyTrack* lowest = m_sampler.dataTrack(channel);
+  KeyTrack samples(Controller const& channel) {
+    KeyTrack const* lowest = m_sampler.dataTrack(channel);
     if (lowest && lowest->bridgesAny()) return samplesOfBridged(channel);
     if (!lowest) return m_sampler.clip() ? KeyTrack(KeyTrack::Shape::Scalar) : m_sampler.everyFrame(channel);
     KeyTrack track = *lowest;
-    const FrameGrid& grid = m_sampler.grid();
+    FrameGrid const& grid = m_sampler.grid();
     m_out.keysLeftOut += track.eraseRange(-kForever, grid.start() - 1);
     m_out.keysLeftOut += track.eraseRange(grid.end() + grid.period, kForever);
     if (isLayered(channel)) addLayers(track, channel);
@@ -95,44 +95,44 @@ class DeviceExport {
     return track;
   }
 
-  KeyTrack samplesOfBridged(const Controller& channel) {
-    const FrameGrid& frames = m_sampler.grid();
+  KeyTrack samplesOfBridged(Controller const& channel) {
+    FrameGrid const& frames = m_sampler.grid();
     FrameGrid grid;
     grid.period = channel.getDataPeriod(*m_sampler.clip());
     grid.firstFrame = frames.start() / grid.period;
     grid.count = frames.count * (frames.period / grid.period);
-    const FrameSampler sampler(m_out.scene, grid);
+    FrameSampler const sampler(m_out.scene, grid);
     m_out.keysLeftOut += sampler.keysOffGrid(channel);
     return sampler.sampleWhere(sampler.framesWithData(channel), channel);
   }
 
   double analogRate() const {
-    const auto* clip = objectAs<Clip>(m_sampler.clip());
-    const double rate = clip ? clip->getFileTime().sampleRate : 0;
+    auto const* clip = objectAs<Clip>(m_sampler.clip());
+    double const rate = clip ? clip->getFileTime().sampleRate : 0;
     return rate > 0 ? rate : m_out.take.rate;
   }
 
-  bool isLayered(const Controller& channel) const {
-    const NLEClip* clip = m_sampler.clip();
+  bool isLayered(Controller const& channel) const {
+    NLEClip const* clip = m_sampler.clip();
     int layers = 0;
     for (int layer = 0; layer < clip->getNumLayers(); ++layer) {
-      const KeyTrack* track = channel.findTrack(clip, layer);
+      KeyTrack const* track = channel.findTrack(clip, layer);
       layers += track && !track->empty() ? 1 : 0;
     }
     return layers > 1 || !channel.findTrack(clip, 0) || channel.findTrack(clip, 0)->empty();
   }
 
-  void addLayers(KeyTrack& track, const Controller& channel) const {
+  void addLayers(KeyTrack& track, Controller const& channel) const {
     Controller::Values values{};
     for (int64 i = 0; i < track.count(); ++i) {
-      const int64 time = track.timeAt(i);
+      int64 const time = track.timeAt(i);
       channel.evaluate(time, values);
       track.set(time, values);
     }
   }
 
   TakeExport& m_out;
-  const FrameSampler& m_sampler;
+  FrameSampler const& m_sampler;
   MetadataByChannel m_analog, m_outputs;
 };
 
@@ -141,7 +141,7 @@ class DeviceExport {
 void exportDevices(TakeExport& out) {
   DeviceExport devices(out);
   for (int i = 0; i < out.scene.getNumModules(); ++i)
-    if (const auto* device = objectAs<AnalogDevice>(out.scene.getModule(i))) devices.add(*device);
+    if (auto const* device = objectAs<AnalogDevice>(out.scene.getModule(i))) devices.add(*device);
   devices.finish();
 }
 

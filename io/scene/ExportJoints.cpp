@@ -11,19 +11,19 @@ namespace talix {
 
 namespace {
 
-bool isBone(const Module* module) { return module->isKindOf(&BaseBone::staticClass()); }
-bool isPlainNode(const Module* module) { return module->getRuntimeClass() == &Node::staticClass(); }
+bool isBone(Module const* module) { return module->isKindOf(&BaseBone::staticClass()); }
+bool isPlainNode(Module const* module) { return module->getRuntimeClass() == &Node::staticClass(); }
 
-bool hasBoneBelow(const Module* module) {
+bool hasBoneBelow(Module const* module) {
   for (int i = 0; i < module->getNumChildren(); ++i) {
-    const Module* child = module->getChild(i);
+    Module const* child = module->getChild(i);
     if (isBone(child) || (isPlainNode(child) && hasBoneBelow(child))) return true;
   }
   return false;
 }
 
 // Bones, and plain nodes that tie bones together or end a chain of them.
-bool isJointBelow(const Module* module, bool parentIsJoint) {
+bool isJointBelow(Module const* module, bool parentIsJoint) {
   return isBone(module) || (isPlainNode(module) && (parentIsJoint || hasBoneBelow(module)));
 }
 
@@ -31,12 +31,12 @@ class JointExport {
  public:
   explicit JointExport(TakeExport& out) : m_out(out), m_sampler(out.sampler) {}
 
-  void addSkeleton(const Node& root) {
-    std::vector<const Node*> nodes;
+  void addSkeleton(Node const& root) {
+    std::vector<Node const*> nodes;
     std::vector<int> parents;
     collect(root, -1, nodes, parents);
-    if (std::none_of(nodes.begin(), nodes.end(), [&](const Node* node) { return isInTake(*node); })) return;
-    const int first = static_cast<int>(m_out.take.joints.size());
+    if (std::none_of(nodes.begin(), nodes.end(), [&](Node const* node) { return isInTake(*node); })) return;
+    int const first = static_cast<int>(m_out.take.joints.size());
     for (size_t i = 0; i < nodes.size(); ++i)
       m_out.take.joints.push_back(
           joint(*nodes[i], parents[i] < 0 ? -1 : first + parents[i],
@@ -51,23 +51,23 @@ class JointExport {
 
  private:
   // Depth first, siblings in order, parents by index into `nodes`.
-  static void collect(const Node& node, int parent, std::vector<const Node*>& nodes,
+  static void collect(Node const& node, int parent, std::vector<Node const*>& nodes,
                       std::vector<int>& parents) {
-    const int index = static_cast<int>(nodes.size());
+    int const index = static_cast<int>(nodes.size());
     nodes.push_back(&node);
     parents.push_back(parent);
     for (int i = 0; i < node.getNumNodeChildren(); ++i) {
-      const Node* child = node.getNodeChild(i);
+      Node const* child = node.getNodeChild(i);
       if (isJointBelow(child, true)) collect(*child, index, nodes, parents);
     }
   }
 
-  bool isInTake(const Node& node) const {
+  bool isInTake(Node const& node) const {
     return isBone(&node) && m_sampler.belongsToClip(*node.getTranslationChannel()) &&
            m_sampler.belongsToClip(*node.getRotationChannel());
   }
 
-  TakeJoint joint(const Node& node, int parent, bool isLast) {
+  TakeJoint joint(Node const& node, int parent, bool isLast) {
     TakeJoint result;
     result.name = node.getName().GetString();
     result.parent = parent;
@@ -86,12 +86,12 @@ class JointExport {
     return result;
   }
 
-  void setBelowParent(TakeJoint& result, const Node& node) const {
-    const Vec3 offset = node.getPreTranslation();
-    const TalixRotation before = node.getPreRotation();
-    const bool turns = !isNoRotation(before);
+  void setBelowParent(TakeJoint& result, Node const& node) const {
+    Vec3 const offset = node.getPreTranslation();
+    TalixRotation const before = node.getPreRotation();
+    bool const turns = !isNoRotation(before);
     result.offset = offset;
-    const Controller& translation = *node.getTranslationChannel();
+    Controller const& translation = *node.getTranslationChannel();
     if (m_sampler.mayChange(translation) || !(node.getConstLocalPos() == Vec3())) {
       if (result.endSite) {
         result.offset = offset + before.rotate(node.getConstLocalPos());
@@ -100,11 +100,11 @@ class JointExport {
       result.translations = m_sampler.everyFrame(translation);
       if (turns || !(offset == Vec3()))
         result.translations.transform([&](double* values) {
-          const Vec3 moved(values);
+          Vec3 const moved(values);
           (offset + (turns ? before.rotate(moved) : moved)).getValue(values);
         });
     }
-    const Controller& rotation = *node.getRotationChannel();
+    Controller const& rotation = *node.getRotationChannel();
     if (result.endSite ||
         (!m_sampler.mayChange(rotation) && !turns && isNoRotation(node.getConstLocalRot(true))))
       return;
@@ -118,12 +118,12 @@ class JointExport {
   }
 
   // A root joint below something that is not simply the world: where it is in the world, frame by frame.
-  void setInWorld(TakeJoint& result, const Node& node) const {
-    const FrameGrid& grid = m_sampler.grid();
+  void setInWorld(TakeJoint& result, Node const& node) const {
+    FrameGrid const& grid = m_sampler.grid();
     FrameRun positions(KeyTrack::Shape::Vector, grid), rotations(KeyTrack::Shape::Rotation, grid);
     for (int64 i = 0; i < grid.count; ++i) {
-      const int64 time = grid.start() + i * grid.period;
-      const Transform world = node.getWorldTransform(time);
+      int64 const time = grid.start() + i * grid.period;
+      Transform const world = node.getWorldTransform(time);
       double quaternion[4];
       world.rotation.getQuaternion(quaternion);
       positions.add(i, &world.position.x);
@@ -135,24 +135,24 @@ class JointExport {
   }
 
   // The file's channels, as long as they are what the joint needs.
-  std::vector<std::string> channels(const TakeJoint& result, const Node& node) const {
+  std::vector<std::string> channels(TakeJoint const& result, Node const& node) const {
     std::istringstream words(fileMetadata::text(node, fileMetadata::kFileChannels));
     std::vector<std::string> names;
     std::vector<BvhChannel> known;
     for (std::string word; words >> word; names.push_back(word)) {
-      const auto channel = bvhChannel(word);
+      auto const channel = bvhChannel(word);
       if (!channel) return {};
       known.push_back(*channel);
     }
-    const std::vector<int> axes = rotationAxes(known);
-    const bool moves = axes.size() < known.size();
+    std::vector<int> const axes = rotationAxes(known);
+    bool const moves = axes.size() < known.size();
     if (!moves && !result.translations.empty()) return {};
     if (axes.empty() ? !result.rotations.empty() : rotationOrderOf(axes) != result.rotationOrder) return {};
     return names;
   }
 
   TakeExport& m_out;
-  const FrameSampler& m_sampler;
+  FrameSampler const& m_sampler;
   int64 m_scaled = 0;
 };
 
@@ -161,8 +161,8 @@ class JointExport {
 void exportJoints(TakeExport& out) {
   JointExport joints(out);
   for (int i = 0; i < out.scene.getNumNodes(); ++i) {
-    const Node* node = out.scene.getNode(i);
-    const Node* parent = node->getNodeParent();
+    Node const* node = out.scene.getNode(i);
+    Node const* parent = node->getNodeParent();
     if (!isJointBelow(node, false)) continue;
     if (!parent || !isJointBelow(parent, false)) joints.addSkeleton(*node);
   }

@@ -12,12 +12,12 @@ namespace talix {
 
 namespace {
 
-bool isStill(const FrameSampler& sampler, const Node& node) {
+bool isStill(FrameSampler const& sampler, Node const& node) {
   return !sampler.mayChange(*node.getTranslationChannel()) &&
          !sampler.mayChange(*node.getRotationChannel()) && !sampler.mayChange(*node.getScaleChannel());
 }
 
-bool hasPreTransform(const Node& node) {
+bool hasPreTransform(Node const& node) {
   return !(node.getPreTranslation() == Vec3()) || !isNoRotation(node.getPreRotation());
 }
 
@@ -28,15 +28,15 @@ bool standsForNoName(std::string_view name) {
   name.remove_prefix(kUnlabeled.size());
   if (name.empty()) return true;
   if (name.size() < 2 || name[0] != '_') return false;
-  for (const char c : name.substr(1))
+  for (char const c : name.substr(1))
     if (!std::isdigit(static_cast<unsigned char>(c))) return false;
   return true;
 }
 
-std::string subjectOf(const Marker& marker) {
-  const Character* character = marker.getCharacterParent();
+std::string subjectOf(Marker const& marker) {
+  Character const* character = marker.getCharacterParent();
   if (!character) return {};
-  const std::string name = character->getName().GetString();
+  std::string const name = character->getName().GetString();
   return fileMetadata::text(*character, fileMetadata::kFileName) == name ? std::string() : name;
 }
 
@@ -44,8 +44,8 @@ class PointExport {
  public:
   explicit PointExport(TakeExport& out) : m_out(out), m_sampler(out.sampler) {}
 
-  void add(const Marker& marker) {
-    const Controller& translation = *marker.getTranslationChannel();
+  void add(Marker const& marker) {
+    Controller const& translation = *marker.getTranslationChannel();
     if (!m_sampler.belongsToClip(translation)) return;
     TakePoint point;
     point.label = marker.getName().GetString();
@@ -54,7 +54,7 @@ class PointExport {
     point.description = fileMetadata::text(marker, fileMetadata::kDescription);
     m_out.keysLeftOut += m_sampler.keysOffGrid(translation);
 
-    const std::vector<bool> frames = m_sampler.framesWithData(translation);
+    std::vector<bool> const frames = m_sampler.framesWithData(translation);
     point.positions = positions(marker, frames);
     if (m_sampler.hasKeys(*marker.getResidualChannel())) point.residuals = residuals(marker, frames);
     point.cameras = cameras(marker);
@@ -62,44 +62,44 @@ class PointExport {
   }
 
  private:
-  KeyTrack positions(const Marker& marker, const std::vector<bool>& frames) const {
-    const Controller& translation = *marker.getTranslationChannel();
+  KeyTrack positions(Marker const& marker, std::vector<bool> const& frames) const {
+    Controller const& translation = *marker.getTranslationChannel();
     if (!hasPreTransform(marker) && isWorldSpace(m_sampler, marker.getNodeParent())) {
-      const KeyTrack* track = m_sampler.asItIs(translation);
-      const auto seen = std::count(frames.begin(), frames.end(), true);
+      KeyTrack const* track = m_sampler.asItIs(translation);
+      auto const seen = std::count(frames.begin(), frames.end(), true);
       return track && track->count() == seen ? *track : m_sampler.sampleWhere(frames, translation);
     }
-    const FrameGrid& grid = m_sampler.grid();
+    FrameGrid const& grid = m_sampler.grid();
     FrameRun run(KeyTrack::Shape::Vector, grid);
     for (int64 i = 0; i < grid.count; ++i) {
       if (!frames[static_cast<size_t>(i)]) continue;
-      const Vec3 position = marker.getWSPos(grid.start() + i * grid.period);
+      Vec3 const position = marker.getWSPos(grid.start() + i * grid.period);
       run.add(i, &position.x);
     }
     return run.take();
   }
 
   // Where there is a position, and a residual was recorded.
-  KeyTrack residuals(const Marker& marker, const std::vector<bool>& positioned) const {
-    const Controller& residual = *marker.getResidualChannel();
+  KeyTrack residuals(Marker const& marker, std::vector<bool> const& positioned) const {
+    Controller const& residual = *marker.getResidualChannel();
     std::vector<bool> frames = m_sampler.framesWithData(residual);
     bool allPositioned = true;
     for (size_t i = 0; i < frames.size(); ++i) {
       allPositioned = allPositioned && (positioned[i] || !frames[i]);
       frames[i] = frames[i] && positioned[i];
     }
-    const KeyTrack* track = allPositioned ? m_sampler.asItIs(residual) : nullptr;
+    KeyTrack const* track = allPositioned ? m_sampler.asItIs(residual) : nullptr;
     return track ? *track : m_sampler.sampleWhere(frames, residual);
   }
 
-  std::vector<unsigned char> cameras(const Marker& marker) const {
-    const Controller* channel = marker.getChannel("Cameras");
-    const KeyTrack* track = channel ? m_sampler.dataTrack(*channel) : nullptr;
+  std::vector<unsigned char> cameras(Marker const& marker) const {
+    Controller const* channel = marker.getChannel("Cameras");
+    KeyTrack const* track = channel ? m_sampler.dataTrack(*channel) : nullptr;
     if (!track || channel->getPropertyType() != DataSource::IntProperty) return {};
-    const FrameGrid& grid = m_sampler.grid();
-    const KeyTrack known = m_sampler.sampleWhere(m_sampler.framesWithData(*channel), *channel);
+    FrameGrid const& grid = m_sampler.grid();
+    KeyTrack const known = m_sampler.sampleWhere(m_sampler.framesWithData(*channel), *channel);
     std::vector<unsigned char> masks(static_cast<size_t>(grid.count));
-    known.forEach(0, known.count(), [&](const KeyTrack::Key& key) {
+    known.forEach(0, known.count(), [&](KeyTrack::Key const& key) {
       masks[static_cast<size_t>((key.time - grid.start()) / grid.period)] =
           static_cast<unsigned char>(std::lround(key.values[0]));
     });
@@ -107,14 +107,14 @@ class PointExport {
   }
 
   TakeExport& m_out;
-  const FrameSampler& m_sampler;
+  FrameSampler const& m_sampler;
 };
 
 }  // namespace
 
-bool isWorldSpace(const FrameSampler& sampler, const Node* node) {
+bool isWorldSpace(FrameSampler const& sampler, Node const* node) {
   for (; node; node = node->getNodeParent()) {
-    const bool still = isStill(sampler, *node) && !hasPreTransform(*node) &&
+    bool const still = isStill(sampler, *node) && !hasPreTransform(*node) &&
                        node->getConstLocalPos() == Vec3() && isNoRotation(node->getConstLocalRot(true)) &&
                        node->getConstLocalScale() == Vec3(1, 1, 1);
     if (!still) return false;
@@ -125,7 +125,7 @@ bool isWorldSpace(const FrameSampler& sampler, const Node* node) {
 void exportPoints(TakeExport& out) {
   PointExport points(out);
   for (int i = 0; i < out.scene.getNumNodes(); ++i)
-    if (const auto* marker = objectAs<Marker>(out.scene.getNode(i))) points.add(*marker);
+    if (auto const* marker = objectAs<Marker>(out.scene.getNode(i))) points.add(*marker);
 }
 
 }  // namespace talix

@@ -8,19 +8,19 @@ namespace {
 
 // The module's attribute of a kind; null when it has one of another kind under that name.
 template <class T>
-T* attributeOf(Module& module, const char* name, Attribute::Type type) {
+T* attributeOf(Module& module, char const* name, Attribute::Type type) {
   Attribute* attribute = module.getAttribute(name);
   if (!attribute) attribute = module.addCustomAttribute(Attribute::create(type, name));
   return objectAs<T>(attribute);
 }
 
 template <class T>
-const T* findAttribute(const Module& module, const char* name) {
-  return objectAs<const T>(const_cast<const Attribute*>(module.getAttribute(name)));
+T const* findAttribute(Module const& module, char const* name) {
+  return objectAs<T const>(const_cast<Attribute const*>(module.getAttribute(name)));
 }
 
-void appendField(std::string& line, const std::string& field) {
-  for (const char c : field) {
+void appendField(std::string& line, std::string const& field) {
+  for (char const c : field) {
     if (c == '\\')
       line += "\\\\";
     else if (c == '\t')
@@ -38,7 +38,7 @@ Record splitLine(std::string_view line) {
     if (line[i] == '\t') {
       record.emplace_back();
     } else if (line[i] == '\\' && i + 1 < line.size()) {
-      const char c = line[++i];
+      char const c = line[++i];
       record.back() += c == 't' ? '\t' : c == 'n' ? '\n' : c;
     } else {
       record.back() += line[i];
@@ -50,24 +50,24 @@ Record splitLine(std::string_view line) {
 }  // namespace
 
 void reserveNames(PropertyTable& table) {
-  for (const char* name : {kFileName, kFileFormat, kFileUnit, kFileUnitInMillimetres, kEvents,
+  for (char const* name : {kFileName, kFileFormat, kFileUnit, kFileUnitInMillimetres, kEvents,
                            kAnalogChannels, kOutputs, kDescription, kFileChannels})
     table.addAttribute(name);
 }
 
-void setText(Module& module, const char* name, const std::string& text) {
+void setText(Module& module, char const* name, std::string const& text) {
   if (auto* attribute = attributeOf<StringAttribute>(module, name, Attribute::String))
     attribute->setValue(text, true, true, 0, true, true);
 }
 
-void setNumber(Module& module, const char* name, double number) {
+void setNumber(Module& module, char const* name, double number) {
   if (auto* attribute = attributeOf<FloatAttribute>(module, name, Attribute::Float))
     attribute->setValue(number, true, true, true, true);
 }
 
-void setRecords(Module& module, const char* name, const std::vector<Record>& records) {
+void setRecords(Module& module, char const* name, std::vector<Record> const& records) {
   std::string lines;
-  for (const Record& record : records) {
+  for (Record const& record : records) {
     if (!lines.empty()) lines += '\n';
     for (size_t i = 0; i < record.size(); ++i) {
       if (i > 0) lines += '\t';
@@ -78,24 +78,24 @@ void setRecords(Module& module, const char* name, const std::vector<Record>& rec
     attribute->setValue(lines, true, true, true, true);
 }
 
-std::string text(const Module& module, const char* name) {
-  const auto* attribute = findAttribute<StringAttribute>(module, name);
+std::string text(Module const& module, char const* name) {
+  auto const* attribute = findAttribute<StringAttribute>(module, name);
   return attribute ? attribute->getValue().GetString() : std::string();
 }
 
-double number(const Module& module, const char* name, double byDefault) {
-  const auto* attribute = findAttribute<FloatAttribute>(module, name);
+double number(Module const& module, char const* name, double byDefault) {
+  auto const* attribute = findAttribute<FloatAttribute>(module, name);
   return attribute ? attribute->getValue() : byDefault;
 }
 
-std::vector<Record> records(const Module& module, const char* name, size_t fields) {
+std::vector<Record> records(Module const& module, char const* name, size_t fields) {
   std::vector<Record> all;
-  const auto* attribute = findAttribute<MultiStringAttribute>(module, name);
+  auto const* attribute = findAttribute<MultiStringAttribute>(module, name);
   if (!attribute) return all;
-  const HString value = attribute->getValue();
+  HString const value = attribute->getValue();
   std::string_view rest = value.GetString();
   while (!rest.empty()) {
-    const size_t end = std::min(rest.find('\n'), rest.size());
+    size_t const end = std::min(rest.find('\n'), rest.size());
     Record record = splitLine(rest.substr(0, end));
     if (record.size() < fields) record.resize(fields);
     all.push_back(std::move(record));
@@ -111,7 +111,7 @@ std::string numberText(double number) {
 
 double textNumber(std::string_view text) {
   double number = 0;
-  const auto read = std::from_chars(text.data(), text.data() + text.size(), number);
+  auto const read = std::from_chars(text.data(), text.data() + text.size(), number);
   return read.ec == std::errc() ? number : 0;
 }
 

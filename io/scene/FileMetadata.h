@@ -17,23 +17,23 @@ namespace talix::fileMetadata {
 // Of a clip: the file's name without folder and suffix, a string. Of a character that stands for a file's
 // points without a subject: the name that it got from it; its markers' labels carry no subject as long as it
 // has that name.
-inline constexpr const char* kFileName = "FileName";
+inline constexpr char const* kFileName = "FileName";
 
 // Of a clip.
-inline constexpr const char* kFileFormat = "FileFormat";                        // string: "C3D", "BVH", "TRC"
-inline constexpr const char* kFileUnit = "FileUnit";                            // string: the file's own word
-inline constexpr const char* kFileUnitInMillimetres = "FileUnitInMillimetres";  // float
+inline constexpr char const* kFileFormat = "FileFormat";                        // string: "C3D", "BVH", "TRC"
+inline constexpr char const* kFileUnit = "FileUnit";                            // string: the file's own word
+inline constexpr char const* kFileUnitInMillimetres = "FileUnitInMillimetres";  // float
 // Records: seconds, label, context, subject, description.
-inline constexpr const char* kEvents = "Events";
+inline constexpr char const* kEvents = "Events";
 // Records: channel in the scene, name in the file, unit, description, scale, offset.
-inline constexpr const char* kAnalogChannels = "AnalogChannels";
+inline constexpr char const* kAnalogChannels = "AnalogChannels";
 // Records: channel in the scene, name in the file, unit, kind.
-inline constexpr const char* kOutputs = "OutputChannels";
+inline constexpr char const* kOutputs = "OutputChannels";
 
 // Of a marker: string.
-inline constexpr const char* kDescription = "Description";
+inline constexpr char const* kDescription = "Description";
 // Of a bone: the file's channel names in their order, separated by blanks, a string.
-inline constexpr const char* kFileChannels = "FileChannels";
+inline constexpr char const* kFileChannels = "FileChannels";
 
 // Takes these names for attributes, so that no channel of a file gets one of them.
 void reserveNames(PropertyTable& table);
@@ -41,15 +41,15 @@ void reserveNames(PropertyTable& table);
 using Record = std::vector<std::string>;
 
 // These set the custom attribute, which is added when the module has none.
-void setText(Module&, const char* name, const std::string& text);
-void setNumber(Module&, const char* name, double number);
-void setRecords(Module&, const char* name, const std::vector<Record>&);
+void setText(Module&, char const* name, std::string const& text);
+void setNumber(Module&, char const* name, double number);
+void setRecords(Module&, char const* name, std::vector<Record> const&);
 
 // Empty, or `byDefault`, when there is no such attribute.
-std::string text(const Module&, const char* name);
-double number(const Module&, const char* name, double byDefault);
+std::string text(Module const&, char const* name);
+double number(Module const&, char const* name, double byDefault);
 // Each record is filled up with empty fields to `fields`.
-std::vector<Record> records(const Module&, const char* name, size_t fields);
+std::vector<Record> records(Module const&, char const* name, size_t fields);
 
 // The shortest text that reads back the same, and back; 0 for other texts.
 std::string numberText(double);

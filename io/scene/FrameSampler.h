@@ -23,16 +23,16 @@ struct FrameGrid {
 // Appends values frame by frame; runs go to the track whole.
 class FrameRun {
  public:
-  FrameRun(KeyTrack::Shape shape, const FrameGrid& grid) : m_track(shape), m_grid(grid) {}
+  FrameRun(KeyTrack::Shape shape, FrameGrid const& grid) : m_track(shape), m_grid(grid) {}
 
-  void add(int64 frame, const double* values);
+  void add(int64 frame, double const* values);
   KeyTrack take();
 
  private:
   void flush();
 
   KeyTrack m_track;
-  const FrameGrid& m_grid;
+  FrameGrid const& m_grid;
   int64 m_first = 0, m_count = 0;
   std::vector<double> m_values;
 };
@@ -40,39 +40,39 @@ class FrameRun {
 class FrameSampler {
  public:
   // The scene's active clip; without one (or with a blend, which holds no keys) every frame has a value.
-  FrameSampler(const Database& scene, const FrameGrid& grid);
+  FrameSampler(Database const& scene, FrameGrid const& grid);
 
-  const FrameGrid& grid() const { return m_grid; }
-  const NLEClip* clip() const { return m_clip; }
+  FrameGrid const& grid() const { return m_grid; }
+  NLEClip const* clip() const { return m_clip; }
 
   // Whether a channel has to do with the clip: it has a track there, or in no clip at all.
-  bool belongsToClip(const Controller&) const;
+  bool belongsToClip(Controller const&) const;
   // In any layer of the clip.
-  bool hasKeys(const Controller& channel) const { return m_clip ? channel.hasKeysInClip(m_clip) : false; }
+  bool hasKeys(Controller const& channel) const { return m_clip ? channel.hasKeysInClip(m_clip) : false; }
   // Whether the channel may change over time: keys in the clip, or an active blend.
-  bool mayChange(const Controller&) const;
+  bool mayChange(Controller const&) const;
 
   // The keys that tell where a channel has data in the clip; null: none.
-  const KeyTrack* dataTrack(const Controller& channel) const { return channel.findDataTrack(m_clip); }
+  KeyTrack const* dataTrack(Controller const& channel) const { return channel.findDataTrack(m_clip); }
   // That track, when it alone makes the channel's values and its keys, all whole and at frames, are all data;
   // else null.
-  const KeyTrack* asItIs(const Controller&) const;
+  KeyTrack const* asItIs(Controller const&) const;
 
   // A value at the frames that have data.
-  KeyTrack sampleWhere(const std::vector<bool>& frames, const Controller&) const;
+  KeyTrack sampleWhere(std::vector<bool> const& frames, Controller const&) const;
   // A value at every frame: the channel's own track where that is what it holds.
-  KeyTrack everyFrame(const Controller&) const;
+  KeyTrack everyFrame(Controller const&) const;
 
   // The frames at which any component of a channel has data.
-  std::vector<bool> framesWithData(const Controller&) const;
+  std::vector<bool> framesWithData(Controller const&) const;
 
   // How many keys lie at no frame of the grid; sampled channels lose them.
-  int64 keysOffGrid(const Controller&) const;
+  int64 keysOffGrid(Controller const&) const;
 
  private:
-  const Database& m_scene;
+  Database const& m_scene;
   FrameGrid m_grid;
-  const NLEClip* m_clip = nullptr;  // null: every frame counts
+  NLEClip const* m_clip = nullptr;  // null: every frame counts
   bool m_blends = false;
 };
 

@@ -12,9 +12,9 @@ namespace talix {
 
 namespace {
 
-bool isDevice(const Module& module) { return module.isKindOf(&AnalogDevice::staticClass()); }
+bool isDevice(Module const& module) { return module.isKindOf(&AnalogDevice::staticClass()); }
 
-std::string channelName(const std::string& name, const char* byDefault) {
+std::string channelName(std::string const& name, char const* byDefault) {
   std::string mended(withoutOuterBlanks(name));
   if (mended.empty()) mended = byDefault;
   for (char& c : mended)
@@ -27,12 +27,12 @@ std::string channelName(const std::string& name, const char* byDefault) {
 class DeviceImport {
  public:
   DeviceImport(TakeImport& import, AnalogDevice& device, DataSource::PropertyType type,
-               const std::string& path)
+               std::string const& path)
       : m_import(import), m_device(device), m_type(type), m_path(path) {}
 
   // Returns the channel's name.
-  std::string add(const std::string& name, const char* byDefault, KeyTrack track) {
-    const std::string mended = channelName(name, byDefault);
+  std::string add(std::string const& name, char const* byDefault, KeyTrack track) {
+    std::string const mended = channelName(name, byDefault);
     std::string free = mended;
     for (int& number = m_lastNumber[mended]; !isFree(free);) free = mended + "_" + std::to_string(++number);
     Controller* channel = m_device.addChannel(free, m_type);
@@ -46,7 +46,7 @@ class DeviceImport {
   }
 
  private:
-  bool isFree(const std::string& name) const {
+  bool isFree(std::string const& name) const {
     return !m_used.contains(name) &&
            m_device.getDatabase()->getPropertyTable().obstacleToChannel(HString(name), m_type).IsEmpty();
   }
@@ -54,12 +54,12 @@ class DeviceImport {
   TakeImport& m_import;
   AnalogDevice& m_device;
   DataSource::PropertyType m_type;
-  const std::string& m_path;
+  std::string const& m_path;
   std::unordered_set<std::string> m_used;
   std::unordered_map<std::string, int> m_lastNumber;  // that a name was given
 };
 
-void importOutputs(TakeImport& import, Take& take, const std::string& path) {
+void importOutputs(TakeImport& import, Take& take, std::string const& path) {
   auto* device = import.place<AnalogDevice>(isDevice, "Outputs", nullptr);
   DeviceImport channels(import, *device, DataSource::Vec3Property, path);
   std::vector<fileMetadata::Record> records;
@@ -69,7 +69,7 @@ void importOutputs(TakeImport& import, Take& take, const std::string& path) {
   fileMetadata::setRecords(import.clip(), fileMetadata::kOutputs, records);
 }
 
-void importAnalog(TakeImport& import, Take& take, const std::string& path) {
+void importAnalog(TakeImport& import, Take& take, std::string const& path) {
   auto* device = import.place<AnalogDevice>(isDevice, "Analog", nullptr);
   DeviceImport channels(import, *device, DataSource::FloatProperty, path);
   std::vector<fileMetadata::Record> records;
@@ -82,7 +82,7 @@ void importAnalog(TakeImport& import, Take& take, const std::string& path) {
 
 }  // namespace
 
-void importDevices(TakeImport& import, Take& take, const std::string& path) {
+void importDevices(TakeImport& import, Take& take, std::string const& path) {
   if (!take.outputs.empty()) importOutputs(import, take, path);
   if (!take.analog.empty()) importAnalog(import, take, path);
 }

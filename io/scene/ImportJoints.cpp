@@ -8,26 +8,26 @@ namespace {
 // Offsets that differ by less are the same, in mm.
 constexpr double kSameOffset = 1e-6;
 
-bool isBone(const Module& module) { return module.isKindOf(&BaseBone::staticClass()); }
-bool isPlainNode(const Module& module) { return module.getRuntimeClass() == &Node::staticClass(); }
+bool isBone(Module const& module) { return module.isKindOf(&BaseBone::staticClass()); }
+bool isPlainNode(Module const& module) { return module.getRuntimeClass() == &Node::staticClass(); }
 
 // "Xposition" is Tx, "Zrotation" Rz: the label of the degree of freedom that a channel moves.
-HString dofLabel(const std::string& channel) {
-  const char axis = channel.empty() ? ' ' : static_cast<char>(channel[0] | 0x20);
-  const bool isRotation = channel.size() > 1 && (channel[1] | 0x20) == 'r';
+HString dofLabel(std::string const& channel) {
+  char const axis = channel.empty() ? ' ' : static_cast<char>(channel[0] | 0x20);
+  bool const isRotation = channel.size() > 1 && (channel[1] | 0x20) == 'r';
   return std::string(1, isRotation ? 'R' : 'T') + axis;
 }
 
-void setDofs(BaseBone& bone, const std::vector<std::string>& channels) {
+void setDofs(BaseBone& bone, std::vector<std::string> const& channels) {
   BitFieldAttribute* dofs = bone.getDofs();
   for (int i = 0; i < dofs->getNumFields(); ++i)
     dofs->setValue(dofs->getLabel(i), false, true, true, true, true);
-  for (const std::string& channel : channels) dofs->setValue(dofLabel(channel), true, true, true, true, true);
+  for (std::string const& channel : channels) dofs->setValue(dofLabel(channel), true, true, true, true, true);
 }
 
-std::string joined(const std::vector<std::string>& words) {
+std::string joined(std::vector<std::string> const& words) {
   std::string text;
-  for (const std::string& word : words) text += (text.empty() ? "" : " ") + word;
+  for (std::string const& word : words) text += (text.empty() ? "" : " ") + word;
   return text;
 }
 
@@ -52,15 +52,15 @@ class JointImport {
 
  private:
   Node* add(TakeJoint& joint) {
-    const bool isRoot = joint.parent < 0;
+    bool const isRoot = joint.parent < 0;
     Node* parent = isRoot ? m_character : m_nodes[static_cast<size_t>(joint.parent)];
-    const std::string name = moduleName(joint.name);
+    std::string const name = moduleName(joint.name);
     m_mended += name != joint.name;
     bool isNew = false;
     Node* node = joint.endSite ? m_import.place<Node>(isPlainNode, name, parent, &isNew)
                                : m_import.place<SolvingBone>(isBone, name, parent, &isNew);
-    const bool turned = isRoot && !m_toCharacter.isIdentity();
-    const Vec3 offset = turned ? m_toCharacter.position(joint.offset) : joint.offset;
+    bool const turned = isRoot && !m_toCharacter.isIdentity();
+    Vec3 const offset = turned ? m_toCharacter.position(joint.offset) : joint.offset;
     if (isNew)
       setUp(*node, joint, offset, turned);
     else
@@ -69,7 +69,7 @@ class JointImport {
     return node;
   }
 
-  void setUp(Node& node, const TakeJoint& joint, const Vec3& offset, bool turned) {
+  void setUp(Node& node, TakeJoint const& joint, Vec3 const& offset, bool turned) {
     node.setPreTranslation(offset);
     if (turned) node.setPreRotation(m_toCharacter.rotation(), false);
     if (joint.endSite) return;
@@ -79,7 +79,7 @@ class JointImport {
       fileMetadata::setText(node, fileMetadata::kFileChannels, joined(joint.channels));
   }
 
-  void compareOffset(const Node& node, const Vec3& offset) {
+  void compareOffset(Node const& node, Vec3 const& offset) {
     if ((node.getPreTranslation() - offset).length() <= kSameOffset) return;
     if (m_otherOffsets++ == 0) m_firstOther = node.getName().GetString();
   }
@@ -87,8 +87,8 @@ class JointImport {
   // A joint's position and orientation below its parent are the file's; the keys hold what the scene's
   // pre-transform leaves of them.
   void addMotion(Node& node, TakeJoint& joint, bool turned) {
-    const TalixRotation unturn = node.getPreRotation().inverse();
-    const TalixRotation before = turned ? unturn * m_toCharacter.rotation() : unturn;
+    TalixRotation const unturn = node.getPreRotation().inverse();
+    TalixRotation const before = turned ? unturn * m_toCharacter.rotation() : unturn;
     takeOffOffset(node, joint, turned, unturn, isNoRotation(before));
     if (!isNoRotation(before))
       joint.rotations.transform([&](double* values) {
@@ -103,12 +103,12 @@ class JointImport {
     node.getRotationChannel()->setTrack(clip, 0, std::move(joint.rotations));
   }
 
-  void takeOffOffset(const Node& node, TakeJoint& joint, bool turned, const TalixRotation& unturn,
+  void takeOffOffset(Node const& node, TakeJoint& joint, bool turned, TalixRotation const& unturn,
                      bool sameTurn) {
-    const Vec3 offset = node.getPreTranslation();
+    Vec3 const offset = node.getPreTranslation();
     if (!turned && offset == Vec3() && isNoRotation(unturn)) return;
     // Where the pre-transform is the file's, turned, the file's own offset comes off without rounding.
-    const bool inFile = sameTurn && !m_toCharacter.isScaled() &&
+    bool const inFile = sameTurn && !m_toCharacter.isScaled() &&
                         offset == (turned ? m_toCharacter.position(joint.offset) : joint.offset);
     joint.translations.transform([&](double* values) {
       Vec3 place(values);

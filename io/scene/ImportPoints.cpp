@@ -7,10 +7,10 @@ namespace talix {
 
 namespace {
 
-bool isMarker(const Module& module) { return module.isKindOf(&Marker::staticClass()); }
+bool isMarker(Module const& module) { return module.isKindOf(&Marker::staticClass()); }
 
 // The masks that are not empty as keys; runs of equal ones take hardly any room.
-KeyTrack cameraTrack(const std::vector<unsigned char>& cameras, int64 start, int64 period) {
+KeyTrack cameraTrack(std::vector<unsigned char> const& cameras, int64 start, int64 period) {
   KeyTrack track(KeyTrack::Shape::Scalar);
   std::vector<double> run;
   for (size_t i = 0; i < cameras.size();) {
@@ -18,7 +18,7 @@ KeyTrack cameraTrack(const std::vector<unsigned char>& cameras, int64 start, int
       ++i;
       continue;
     }
-    const size_t first = i;
+    size_t const first = i;
     run.clear();
     while (i < cameras.size() && cameras[i] != 0) run.push_back(cameras[i++]);
     track.append(start + static_cast<int64>(first) * period, period, run.data(),
@@ -29,12 +29,12 @@ KeyTrack cameraTrack(const std::vector<unsigned char>& cameras, int64 start, int
 
 class PointImport {
  public:
-  PointImport(TakeImport& import, const Take& take)
+  PointImport(TakeImport& import, Take const& take)
       : m_import(import), m_take(take), m_period(ticksPerFrameAt(take.rate)) {}
 
   void add(TakePoint& point) {
     Marker* marker = markerFor(point);
-    const FileToParent& toParent = spaceBelow(marker->getNodeParent());
+    FileToParent const& toParent = spaceBelow(marker->getNodeParent());
     if (!toParent.isIdentity())
       point.positions.transform([&](double* values) { toParent.position(Vec3(values)).getValue(values); });
     NLEClip* clip = &m_import.clip();
@@ -57,7 +57,7 @@ class PointImport {
   }
 
  private:
-  Marker* markerFor(const TakePoint& point) {
+  Marker* markerFor(TakePoint const& point) {
     if (point.label.empty()) {
       ++m_unlabeled;
       return m_import.placeUnlabeled();
@@ -67,20 +67,20 @@ class PointImport {
     return m_import.place<Marker>(isMarker, mended(point.label), subject);
   }
 
-  std::string mended(const std::string& name) {
+  std::string mended(std::string const& name) {
     std::string result = moduleName(name);
     m_mended += result != name;
     return result;
   }
 
-  const FileToParent& spaceBelow(Node* parent) {
-    const auto found = m_spaces.find(parent);
+  FileToParent const& spaceBelow(Node* parent) {
+    auto const found = m_spaces.find(parent);
     return found != m_spaces.end()
                ? found->second
                : m_spaces.emplace(parent, FileToParent(m_import.turn(), parent)).first->second;
   }
 
-  void addCameras(Marker& marker, const TakePoint& point) {
+  void addCameras(Marker& marker, TakePoint const& point) {
     KeyTrack track = cameraTrack(point.cameras, m_take.firstFrame * m_period, m_period);
     if (track.empty()) return;
     if (Controller* channel = marker.addChannel("Cameras", DataSource::IntProperty))
@@ -90,7 +90,7 @@ class PointImport {
   }
 
   TakeImport& m_import;
-  const Take& m_take;
+  Take const& m_take;
   int64 m_period;
   std::unordered_map<Node*, FileToParent> m_spaces;
   int64 m_unlabeled = 0, m_mended = 0, m_noCameras = 0;

@@ -16,11 +16,11 @@ struct TakeExport {
   std::vector<TakeNote>& notes;
   int64 keysLeftOut = 0;  // between frames, or outside the range
 
-  void warn(const std::string& text) { notes.push_back({TakeNote::Level::Warning, text}); }
+  void warn(std::string const& text) { notes.push_back({TakeNote::Level::Warning, text}); }
 };
 
 // Whether positions below this node (null: the world) are world positions, at all times.
-bool isWorldSpace(const FrameSampler&, const Node*);
+bool isWorldSpace(FrameSampler const&, Node const*);
 
 void exportPoints(TakeExport&);
 void exportJoints(TakeExport&);

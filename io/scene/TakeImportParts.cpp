@@ -8,21 +8,21 @@ namespace talix {
 
 namespace {
 
-bool isCharacter(const Module& module) { return module.isKindOf(&Character::staticClass()); }
+bool isCharacter(Module const& module) { return module.isKindOf(&Character::staticClass()); }
 
 }  // namespace
 
-std::string moduleName(const std::string& name) {
+std::string moduleName(std::string const& name) {
   std::string mended = name;
   std::replace(mended.begin(), mended.end(), '\\', '_');
   return mended;
 }
 
-std::string counted(int64 count, const std::string& noun) {
+std::string counted(int64 count, std::string const& noun) {
   return std::to_string(count) + " " + noun + (count == 1 ? "" : "s");
 }
 
-TakeImport::TakeImport(Database& scene, Clip& clip, const UpAxisConversion& turn, std::string fileName,
+TakeImport::TakeImport(Database& scene, Clip& clip, UpAxisConversion const& turn, std::string fileName,
                        std::vector<TakeNote>& notes)
     : m_scene(scene), m_clip(clip), m_turn(turn), m_fileName(std::move(fileName)), m_notes(notes) {
   fileMetadata::reserveNames(m_scene.getPropertyTable());
@@ -30,7 +30,7 @@ TakeImport::TakeImport(Database& scene, Clip& clip, const UpAxisConversion& turn
 
 // What stands below a parent before the import puts anything there.
 TakeImport::Waiting& TakeImport::waitingBelow(Module* parent) {
-  const auto [entry, isFirst] = m_waiting.try_emplace(parent);
+  auto const [entry, isFirst] = m_waiting.try_emplace(parent);
   Waiting& waiting = entry->second;
   if (!isFirst) return waiting;
   if (parent) {
@@ -47,11 +47,11 @@ TakeImport::Waiting& TakeImport::waitingBelow(Module* parent) {
   return waiting;
 }
 
-Module* TakeImport::placeModule(HRuntimeClass* type, bool (*fits)(const Module&), const std::string& name,
+Module* TakeImport::placeModule(HRuntimeClass* type, bool (*fits)(Module const&), std::string const& name,
                                 Module* parent, bool* isNew) {
   if (isNew) *isNew = false;
   Waiting& waiting = waitingBelow(parent);
-  if (const auto found = waiting.find(name); found != waiting.end()) {
+  if (auto const found = waiting.find(name); found != waiting.end()) {
     for (Module*& module : found->second)
       if (module && fits(*module)) return std::exchange(module, nullptr);
   }
@@ -71,16 +71,16 @@ Marker* TakeImport::placeUnlabeled() {
   return static_cast<Marker*>(made);
 }
 
-Character* TakeImport::character(const std::string& name, bool* isNew) {
+Character* TakeImport::character(std::string const& name, bool* isNew) {
   if (isNew) *isNew = false;
   Character*& known = m_characters[name];
   if (!known) known = place<Character>(isCharacter, name, nullptr, isNew);
   return known;
 }
 
-Character* TakeImport::fileCharacter(const std::string& takeName) {
+Character* TakeImport::fileCharacter(std::string const& takeName) {
   bool isNew = false;
-  const std::string name = moduleName(takeName);
+  std::string const name = moduleName(takeName);
   Character* found = character(name, &isNew);
   if (isNew) fileMetadata::setText(*found, fileMetadata::kFileName, name);
   return found;
@@ -88,7 +88,7 @@ Character* TakeImport::fileCharacter(const std::string& takeName) {
 
 void TakeImport::noteRepeatedNames() {
   if (m_repeated.empty()) return;
-  const std::string first = "\"" + m_repeated.front() + "\"";
+  std::string const first = "\"" + m_repeated.front() + "\"";
   if (m_repeated.size() == 1)
     info("the name " + first + " stands more than once");
   else

@@ -17,39 +17,39 @@ namespace talix {
 // some.
 class TakeImport {
  public:
-  TakeImport(Database& scene, Clip& clip, const UpAxisConversion& turn, std::string fileName,
+  TakeImport(Database& scene, Clip& clip, UpAxisConversion const& turn, std::string fileName,
              std::vector<TakeNote>& notes);
 
   Clip& clip() const { return m_clip; }
-  const UpAxisConversion& turn() const { return m_turn; }
-  void info(const std::string& text) { note(TakeNote::Level::Info, text); }
-  void warn(const std::string& text) { note(TakeNote::Level::Warning, text); }
+  UpAxisConversion const& turn() const { return m_turn; }
+  void info(std::string const& text) { note(TakeNote::Level::Info, text); }
+  void warn(std::string const& text) { note(TakeNote::Level::Warning, text); }
 
   // The module of that name below `parent` (null: root) that was there before the import and that `fits`,
   // each handed out once; else a new one of `type`, of exactly that name. isNew (may be null): whether it was
   // made.
   template <class T>
-  T* place(bool (*fits)(const Module&), const std::string& name, Module* parent, bool* isNew = nullptr) {
+  T* place(bool (*fits)(Module const&), std::string const& name, Module* parent, bool* isNew = nullptr) {
     return static_cast<T*>(placeModule(&T::staticClass(), fits, name, parent, isNew));
   }
   // A new marker at the root under a free name.
   Marker* placeUnlabeled();
   // The character at the root with that name; each name stands for one.
-  Character* character(const std::string& name, bool* isNew = nullptr);
+  Character* character(std::string const& name, bool* isNew = nullptr);
   // The character for what the file names no subject of.
-  Character* fileCharacter(const std::string& takeName);
+  Character* fileCharacter(std::string const& takeName);
 
-  const std::vector<Module*>& created() const { return m_created; }
+  std::vector<Module*> const& created() const { return m_created; }
   // Says which names clash now.
   void noteRepeatedNames();
 
  private:
   using Waiting = std::unordered_map<std::string, std::vector<Module*>>;  // in order, null once handed out
 
-  Module* placeModule(HRuntimeClass* type, bool (*fits)(const Module&), const std::string& name,
+  Module* placeModule(HRuntimeClass* type, bool (*fits)(Module const&), std::string const& name,
                       Module* parent, bool* isNew);
   Waiting& waitingBelow(Module* parent);
-  void note(TakeNote::Level level, const std::string& text) {
+  void note(TakeNote::Level level, std::string const& text) {
     m_notes.push_back({level, m_fileName + ": " + text});
   }
 
@@ -65,13 +65,13 @@ class TakeImport {
 };
 
 // A name as modules can have it: "\" becomes "_".
-std::string moduleName(const std::string& name);
+std::string moduleName(std::string const& name);
 
 // "1 point", "3 points"
-std::string counted(int64 count, const std::string& noun);
+std::string counted(int64 count, std::string const& noun);
 
 // Throws FileError when there is no channel name left.
-void importDevices(TakeImport&, Take&, const std::string& path);
+void importDevices(TakeImport&, Take&, std::string const& path);
 void importPoints(TakeImport&, Take&);
 void importJoints(TakeImport&, Take&);
 

@@ -4,7 +4,7 @@
 
 namespace talix {
 
-Vec3 UpAxisConversion::operator()(const Vec3& v) const {
+Vec3 UpAxisConversion::operator()(Vec3 const& v) const {
   if (isIdentity()) return v;
   Vec3 turned = v;
   turned[m_to] = v[m_from];
@@ -19,23 +19,23 @@ TalixRotation UpAxisConversion::rotation() const {
   return TalixRotation(axis * (std::numbers::pi / 2));
 }
 
-bool isNoRotation(const TalixRotation& rotation) {
+bool isNoRotation(TalixRotation const& rotation) {
   double q[4];
   rotation.getQuaternion(q);
   return q[0] == 0 && q[1] == 0 && q[2] == 0;
 }
 
-FileToParent::FileToParent(const UpAxisConversion& turn, const Node* parent) : m_turn(turn) {
+FileToParent::FileToParent(UpAxisConversion const& turn, Node const* parent) : m_turn(turn) {
   if (!parent) return;
-  const Transform world = parent->getWorldTransform(0);
+  Transform const world = parent->getWorldTransform(0);
   m_origin = world.position;
   m_unturn = world.rotation.inverse();
   for (int axis = 0; axis < 3; ++axis) m_scale[axis] = world.scale[axis] != 0 ? 1 / world.scale[axis] : 1;
   m_parentIsWorld = m_origin == Vec3() && m_scale == Vec3(1, 1, 1) && isNoRotation(m_unturn);
 }
 
-Vec3 FileToParent::position(const Vec3& inFile) const {
-  const Vec3 turned = m_turn(inFile);
+Vec3 FileToParent::position(Vec3 const& inFile) const {
+  Vec3 const turned = m_turn(inFile);
   return m_parentIsWorld ? turned : scaled(m_unturn.rotate(turned - m_origin), m_scale);
 }
 

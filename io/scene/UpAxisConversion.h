@@ -13,23 +13,23 @@ class UpAxisConversion {
 
   bool isIdentity() const { return m_from == m_to; }
   // Exact: swaps and changes signs.
-  Vec3 operator()(const Vec3&) const;
+  Vec3 operator()(Vec3 const&) const;
   TalixRotation rotation() const;
 
  private:
   int m_from = 0, m_to = 0;
 };
 
-bool isNoRotation(const TalixRotation&);
+bool isNoRotation(TalixRotation const&);
 
 // From a file's world to the space below a node (null: the scene's world), which must not move.
 class FileToParent {
  public:
-  FileToParent(const UpAxisConversion& turn, const Node* parent);
+  FileToParent(UpAxisConversion const& turn, Node const* parent);
 
   bool isIdentity() const { return m_turn.isIdentity() && m_parentIsWorld; }
   bool isScaled() const { return !(m_scale == Vec3(1, 1, 1)); }
-  Vec3 position(const Vec3& inFile) const;
+  Vec3 position(Vec3 const& inFile) const;
   TalixRotation rotation() const;
 
  private:

@@ -23,7 +23,7 @@ Cells tabbedCells(std::string_view row) {
   if (row.find('\t') == std::string_view::npos) return cellsOf(row);
   Cells cells;
   for (size_t start = 0; start <= row.size();) {
-    const size_t end = std::min(row.find('\t', start), row.size());
+    size_t const end = std::min(row.find('\t', start), row.size());
     cells.push_back(trimmed(row.substr(start, end - start)));
     start = end + 1;
   }
@@ -36,7 +36,7 @@ class HeaderValues {
  public:
   HeaderValues(Cells names, std::string_view row) : m_names(std::move(names)), m_values(tabbedCells(row)) {
     // Files padded with blanks and doubled tabs have more cells than names; they leave no value out.
-    const bool padded = m_values.size() > m_names.size();
+    bool const padded = m_values.size() > m_names.size();
     if (padded) m_values = cellsOf(row);
     if (padded)
       m_values.erase(std::remove(m_values.begin(), m_values.end(), std::string_view()), m_values.end());
@@ -49,7 +49,7 @@ class HeaderValues {
   }
 
   std::optional<double> number(std::string_view lowerCaseName) const {
-    const auto value = parseNumber(text(lowerCaseName));
+    auto const value = parseNumber(text(lowerCaseName));
     return value && std::isfinite(*value) ? value : std::nullopt;
   }
 
@@ -57,7 +57,7 @@ class HeaderValues {
   Cells m_names, m_values;
 };
 
-bool hasName(const Cells& names, std::string_view lowerCaseName) {
+bool hasName(Cells const& names, std::string_view lowerCaseName) {
   return std::any_of(names.begin(), names.end(),
                      [&](std::string_view name) { return equalsIgnoringCase(name, lowerCaseName); });
 }
@@ -65,16 +65,16 @@ bool hasName(const Cells& names, std::string_view lowerCaseName) {
 void readValues(TextScanner& scanner, TrcHeader& header) {
   std::string_view row;
   int64 line = 0;
-  const auto takeRow = [&](const char* expected) {
+  auto const takeRow = [&](char const* expected) {
     if (!takeFilledLine(scanner, row, line))
       scanner.fail(std::string(expected) + " expected; the file ends inside its header");
   };
   takeRow("the line of header names beginning with DataRate");
-  const Cells names = cellsOf(row);
+  Cells const names = cellsOf(row);
   if (!hasName(names, "datarate"))
     scanner.failAt(line, "the header names, DataRate among them, expected, not " + shown(row));
   takeRow("the line of header values (DataRate ...)");
-  const HeaderValues values(names, row);
+  HeaderValues const values(names, row);
   header.rate = values.number("datarate").value_or(0);
   if (!isFrameRate(header.rate))
     scanner.failAt(line, "a DataRate that is " + std::string(kFrameRateExpected) + " expected, not " +
@@ -90,15 +90,15 @@ void readNames(TextScanner& scanner, TrcHeader& header) {
   int64 line = 0;
   if (!takeFilledLine(scanner, row, line))
     scanner.fail("the line of marker names beginning with Frame# expected; the file ends inside its header");
-  const Cells cells = tabbedCells(row);
+  Cells const cells = tabbedCells(row);
   if (!startsIgnoringCase(cells[0], "frame") || cells.size() < kFirst ||
       !startsIgnoringCase(cells[1], "time"))
     scanner.failAt(line,
                    "the line of marker names beginning with Frame# and Time expected, not " + shown(row));
-  const bool tabbed = row.find('\t') != std::string_view::npos;
+  bool const tabbed = row.find('\t') != std::string_view::npos;
   for (size_t i = kFirst; tabbed && i < cells.size(); ++i)
     if (!cells[i].empty() && (i - kFirst) % 3 != 0) header.namesOutOfPlace = true;
-  const bool inOrder = !tabbed || header.namesOutOfPlace;
+  bool const inOrder = !tabbed || header.namesOutOfPlace;
   for (size_t i = kFirst; i < cells.size(); i += inOrder ? 1 : 3)
     if (!inOrder || !cells[i].empty()) header.names.emplace_back(cells[i]);
 }

@@ -18,7 +18,7 @@ constexpr double kLastFrame = 2147483647;
 // Not-a-number as the usual programs print it, which is more than parseNumber knows.
 bool isNaNText(std::string_view cell) {
   if (!cell.empty() && (cell[0] == '-' || cell[0] == '+')) cell.remove_prefix(1);
-  for (const char* spelling : {"nan", "1.#qnan", "1.#snan", "1.#ind", "1.#nan"})
+  for (char const* spelling : {"nan", "1.#qnan", "1.#snan", "1.#ind", "1.#nan"})
     if (startsIgnoringCase(cell, spelling)) return true;
   return false;
 }
@@ -26,9 +26,9 @@ bool isNaNText(std::string_view cell) {
 // A marker's positions of successive frames, gathered before they go to its key track.
 class MarkerRun {
  public:
-  void add(TakePoint& point, int64 frame, const Vec3& place, int64 ticksPerFrame) {
+  void add(TakePoint& point, int64 frame, Vec3 const& place, int64 ticksPerFrame) {
     constexpr size_t kLongestRun = 256;
-    const size_t length = m_values.size() / 3;
+    size_t const length = m_values.size() / 3;
     if (length == kLongestRun || frame != m_first + static_cast<int64>(length)) flush(point, ticksPerFrame);
     if (m_values.empty()) m_first = frame;
     m_values.insert(m_values.end(), {place.x, place.y, place.z});
@@ -48,7 +48,7 @@ class MarkerRun {
 
 class RowReader {
  public:
-  RowReader(const FileBytes& bytes, TextScanner& scanner, const TrcHeader& header, Take& take)
+  RowReader(FileBytes const& bytes, TextScanner& scanner, TrcHeader const& header, Take& take)
       : m_bytes(bytes),
         m_scanner(scanner),
         m_header(header),
@@ -118,11 +118,11 @@ class RowReader {
   }
 
   void readFrame(std::string_view cell) {
-    const int64 before = m_frame;
+    int64 const before = m_frame;
     if (cell.empty()) {
       m_frame = m_rows == 0 ? 1 : m_frame + 1;
     } else {
-      const auto number = parseNumber(cell);
+      auto const number = parseNumber(cell);
       if (!number || *number != std::floor(*number))
         m_scanner.failAt(m_line, "a whole frame number expected, not " + shown(cell));
       if (!(std::abs(*number) <= m_lastFrame))
@@ -140,7 +140,7 @@ class RowReader {
 
   void readTime(std::string_view cell) {
     if (cell.empty()) return;
-    const auto seconds = parseNumber(cell);
+    auto const seconds = parseNumber(cell);
     if (!seconds) m_scanner.failAt(m_line, "a time in seconds expected, not " + shown(cell));
     if (!m_timed) m_firstTime = {m_frame, *seconds};
     m_timed = true;
@@ -167,9 +167,9 @@ class RowReader {
   // False for a gap.
   bool readCoordinate(std::string_view cell, double& coordinate) {
     if (cell.empty()) return false;
-    const auto number = parseNumber(cell);
+    auto const number = parseNumber(cell);
     if (number ? std::isnan(*number) : isNaNText(cell)) return false;
-    const double millimetres = number.value_or(INFINITY) * m_take.unitInMillimetres;
+    double const millimetres = number.value_or(INFINITY) * m_take.unitInMillimetres;
     if (!std::isfinite(millimetres))
       m_scanner.failAt(m_line,
                        "a number expected in column " + std::to_string(m_column) + ", not " + shown(cell));
@@ -177,7 +177,7 @@ class RowReader {
     return true;
   }
 
-  void addPosition(size_t marker, const Vec3& place) {
+  void addPosition(size_t marker, Vec3 const& place) {
     while (marker >= m_take.points.size()) {
       m_take.points.emplace_back();
       m_runs.emplace_back();
@@ -187,8 +187,8 @@ class RowReader {
     m_origins += place == Vec3();
   }
 
-  void note(TakeNote::Level level, const std::string& text) { m_take.notes.push_back({level, text}); }
-  void warn(const std::string& text) { note(TakeNote::Level::Warning, text); }
+  void note(TakeNote::Level level, std::string const& text) { m_take.notes.push_back({level, text}); }
+  void warn(std::string const& text) { note(TakeNote::Level::Warning, text); }
 
   void addNotes() {
     noteAlignment();
@@ -202,7 +202,7 @@ class RowReader {
   }
 
   void noteAlignment() {
-    const std::string extra = std::to_string(m_coordinateColumn - kFirstColumn);
+    std::string const extra = std::to_string(m_coordinateColumn - kFirstColumn);
     if (m_firstColumn != kFirstColumn)
       warn("header and rows have " + extra + " empty column before the first marker, which was left out");
     else if (m_coordinateColumn != kFirstColumn)
@@ -212,7 +212,7 @@ class RowReader {
   }
 
   void noteCounts() {
-    const auto rows = static_cast<double>(m_rows), markers = static_cast<double>(m_take.points.size());
+    auto const rows = static_cast<double>(m_rows), markers = static_cast<double>(m_take.points.size());
     if (m_header.frameCount && *m_header.frameCount != rows)
       warn("the header announces " + shortNumber(*m_header.frameCount) + " frames, the file has " +
            shortNumber(rows) + " rows; the rows were taken");
@@ -229,16 +229,16 @@ class RowReader {
   // Recordings count their first frame as 1 or 0 at time 0, and parts of one keep both frame and time.
   void noteTimes() {
     if (!m_timed) return;
-    const auto secondsAt = [&](int64 frame) { return static_cast<double>(frame) / m_take.rate; };
-    const double from0 = m_firstTime.seconds - secondsAt(m_firstTime.frame);
-    const double from1 = m_firstTime.seconds - secondsAt(m_firstTime.frame - 1);
-    const double halfFrame = 0.5 / m_take.rate;
+    auto const secondsAt = [&](int64 frame) { return static_cast<double>(frame) / m_take.rate; };
+    double const from0 = m_firstTime.seconds - secondsAt(m_firstTime.frame);
+    double const from1 = m_firstTime.seconds - secondsAt(m_firstTime.frame - 1);
+    double const halfFrame = 0.5 / m_take.rate;
     if (!(std::min(std::abs(from0), std::abs(from1)) <= halfFrame))
       note(TakeNote::Level::Info, "the Time column starts with " + shortNumber(m_firstTime.seconds) +
                                       " s at frame " + std::to_string(m_firstTime.frame) +
                                       "; the frame numbers were taken");
-    const double lasts = m_lastTime.seconds - m_firstTime.seconds;
-    const double framesLast = secondsAt(m_lastTime.frame - m_firstTime.frame);
+    double const lasts = m_lastTime.seconds - m_firstTime.seconds;
+    double const framesLast = secondsAt(m_lastTime.frame - m_firstTime.frame);
     if (!(std::abs(lasts - framesLast) <= 2 * halfFrame))
       warn("the Time column lasts " + shortNumber(lasts) + " s, the frames at the file's rate " +
            shortNumber(framesLast) + " s; frame numbers and rate were taken");
@@ -250,9 +250,9 @@ class RowReader {
   };
   static constexpr size_t kFirstColumn = 2;  // after Frame# and Time
 
-  const FileBytes& m_bytes;
+  FileBytes const& m_bytes;
   TextScanner& m_scanner;
-  const TrcHeader& m_header;
+  TrcHeader const& m_header;
   Take& m_take;
   int64 m_ticks;
   double m_lastFrame = 0;
@@ -267,8 +267,8 @@ class RowReader {
   int64 m_positions = 0, m_origins = 0, m_partial = 0;
 };
 
-void setUnit(Take& take, const std::string& path, const std::string& given, const std::string& wanted) {
-  const std::string& unit = wanted.empty() ? given : wanted;
+void setUnit(Take& take, std::string const& path, std::string const& given, std::string const& wanted) {
+  std::string const& unit = wanted.empty() ? given : wanted;
   take.fileUnit = unit.empty() ? "mm" : unit;
   take.unitInMillimetres = millimetresPerUnit(take.fileUnit);
   if (take.unitInMillimetres > 0 && !unit.empty()) return;
@@ -292,10 +292,10 @@ void setUpAxis(Take& take) {
 }
 
 // "Subject:Name"; a star stands before the numbers of points that nobody has named.
-TakePoint namedPoint(const std::string& name) {
+TakePoint namedPoint(std::string const& name) {
   TakePoint point;
-  const size_t colon = name.find(':');
-  const bool hasSubject = colon != std::string::npos && colon > 0 && colon + 1 < name.size();
+  size_t const colon = name.find(':');
+  bool const hasSubject = colon != std::string::npos && colon > 0 && colon + 1 < name.size();
   if (hasSubject) point.subject = name.substr(0, colon);
   point.label = hasSubject ? name.substr(colon + 1) : name;
   return point.label.starts_with('*') ? TakePoint() : point;
@@ -303,10 +303,10 @@ TakePoint namedPoint(const std::string& name) {
 
 }  // namespace
 
-Take readTRC(const std::string& path, const ReadOptions& options) {
-  const FileBytes bytes(path);
+Take readTRC(std::string const& path, ReadOptions const& options) {
+  FileBytes const bytes(path);
   TextScanner scanner(bytes);
-  const TrcHeader header = readTrcHeader(scanner);
+  TrcHeader const header = readTrcHeader(scanner);
 
   Take take;
   take.format = "TRC";
@@ -314,7 +314,7 @@ Take readTRC(const std::string& path, const ReadOptions& options) {
   take.rate = header.rate;
   setUnit(take, path, header.unit, options.unit);
   setUpAxis(take);
-  for (const std::string& name : header.names) take.points.push_back(namedPoint(name));
+  for (std::string const& name : header.names) take.points.push_back(namedPoint(name));
   RowReader(bytes, scanner, header, take).read();
   return take;
 }

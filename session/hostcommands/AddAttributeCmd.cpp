@@ -24,7 +24,7 @@ class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
   bool execute(Given const&, Args const& args, Variable&) override {
     Module* module = moduleAt(args[0].getStringValue(-1));
     if (!module) return false;
-    const HString name = args[1].getStringValue(-1), kindText = args[2].getStringValue(-1);
+    HString const name = args[1].getStringValue(-1), kindText = args[2].getStringValue(-1);
     AttributeKind const* kind = findAttributeKind(kindText);
     if (!kind) {
       logError("%s is not a kind of attribute: %s.", kindText.GetStr(), attributeKindNames().c_str());

@@ -25,8 +25,8 @@ class AddChannelCmd final : public ScriptCommand<AddChannelCmd> {
   bool execute(Given const&, Args const& args, Variable&) override {
     Module* module = moduleAt(args[0].getStringValue(-1));
     if (!module) return false;
-    const HString name = args[1].getStringValue(-1), kindText = args[2].getStringValue(-1);
-    const auto* kind = std::ranges::find_if(kChannelKinds, [&](DataSource::PropertyType type) {
+    HString const name = args[1].getStringValue(-1), kindText = args[2].getStringValue(-1);
+    auto const* kind = std::ranges::find_if(kChannelKinds, [&](DataSource::PropertyType type) {
       return kindText == PropertyTable::getTypeName(type);
     });
     if (kind == std::end(kChannelKinds)) {

@@ -22,9 +22,9 @@ std::optional<ChannelChoice> channelNamed(HString const& given) {
   HString name = given;
   Controller::fixChannelStr(name);
   ChannelChoice choice{Controller::mapPropertyName(name)};
-  const int dot = name.GetLength() - 2;
+  int const dot = name.GetLength() - 2;
   if (choice.id == 0 && dot > 0 && name[dot] == '.') {
-    const char letter = static_cast<char>(name[dot + 1] | 0x20);
+    char const letter = static_cast<char>(name[dot + 1] | 0x20);
     if (letter >= 'x' && letter <= 'z') {
       choice.mask = 1u << (letter - 'x');
       name = name.Left(static_cast<uint64>(dot));
@@ -35,7 +35,7 @@ std::optional<ChannelChoice> channelNamed(HString const& given) {
     Command::logError("Unknown property type: %s", given.GetStr());
     return {};
   }
-  const DataSource::PropertyType type = Controller::mapToPropertyType(choice.id);
+  DataSource::PropertyType const type = Controller::mapToPropertyType(choice.id);
   if (choice.mask != 7 && type != DataSource::Vec3Property && type != DataSource::RotProperty) {
     Command::logError("%s has no components.", name.GetStr());
     return {};
@@ -69,9 +69,9 @@ std::optional<int64> timeOfFrame(double frame) {
 }
 
 std::optional<HTimeRange> rangeOfFrames(double start, double end) {
-  const std::optional<int64> first = timeOfFrame(start);
+  std::optional<int64> const first = timeOfFrame(start);
   if (!first) return {};
-  const std::optional<int64> last = timeOfFrame(end);
+  std::optional<int64> const last = timeOfFrame(end);
   if (!last) return {};
   if (*first > *last) {
     Command::logError("The start frame %g lies after the end frame %g.", start, end);

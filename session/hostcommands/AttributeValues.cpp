@@ -77,7 +77,7 @@ HString linesFrom(Values const& values) {
 }
 
 Reading takeVector(Attribute& attribute, Values const& values, Module const& module) {
-  const std::optional<Vec3> vector = vectorFrom(values);
+  std::optional<Vec3> const vector = vectorFrom(values);
   if (!vector) return Reading::Misfit;
   if (attribute.getType() == Attribute::Vector) {
     static_cast<VectorAttribute&>(attribute).setValue(*vector, true, true, true, true);
@@ -99,14 +99,14 @@ Reading takeTime(TimeAttribute& attribute, Values const& values) {
   else if (!isString(values[0]) ||
            !HTimeManager::getInstance()->framesFromString(values[0].getStringValue(-1), false, frame))
     return Reading::Misfit;
-  const std::optional<int64> time = timeOfFrame(frame);
+  std::optional<int64> const time = timeOfFrame(frame);
   if (!time) return Reading::Logged;
   attribute.setValue(*time, true, true, true, true);
   return Reading::Taken;
 }
 
 Reading takeMatrix(MatrixAttribute& attribute, Values const& values) {
-  const auto n = static_cast<uint64>(std::llround(std::sqrt(static_cast<double>(values.size()))));
+  auto const n = static_cast<uint64>(std::llround(std::sqrt(static_cast<double>(values.size()))));
   if (n * n != values.size() || !std::all_of(values.begin(), values.end(), isNumber)) return Reading::Misfit;
   Matrix matrix(n);
   for (uint64 i = 0; i < values.size(); ++i) matrix[i / n][i % n] = values[i].getFloatValue(-1);
@@ -152,7 +152,7 @@ Reading takeScalar(Attribute& attribute, Values const& values) {
       static_cast<StringAttribute&>(attribute).setValue(value.getStringValue(-1), true, true, 0, true, true);
       return Reading::Taken;
     case Attribute::Boolean: {
-      const double number = value.getFloatValue(-1);
+      double const number = value.getFloatValue(-1);
       if (!value.isNumber() || (number != 0 && number != 1)) return Reading::Misfit;
       static_cast<BoolAttribute&>(attribute).setValue(number != 0, true, true, true, true);
       return Reading::Taken;
@@ -194,7 +194,7 @@ bool isReference(Attribute const& attribute) {
 }  // namespace
 
 AttributeKind const* findAttributeKind(HString const& name) {
-  const auto* kind = std::find_if(std::begin(kAttributeKinds), std::end(kAttributeKinds),
+  auto const* kind = std::find_if(std::begin(kAttributeKinds), std::end(kAttributeKinds),
                                   [&](AttributeKind const& known) { return name == known.name; });
   return kind == std::end(kAttributeKinds) ? nullptr : kind;
 }
@@ -210,8 +210,8 @@ std::string attributeKindNames() {
 
 std::unique_ptr<Attribute> makeAttribute(AttributeKind const& kind, HString const& name, Args const& args,
                                          int first, Module const& module) {
-  const Values values = flattened(args, first);
-  const bool labelled = kind.takesLabels();
+  Values const values = flattened(args, first);
+  bool const labelled = kind.takesLabels();
   Reading reading = Reading::Taken;
   std::unique_ptr<Attribute> attribute;
   if (labelled && !std::all_of(values.begin(), values.end(), isString)) {

@@ -16,7 +16,7 @@ class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     if (!fits(info.args, args) || !args[2].isNumber()) return false;
-    const double value = args[2].getFloatValue(-1);
+    double const value = args[2].getFloatValue(-1);
     return value == 0 || value == 1 || value == 2;
   }
 
@@ -24,7 +24,7 @@ class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
     Module* module = moduleAt(args[0].getStringValue(-1));
     if (!module) return false;
     char const* name = args[1].getStringValue(-1);
-    const auto choice = channelNamed(name);
+    auto const choice = channelNamed(name);
     if (!choice) return false;
     if (choice->mask != 7) {
       logError("%s is a component; channels are locked as a whole.", name);
@@ -35,7 +35,7 @@ class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
       logError("Cannot find property named %s on module %s", name, module->getName().GetStr());
       return false;
     }
-    const Variable::BoolType lock = args[2].getBoolValue(-1);
+    Variable::BoolType const lock = args[2].getBoolValue(-1);
     channel->setLocked(lock == Variable::Toggle ? !channel->isLocked() : lock == Variable::True);
     return true;
   }

@@ -28,9 +28,9 @@ class OpenCmd final : public ScriptCommand<OpenCmd> {
   // Throws FileError: the runner makes it the error line, and a failure of the file rather than of the
   // command.
   bool execute(Given const& given, Args const& args, Variable&) override {
-    const GivenOptions options(given);
-    const HString up = options.textOr(kUp, ""), units = options.textOr(kUnits, "");
-    const int axis = axisNamed(up);
+    GivenOptions const options(given);
+    HString const up = options.textOr(kUp, ""), units = options.textOr(kUnits, "");
+    int const axis = axisNamed(up);
     if (options.has(kUp) && axis < 0) {
       logError("%s is not an axis: x, y or z.", up.GetStr());
       return false;
@@ -39,7 +39,7 @@ class OpenCmd final : public ScriptCommand<OpenCmd> {
       logError("%s is not a unit: mm, cm, m, in or ft.", units.GetStr());
       return false;
     }
-    const std::string path = args[0].getStringValue(-1);
+    std::string const path = args[0].getStringValue(-1);
     std::vector<TakeNote> notes;
     importTake(readTake(path, {.unit = units.GetString()}), path, axis, *g_db, notes);
     logNotes(notes);

@@ -23,7 +23,7 @@ class SelectChannelsCmd final : public ScriptCommand<SelectChannelsCmd> {
   bool execute(Given const&, Args const& args, Variable&) override {
     std::vector<unsigned> ids;
     for (Variable const& arg : args) {
-      const auto channel = channelNamed(arg.getStringValue(-1));
+      auto const channel = channelNamed(arg.getStringValue(-1));
       if (!channel) return false;
       ids.push_back(channel->id | channel->mask << 28);
     }

@@ -43,21 +43,21 @@ class SelectCmd final : public ScriptCommand<SelectCmd> {
 
   // Everything is looked up before anything changes.
   bool execute(Given const& given, Args const& args, Variable&) override {
-    const GivenOptions options(given);
+    GivenOptions const options(given);
     HRuntimeClass const* type = nullptr;
     if (options.has(kType) && !(type = typeNamed(options.textOr(kType, "")))) return false;
-    const int extent = lastOf(given, kAll, kNone);
-    const bool byClass = extent == kAll || (type && args.getCount() == 0 && extent != kNone);
+    int const extent = lastOf(given, kAll, kNone);
+    bool const byClass = extent == kAll || (type && args.getCount() == 0 && extent != kNone);
     std::vector<Module*> chosen;
     if (byClass) addAll(type, chosen);
     if (!addNamed(args, type, chosen)) return false;
-    const bool setPrimary = options.has(kPrimary);
-    const HString primaryPath = options.textOr(kPrimary, "");
+    bool const setPrimary = options.has(kPrimary);
+    HString const primaryPath = options.textOr(kPrimary, "");
     Module* primary = nullptr;
     if (!primaryPath.IsEmpty() && !(primary = moduleAt(primaryPath))) return false;
 
-    const int mode = lastOf(given, kAdd, kRemove, kToggle);
-    const bool replaces = mode < 0 && (byClass || args.getCount() > 0);
+    int const mode = lastOf(given, kAdd, kRemove, kToggle);
+    bool const replaces = mode < 0 && (byClass || args.getCount() > 0);
     if (extent == kNone || replaces) g_db->selectAllModules(false);
     for (Module* module : chosen)
       module->setSelected(mode == kToggle ? !module->isSelected() : mode != kRemove);

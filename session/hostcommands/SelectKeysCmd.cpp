@@ -27,12 +27,12 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
                        kNone = info.option("none"), kAdd = info.option("add"), kOnMod = info.option("onMod");
 
   bool execute(Given const& given, Args const& args, Variable&) override {
-    const GivenOptions options(given);
+    GivenOptions const options(given);
     std::vector<ChannelChoice> channels;
     if (!chooseChannels(args, options.has(kAll), channels)) return false;
     HTimeRange range = HTimeRange::forever();
     if (CommandOption const* frames = options.find(kFrames)) {
-      const auto chosen =
+      auto const chosen =
           rangeOfFrames(frames->getArg(0).getFloatValue(-1), frames->getArg(1).getFloatValue(-1));
       if (!chosen) return false;
       range = *chosen;
@@ -53,12 +53,12 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
   // No channels mean all.
   static bool chooseChannels(Args const& args, bool all, std::vector<ChannelChoice>& channels) {
     if (args.getCount() > 0) {
-      const auto channel = channelNamed(args[0].getStringValue(-1));
+      auto const channel = channelNamed(args[0].getStringValue(-1));
       if (channel) channels.push_back(*channel);
       return channel.has_value();
     }
     for (int i = 0; !all && i < g_db->getNumActiveProperties(); ++i) {
-      const unsigned id = g_db->getActiveProperty(i);
+      unsigned const id = g_db->getActiveProperty(i);
       channels.push_back({id & PropertyTable::kIdMask, id >> 28 & 7});
     }
     return true;

@@ -23,10 +23,10 @@ class SelectTimeCmd final : public ScriptCommand<SelectTimeCmd> {
   }
 
   bool execute(Given const& given, Args const& args, Variable&) override {
-    const GivenOptions options(given);
+    GivenOptions const options(given);
     HTimeRange range;
     if (args.getCount() > 0) {
-      const auto chosen = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
+      auto const chosen = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
       if (!chosen) return false;
       range = *chosen;
     }

@@ -24,7 +24,7 @@ class SetActiveClipCmd final : public ScriptCommand<SetActiveClipCmd> {
   bool execute(Given const&, Args const& args, Variable&) override {
     Module* clip = nullptr;
     if (args.getCount() > 0) {
-      const HString path = args[0].getStringValue(-1);
+      HString const path = args[0].getStringValue(-1);
       clip = g_db->getModuleWithPath(path, &NLEClip::s_classNLEClip, false);
       if (!clip) {
         logError("%s is not a valid unique path to a Clip in the scene.", path.GetStr());

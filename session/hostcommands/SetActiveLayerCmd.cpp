@@ -20,7 +20,7 @@ class SetActiveLayerCmd final : public ScriptCommand<SetActiveLayerCmd> {
       logError("No clip is active.");
       return false;
     }
-    const int layer = args[0].getIntValue(-1);
+    int const layer = args[0].getIntValue(-1);
     if (g_db->setActiveLayer(layer)) return true;
     logError("The active clip has no layer %d; its layers are 0 to %d.", layer,
              g_db->getActiveClip()->getNumLayers() - 1);

@@ -18,7 +18,7 @@ class SetAnimRangeCmd final : public ScriptCommand<SetAnimRangeCmd> {
   }
 
   bool execute(Given const&, Args const& args, Variable&) override {
-    const auto range = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
+    auto const range = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
     if (range) HTimeManager::getInstance()->setAnimRange(*range, true);
     return range.has_value();
   }

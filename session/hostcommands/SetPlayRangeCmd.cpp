@@ -19,7 +19,7 @@ class SetPlayRangeCmd final : public ScriptCommand<SetPlayRangeCmd> {
   }
 
   bool execute(Given const&, Args const& args, Variable&) override {
-    const auto range = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
+    auto const range = rangeOfFrames(args[0].getFloatValue(-1), args[1].getFloatValue(-1));
     if (range) HTimeManager::getInstance()->setPlayRange(*range, true);
     return range.has_value();
   }

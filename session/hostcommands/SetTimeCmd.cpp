@@ -19,7 +19,7 @@ class SetTimeCmd final : public ScriptCommand<SetTimeCmd> {
   }
 
   bool execute(Given const&, Args const& args, Variable&) override {
-    const auto time = timeOfFrame(args[0].getFloatValue(-1));
+    auto const time = timeOfFrame(args[0].getFloatValue(-1));
     if (time) HTimeManager::getInstance()->setTime(*time, true);
     return time.has_value();
   }

@@ -10,7 +10,7 @@ namespace talix {
 
 inline void logNotes(std::vector<TakeNote> const& notes) {
   for (TakeNote const& note : notes) {
-    const auto log = note.level == TakeNote::Level::Warning ? &Command::logWarning : &Command::logInfo;
+    auto const log = note.level == TakeNote::Level::Warning ? &Command::logWarning : &Command::logInfo;
     log("%s", note.text.c_str());
   }
 }

@@ -10,7 +10,7 @@ bool isStepCount(Args const& args) {
 }
 
 void goSteps(Args const& args, bool (UndoJournal::*go)(HString&), char const* name, char const* done) {
-  const int wanted = args.getCount() ? args[0].getIntValue(-1) : 1;
+  int const wanted = args.getCount() ? args[0].getIntValue(-1) : 1;
   int count = 0;
   HString step;
   while (count < wanted && (g_db->getUndoJournal().*go)(step)) ++count;

@@ -111,7 +111,7 @@ int posix_memalign(void** block, size_t alignment, size_t size) {
     static auto* const original = next<int(char const*, int, ...)>(#name); \
     va_list rest;                                                          \
     va_start(rest, flags);                                                 \
-    const auto mode = va_arg(rest, mode_t);                                \
+    auto const mode = va_arg(rest, mode_t);                                \
     va_end(rest);                                                          \
     return noFile(EACCES) ? -1 : original(path, flags, mode);              \
   }
@@ -177,7 +177,7 @@ static int armedMain(int argc, char** argv, char** environment) {
 int __libc_start_main(Main* main, int argc, char** argv, void (*init)(), void (*fini)(), void (*rtldFini)(),
                       void* stackEnd) {
   s_main = main;
-  const auto start =
+  auto const start =
       next<int(Main*, int, char**, void (*)(), void (*)(), void (*)(), void*)>("__libc_start_main");
   return start(armedMain, argc, argv, init, fini, rtldFini, stackEnd);
 }

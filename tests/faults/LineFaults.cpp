@@ -56,7 +56,7 @@ class Trials {
     if (inCopy(line, {}) != kSame) return m_report.fault("%s: does not run by itself", line.c_str());
     m_after.assign(m_shared->text, m_shared->size);
     m_outcome = m_shared->outcome;
-    const long memory = m_shared->memory, file = m_shared->file;
+    long const memory = m_shared->memory, file = m_shared->file;
     // The first fault differs from line to line, so that many places are met whatever the stride.
     for (long n = 1 + m_lines % m_stride; n <= memory; n += m_stride) tryFault(line, {n, 0});
     for (long n = 1 + m_lines % m_stride; n <= file; n += m_stride) tryFault(line, {0, n});
@@ -74,8 +74,8 @@ class Trials {
 
  private:
   void tryFault(std::string const& line, Fault fault) {
-    const int status = inCopy(line, fault);
-    const auto told = [&](char const* what, char const* detail) {
+    int const status = inCopy(line, fault);
+    auto const told = [&](char const* what, char const* detail) {
       m_report.fault("%s, %s %ld: %s%s", line.c_str(), fault.memory ? "allocation" : "file call",
                      fault.memory + fault.file, what, detail);
     };
@@ -88,7 +88,7 @@ class Trials {
   // The exit status of a copy that runs the line with a fault; minus the signal that ended it.
   int inCopy(std::string const& line, Fault fault) {
     std::fflush(stdout);
-    const pid_t child = fork();
+    pid_t const child = fork();
     if (child == 0) _exit(tried(line, fault));
     int status = 0;
     waitpid(child, &status, 0);
@@ -101,15 +101,15 @@ class Trials {
     LineResult const& result = m_session.run(line);
     m_disarm(&m_shared->memory, &m_shared->file);
     m_shared->outcome = static_cast<int>(result.outcome);
-    const bool lacked = result.outcome == LineResult::Outcome::OutOfMemory;
+    bool const lacked = result.outcome == LineResult::Outcome::OutOfMemory;
     if (result.torn) return kEnded;  // whoever runs the lines ends then
-    const std::string text = SceneText().write();
+    std::string const text = SceneText().write();
     if (fault.memory == 0 && fault.file == 0) {
       tell(text);
       return kSame;
     }
     if (!lacked && m_shared->outcome == m_outcome) {
-      const std::string difference = firstDifference(m_after, text);
+      std::string const difference = firstDifference(m_after, text);
       return difference.empty() ? kSame : wrong("goes on otherwise:\n" + difference);
     }
     if (!result.failed()) return wrong("succeeds without a reason");
@@ -117,15 +117,15 @@ class Trials {
   }
 
   int isAsBefore(std::string const& text, std::string const& line) {
-    if (const std::string difference = firstDifference(m_before, text); !difference.empty())
+    if (std::string const difference = firstDifference(m_before, text); !difference.empty())
       return wrong("is not taken back:\n" + difference);
     UndoJournal& journal = g_db->getUndoJournal();
     if (journal.getNumUndoSteps() != m_steps) return wrong("the steps are not as before");
     if (static_cast<int>(m_session.run(line).outcome) != m_outcome) return wrong("does not run afterwards");
     HString name;
-    const bool isStep = journal.getNumUndoSteps() == m_steps + 1 && journal.getNumRedoSteps() == 0;
+    bool const isStep = journal.getNumUndoSteps() == m_steps + 1 && journal.getNumRedoSteps() == 0;
     if (isStep) journal.undo(name);
-    const std::string difference = isStep ? firstDifference(m_before, SceneText().write()) : "";
+    std::string const difference = isStep ? firstDifference(m_before, SceneText().write()) : "";
     return difference.empty() ? kTakenBack : wrong("cannot be undone afterwards:\n" + difference);
   }
 

@@ -65,7 +65,7 @@ class Runs {
   void tryAll(Case const& which) {
     m_case = &which;
     m_new.clear();
-    const int status = run("", true);
+    int const status = run("", true);
     if (status != 0) return m_report.fault("%s: exit status %d without a fault", which.name, status);
     for (auto const& entry : fs::directory_iterator(m_folder / "work"))
       m_new[entry.path().filename()] = contentOf(entry.path());
@@ -89,18 +89,18 @@ class Runs {
   static constexpr char kSettings[] = "profile.ini";  // is read as well, so that it is not there before
 
   void tryFault(char const* kind, long n) {
-    const bool memory = *kind == 'm';
-    const std::string fault = kind + std::to_string(n);
-    const int status = run(fault, n % 2 == 0);
+    bool const memory = *kind == 'm';
+    std::string const fault = kind + std::to_string(n);
+    int const status = run(fault, n % 2 == 0);
     ++m_runs;
     ++m_statuses[status];
-    const auto told = [&](char const* what, std::string const& detail) {
+    auto const told = [&](char const* what, std::string const& detail) {
       m_report.fault("%s, %s: %s%s", m_case->name, fault.c_str(), what, detail.c_str());
     };
-    const std::string said = contentOf(m_folder / "err");
+    std::string const said = contentOf(m_folder / "err");
     if (status < 0) return told("ended by signal ", strsignal(-status));
     if (status == 2 || status > 4 || (status == 4 && !memory)) told("exit status ", std::to_string(status));
-    const size_t line = said.find("error: Out of memory\n");
+    size_t const line = said.find("error: Out of memory\n");
     if (status == 4 && (line == said.npos || said.find("error: ") != line || said.rfind("error: ") != line))
       told("said ", said);
     if (status == 1 && memory && !m_case->keepsSteps) told("a line failed for lack of memory: ", said);
@@ -111,15 +111,15 @@ class Runs {
   void lookAtFiles(int status, bool existed, Told told) {
     std::set<std::string> left;
     for (auto const& entry : fs::directory_iterator(m_folder / "work")) {
-      const std::string name = entry.path().filename();
+      std::string const name = entry.path().filename();
       left.insert(name);
-      const auto known = m_new.find(name);
+      auto const known = m_new.find(name);
       if (known == m_new.end()) {
         told("left the file ", name);
         continue;
       }
-      const std::string content = contentOf(entry.path());
-      const bool isOld = existed && content == kOld;
+      std::string const content = contentOf(entry.path());
+      bool const isOld = existed && content == kOld;
       // What lines of a run with steps were taken back may be missing from the file.
       if (!isOld && content != known->second && !m_case->keepsSteps) told("tore the file ", name);
       if (isOld && status == 0) told("did not write the file ", name);
@@ -132,7 +132,7 @@ class Runs {
 
   // The exit status, or minus the signal.
   int run(std::string const& fault, bool withTargets) {
-    const fs::path work = m_folder / "work";
+    fs::path const work = m_folder / "work";
     fs::remove_all(work);
     fs::create_directories(work);
     if (withTargets)
@@ -146,8 +146,8 @@ class Runs {
     std::vector<char*> argv;
     for (std::string& word : words) argv.push_back(word.data());
     argv.push_back(nullptr);
-    const std::string out = m_folder / "out", err = m_folder / "err", count = m_folder / "count";
-    const pid_t child = fork();
+    std::string const out = m_folder / "out", err = m_folder / "err", count = m_folder / "count";
+    pid_t const child = fork();
     if (child == 0) {
       if (chdir(work.c_str()) != 0) _exit(127);
       dup2(open(out.c_str(), O_CREAT | O_TRUNC | O_WRONLY, 0600), 1);

@@ -25,24 +25,24 @@ std::string shortText(double value) {
 
 class Listing {
  public:
-  std::string write(const Take& take) {
+  std::string write(Take const& take) {
     m_out << "  " << take.format << " " << take.name << (take.variant.empty() ? "" : ", ") << take.variant
           << ": " << shortText(take.rate) << " Hz, " << take.frameCount << " frames from " << take.firstFrame
           << ", " << take.fileUnit << " of " << shortText(take.unitInMillimetres) << " mm"
           << (take.unitAssumed ? " (assumed)" : "") << ", up "
           << "xyz"[static_cast<int>(take.up)] << (take.upAssumed ? " (assumed)" : "") << "\n";
-    for (const TakeNote& note : take.notes)
+    for (TakeNote const& note : take.notes)
       m_out << "  " << (note.level == TakeNote::Level::Warning ? "warning: " : "info: ") << note.text << "\n";
     m_period = ticksPerFrameAt(take.rate);
-    for (const TakePoint& point : take.points) addPoint(point);
-    for (const ModelOutput& output : take.outputs)
+    for (TakePoint const& point : take.points) addPoint(point);
+    for (ModelOutput const& output : take.outputs)
       addTrack("output " + output.name + " " + output.kind + " " + output.unit, output.values);
-    for (const TakeJoint& joint : take.joints) addJoint(joint);
-    for (const TakeEvent& event : take.events)
+    for (TakeJoint const& joint : take.joints) addJoint(joint);
+    for (TakeEvent const& event : take.events)
       m_out << "  event " << event.label << ", " << event.context << ", " << event.subject << ", "
             << event.description << ": " << shortText(event.seconds) << "\n";
     m_period = take.analogRate > 0 ? ticksPerFrameAt(take.analogRate) : 1;
-    for (const TakeAnalogChannel& channel : take.analog)
+    for (TakeAnalogChannel const& channel : take.analog)
       addTrack("analog " + channel.name + ", " + channel.unit + ", " + channel.description + ", * " +
                    shortText(channel.scale) + " + " + shortText(channel.offset) + " at " +
                    shortText(take.analogRate) + " Hz",
@@ -51,7 +51,7 @@ class Listing {
   }
 
  private:
-  void addPoint(const TakePoint& point) {
+  void addPoint(TakePoint const& point) {
     addTrack("point " + point.subject + ":" + point.label + ", " + point.description, point.positions);
     if (!point.residuals.empty()) addTrack("  residuals", point.residuals);
     if (point.cameras.empty()) return;
@@ -59,22 +59,22 @@ class Listing {
           << std::accumulate(point.cameras.begin(), point.cameras.end(), int64{0}) << "\n";
   }
 
-  void addJoint(const TakeJoint& joint) {
+  void addJoint(TakeJoint const& joint) {
     m_out << "  joint " << joint.name << (joint.endSite ? " (end)" : "") << " below " << joint.parent
           << ", order " << joint.rotationOrder << ", at";
     for (int axis = 0; axis < 3; ++axis) m_out << " " << shortText(joint.offset[axis]);
-    for (const std::string& channel : joint.channels) m_out << " " << channel;
+    for (std::string const& channel : joint.channels) m_out << " " << channel;
     m_out << "\n";
     if (!joint.translations.empty()) addTrack("  translations", joint.translations);
     if (!joint.rotations.empty()) addTrack("  rotations", joint.rotations);
   }
 
-  void addTrack(const std::string& what, const KeyTrack& track) {
+  void addTrack(std::string const& what, KeyTrack const& track) {
     EXPECT_STREQ(track.checkInvariants(), "");
     m_out << "  " << what << ": " << track.count() << " keys";
     int64 index = 0, runs = 0, former = 0;
     KeyTrack::Values sum{};
-    track.forEach(0, track.count(), [&](const KeyTrack::Key& key) {
+    track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
       runs += index == 0 || key.time - former != m_period;
       former = key.time;
       for (size_t c = 0; c < sum.size(); ++c) sum[c] += key.values[c];
@@ -91,7 +91,7 @@ class Listing {
     m_out << "\n";
   }
 
-  void add(const KeyTrack& track, const std::string& what, const KeyTrack::Values& values) {
+  void add(KeyTrack const& track, std::string const& what, KeyTrack::Values const& values) {
     m_out << "; " << what;
     for (size_t c = 0; c < static_cast<size_t>(track.width()); ++c)
       m_out << (c ? " " : "") << shortText(values[c]);
@@ -103,22 +103,22 @@ class Listing {
 
 TEST(Listing, EveryTakeIsReadAsListed) {
   std::vector<std::string> names;
-  for (const char* folder : {"", "small/"})
-    for (const auto& entry : fs::directory_iterator(dataFile(folder)))
-      if (const std::string suffix = entry.path().extension();
+  for (char const* folder : {"", "small/"})
+    for (auto const& entry : fs::directory_iterator(dataFile(folder)))
+      if (std::string const suffix = entry.path().extension();
           suffix == ".c3d" || suffix == ".bvh" || suffix == ".trc")
         names.push_back(folder + entry.path().filename().string());
   std::sort(names.begin(), names.end());
   std::string found;
-  for (const std::string& name : names) {
+  for (std::string const& name : names) {
     std::string error = errorOf([&] { found += name + "\n" + Listing().write(readTake(dataFile(name))); });
     // The path up to the data is that of this machine.
     if (error.starts_with(dataFile(""))) error.erase(0, dataFile("").size());
     if (!error.empty()) found += name + "\n  error: " + error + "\n";
   }
-  const std::string path = dataFile("golden/takes.txt");
+  std::string const path = dataFile("golden/takes.txt");
   if (std::getenv("TALIX_UPDATE")) std::ofstream(path, std::ios::binary) << found;
-  const std::string expected = readText(path);
+  std::string const expected = readText(path);
   std::istringstream was(expected), is(found);
   std::string take, one, other;
   for (int line = 1; std::getline(was, one) && std::getline(is, other); ++line) {

@@ -14,10 +14,10 @@ bool near(double a, double b, double tolerance) {
   return std::abs(a - b) <= tolerance * std::max(1.0, std::abs(a));
 }
 
-std::string keyDifference(const KeyTrack& a, const KeyTrack& b, double tolerance) {
+std::string keyDifference(KeyTrack const& a, KeyTrack const& b, double tolerance) {
   if (a.count() != b.count()) return std::to_string(a.count()) + " keys are " + std::to_string(b.count());
   for (int64 i = 0; i < a.count(); ++i) {
-    const KeyTrack::Key from = a.at(i), to = b.at(i);
+    KeyTrack::Key const from = a.at(i), to = b.at(i);
     if (from.time != to.time || from.components != to.components) return "key " + std::to_string(i);
     double sign = 1;
     if (a.shape() == KeyTrack::Shape::Rotation) {  // a quaternion's negative is the same rotation
@@ -38,25 +38,25 @@ class Comparison {
   explicit Comparison(double tolerance) : m_tolerance(tolerance) {}
 
   template <class T>
-  void same(const std::string& what, const T& a, const T& b) {
+  void same(std::string const& what, T const& a, T const& b) {
     if (!(a == b)) say(what);
   }
-  void same(const std::string& what, const KeyTrack& a, const KeyTrack& b) {
-    if (const std::string text = keyDifference(a, b, m_tolerance); !text.empty()) say(what + ", " + text);
+  void same(std::string const& what, KeyTrack const& a, KeyTrack const& b) {
+    if (std::string const text = keyDifference(a, b, m_tolerance); !text.empty()) say(what + ", " + text);
   }
-  void same(const std::string& what, double a, double b) {
+  void same(std::string const& what, double a, double b) {
     if (!near(a, b, m_tolerance)) say(what);
   }
   // False when the numbers differ, so that the items cannot be compared.
   template <class T>
-  bool sameCount(const std::string& what, const std::vector<T>& a, const std::vector<T>& b) {
+  bool sameCount(std::string const& what, std::vector<T> const& a, std::vector<T> const& b) {
     if (a.size() != b.size()) say(std::to_string(a.size()) + " " + what + " are " + std::to_string(b.size()));
     return a.size() == b.size();
   }
-  const std::string& first() const { return m_first; }
+  std::string const& first() const { return m_first; }
 
  private:
-  void say(const std::string& what) {
+  void say(std::string const& what) {
     if (m_first.empty()) m_first = what;
   }
 
@@ -64,11 +64,11 @@ class Comparison {
   std::string m_first;
 };
 
-void comparePoints(Comparison& is, const Take& a, const Take& b) {
+void comparePoints(Comparison& is, Take const& a, Take const& b) {
   if (!is.sameCount("points", a.points, b.points)) return;
   for (size_t i = 0; i < a.points.size(); ++i) {
-    const TakePoint &from = a.points[i], &to = b.points[i];
-    const std::string what = "point " + std::to_string(i) + " " + from.label + ": ";
+    TakePoint const &from = a.points[i], &to = b.points[i];
+    std::string const what = "point " + std::to_string(i) + " " + from.label + ": ";
     is.same(what + "label " + to.label, from.label, to.label);
     is.same(what + "subject " + to.subject, from.subject, to.subject);
     is.same(what + "description", from.description, to.description);
@@ -78,28 +78,28 @@ void comparePoints(Comparison& is, const Take& a, const Take& b) {
   }
 }
 
-void compareDevices(Comparison& is, const Take& a, const Take& b) {
+void compareDevices(Comparison& is, Take const& a, Take const& b) {
   is.same("analog rate", a.analogRate, b.analogRate);
   if (!is.sameCount("outputs", a.outputs, b.outputs) || !is.sameCount("channels", a.analog, b.analog)) return;
   for (size_t i = 0; i < a.outputs.size(); ++i) {
-    const ModelOutput &from = a.outputs[i], &to = b.outputs[i];
+    ModelOutput const &from = a.outputs[i], &to = b.outputs[i];
     is.same("output " + from.name + " is " + to.name, from.name + from.unit + from.kind,
             to.name + to.unit + to.kind);
     is.same("output " + from.name, from.values, to.values);
   }
   for (size_t i = 0; i < a.analog.size(); ++i) {
-    const TakeAnalogChannel &from = a.analog[i], &to = b.analog[i];
+    TakeAnalogChannel const &from = a.analog[i], &to = b.analog[i];
     is.same("channel " + from.name + " is " + to.name, from.name + from.unit + from.description,
             to.name + to.unit + to.description);
     is.same("channel " + from.name, from.samples, to.samples);
   }
 }
 
-void compareJoints(Comparison& is, const Take& a, const Take& b) {
+void compareJoints(Comparison& is, Take const& a, Take const& b) {
   if (!is.sameCount("joints", a.joints, b.joints)) return;
   for (size_t i = 0; i < a.joints.size(); ++i) {
-    const TakeJoint &from = a.joints[i], &to = b.joints[i];
-    const std::string what = "joint " + std::to_string(i) + " " + from.name + ": ";
+    TakeJoint const &from = a.joints[i], &to = b.joints[i];
+    std::string const what = "joint " + std::to_string(i) + " " + from.name + ": ";
     is.same(what + "name " + to.name, from.name, to.name);
     is.same(what + "parent", from.parent, to.parent);
     is.same(what + "end site", from.endSite, to.endSite);
@@ -111,10 +111,10 @@ void compareJoints(Comparison& is, const Take& a, const Take& b) {
   }
 }
 
-void compareEvents(Comparison& is, const Take& a, const Take& b) {
+void compareEvents(Comparison& is, Take const& a, Take const& b) {
   if (!is.sameCount("events", a.events, b.events)) return;
   for (size_t i = 0; i < a.events.size(); ++i) {
-    const TakeEvent &from = a.events[i], &to = b.events[i];
+    TakeEvent const &from = a.events[i], &to = b.events[i];
     is.same("event " + from.label, from.label + from.context + from.subject + from.description,
             to.label + to.context + to.subject + to.description);
     is.same("time of event " + from.label, from.seconds, to.seconds);
@@ -123,7 +123,7 @@ void compareEvents(Comparison& is, const Take& a, const Take& b) {
 
 }  // namespace
 
-std::string differenceOf(const Take& a, const Take& b, double tolerance) {
+std::string differenceOf(Take const& a, Take const& b, double tolerance) {
   Comparison is(tolerance);
   is.same("rate", std::abs(a.rate - b.rate) <= 1e-12 * a.rate, true);
   is.same("first frame", a.firstFrame, b.firstFrame);

@@ -10,9 +10,9 @@ namespace {
 using testing::HasSubstr;
 
 TEST(TakeFormats, ContentGoesBeforeSuffix) {
-  const TempFolder folder;
-  const std::string bvh = readText(dataFile("frametime_precise_01.bvh"));
-  const std::string trc = readText(dataFile("nan_case_01.trc"));
+  TempFolder const folder;
+  std::string const bvh = readText(dataFile("frametime_precise_01.bvh"));
+  std::string const trc = readText(dataFile("nan_case_01.trc"));
   EXPECT_EQ(readTake(folder.file("a.trc", bvh)).format, "BVH");
   EXPECT_EQ(readTake(folder.file("b", "\xEF\xBB\xBF\n" + bvh)).format, "BVH");
   EXPECT_EQ(readTake(folder.file("c.bvh", trc)).format, "TRC");
@@ -21,7 +21,7 @@ TEST(TakeFormats, ContentGoesBeforeSuffix) {
 }
 
 TEST(TakeFormats, SuffixDecidesWhereContentHasNoMark) {
-  const TempFolder folder;
+  TempFolder const folder;
   EXPECT_THAT(errorOf([&] { readTake(folder.file("a.Bvh", "nothing")); }),
               HasSubstr("line 1: HIERARCHY expected"));
   EXPECT_THAT(errorOf([&] { readTake(folder.file("a.trc", "nothing")); }),
@@ -33,9 +33,9 @@ TEST(TakeFormats, SuffixDecidesWhereContentHasNoMark) {
 }
 
 TEST(TakeFormats, WritesBySuffixOnly) {
-  const TempFolder folder;
+  TempFolder const folder;
   std::vector<TakeNote> notes;
-  const Take take = readTake(dataFile("frametime_precise_01.bvh"));
+  Take const take = readTake(dataFile("frametime_precise_01.bvh"));
   EXPECT_THAT(errorOf([&] { writeTake(take, folder.path("a.trc"), notes); }),
               HasSubstr("a.trc: takes are written as"));
   writeTake(take, folder.path("a.bvh"), notes);

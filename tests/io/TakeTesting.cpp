@@ -6,38 +6,38 @@
 
 namespace talix {
 
-std::string dataFile(const std::string& name) { return std::string(TALIX_TEST_DATA "/") + name; }
+std::string dataFile(std::string const& name) { return std::string(TALIX_TEST_DATA "/") + name; }
 
-std::string errorOf(const std::function<void()>& work) {
+std::string errorOf(std::function<void()> const& work) {
   try {
     work();
-  } catch (const FileError& error) {
+  } catch (FileError const& error) {
     return error.what();
   }
   return {};
 }
 
-std::string notesOf(const std::vector<TakeNote>& notes) {
+std::string notesOf(std::vector<TakeNote> const& notes) {
   std::string text;
-  for (const TakeNote& note : notes)
+  for (TakeNote const& note : notes)
     text += (note.level == TakeNote::Level::Warning ? "warning: " : "info: ") + note.text + "\n";
   return text;
 }
 
-void expectSurvivesDamage(const std::string& content, const std::string& suffix, size_t step, int damages,
-                          const std::function<Take(const std::string& path)>& read) {
-  const TempFolder folder;
-  const auto survives = [&](const std::string& damaged) {
-    const std::string path = folder.file("damaged" + suffix, damaged);
+void expectSurvivesDamage(std::string const& content, std::string const& suffix, size_t step, int damages,
+                          std::function<Take(std::string const& path)> const& read) {
+  TempFolder const folder;
+  auto const survives = [&](std::string const& damaged) {
+    std::string const path = folder.file("damaged" + suffix, damaged);
     try {
-      const Take take = read(path);
-      for (const TakePoint& point : take.points) {
+      Take const take = read(path);
+      for (TakePoint const& point : take.points) {
         ASSERT_STREQ(point.positions.checkInvariants(), "");
         ASSERT_TRUE(point.residuals.empty() || point.residuals.count() == point.positions.count());
         ASSERT_TRUE(point.cameras.empty() || point.cameras.size() == static_cast<size_t>(take.frameCount));
       }
-      for (const TakeJoint& joint : take.joints) ASSERT_STREQ(joint.rotations.checkInvariants(), "");
-    } catch (const FileError& error) {
+      for (TakeJoint const& joint : take.joints) ASSERT_STREQ(joint.rotations.checkInvariants(), "");
+    } catch (FileError const& error) {
       ASSERT_EQ(std::string(error.what()).rfind(path, 0), 0u) << error.what();
     }
   };

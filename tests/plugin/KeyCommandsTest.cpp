@@ -55,9 +55,9 @@ class Stepping : public KeyCommands {
       for (Controller* channel : {node->getProperty("Translation"), node->getProperty("Scale")}) {
         bool inRun = false;
         for (int i = 0; i < kFrames; ++i) {
-          const int n = back ? kFrames - 1 - i : i;
+          int const n = back ? kFrames - 1 - i : i;
           if (!manager().getAnimRange().contains(at(n)) || !channel->hasKeyAt(at(n))) continue;
-          const bool selected = channel->isKeySelectedAt(at(n), 7);
+          bool const selected = channel->isKeySelectedAt(at(n), 7);
           if (selected && !inRun) frames.insert(n);
           inRun = selected;
         }
@@ -67,7 +67,7 @@ class Stepping : public KeyCommands {
 
   // The frame that a step leads to.
   int step(bool back) {
-    const std::string said = back ? run("findSelectedKeys", {}, {{"b"}}) : run("findSelectedKeys");
+    std::string const said = back ? run("findSelectedKeys", {}, {{"b"}}) : run("findSelectedKeys");
     EXPECT_EQ(said, "info: Found one or more selected keys\nnothing");
     return frame();
   }
@@ -82,13 +82,13 @@ TEST_F(Stepping, ComesToEveryRunOnceInARound) {
   for (int trial = 0; trial < 300; ++trial) {
     scatter();
     for (bool back : {false, true}) {
-      const std::set<int> ends = runEnds(back);
+      std::set<int> const ends = runEnds(back);
       std::vector<int> round(ends.begin(), ends.end());
       if (round.empty()) continue;
       if (back) std::reverse(round.begin(), round.end());
       manager().setTime(at(upTo(kFrames)), true);
       // Wherever it starts, from then on it goes around.
-      const int start = step(back);
+      int const start = step(back);
       auto next = std::find(round.begin(), round.end(), start);
       ASSERT_NE(next, round.end()) << "frame " << start << " begins no run";
       for (size_t i = 0; i < 2 * round.size(); ++i) {
@@ -103,12 +103,12 @@ TEST_F(Stepping, StartsBehindTheCurrentTime) {
   for (int trial = 0; trial < 300; ++trial) {
     scatter();
     for (bool back : {false, true}) {
-      const std::set<int> ends = runEnds(back);
-      const int from = upTo(kFrames);
+      std::set<int> const ends = runEnds(back);
+      int const from = upTo(kFrames);
       manager().setTime(at(from), true);
-      const auto next = back ? ends.lower_bound(from) : ends.upper_bound(from);
-      const bool opens = back ? next == ends.end() : next == ends.begin();
-      const bool wraps = back ? next == ends.begin() : next == ends.end();
+      auto const next = back ? ends.lower_bound(from) : ends.upper_bound(from);
+      bool const opens = back ? next == ends.end() : next == ends.begin();
+      bool const wraps = back ? next == ends.begin() : next == ends.end();
       if (ends.empty()) {
         EXPECT_EQ(run("findSelectedKeys"), "info: No selected keys found\nnothing");
         EXPECT_EQ(frame(), from);
@@ -137,7 +137,7 @@ TEST_F(KeyCommands, RefuseTimesBeyondTheTimeLine) {
   slow.setFrameRate(1e-3);
   manager().setFrameRate(slow);
   constexpr int kFar = 2147483647;  // 68,000 years at this rate
-  const std::string beyond = "error: Frame 2147483647 lies beyond the time line.\nfailed";
+  std::string const beyond = "error: Frame 2147483647 lies beyond the time line.\nfailed";
   EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"frame", {kFar}}}), beyond);
   EXPECT_EQ(run("hasKey", {"n", "Translation"}, {{"seconds", {kFar}}}), beyond);
   EXPECT_EQ(run("pasteKeys", {}, {{"useFrame", {kFar}}}), beyond);

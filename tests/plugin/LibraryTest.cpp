@@ -62,7 +62,7 @@ TEST(PluginObject, SaysWhoItIsAndHoldsNothingBeforeInitialise) {
   CommandPluginBase* plugin = PluginLibrary::get().getPlugin(0);
   CommandPluginBase* another = PluginLibrary::get().getPlugin(0);
   EXPECT_NE(plugin, another);
-  const std::vector<std::string> texts = {
+  std::vector<std::string> const texts = {
       plugin->getVendor().GetString(),    plugin->getAuthor().GetString(),
       plugin->getBuildDate().GetString(), plugin->getInterfaceVersion().GetString(),
       plugin->getName().GetString(),      plugin->getVersion().GetString()};
@@ -93,7 +93,7 @@ TEST(PluginObject, LeavesItsCommandsToTheHost) {
 TEST(PluginObject, MakesEverythingAgainWhenInitialisedAgain) {
   CommandPluginBase* plugin = PluginLibrary::get().getPlugin(0);
   plugin->initialise();
-  const int once = plugin->getNumCommands();
+  int const once = plugin->getNumCommands();
   plugin->initialise();
   ASSERT_EQ(plugin->getNumCommands(), 2 * once);
   std::set<Command*> different;

@@ -18,16 +18,16 @@ class ObjectCommands : public SceneFixture {
 // The rule step by step: a list of seen paths, every candidate tried from the start.
 void makeUniqueLiterally() {
   std::vector<HString> seen;
-  const int count = g_db->getNumModules();
+  int const count = g_db->getNumModules();
   for (int i = 0; i < count; ++i) {
     Module* module = g_db->getModule(i);
-    const HString path = module->getFullPathString();
+    HString const path = module->getFullPathString();
     if (std::find(seen.begin(), seen.end(), path) == seen.end()) {
       seen.push_back(path);
       continue;
     }
-    const HString name = module->getName();
-    const int length = name.GetLength();
+    HString const name = module->getName();
+    int const length = name.GetLength();
     int last = length - 1;
     while (last >= 0 && name[last] >= '0' && name[last] <= '9') --last;
     HString base = name;
@@ -36,7 +36,7 @@ void makeUniqueLiterally() {
       base = name.Left(static_cast<uint64>(last - 1));
       number = std::stoi(name.Right(static_cast<uint64>(length - last - 1)).GetString());
     }
-    const HString parent = module->getParent() ? module->getParent()->getFullPathString() : HString();
+    HString const parent = module->getParent() ? module->getParent()->getFullPathString() : HString();
     HString candidate;
     do candidate.Format("%s_%d", base.GetStr(), ++number);
     while (g_db->getModuleWithPath(parent + "\\" + candidate, nullptr, false));
@@ -46,14 +46,14 @@ void makeUniqueLiterally() {
 
 TEST_F(ObjectCommands, UniquePathsFollowTheRule) {
   // Parents made before and after their children, names that are one another's candidates.
-  const auto build = [&](unsigned seed) {
+  auto const build = [&](unsigned seed) {
     static constexpr char const* kNames[] = {"a",    "a_1", "a_2", "a_x1", "a_x2",
                                              "a__1", "7",   "_2",  "a_3",  "a_y2"};
     std::mt19937 random(seed);
-    const auto below = [&](size_t end) { return std::uniform_int_distribution<size_t>(0, end - 1)(random); };
+    auto const below = [&](size_t end) { return std::uniform_int_distribution<size_t>(0, end - 1)(random); };
     g_db->newScene();
     std::vector<Module*> modules;
-    const size_t names = 1 + below(10);
+    size_t const names = 1 + below(10);
     for (size_t i = 0; i < 60; ++i) modules.push_back(make("x"));
     for (Module* module : modules) module->setName(kNames[below(names)]);
     for (size_t i = 0; i < 40; ++i) modules[below(modules.size())]->addChild(modules[below(modules.size())]);
@@ -61,7 +61,7 @@ TEST_F(ObjectCommands, UniquePathsFollowTheRule) {
   for (unsigned seed = 0; seed < 300; ++seed) {
     build(seed);
     makeUniqueLiterally();
-    const std::vector<std::string> expected = names();
+    std::vector<std::string> const expected = names();
     build(seed);
     ASSERT_NE(expected, names());
     EXPECT_EQ(run("makeUnique"), "nothing");

@@ -55,7 +55,7 @@ TArray<Variable> arrayOf(ArgList const& args) {
 CommandOption given(Command const& command, GivenOption const& option) {
   int count = 0;
   Variable::VarType type = Variable::None;
-  const int index = command.getOptionSyntax(option.name, count, type);
+  int const index = command.getOptionSyntax(option.name, count, type);
   if (index < 0) throw std::invalid_argument(std::string("no option ") + option.name);
   CommandOption copy = command.getOption(index);
   for (size_t i = 0; i < option.values.size(); ++i) copy.setArg(static_cast<int>(i), option.values[i]);
@@ -71,7 +71,7 @@ PluginLibrary const& PluginLibrary::get() {
     void* handle = dlopen(path().c_str(), RTLD_NOW | RTLD_LOCAL);
     if (!handle) throw std::runtime_error(dlerror());
     PluginLibrary found{};
-    const auto find = [&](auto& function, char const* name) {
+    auto const find = [&](auto& function, char const* name) {
       function = reinterpret_cast<std::decay_t<decltype(function)>>(dlsym(handle, name));
       if (!function) throw std::runtime_error(std::string("no ") + name);
     };
@@ -108,7 +108,7 @@ std::string run(Command& command, ArgList const& args, std::vector<GivenOption> 
   Lines sink;
   LogSink* former = setLogSink(&sink);
   Variable result;
-  const bool done = command.execute(givenOptions, arrayOf(args), result);
+  bool const done = command.execute(givenOptions, arrayOf(args), result);
   setLogSink(former);
   return sink.lines + (done                                 ? textOf(result)
                        : result.getType() == Variable::None ? "failed"

@@ -23,10 +23,10 @@ TEST_F(PropertyReaders, NameTheGetterToUseForOtherKinds) {
     char const* name;
     std::array<std::string, 6> said;
   };
-  const std::string get = "reads", either = "either", no = "-";
-  const std::string Int = "Int", Bool = "Boolean", Text = "String", Bits = "BooleanArray", Ints = "IntArray";
-  const std::string Float = "Float", Vector = "Vector";
-  const Kind kinds[] = {{"int", {get, Int, Int, Int, Int, Int}},
+  std::string const get = "reads", either = "either", no = "-";
+  std::string const Int = "Int", Bool = "Boolean", Text = "String", Bits = "BooleanArray", Ints = "IntArray";
+  std::string const Float = "Float", Vector = "Vector";
+  Kind const kinds[] = {{"int", {get, Int, Int, Int, Int, Int}},
                         {"enum", {get, either, get, either, either, Text}},
                         {"float", {Float, Float, Float, Float, Float, Float}},
                         {"string", {Text, Text, get, Text, Text, Text}},
@@ -43,10 +43,10 @@ TEST_F(PropertyReaders, NameTheGetterToUseForOtherKinds) {
                         {"matrix", {no, no, no, no, no, no}},
                         {"multiModule", {no, no, no, no, no, get}},
                         {"temperature", {get, no, no, no, no, Int}}};
-  const auto messageOf = [&](std::string const& said) -> std::string {
+  auto const messageOf = [&](std::string const& said) -> std::string {
     if (said == no) return "Unsupported attribute type";
     if (said == "a label") return "Not enough arguments for getBooleanProperty command";
-    const std::string use = said == either ? "either getIntProperty or getString" : "get" + said;
+    std::string const use = said == either ? "either getIntProperty or getString" : "get" + said;
     return "Use " + use + "Property for this type of attribute";
   };
   Node* node = make("n");
@@ -54,8 +54,8 @@ TEST_F(PropertyReaders, NameTheGetterToUseForOtherKinds) {
     add(node, static_cast<Attribute::Type>(i), kinds[i].name, {"L"});
   for (Kind const& kind : kinds)
     for (size_t i = 0; i < std::size(getters); ++i) {
-      const std::string getter = std::string("get") + getters[i] + "Property";
-      const std::string said = run(getter.c_str(), {"n", kind.name});
+      std::string const getter = std::string("get") + getters[i] + "Property";
+      std::string const said = run(getter.c_str(), {"n", kind.name});
       if (kind.said[i] == get) {
         EXPECT_EQ(said.find("error"), std::string::npos) << getter << " " << kind.name;
       } else {

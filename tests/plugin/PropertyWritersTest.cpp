@@ -93,8 +93,8 @@ TEST_F(PropertyWriters, DropActivePropertiesThatNobodyHasWhenTheyFollow) {
 
 TEST_F(PropertyWriters, LeaveCreatedKeysSelectedOnTheActiveComponents) {
   PropertyTable& table = PropertyTable::getInstance();
-  const unsigned translation = table.findId("Translation");
-  const auto selectedBy = [&](unsigned bits) {
+  unsigned const translation = table.findId("Translation");
+  auto const selectedBy = [&](unsigned bits) {
     Node* node = make("n");
     g_db->selectAllModules(false);
     node->setSelected(true);
@@ -113,7 +113,7 @@ TEST_F(PropertyWriters, LeaveCreatedKeysSelectedOnTheActiveComponents) {
 
 TEST_F(PropertyWriters, FillSquareMatrices) {
   auto* grid = add<MatrixAttribute>(make("n"), Attribute::MatrixKind, "Grid");
-  for (const auto& [count, rows] : {std::pair{1, 1u}, {3, 1}, {4, 2}, {36, 6}, {37, 6}, {10, 3}}) {
+  for (auto const& [count, rows] : {std::pair{1, 1u}, {3, 1}, {4, 2}, {36, 6}, {37, 6}, {10, 3}}) {
     ArgList args = {"Grid"};
     for (int i = 1; i <= count; ++i) args.push_back(i);
     EXPECT_EQ(run("setProperty", args, {{"onMod", {"n"}}}) == "nothing", count <= 36);

@@ -16,7 +16,7 @@ TEST_F(TransformCommands, OffsetsAreThoseOfTheTimeAndOfMissingMarkersNone) {
   EXPECT_TRUE(constraint->setConstraintOffset({1, 2, 3}));
   constraint->setTarget(bone);
   make<Clip>("take");
-  const int64 time = HTimeManager::getInstance()->getTime(5);
+  int64 const time = HTimeManager::getInstance()->getTime(5);
   HTimeManager::getInstance()->setTime(time, true);
   bone->setLocalPos(time, {200, 0, 0});
   bone->setConstLocalScale({2, 2, 2});

@@ -87,7 +87,7 @@ class SelectionCmd final : public ScriptCommand<SelectionCmd> {
                                        .returns = Variable::StringArray};
 
   bool execute(Given const&, Args const&, Variable& result) override {
-    const int count = g_db->getNumSelectedModules();
+    int const count = g_db->getNumSelectedModules();
     Module const* primary = g_db->getPrimarySelectedModule();
     result = Variable(Variable::StringArray, primary ? count + 2 : count);
     for (int i = 0; i < count; ++i)
@@ -108,7 +108,7 @@ class ChannelsCmd final : public ScriptCommand<ChannelsCmd> {
   bool execute(Given const&, Args const&, Variable& result) override {
     result = Variable(Variable::StringArray, g_db->getNumActiveProperties());
     for (int i = 0; i < g_db->getNumActiveProperties(); ++i) {
-      const unsigned id = g_db->getActiveProperty(i);
+      unsigned const id = g_db->getActiveProperty(i);
       result.setValue((Controller::mapPropertyId(id).GetString() + ":" + std::to_string(id >> 28)).c_str(),
                       i);
     }

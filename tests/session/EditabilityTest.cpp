@@ -88,7 +88,7 @@ class Editability : public testing::Test {
           "addLayer", "setProperty Translation 7 7 7 -d -onMod s\\m", "selectChannels Translation"})
       run(line);
     for (int i = 0; i < 24; ++i) {
-      const std::string x = std::to_string(i % 6), module = i / 6 % 2 ? "b\\m" : "s\\m";
+      std::string const x = std::to_string(i % 6), module = i / 6 % 2 ? "b\\m" : "s\\m";
       run("setActiveLayer " + std::to_string(i / 12));
       run("setKey Translation " + x + " " + std::to_string(i / 6) + " 0 -t " + x + " -onMod " + module);
       run("setKey Rotation " + x + " 0 0 -t " + x + " -onMod " + module);
@@ -111,7 +111,7 @@ class Editability : public testing::Test {
     explicit State(Node const& node) : pre(node.getPreTranslation(), node.getPreRotation()) {
       for (int i = 0; i < node.getNumChannels(); ++i) {
         Controller const& channel = *node.getChannel(i);
-        const std::string name = channel.getName().GetString();
+        std::string const name = channel.getName().GetString();
         settings[name] = {channel.getDefaultValues(), channel.getInterpolation()};
         for (int layer = 0; layer < 2; ++layer)
           if (KeyTrack const* track = channel.findTrack(g_db->getHeadClip(), layer); track && !track->empty())
@@ -139,9 +139,9 @@ TEST_F(Editability, OfEveryWriter) {
     for (size_t i = 0; i < std::size(kLocks); ++i) {
       build(writer.selection);
       lock(kLocks[i]);
-      const State before(target());
-      const std::string said = run(writer.line);
-      const std::string effect = before.difference(State(target())) + said;
+      State const before(target());
+      std::string const said = run(writer.line);
+      std::string const effect = before.difference(State(target())) + said;
       EXPECT_EQ(effect.empty() ? "." : effect, writer.effects[i])
           << writer.line << ", locked: " << kLocks[i].name;
     }

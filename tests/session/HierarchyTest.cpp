@@ -12,7 +12,7 @@ struct Deviation {
   double position = 0, relative = 0, angle = 0;  // mm, parts, degrees
 
   void add(Transform const& was, Transform const& is) {
-    const double far = (was.position - is.position).length();
+    double const far = (was.position - is.position).length();
     Vec3 turn;
     (was.rotation.inverse() * is.rotation).getAsVector(turn);
     position = std::max(position, far);
@@ -51,20 +51,20 @@ TEST_P(SkeletonTest, KeepsItsMotion) {
        {"select LeftHand Head Hips -primary Hips|parent -adjust", "select LeftHand|unparent -adjust",
         "select RightArm LeftHand|parent -adjust", "select LeftUpLeg Neck|unparent -adjust"}) {
     // The nodes that move, and whose children move with them.
-    const std::string text = lines;
-    const size_t cut = text.find('|');
+    std::string const text = lines;
+    size_t const cut = text.find('|');
     run(text.substr(0, cut));
     std::vector<Node const*> nodes;
     for (int i = 0; i < g_db->getNumSelectedNodes(); ++i) nodes.push_back(g_db->getSelectedNode(i));
     std::vector<Transform> before;
     for (auto const* times : {&keys, &frames})
-      for (const int64 at : *times)
+      for (int64 const at : *times)
         for (Node const* node : nodes) before.push_back(node->getWorldTransform(at));
     run(text.substr(cut + 1));
     Deviation atKeys, between;
     auto was = before.begin();
     for (auto const* times : {&keys, &frames})
-      for (const int64 at : *times)
+      for (int64 const at : *times)
         for (Node const* node : nodes)
           (times == &keys ? atKeys : between).add(*was++, node->getWorldTransform(at));
     EXPECT_LT(atKeys.relative, 1e-9) << lines;

@@ -65,7 +65,7 @@ TEST_F(Names, BuiltInOnesOfEveryClass) {
   run("create AnalogDevice a");
   for (std::string const& name : attributes)
     for (std::string const& given : {name, upperCase(name)}) {
-      const std::string wanted = g_db->getModule(0)->getAttribute(given.c_str())
+      std::string const wanted = g_db->getModule(0)->getAttribute(given.c_str())
                                      ? "Module a already has a property named " + given + "."
                                      : "\"" + given +
                                            "\" cannot be the name of a channel: it is the name of an "

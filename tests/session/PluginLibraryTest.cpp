@@ -14,7 +14,7 @@ std::string sample(std::string const& name) { return std::string(TALIX_BIN) + "/
 
 std::string problemOf(std::string const& path) {
   try {
-    const Session session(path);
+    Session const session(path);
   } catch (std::exception const& error) {
     return error.what();
   }
@@ -22,9 +22,9 @@ std::string problemOf(std::string const& path) {
 }
 
 TEST(PluginLibraryTest, SaysWhyALibraryCannotBeUsed) {
-  const talix_tests::TempFolder folder;
-  const std::string text = folder.file("plugin_test.so", "no library at all\n");
-  const auto because = [](std::string const& path, std::string const& reason) {
+  talix_tests::TempFolder const folder;
+  std::string const text = folder.file("plugin_test.so", "no library at all\n");
+  auto const because = [](std::string const& path, std::string const& reason) {
     return path + ": " + reason;
   };
 
@@ -46,7 +46,7 @@ TEST(PluginLibraryTest, SaysWhyALibraryCannotBeUsed) {
 }
 
 TEST(PluginLibraryTest, CommandsOfThePluginComeFirstAndNullOnesAreLeftOut) {
-  const Session session(sample("Sample"));
+  Session const session(sample("Sample"));
   auto const& entries = session.commands().entries();
   ASSERT_FALSE(entries.empty());
   EXPECT_EQ(entries.front().command->getName(), "echo");
@@ -65,8 +65,8 @@ TEST(PluginLibraryTest, LoadsAgainAfterUnloading) {
 
 TEST(PluginLibraryTest, FindsThePluginBesideTheProgramOrInstalled) {
   namespace fs = std::filesystem;
-  const talix_tests::TempFolder folder;
-  const fs::path root = folder.path("");
+  talix_tests::TempFolder const folder;
+  fs::path const root = folder.path("");
   fs::create_directories(root / "bin");
   EXPECT_THROW(findPlugin((root / "bin").string()), PluginError);
   fs::create_directories(root / "lib/talix");

@@ -30,11 +30,11 @@ class ProgramTest : public testing::Test {
   // Runs a shell line in the test's folder; "talix" is the program, "$sample" the option for the sample
   // plug-in.
   int run(std::string const& line) {
-    const std::string bin = TALIX_BIN;
-    const std::string command = "cd '" + m_folder.path("") + "' && talix() { '" + bin +
+    std::string const bin = TALIX_BIN;
+    std::string const command = "cd '" + m_folder.path("") + "' && talix() { '" + bin +
                                 "/talix' \"$@\"; } && sample='--plugin " + bin + "/sample/Sample.so' && { " +
                                 line + "\n} >out 2>err";
-    const int status = std::system(command.c_str());
+    int const status = std::system(command.c_str());
     m_out = text("out");
     m_err = text("err");
     return WIFEXITED(status) ? WEXITSTATUS(status) : -1;
@@ -42,13 +42,13 @@ class ProgramTest : public testing::Test {
   // Runs "talix run" at a terminal without echo and types. What it shows is in m_out, "<" for a carriage
   // return.
   int runAtTerminal(std::vector<std::string> args, std::string const& typed) {
-    const std::string bin = TALIX_BIN;
+    std::string const bin = TALIX_BIN;
     args.insert(args.begin(), {bin + "/talix", "run", "--plugin", bin + "/sample/Sample.so"});
     std::vector<char*> words;
     for (std::string& arg : args) words.push_back(arg.data());
     words.push_back(nullptr);
     int terminal = -1;
-    const pid_t child = forkpty(&terminal, nullptr, nullptr, nullptr);
+    pid_t const child = forkpty(&terminal, nullptr, nullptr, nullptr);
     if (child == 0) {
       termios quiet{};
       tcgetattr(0, &quiet);
@@ -62,7 +62,7 @@ class ProgramTest : public testing::Test {
     char chunk[4096];
     bool toType = !typed.empty();
     for (ssize_t size = 0; (size = read(terminal, chunk, sizeof chunk)) > 0;) {
-      for (const char c : std::string_view(chunk, static_cast<size_t>(size))) {
+      for (char const c : std::string_view(chunk, static_cast<size_t>(size))) {
         if (c == '\n' && m_out.ends_with('<')) m_out.pop_back();
         m_out += c == '\r' ? '<' : c;
       }
@@ -75,7 +75,7 @@ class ProgramTest : public testing::Test {
   }
   std::string text(std::string const& file) const { return talix_tests::readText(m_folder.path(file)); }
 
-  const talix_tests::TempFolder m_folder;
+  talix_tests::TempFolder const m_folder;
   std::string m_out, m_err;
 };
 
@@ -99,7 +99,7 @@ TEST_F(ProgramTest, AFailedLineStopsTheRunUnlessToldOtherwise) {
 }
 
 TEST_F(ProgramTest, NothingIsSavedAfterAFailedLine) {
-  const std::string scene = "--open '" TALIX_TEST_DATA "/pose_t_01.bvh' --save out.bvh ";
+  std::string const scene = "--open '" TALIX_TEST_DATA "/pose_t_01.bvh' --save out.bvh ";
   EXPECT_EQ(run("talix run $sample " + scene + "-c nothing"), 1);
   EXPECT_FALSE(fs::exists(m_folder.path("out.bvh")));
   EXPECT_EQ(run("talix run $sample " + scene + "--keep-going -c nothing"), 1);
@@ -148,11 +148,11 @@ TEST_F(ProgramTest, JsonHasOneObjectForEachLineThatIsRun) {
                 "'selection'"),
             1);
   EXPECT_EQ(m_err, "");
-  const auto line = [](std::string const& file, int number, std::string const& rest) {
+  auto const line = [](std::string const& file, int number, std::string const& rest) {
     return boost::json::parse("{\"file\": \"" + file + "\", \"line\": " + std::to_string(number) + ", " +
                               rest + "}");
   };
-  const std::vector<boost::json::value> expected = {
+  std::vector<boost::json::value> const expected = {
       line("some.talix", 2, R"("command": "echo", "ok": true, "result": [1.0, 2.5, 3.0], "log": [])"),
       line("some.talix", 4, R"("command": "fail", "ok": false, "result": null, "log": [
            {"level": "info", "text": "about to fail"}, {"level": "warning", "text": "100% sure"},
@@ -170,7 +170,7 @@ TEST_F(ProgramTest, JsonHasOneObjectForEachLineThatIsRun) {
 
 TEST_F(ProgramTest, CommandsAreDescribed) {
   ASSERT_EQ(run("talix commands $sample --json"), 0);
-  const boost::json::value all = boost::json::parse(m_out);
+  boost::json::value const all = boost::json::parse(m_out);
   EXPECT_EQ(all.as_array().front().at("name"), "echo");
   EXPECT_EQ(all.as_array().back().at("name"), "help");
   ASSERT_EQ(run("talix commands $sample --json fail"), 0);
@@ -181,7 +181,7 @@ TEST_F(ProgramTest, CommandsAreDescribed) {
                                   {"name": "deselect", "args": 0, "type": 0, "mask": 0, "hidden": false}],
       "returns": 0, "solo": true, "source": "Sample Commands"}])"));
   ASSERT_EQ(run("talix commands $sample echo"), 0);
-  const std::string page = m_out;
+  std::string const page = m_out;
   ASSERT_EQ(run("talix run $sample -c 'help echo'"), 0);
   EXPECT_EQ(m_out, page);
   ASSERT_EQ(run("talix commands $sample"), 0);
@@ -216,7 +216,7 @@ TEST_F(ProgramTest, InterruptsCancelATaskOnce) {
 // Through a terminal of its own: what it shows, and what is typed at questions.
 TEST_F(ProgramTest, TerminalsShowProgressAndAnswerQuestions) {
   ASSERT_EQ(runAtTerminal({"-c", "work \"Fitting\" 0", "-c", "echo done"}, ""), 0) << m_out;
-  const std::string bar = "[#####---------------]  25%  Fitting";
+  std::string const bar = "[#####---------------]  25%  Fitting";
   EXPECT_EQ(m_out, "<" + bar + "<" + std::string(bar.size(), ' ') + "<done\n");
   ASSERT_EQ(runAtTerminal({"-c", "ask Sure?", "-c", "ask \"And now?\""}, "y\nno\n"), 0) << m_out;
   EXPECT_THAT(m_out, HasSubstr("Sure? [y/N] 1\nAnd now? [y/N] 0\n"));

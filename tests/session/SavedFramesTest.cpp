@@ -24,7 +24,7 @@ struct Curve {
   bool vector;
 };
 
-const std::vector<Curve> kCurves = {{"\\S\\A", "Translation", true},
+std::vector<Curve> const kCurves = {{"\\S\\A", "Translation", true},
                                     {"\\S\\B", "Translation", true},
                                     {"\\h\\A", "Translation", true},
                                     {"\\D", "Force", true},
@@ -65,9 +65,9 @@ class SavedFrames : public testing::Test {
   static Keys keysOf(size_t curve) {
     Keys keys;
     KeyTrack const* track = channelOf(kCurves[curve])->findActiveTrack();
-    const int64 period = HTimeManager::getInstance()->getTicksPerFrame();
+    int64 const period = HTimeManager::getInstance()->getTicksPerFrame();
     for (int64 i = 0; track && i < track->count(); ++i) {
-      const KeyTrack::Key key = track->at(i);
+      KeyTrack::Key const key = track->at(i);
       EXPECT_EQ(key.time % period, 0) << "a key between frames";
       keys.held[static_cast<size_t>(key.time / period)] = key.components;
       keys.selected[static_cast<size_t>(key.time / period)] = key.selected;
@@ -84,7 +84,7 @@ class SavedFrames : public testing::Test {
   // A row of keys that bends now and then, so that some can be taken out.
   Model fill(Model model, size_t curve, int first, int last) {
     for (int f = first; f <= last; ++f) {
-      const std::string x = std::to_string(f % 7 == 0 ? f + 30 : f);
+      std::string const x = std::to_string(f % 7 == 0 ? f + 30 : f);
       run("setKey " + kCurves[curve].channel + " " + (kCurves[curve].vector ? x + " 5 " + x : x) + " -t " +
           std::to_string(f) + " -onMod " + kCurves[curve].module);
       model[curve][static_cast<size_t>(f)] = 7;
@@ -100,10 +100,10 @@ class SavedFrames : public testing::Test {
   }
 
   Model cutRange(Model model, size_t curve) {
-    const bool part = kCurves[curve].vector && upTo(3) == 0;
+    bool const part = kCurves[curve].vector && upTo(3) == 0;
     choose(curve, part ? ".y" : "");
-    const auto [first, last] = selectTime();
-    const int keys = channelOf(kCurves[curve])->getNumKeys();
+    auto const [first, last] = selectTime();
+    int const keys = channelOf(kCurves[curve])->getNumKeys();
     run("cutKeys -ranges");
     for (int f = first; keys > 0 && f <= last; ++f) model[curve][static_cast<size_t>(f)] &= part ? 5u : 0u;
     return model;
@@ -112,7 +112,7 @@ class SavedFrames : public testing::Test {
   Model cutSelected(Model model, size_t curve) {
     choose(curve);
     selectSomeKeys(curve);
-    const Keys keys = keysOf(curve);
+    Keys const keys = keysOf(curve);
     run("cutKeys");
     for (unsigned c = 1; c < 8; c *= 2) forEachChosen(keys, c, [&](size_t f) { model[curve][f] &= ~c; });
     return model;
@@ -122,9 +122,9 @@ class SavedFrames : public testing::Test {
     if (kCurves[from].vector != kCurves[to].vector) return model;
     choose(from);
     selectSomeKeys(from);
-    const auto [first, last] = selectTime();
+    auto const [first, last] = selectTime();
     Keys keys = keysOf(from);
-    const int way = upTo(2);
+    int const way = upTo(2);
     run(way == 0 ? "copyKeys" : way == 1 ? "copyKeys -ranges" : "copyKeys -all");
     // Copied whole, a key holds the components that it lacks as well.
     for (int f = 0; way > 0 && f < kAllFrames; ++f) {
@@ -133,13 +133,13 @@ class SavedFrames : public testing::Test {
       chosen = held && (way == 2 || (f >= first && f <= last)) ? 7 : 0;
       held = held ? 7 : 0;
     }
-    const auto start = std::find_if(keys.selected.begin(), keys.selected.end(), [](unsigned c) { return c; });
+    auto const start = std::find_if(keys.selected.begin(), keys.selected.end(), [](unsigned c) { return c; });
     if (start == keys.selected.end()) return model;
-    const auto origin = static_cast<size_t>(start - keys.selected.begin());
-    const auto at = static_cast<size_t>(frame());
+    auto const origin = static_cast<size_t>(start - keys.selected.begin());
+    auto const at = static_cast<size_t>(frame());
     choose(to);
     run("pasteKeys -useFrame " + std::to_string(at));
-    const Data source = model[from];
+    Data const source = model[from];
     for (unsigned c = 1; c < 8; c *= 2)
       forEachChosen(keys, c, [&](size_t f) {
         if (f + at - origin < kAllFrames) model[to][f + at - origin] |= c & (source[f] | keys.selected[f]);
@@ -163,16 +163,16 @@ class SavedFrames : public testing::Test {
   }
 
   std::pair<int, int> selectTime() {
-    const int first = frame(), last = std::min(first + upTo(12), kSavedFrames);
+    int const first = frame(), last = std::min(first + upTo(12), kSavedFrames);
     run("selectTime " + std::to_string(first) + " " + std::to_string(last));
     return {first, last};
   }
 
   void selectSomeKeys(size_t curve) {
-    const std::string& channel = kCurves[curve].channel;
+    std::string const& channel = kCurves[curve].channel;
     run("selectKeys -none");
     for (int i = 0; i < 3; ++i) {
-      const int first = frame(), last = first + upTo(6);
+      int const first = frame(), last = first + upTo(6);
       run("selectKeys " + channel + (kCurves[curve].vector && upTo(4) == 0 ? ".x" : "") + " -add -frames " +
           std::to_string(first) + " " + std::to_string(last));
     }
@@ -183,9 +183,9 @@ class SavedFrames : public testing::Test {
   static void forEachChosen(Keys const& keys, unsigned component, Visit visit) {
     int former = -1;
     for (int f = 0; f < kAllFrames; ++f) {
-      const auto at = static_cast<size_t>(f);
+      auto const at = static_cast<size_t>(f);
       if (!(keys.held[at] & component)) continue;
-      const bool chosen = (keys.selected[at] & component) != 0;
+      bool const chosen = (keys.selected[at] & component) != 0;
       for (int between = former + 1; chosen && former >= 0 && between < f; ++between)
         visit(static_cast<size_t>(between));
       if (chosen) visit(at);
@@ -196,7 +196,7 @@ class SavedFrames : public testing::Test {
   // --- comparing ---
 
   static std::string seen(KeyTrack const& track) {
-    const int64 period = HTimeManager::getInstance()->getTicksPerFrame();
+    int64 const period = HTimeManager::getInstance()->getTicksPerFrame();
     std::string text;
     for (int64 f = 1; f <= kSavedFrames; ++f) text += track.find(f * period) >= 0 ? 'x' : '.';
     return text;
@@ -209,14 +209,14 @@ class SavedFrames : public testing::Test {
 
   void compare(Model const& model) {
     run("save " + m_file);
-    const talix::Take take = talix::readTake(m_file);
+    talix::Take const take = talix::readTake(m_file);
     ASSERT_EQ(take.points.size(), 3u);
     for (size_t i = 0; i < 3; ++i) ASSERT_EQ(seen(take.points[i].positions), seen(model[i])) << m_script;
     ASSERT_EQ(take.outputs.size(), 1u);
     ASSERT_EQ(seen(take.outputs[0].values), seen(model[3])) << m_script;
     // A file has a sample at every frame.
     KeyTrack const* samples = channelOf(kCurves[4])->findActiveTrack();
-    const int64 period = HTimeManager::getInstance()->getTicksPerFrame();
+    int64 const period = HTimeManager::getInstance()->getTicksPerFrame();
     for (int64 f = 1; samples && f <= kSavedFrames; ++f)
       ASSERT_EQ(samples->find(f * period) >= 0 || samples->bridgedAt(f * period),
                 model[4][static_cast<size_t>(f)] != 0)
@@ -244,11 +244,11 @@ TEST_F(SavedFrames, AreThoseOfTheModelAfterAnyEdits) {
     Model model(kCurves.size());
     for (size_t i = 0; i < kCurves.size(); ++i) model = fill(model, i, 1 + upTo(5), kSavedFrames - upTo(5));
     for (int step = 0; step < 40 && !HasFatalFailure(); ++step) {
-      const int before = journal.getNumUndoSteps();
-      const Model then = model;
-      const size_t one = curve(), other = curve();
-      const int kind = upTo(9);
-      const int first = frame();
+      int const before = journal.getNumUndoSteps();
+      Model const then = model;
+      size_t const one = curve(), other = curve();
+      int const kind = upTo(9);
+      int const first = frame();
       model = kind <= 2   ? thin(model, one)
               : kind == 3 ? fill(model, one, first, std::min(first + upTo(4), kSavedFrames))
               : kind == 4 ? cutRange(model, one)
@@ -259,7 +259,7 @@ TEST_F(SavedFrames, AreThoseOfTheModelAfterAnyEdits) {
       compare(model);
       changes += model != then;
       if (HasFatalFailure() || upTo(2)) continue;
-      const int steps = journal.getNumUndoSteps() - before;
+      int const steps = journal.getNumUndoSteps() - before;
       for (int i = 0; i < steps; ++i) run("undo");
       compare(then);
       if (upTo(1)) {

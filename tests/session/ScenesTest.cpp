@@ -25,7 +25,7 @@ class Stage {
   }
   int done() const { return m_done; }
   std::string text() {
-    const SceneScope scope(m_scene);
+    SceneScope const scope(m_scene);
     return m_said + talix_tests::SceneText(m_scene).write();
   }
   Database& scene() { return m_scene; }
@@ -41,15 +41,15 @@ class Stage {
 // its own way: "heat" is of one kind or another.
 std::vector<std::string> randomLines(unsigned seed, int count) {
   std::mt19937 random(seed);
-  const auto below = [&](unsigned end) { return random() % end; };
-  const auto oneOf = [&](std::initializer_list<char const*> texts) {
+  auto const below = [&](unsigned end) { return random() % end; };
+  auto const oneOf = [&](std::initializer_list<char const*> texts) {
     return std::string(texts.begin()[below(static_cast<unsigned>(texts.size()))]);
   };
-  const auto number = [&] { return std::to_string(below(60)); };
-  const auto name = [&] { return oneOf({"\\a", "\\b", "\\hub", "a", "b", "hub"}); };
-  const auto channel = [&] { return oneOf({"Translation", "tx", "Rotation", "heat", "HEAT"}); };
-  const std::string heat = seed % 2 ? " heat float" : " heat vector", others = seed % 2 ? "" : " 1 2";
-  const std::function<std::string()> makers[] = {
+  auto const number = [&] { return std::to_string(below(60)); };
+  auto const name = [&] { return oneOf({"\\a", "\\b", "\\hub", "a", "b", "hub"}); };
+  auto const channel = [&] { return oneOf({"Translation", "tx", "Rotation", "heat", "HEAT"}); };
+  std::string const heat = seed % 2 ? " heat float" : " heat vector", others = seed % 2 ? "" : " 1 2";
+  std::function<std::string()> const makers[] = {
       [&] {
         return "create " + oneOf({"Node", "Marker", "Clip"}) + " " + oneOf({"a", "b", "hub"});
       },
@@ -90,14 +90,14 @@ std::vector<std::string> randomLines(unsigned seed, int count) {
   std::vector<std::string> lines{"newScene",      "create Clip take", "create Marker a",
                                  "create Node b", "create Node hub",  "addChannel \\a" + heat,
                                  "select \\a"};
-  const auto deletion = static_cast<unsigned>(std::size(makers)) - 1;
+  auto const deletion = static_cast<unsigned>(std::size(makers)) - 1;
   // Seldom a deletion, so that there is something to work on.
   while (static_cast<int>(lines.size()) < count) lines.push_back(makers[below(deletion + below(2))]());
   return lines;
 }
 
 void prepare(Stage& stage) {
-  const SceneScope scope(stage.scene());
+  SceneScope const scope(stage.scene());
   stage.scene().getUndoJournal().setEnabled(true);
 }
 
@@ -109,7 +109,7 @@ std::string alone(std::vector<std::string> const& lines) {
 }
 
 TEST(Scenes, InTurnDoWhatTheyDoAlone) {
-  const std::string bystander = talix_tests::SceneText(*g_db).write();
+  std::string const bystander = talix_tests::SceneText(*g_db).write();
   int done = 0;
   for (unsigned seed = 1; seed < 40; seed += 2) {
     std::vector<std::string> a = randomLines(seed, 150), b = randomLines(seed + 1, 150);
@@ -130,7 +130,7 @@ TEST(Scenes, InTurnDoWhatTheyDoAlone) {
 }
 
 TEST(Scenes, AtOnceDoWhatTheyDoAlone) {
-  const auto run = [](unsigned seed) { return alone(randomLines(seed, 800)); };
+  auto const run = [](unsigned seed) { return alone(randomLines(seed, 800)); };
   std::vector<std::future<std::string>> atOnce;
   for (unsigned seed = 1; seed <= 4; ++seed) atOnce.push_back(std::async(std::launch::async, run, seed));
   for (unsigned seed = 1; seed <= 4; ++seed)
@@ -156,22 +156,22 @@ TEST(Scenes, BelongToOneThreadAtATime) {
   Database* const mine = g_db;
   Database inner;
   {
-    const SceneScope once(inner);
-    const SceneScope again(inner);
+    SceneScope const once(inner);
+    SceneScope const again(inner);
     EXPECT_EQ(g_db, &inner);
     auto* node = static_cast<Node*>(inner.createModule(&Node::staticClass(), "n", nullptr));
     EXPECT_EQ(node->getDatabase(), &inner);
-    EXPECT_EQ(refusal([&] { const SceneScope scope(inner); }), "the scene is in use by another thread");
+    EXPECT_EQ(refusal([&] { SceneScope const scope(inner); }), "the scene is in use by another thread");
     EXPECT_EQ(refusal([&] { talix::Session("", inner); }), "the scene is in use by another thread");
     EXPECT_EQ(refusal([&] { node->setName("x"); }), "the scene is in use by another thread");
     EXPECT_EQ(refusal([&] { node->getWSPos(0); }), "the scene is in use by another thread");
     EXPECT_EQ(refusal([&] { HTimeManager::getInstance(); }), "this thread has no scene");
   }
   EXPECT_EQ(g_db, mine);
-  EXPECT_EQ(refusal([&] { const SceneScope scope(*mine); }), "the scene is in use by another thread");
+  EXPECT_EQ(refusal([&] { SceneScope const scope(*mine); }), "the scene is in use by another thread");
   EXPECT_EQ(refusal([&] { inner.getModule(0)->setName("x"); }), "the thread does not hold the scene");
   EXPECT_EQ(refusal([&] {
-              const SceneScope scope(inner);
+              SceneScope const scope(inner);
               inner.getModule(0)->setName("y");
             }),
             "");
@@ -180,11 +180,11 @@ TEST(Scenes, BelongToOneThreadAtATime) {
 
 TEST(Scenes, TakeNoModuleOfAnother) {
   Database other;
-  const SceneScope outer(other);
+  SceneScope const outer(other);
   Module* strange = other.createModule(&Marker::staticClass(), "strange", nullptr);
-  const SceneScope inner(*g_db);
+  SceneScope const inner(*g_db);
   Database own;
-  const SceneScope scope(own);
+  SceneScope const scope(own);
   auto* node = static_cast<Node*>(own.createModule(&Node::staticClass(), "own", nullptr));
   EXPECT_FALSE(node->addChild(strange) || own.setPrimarySelectedModule(strange) ||
                own.removeFromScene(strange, true, true, true, true));
@@ -198,7 +198,7 @@ TEST(Scenes, TakeNoModuleOfAnother) {
   EXPECT_TRUE(!friends->getValue() && node->getNumConnectingLines() == 0);
   std::unique_ptr<Marker> made;
   {
-    const SceneScope again(other);
+    SceneScope const again(other);
     made.reset(Marker::createInstance());
   }
   EXPECT_FALSE(own.addToScene(made.get(), true, nullptr, false, true));

@@ -29,7 +29,7 @@ class ScriptTextTest : public testing::Test {
   ScriptLine::Outcome read(std::string const& text) { return m_line.read("any " + text, m_registry); }
 
   void expectRoundTrip(Variable const& value) {
-    const std::string text = toText(value);
+    std::string const text = toText(value);
     ASSERT_EQ(read(text), ScriptLine::Outcome::Command) << text << ": " << m_line.problem();
     ASSERT_EQ(m_line.args().getCount(), 1) << text;
     Variable const& back = m_line.args()[0];
@@ -38,7 +38,7 @@ class ScriptTextTest : public testing::Test {
     for (int i = 0; i < value.getNumItems(); ++i) {
       EXPECT_STREQ(back.getStringValue(i), value.getStringValue(i)) << text;
       EXPECT_EQ(back.getVecValue(i), value.getVecValue(i)) << text;
-      const double a = back.getFloatValue(i), b = value.getFloatValue(i);
+      double const a = back.getFloatValue(i), b = value.getFloatValue(i);
       EXPECT_EQ(std::memcmp(&a, &b, sizeof a), 0) << text;
     }
   }
@@ -46,7 +46,7 @@ class ScriptTextTest : public testing::Test {
   double anyDouble() {
     double value;
     do {
-      const uint64 bits = m_random();
+      uint64 const bits = m_random();
       std::memcpy(&value, &bits, sizeof value);
     } while (!std::isfinite(value));
     // Half of them as people write numbers.
@@ -71,7 +71,7 @@ class ScriptTextTest : public testing::Test {
 
 TEST_F(ScriptTextTest, WhatIsPrintedReadsBackTheSame) {
   for (int i = 0; i < 20000 && !HasFailure(); ++i) {
-    const int count = 1 + static_cast<int>(m_random() % 4);
+    int const count = 1 + static_cast<int>(m_random() % 4);
     Variable texts(Variable::StringArray, count), numbers(Variable::FloatArray, count),
         vectors(Variable::VectorArray, count), booleans(Variable::BoolArray, count), number, vector, integer;
     for (int k = 0; k < count; ++k) {
@@ -85,7 +85,7 @@ TEST_F(ScriptTextTest, WhatIsPrintedReadsBackTheSame) {
     integer.setValue(static_cast<int>(static_cast<uint32>(m_random())), -1);
     for (Variable const& value : {texts, numbers, vectors, booleans, number, vector, integer})
       expectRoundTrip(value);
-    const std::string text = anyText(), quoted = quotedText(text);
+    std::string const text = anyText(), quoted = quotedText(text);
     ASSERT_EQ(read(quoted + " -word " + quoted), ScriptLine::Outcome::Command) << text;
     EXPECT_EQ(m_line.args()[0].getStringValue(-1), text);
     EXPECT_EQ(m_line.options()[0].getArg(0).getStringValue(-1), text);
@@ -101,7 +101,7 @@ TEST_F(ScriptTextTest, AnyBytesAreReadOrRefused) {
     std::string line = m_random() % 4 ? "any " : "";
     for (size_t length = m_random() % 24; length > 0; --length)
       line += m_random() % 8 ? bytes[m_random() % bytes.size()] : static_cast<char>(m_random());
-    const ScriptLine::Outcome outcome = m_line.read(line, m_registry);
+    ScriptLine::Outcome const outcome = m_line.read(line, m_registry);
     if (outcome != ScriptLine::Outcome::Refused) continue;
     ++refused;
     ASSERT_FALSE(m_line.problem().empty()) << line;

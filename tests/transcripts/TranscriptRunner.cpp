@@ -39,7 +39,7 @@ constexpr std::string_view kPrompt = "> ", kTake = "# take: ";
 Lines splitLines(std::string_view text) {
   Lines lines;
   while (!text.empty()) {
-    const size_t end = text.find('\n');
+    size_t const end = text.find('\n');
     lines.emplace_back(text.substr(0, end));
     text.remove_prefix(end == std::string_view::npos ? text.size() : end + 1);
   }
@@ -50,7 +50,7 @@ void addPrinted(std::string_view text, Lines& lines) {
   Lines printed = splitLines(text);
   if (printed.empty()) printed.emplace_back();
   for (std::string const& line : printed) {
-    const bool plain = !line.empty() && std::string_view("#>|").find(line.front()) == std::string_view::npos;
+    bool const plain = !line.empty() && std::string_view("#>|").find(line.front()) == std::string_view::npos;
     lines.push_back(plain ? line : line.empty() ? "|" : "| " + line);
   }
 }
@@ -69,8 +69,8 @@ class UndoCheck {
   UndoCheck() : m_states{SceneText().write()} {}
 
   void lineDone(std::string const& line) {
-    const auto steps = static_cast<size_t>(m_journal.getNumUndoSteps());
-    const bool fresh = steps == m_steps + 1 && m_journal.getNumRedoSteps() == 0 && !line.starts_with("redo");
+    auto const steps = static_cast<size_t>(m_journal.getNumUndoSteps());
+    bool const fresh = steps == m_steps + 1 && m_journal.getNumRedoSteps() == 0 && !line.starts_with("redo");
     if (line.starts_with("newScene")) m_states.clear();
     if (fresh || m_states.empty()) {
       m_states.resize(steps);
@@ -89,7 +89,7 @@ class UndoCheck {
 
  private:
   void compare(size_t steps, std::string const& line) const {
-    const std::string difference = firstDifference(m_states.at(steps), SceneText().write());
+    std::string const difference = firstDifference(m_states.at(steps), SceneText().write());
     if (!difference.empty())
       throw std::runtime_error("after " + std::to_string(steps) + " steps, line " + line + ":\n  " +
                                difference);
@@ -114,7 +114,7 @@ Lines replayed(Lines const& file, std::string const& plugin) {
       check.lineDone(line.substr(kPrompt.size()));
     } else if (line.starts_with(kTake)) {
       lines.push_back(line);
-      const std::string open = "open " + line.substr(kTake.size());
+      std::string const open = "open " + line.substr(kTake.size());
       if (talix::LineResult const& result = session.run(open); result.failed()) addResult(result, lines);
       check.lineDone(open);
     } else if (line.empty() || line.front() == '#') {
@@ -131,7 +131,7 @@ void tellDifference(std::string const& path, Lines const& expected, Lines const&
   while (i < expected.size() && i < found.size() && expected[i] == found[i]) ++i;
   size_t prompt = i;
   while (prompt > 0 && !expected[--prompt].starts_with(kPrompt)) continue;
-  const auto lineOr = [](Lines const& lines, size_t at) {
+  auto const lineOr = [](Lines const& lines, size_t at) {
     return at < lines.size() ? lines[at] : "(the end)";
   };
   std::cout << path << ":" << i + 1 << ": after \"" << expected[prompt]
@@ -141,7 +141,7 @@ void tellDifference(std::string const& path, Lines const& expected, Lines const&
 Lines readFile(std::string const& path) {
   std::ifstream file(path, std::ios::binary);
   if (!file) throw std::runtime_error(path + ": cannot be opened");
-  const std::string text(std::istreambuf_iterator<char>(file), {});
+  std::string const text(std::istreambuf_iterator<char>(file), {});
   return splitLines(text);
 }
 
@@ -158,7 +158,7 @@ int main(int argc, char** argv) {
   std::string plugin, current;
   std::vector<std::string> paths;
   for (int i = 1; i < argc; ++i) {
-    const std::string arg = argv[i];
+    std::string const arg = argv[i];
     if (arg == "--update") {
       update = true;
     } else if (arg == "--dev") {
@@ -177,8 +177,8 @@ int main(int argc, char** argv) {
     std::filesystem::current_path(TALIX_TESTS_FOLDER);
     for (std::string const& path : paths) {
       current = path;
-      const Lines expected = readFile(path);
-      const Lines found = replayed(expected, plugin);
+      Lines const expected = readFile(path);
+      Lines const found = replayed(expected, plugin);
       if (found == expected) continue;
       if (update) {
         writeFile(path, found);

@@ -45,7 +45,7 @@ struct Statistics {
     least = count ? std::min(least, distance) : distance;
     greatest = count ? std::max(greatest, distance) : distance;
     count += times;
-    const double off = distance - mean;
+    double const off = distance - mean;
     mean += off * (static_cast<double>(times) / static_cast<double>(count));
     squares += off * (distance - mean) * static_cast<double>(times);
   }
@@ -58,7 +58,7 @@ class Walk {
  public:
   Walk(Node const* a, Node const* b, int64 step)
       : m_step(step), m_reader(std::array{a, b}, a->getDatabase()->getActiveClip()) {
-    const HTimeRange motion = m_reader.getMotionRange();
+    HTimeRange const motion = m_reader.getMotionRange();
     if (motion.isEmpty()) return;
     m_firstMoving = frameAtOrBefore(motion.getStart(), step);
     m_lastMoving = frameAtOrAfter(motion.getEnd(), step);
@@ -69,15 +69,15 @@ class Walk {
   void run(int64 first, int64 last, Visit visit) const {
     constexpr int64 kBlock = 4096;
     while (first <= last) {
-      const bool moves = first >= m_firstMoving && first < m_lastMoving;
+      bool const moves = first >= m_firstMoving && first < m_lastMoving;
       if (!moves) {
-        const int64 end = first < m_firstMoving ? std::min(last, m_firstMoving - 1) : last;
+        int64 const end = first < m_firstMoving ? std::min(last, m_firstMoving - 1) : last;
         visit(first, end - first + 1, at(first, 1)[0]);
         first = end + 1;
         continue;
       }
-      const int64 count = std::min({kBlock, last - first + 1, m_lastMoving - first});
-      const std::vector<double> distances = at(first, count);
+      int64 const count = std::min({kBlock, last - first + 1, m_lastMoving - first});
+      std::vector<double> const distances = at(first, count);
       for (int64 i = 0; i < count; ++i) visit(first + i, 1, distances[static_cast<size_t>(i)]);
       first += count;
     }
@@ -103,8 +103,8 @@ Statistics measure(Node const* a, Node const* b, TSimpleArray<HTimeRange> const&
                    int64 step = 0) {
   if (step <= 0) step = a->getDatabase()->getTimeManager()->getTicksPerFrame();
   step = std::min(step, kForever);
-  const NodeKeys keysOfA(a), keysOfB(b);
-  const Walk walk(a, b, step);
+  NodeKeys const keysOfA(a), keysOfB(b);
+  Walk const walk(a, b, step);
   Statistics found;
   for (HTimeRange range : ranges) {
     if (mustHaveKeys) {
@@ -151,7 +151,7 @@ double DistanceUtils::getMaxDistance(Node const* a, Node const* b, TSimpleArray<
 
 double DistanceUtils::getDistanceRange(Node const* a, Node const* b, TSimpleArray<HTimeRange> const& ranges,
                                        bool mustHaveKeys, int64 step) {
-  const Statistics found = measure(a, b, ranges, mustHaveKeys, step);
+  Statistics const found = measure(a, b, ranges, mustHaveKeys, step);
   return found.greatest - found.least;
 }
 

@@ -27,7 +27,7 @@ class Duplication {
   std::vector<Module*> make();
   // Null for a module that was not copied.
   Module* copyOf(Module const* original) const {
-    const auto found = m_copies.find(original);
+    auto const found = m_copies.find(original);
     return found == m_copies.end() ? nullptr : found->second;
   }
 
@@ -69,7 +69,7 @@ void Duplication::makeOne(Module* original) {
     m_copies.emplace(original, copy);
     return;
   }
-  const std::string limit = type->isSingleInstance() ? std::string("one ") + type->getName()
+  std::string const limit = type->isSingleInstance() ? std::string("one ") + type->getName()
                                                      : std::to_string(NLEClip::kMaximum) + " clips";
   writeLog(LogLevel::Warning, original->getMinimumPathString(false).GetString() +
                                   " was not duplicated: a scene holds at most " + limit);
@@ -123,7 +123,7 @@ void copyChannels(Module const& original, Module& copy) {
     own->setDefaultValues(channel.getDefaultValues());
     own->setInterpType(static_cast<int>(channel.getInterpolation()));
     own->setLocked(channel.isLocked());
-    const DataEdit edit(*own);
+    DataEdit const edit(*own);
     for (NLEClip* clip = own->getDatabase()->getHeadClip(); clip; clip = clip->getNext())
       copyKeys(channel, clip, *own, clip);
   }
@@ -135,7 +135,7 @@ void Duplication::copyNode(Node const& original, Node& copy) const {
   copy.setPreRotation(original.getPreRotation(), false);
   copy.setPreTranslation(original.getPreTranslation());
   for (int i = 0; i < original.getNumConnectingLines(); ++i) {
-    const MarkerConnection line = original.getConnectingLine(i);
+    MarkerConnection const line = original.getConnectingLine(i);
     MarkerConnection own(static_cast<Node*>(counterpart(line.getTarget())));
     own.setConnectingColor(line.getConnectingColor());
     copy.addConnectingLine(own);
@@ -160,7 +160,7 @@ void Duplication::copyClipKeys() const {
     Module* module = m_scene.getModule(i);
     for (int k = 0; k < module->getNumChannels(); ++k) {
       Controller* channel = module->getChannel(k);
-      const DataEdit edit(*channel);
+      DataEdit const edit(*channel);
       for (auto const& [clip, copy] : clips) copyKeys(*channel, clip, *channel, copy);
     }
   }
@@ -193,7 +193,7 @@ void Database::duplicateSelectedObjects() {
   for (int i = 0; i < getNumSelectedModules(); ++i) originals.push_back(getSelectedModule(i));
   Module const* primary = getPrimarySelectedModule();
   Duplication duplication(*this, std::move(originals));
-  const std::vector<Module*> copies = duplication.make();
+  std::vector<Module*> const copies = duplication.make();
   if (copies.empty()) return;
   m_selection.clear();
   for (Module* copy : copies) copy->setSelected(true);

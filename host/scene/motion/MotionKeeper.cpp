@@ -65,7 +65,7 @@ struct MotionKeeper::Part {
   // Above 1 a value is too far from what it ought to be. `reach`: how much the parent's scale makes of a
   // length.
   double deviation(Values const& value, Values const& ought, double reach) const {
-    const double apart = distance(value, ought);
+    double const apart = distance(value, ought);
     if (kind == kRotation) return apart / kAngleTolerance;
     if (kind == kScale) return apart / std::max(kScaleTolerance, kRelative * sizeOf(ought));
     return apart * reach / std::max(kLengthTolerance, kRelative * reach * sizeOf(ought));
@@ -153,7 +153,7 @@ void MotionKeeper::ClipMotion::collectTimes(MotionScope::Relation const& relatio
   for (ChannelState const* state : m_keeper.m_before.channels()) mergeKeyTimes(times, *state, m_clip);
   for (Controller const* channel : m_keeper.m_channels) mergeKeyTimes(times, *channel, *m_clip);
   if (!times.empty()) m_motion = HTimeRange(times.front(), times.back());
-  for (const int64 end : {m_keeper.m_range.getStart(), m_keeper.m_range.getEnd()})
+  for (int64 const end : {m_keeper.m_range.getStart(), m_keeper.m_range.getEnd()})
     if (hasEnd(end)) mergeTimes(times, {end});
   // What is keyed nowhere is told apart from the default value by one key.
   if (times.empty()) times.push_back(m_keeper.m_scene.getTimeManager()->getAnimRange().getStart());
@@ -162,7 +162,7 @@ void MotionKeeper::ClipMotion::collectTimes(MotionScope::Relation const& relatio
 }
 
 MotionKeeper::Goals const& MotionKeeper::ClipMotion::goalsAtFrames() const {
-  const int64 first = frameAfter(m_goals.times.front()), last = frameAtOrBefore(m_goals.times.back());
+  int64 const first = frameAfter(m_goals.times.front()), last = frameAtOrBefore(m_goals.times.back());
   if (m_frames.times.empty() && first <= last && (last - first) / m_period < kMostFrames) {
     KeyTimes frames;
     for (int64 time = first; time <= last; time += m_period) frames.push_back(time);
@@ -173,13 +173,13 @@ MotionKeeper::Goals const& MotionKeeper::ClipMotion::goalsAtFrames() const {
 
 MotionKeeper::Goals MotionKeeper::ClipMotion::goalsAt(KeyTimes times) const {
   // Rounds that ask for some of the known frames get them from there.
-  const bool known = !m_frames.times.empty() && std::all_of(times.begin(), times.end(), [this](int64 time) {
+  bool const known = !m_frames.times.empty() && std::all_of(times.begin(), times.end(), [this](int64 time) {
     return time % m_period == 0 && time >= m_frames.times.front() && time <= m_frames.times.back();
   });
   if (known) {
     Goals goals{std::move(times), {}, {}};
-    for (const int64 time : goals.times) {
-      const auto i = static_cast<size_t>((time - m_frames.times.front()) / m_period);
+    for (int64 const time : goals.times) {
+      auto const i = static_cast<size_t>((time - m_frames.times.front()) / m_period);
       goals.sums.push_back(m_frames.sums[i]);
       goals.reach.push_back(m_frames.reach[i]);
     }
@@ -189,7 +189,7 @@ MotionKeeper::Goals MotionKeeper::ClipMotion::goalsAt(KeyTimes times) const {
   goals.sums = m_node.readWorld(SampleTimes(goals.times));
   goals.reach.assign(goals.times.size(), 1);
   if (m_target) {
-    const std::vector<Transform> spaces = m_target->readWorld(SampleTimes(goals.times));
+    std::vector<Transform> const spaces = m_target->readWorld(SampleTimes(goals.times));
     for (size_t i = 0; i < spaces.size(); ++i) {
       Vec3 const& scale = spaces[i].scale;
       goals.sums[i] = goals.sums[i].relativeTo(spaces[i]);
@@ -199,7 +199,7 @@ MotionKeeper::Goals MotionKeeper::ClipMotion::goalsAt(KeyTimes times) const {
   for (Transform& sum : goals.sums) {
     sum = {m_keeper.m_back.rotate(sum.position - m_keeper.m_origin), m_keeper.m_back * sum.rotation,
            sum.scale};
-    for (const Kind kind : {kTranslation, kRotation, kScale})
+    for (Kind const kind : {kTranslation, kRotation, kScale})
       m_keeper.m_finite = m_keeper.m_finite && isFinite(Part{kind}.of(sum));
   }
   return goals;
@@ -209,7 +209,7 @@ MotionKeeper::Goals MotionKeeper::ClipMotion::goalsAt(KeyTimes times) const {
 
 std::vector<Values> MotionKeeper::ClipMotion::sampled(Part part, KeyTrack const* track,
                                                       KeyTimes const& times) const {
-  const Values otherwise =
+  Values const otherwise =
       m_layer == 0 ? m_keeper.m_defaults[static_cast<size_t>(part.kind)] : channel(part).neutral();
   return LayeredKeys{
       channel(part).getPropertyType(), channel(part).getInterpolation(), otherwise, {&track, 1}}
@@ -223,17 +223,17 @@ std::vector<Values> MotionKeeper::ClipMotion::valuesAt(Part part, Goals const& g
   if (m_clip->getNumLayers() > 1) {
     // All layers make the sum: what those below and above leave is this one's part.
     Controller const& own = channel(part);
-    const Values neutral = own.neutral();
+    Values const neutral = own.neutral();
     std::vector<KeyTrack const*> below, above{nullptr};
     for (int layer = 0; layer < m_clip->getNumLayers(); ++layer)
       if (layer != m_layer) (layer < m_layer ? below : above).push_back(own.findTrack(m_clip, layer));
-    const auto sum = [&](Values const& otherwise, std::vector<KeyTrack const*> const& layers) {
+    auto const sum = [&](Values const& otherwise, std::vector<KeyTrack const*> const& layers) {
       return LayeredKeys{own.getPropertyType(), own.getInterpolation(), otherwise, layers}.sample(
           SampleTimes(goals.times));
     };
-    const auto lower =
+    auto const lower =
         sum(m_layer == 0 ? neutral : m_keeper.m_defaults[static_cast<size_t>(part.kind)], below);
-    const auto upper = sum(neutral, above);
+    auto const upper = sum(neutral, above);
     for (size_t i = 0; i < values.size(); ++i) {
       if (part.kind == kRotation)
         values[i] = rawValues(rotationOf(lower[i]).inverse() * rotationOf(values[i]) *
@@ -243,7 +243,7 @@ std::vector<Values> MotionKeeper::ClipMotion::valuesAt(Part part, Goals const& g
     }
   }
   if (!m_keeper.isEverywhere()) {
-    const std::vector<Values> now = sampled(part, present(part), goals.times);
+    std::vector<Values> const now = sampled(part, present(part), goals.times);
     for (size_t i = 0; i < values.size(); ++i)
       if (!contains(goals.times[i])) values[i] = now[i];
   }
@@ -264,21 +264,21 @@ std::vector<HTimeRange> MotionKeeper::ClipMotion::spansOf(KeyTimes const& limits
 std::vector<bool> MotionKeeper::ClipMotion::deviating(Part part, KeyTrack const* track,
                                                       std::vector<HTimeRange> const& spans) const {
   if (spans.empty()) return {};
-  const bool all = !goalsAtFrames().times.empty();
+  bool const all = !goalsAtFrames().times.empty();
   KeyTimes times;
   std::vector<std::pair<size_t, double>> probes;  // span, and how much of the tolerance counts
   for (size_t i = 0; i < spans.size(); ++i) {
-    const int64 first = frameAfter(spans[i].getStart()), last = frameAtOrBefore(spans[i].getEnd() - 1);
-    const int64 step = all ? 1 : 1 + (last - first) / m_period / kProbes;
+    int64 const first = frameAfter(spans[i].getStart()), last = frameAtOrBefore(spans[i].getEnd() - 1);
+    int64 const step = all ? 1 : 1 + (last - first) / m_period / kProbes;
     // Between the probes it may be a little more.
     for (int64 time = first; time <= last; time += step * m_period)
       if (hasData(time)) times.push_back(time), probes.emplace_back(i, step == 1 ? 1 : 0.9);
   }
   std::vector<bool> deviates(spans.size());
   if (times.empty()) return deviates;
-  const std::vector<Values> is = sampled(part, track, times);
-  const Goals goals = goalsAt(std::move(times));
-  const std::vector<Values> ought = valuesAt(part, goals);
+  std::vector<Values> const is = sampled(part, track, times);
+  Goals const goals = goalsAt(std::move(times));
+  std::vector<Values> const ought = valuesAt(part, goals);
   for (size_t i = 0; i < probes.size(); ++i)
     if (part.deviation(is[i], ought[i], goals.reach[i]) > probes[i].second) deviates[probes[i].first] = true;
   return deviates;
@@ -290,22 +290,22 @@ KeyTimes MotionKeeper::ClipMotion::keysNeeded(Part part, std::vector<Values> con
   KeyTimes const& times = m_goals.times;
   KeyTimes own;
   mergeKeyTimes(own, channel(part), *m_clip);
-  for (const int64 end : {m_keeper.m_range.getStart(), m_keeper.m_range.getEnd()})
+  for (int64 const end : {m_keeper.m_range.getStart(), m_keeper.m_range.getEnd()})
     if (hasEnd(end)) mergeTimes(own, {end});
   keepOnly(own, [&](int64 time) { return std::binary_search(times.begin(), times.end(), time); });
   // Keys that are added later change a cubic curve beyond their neighbours.
-  const bool local = channel(part).getInterpolation() != Interpolation::Cubic;
+  bool const local = channel(part).getInterpolation() != Interpolation::Cubic;
   if (own.empty() || own.size() == times.size() || !local) return times;
 
   KeyTrack track =
       present(part) ? *present(part) : KeyTrack(Controller::shapeOf(channel(part).getPropertyType()));
   for (size_t i = 0, k = 0; k < own.size(); ++i)
     if (times[i] == own[k]) track.set(times[i], values[i]), ++k;
-  const std::vector<Values> is = sampled(part, &track, times);
+  std::vector<Values> const is = sampled(part, &track, times);
   KeyTimes needed;
   for (size_t i = 0, k = 0; i < times.size(); ++k) {
     // Up to and with the next own one.
-    const size_t first = i;
+    size_t const first = i;
     bool right = true;
     for (; i < times.size() && (k == own.size() || times[i] < own[k]); ++i)
       right &= part.same(values[i], is[i]);
@@ -320,21 +320,21 @@ KeyTimes MotionKeeper::ClipMotion::keysNeeded(Part part, std::vector<Values> con
 // Keys beside the ends of the range that hold what lies outside, where it would change. An end at which the
 // motion of all nodes ends has nothing outside.
 void MotionKeeper::ClipMotion::holdOutside(Part part, KeyTrack& track) const {
-  const int64 start = m_keeper.m_range.getStart(), end = m_keeper.m_range.getEnd();
-  const int64 first = m_motion.getStart(), last = m_motion.getEnd();
-  const bool startsAll = !m_motion.isEmpty() && first >= start && frameAtOrBefore(first) <= start;
-  const bool endsAll = !m_motion.isEmpty() && last <= end && frameAfter(last) > end;
+  int64 const start = m_keeper.m_range.getStart(), end = m_keeper.m_range.getEnd();
+  int64 const first = m_motion.getStart(), last = m_motion.getEnd();
+  bool const startsAll = !m_motion.isEmpty() && first >= start && frameAtOrBefore(first) <= start;
+  bool const endsAll = !m_motion.isEmpty() && last <= end && frameAfter(last) > end;
   KeyTimes beside;
   if (hasEnd(start) && !startsAll) beside.push_back(frameAtOrBefore(start - 1));
   if (hasEnd(end) && !endsAll) beside.push_back(frameAfter(end));
   // Where a marker was not seen there, what lies outside begins at its next key.
   for (int64& time : beside) {
     if (hasData(time)) continue;
-    const int64 key = time < start ? m_positions.lowerBound(time) - 1 : m_positions.lowerBound(time);
+    int64 const key = time < start ? m_positions.lowerBound(time) - 1 : m_positions.lowerBound(time);
     time = key < 0 || key >= m_positions.count() ? kForever : m_positions.timeAt(key);
   }
   keepOnly(beside, hasEnd);
-  const std::vector<Values> ought = sampled(part, present(part), beside), is = sampled(part, &track, beside);
+  std::vector<Values> const ought = sampled(part, present(part), beside), is = sampled(part, &track, beside);
   for (size_t i = 0; i < beside.size(); ++i)
     if (part.deviation(is[i], ought[i], 1) > 1) track.set(beside[i], ought[i]);
 }
@@ -344,25 +344,25 @@ void MotionKeeper::ClipMotion::refine(Part part, KeyTrack& track) const {
   KeyTimes limits = keyTimesOf(track);
   mergeTimes(limits, m_goals.times);
   for (std::vector<HTimeRange> spans = spansOf(limits); !spans.empty();) {
-    const std::vector<bool> deviates = deviating(part, &track, spans);
+    std::vector<bool> const deviates = deviating(part, &track, spans);
     KeyTimes added;
     for (size_t i = 0; i < spans.size(); ++i) {
       if (!deviates[i]) continue;
-      const int64 first = frameAfter(spans[i].getStart()), last = frameAtOrBefore(spans[i].getEnd() - 1);
+      int64 const first = frameAfter(spans[i].getStart()), last = frameAtOrBefore(spans[i].getEnd() - 1);
       added.push_back(first + (last - first) / m_period / 2 * m_period);
     }
     if (added.empty()) return;
-    const Goals goals = goalsAt(added);
-    const std::vector<Values> values = valuesAt(part, goals);
+    Goals const goals = goalsAt(added);
+    std::vector<Values> const values = valuesAt(part, goals);
     for (size_t i = 0; i < added.size(); ++i) track.set(added[i], values[i]);
     // A key changes the curve up to two keys away (cubic), or further where keys hold single components.
-    const bool far = track.countHolding(KeyTrack::kAll) < track.count();
+    bool const far = track.countHolding(KeyTrack::kAll) < track.count();
     KeyTimes near = keyTimesOf(track);
     spans = spansOf(near);
     if (far) continue;
     std::erase_if(spans, [&](HTimeRange const& span) {
-      const int64 from = track.find(span.getStart()), to = track.count() - 1;
-      const auto next =
+      int64 const from = track.find(span.getStart()), to = track.count() - 1;
+      auto const next =
           std::lower_bound(added.begin(), added.end(), track.timeAt(std::max<int64>(from - 2, 0)));
       return next == added.end() || *next > track.timeAt(std::min(from + 3, to));
     });
@@ -371,27 +371,27 @@ void MotionKeeper::ClipMotion::refine(Part part, KeyTrack& track) const {
 
 void MotionKeeper::ClipMotion::rekey(Part part) {
   if (m_goals.times.empty()) return;  // the node has nothing in the range
-  const std::vector<Values> values = valuesAt(part, m_goals);
-  const std::vector<Values> is = sampled(part, present(part), m_goals.times);
+  std::vector<Values> const values = valuesAt(part, m_goals);
+  std::vector<Values> const is = sampled(part, present(part), m_goals.times);
   bool right = true;
   for (size_t i = 0; i < values.size() && right; ++i) right = part.same(values[i], is[i]);
   if (right) {
-    const std::vector<bool> deviates = deviating(part, present(part), spansOf(m_goals.times));
+    std::vector<bool> const deviates = deviating(part, present(part), spansOf(m_goals.times));
     if (std::find(deviates.begin(), deviates.end(), true) == deviates.end()) return;
   }
-  if (const Obstacle obstacle = obstacleToKeys(channel(part), m_clip, m_layer); obstacle != Obstacle::none)
+  if (Obstacle const obstacle = obstacleToKeys(channel(part), m_clip, m_layer); obstacle != Obstacle::none)
     return m_keeper.cannotKeep(part, m_clip, reasonOf(obstacle));
 
   KeyTrack track =
       present(part) ? *present(part) : KeyTrack(Controller::shapeOf(channel(part).getPropertyType()));
   size_t i = 0;
-  for (const int64 time : keysNeeded(part, values)) {
+  for (int64 const time : keysNeeded(part, values)) {
     while (m_goals.times[i] != time) ++i;
     track.set(time, values[i]);
   }
   holdOutside(part, track);
   // What holds the outside may bend the curve inside, where the range ends without data.
-  const std::vector<Values> bent = sampled(part, &track, m_goals.times);
+  std::vector<Values> const bent = sampled(part, &track, m_goals.times);
   for (size_t k = 0; k < values.size(); ++k)
     if (!part.same(values[k], bent[k])) track.set(m_goals.times[k], values[k]);
   refine(part, track);
@@ -429,7 +429,7 @@ Values MotionKeeper::inNewSpace(Part part, MotionScope::Relation const& relation
   auto const& [from, to] = relation.spaces;
   switch (part.kind) {
     case kTranslation: {
-      const Transform place{m_origin + m_pre.rotate(Vec3(own.data())), {}, {1, 1, 1}};
+      Transform const place{m_origin + m_pre.rotate(Vec3(own.data())), {}, {1, 1, 1}};
       return rawValues(m_back.rotate(positionRelativeTo(to, (from * place).position) - m_origin));
     }
     case kRotation:
@@ -449,13 +449,13 @@ bool MotionKeeper::changes(Part part, MotionScope::Relation const& relation) con
 
 void MotionKeeper::keepDefaults() {
   MotionScope::Relation const& relation = m_scope.relation(m_before.parent, m_target, nullptr);
-  for (const Part part : {Part{kTranslation}, Part{kRotation}, Part{kScale}}) {
+  for (Part const part : {Part{kTranslation}, Part{kRotation}, Part{kScale}}) {
     Values& value = m_defaults[static_cast<size_t>(part.kind)];
-    const Values moved =
+    Values const moved =
         inNewSpace(part, relation, m_before.channels()[static_cast<size_t>(part.kind)]->byDefault);
     if (part.same(value, moved)) continue;
     m_finite = m_finite && isFinite(moved);
-    const Obstacle obstacle = obstacleToDefault(*m_channels[static_cast<size_t>(part.kind)]);
+    Obstacle const obstacle = obstacleToDefault(*m_channels[static_cast<size_t>(part.kind)]);
     if (obstacle == Obstacle::none)
       value = moved;
     else
@@ -468,14 +468,14 @@ void MotionKeeper::keepDefaults() {
 // value shows and is not right.
 bool MotionKeeper::moveKeys(Part part, NLEClip* clip, MotionScope::Relation const& relation) {
   Controller& channel = *m_channels[static_cast<size_t>(part.kind)];
-  const Values byDefault = m_before.channels()[static_cast<size_t>(part.kind)]->byDefault;
+  Values const byDefault = m_before.channels()[static_cast<size_t>(part.kind)]->byDefault;
   KeyTrack const* lowest = channel.findTrack(clip, 0);
   if ((!lowest || lowest->empty()) &&
       !part.same(inNewSpace(part, relation, byDefault), m_defaults[static_cast<size_t>(part.kind)]))
     return false;
   if (!changes(part, relation)) return true;
 
-  const Values zero = inNewSpace(part, relation, {});
+  Values const zero = inNewSpace(part, relation, {});
   std::vector<Change> moved;
   for (int layer = 0; layer < clip->getNumLayers(); ++layer) {
     KeyTrack const* track = channel.findTrack(clip, layer);
@@ -502,7 +502,7 @@ bool MotionKeeper::moveKeys(Part part, NLEClip* clip, MotionScope::Relation cons
 void MotionKeeper::keepInClip(NLEClip* clip) {
   MotionScope::Relation const& relation = m_scope.relation(m_before.parent, m_target, clip);
   std::optional<ClipMotion> motion;
-  for (const Part part : {Part{kTranslation}, Part{kRotation}, Part{kScale}}) {
+  for (Part const part : {Part{kTranslation}, Part{kRotation}, Part{kScale}}) {
     if (part.kind == kScale && !relation.scales) continue;
     if (!relation.moves && isEverywhere() && moveKeys(part, clip, relation)) continue;
     if (!motion) motion.emplace(*this, clip, relation);
@@ -548,11 +548,11 @@ void MotionKeeper::apply() {
   m_scope.remember(m_node);
   for (size_t i = 0; i < m_channels.size(); ++i) {
     if (m_defaults[i] == m_channels[i]->getDefaultValues()) continue;
-    const DataEdit edit = DataEdit::ofDefault(*m_channels[i]);
+    DataEdit const edit = DataEdit::ofDefault(*m_channels[i]);
     m_channels[i]->setDefaultValues(m_defaults[i]);
   }
   for (Change& change : m_changes) {
-    const DataEdit edit(*change.channel, m_range);
+    DataEdit const edit(*change.channel, m_range);
     change.channel->setTrack(change.clip, change.layer, std::move(change.track));
   }
 }
@@ -585,7 +585,7 @@ bool MotionKeeper::run() {
 bool Node::parentAdjust(Node* target, HTimeRange const& range) {
   if (range.isEmpty()) return true;
   if (target && (target == this || target->isDescendedFrom(this))) return false;
-  const MotionScope own(*getDatabase());
+  MotionScope const own(*getDatabase());
   MotionScope& scope = *getDatabase()->getMotionScope();
   scope.start();
   if (scope.formerParent(this) == target) return true;

@@ -21,17 +21,17 @@ void MotionScope::start() {
 }
 
 Node const* MotionScope::formerParent(Node const* node) const {
-  const auto found = m_parents.find(node);
+  auto const found = m_parents.find(node);
   return found == m_parents.end() ? node->getNodeParent() : found->second;
 }
 
 void MotionScope::remember(Node const& node) {
-  const auto [entry, isNew] = m_former.try_emplace(&node, node);
+  auto const [entry, isNew] = m_former.try_emplace(&node, node);
   if (isNew) entry->second.parent = formerParent(&node);
 }
 
 NodeState const* MotionScope::former(Node const* node) {
-  const auto found = m_former.find(node);
+  auto const found = m_former.find(node);
   if (found != m_former.end()) return &found->second;
   if (formerParent(node) == node->getNodeParent()) return nullptr;
   remember(*node);
@@ -39,7 +39,7 @@ NodeState const* MotionScope::former(Node const* node) {
 }
 
 NodeState MotionScope::stateOf(Node const& node) const {
-  const auto found = m_former.find(&node);
+  auto const found = m_former.find(&node);
   if (found != m_former.end()) return found->second;
   NodeState state(node);
   state.parent = formerParent(&node);
@@ -48,19 +48,19 @@ NodeState MotionScope::stateOf(Node const& node) const {
 
 MotionScope::Relation const& MotionScope::relation(Node const* parent, Node const* target,
                                                    NLEClip const* clip) {
-  const auto [entry, isNew] = m_relations.try_emplace({parent, target, clip});
+  auto const [entry, isNew] = m_relations.try_emplace({parent, target, clip});
   Relation& relation = entry->second;
   if (!isNew) return relation;
 
   std::vector<Node const*> before, after;
   for (Node const* node = parent; node; node = formerParent(node)) before.push_back(node);
   for (Node const* node = target; node; node = node->getNodeParent()) after.push_back(node);
-  const auto collect = [&](std::vector<Node const*> const& chain, std::vector<Node const*> const& other,
+  auto const collect = [&](std::vector<Node const*> const& chain, std::vector<Node const*> const& other,
                            bool then) {
     for (Node const* node : chain) {
-      const NodeState state = then ? stateOf(*node) : NodeState(*node);
+      NodeState const state = then ? stateOf(*node) : NodeState(*node);
       // What is above both cancels out, as long as it does not scale, since transforms do not shear.
-      const bool shared =
+      bool const shared =
           std::find(other.begin(), other.end(), node) != other.end() && !m_former.contains(node);
       for (ChannelState const* channel : state.channels()) {
         mergeKeyTimes(relation.times, *channel, clip);
@@ -71,7 +71,7 @@ MotionScope::Relation const& MotionScope::relation(Node const* parent, Node cons
   };
   collect(before, after, true);
   collect(after, before, false);
-  const auto at = [&](Node const* node, SceneReader::Former const& then) {
+  auto const at = [&](Node const* node, SceneReader::Former const& then) {
     return node ? SceneReader({&node, 1}, clip, then).readWorld(SampleTimes(0, 1, 1))[0] : Transform();
   };
   relation.spaces = {at(parent, [this](Node const* node) { return former(node); }), at(target, {})};

@@ -15,7 +15,7 @@ namespace {
 using testing::ElementsAre;
 
 TEST(HString, PartsAndComparison) {
-  const HString text("Hips:Spine");
+  HString const text("Hips:Spine");
   EXPECT_EQ(text.Left(4), "Hips");
   EXPECT_EQ(text.Right(5), "Spine");
   EXPECT_EQ(text.Left(100), text);
@@ -151,7 +151,7 @@ TEST(Variable, ElementsTakeTheArraysType) {
 
 // Each value with what it becomes as a text, or as an array: what cannot be converted stays as it is.
 TEST(Variable, ConvertsWhereNothingIsLost) {
-  const auto of = [](auto given) {
+  auto const of = [](auto given) {
     Variable value;
     value.setValue(given, -1);
     return value;
@@ -187,7 +187,7 @@ TEST(Variable, ConvertsWhereNothingIsLost) {
 }
 
 TEST(ControlID, TextIsADecimalNumber) {
-  const ControlID a(ControlID::CreateUnique), b(ControlID::CreateUnique);
+  ControlID const a(ControlID::CreateUnique), b(ControlID::CreateUnique);
   EXPECT_FALSE(a == b || a.isBlank());
   EXPECT_TRUE(ControlID(ControlID::CreateBlank).isBlank());
   std::wostringstream out;

@@ -21,16 +21,16 @@ class KeyReductionTest : public SceneTest {
     int64 time = -3000;
     Vec3 at = randomVec(1), slope;
     for (int run = 0; run < 8; ++run) {
-      const size_t kind = below(5);
+      size_t const kind = below(5);
       slope = randomVec(0.05);
-      const int64 step = below(4) ? kPeriod : kPeriod * 2 / 3;
+      int64 const step = below(4) ? kPeriod : kPeriod * 2 / 3;
       for (size_t i = 0, count = 3 + below(40); i < count; ++i) {
         time += step;
         if (kind == 0) at = at + slope;
         if (kind == 1) at = at + slope * std::sin(0.2 * static_cast<double>(i));
         if (kind == 2 && below(6) == 0) at = randomVec(1);
         if (kind == 3) at = at + randomVec(0.002);
-        const unsigned mask = partial && below(3) == 0 ? 1u << below(3) : unsigned{KeyTrack::kAll};
+        unsigned const mask = partial && below(3) == 0 ? 1u << below(3) : unsigned{KeyTrack::kAll};
         track.set(time, valuesOf(shape, at), mask);
       }
       if (below(2)) time += static_cast<int64>(below(12)) * kPeriod;
@@ -64,7 +64,7 @@ class KeyReductionTest : public SceneTest {
       times.insert(t);
     for (int64 i = 0; i < original.count(); ++i) times.insert(original.timeAt(i));
     double most = 0;
-    for (const int64 t : times) {
+    for (int64 const t : times) {
       KeyTrack::Values a{}, b{};
       original.evaluate(t, kind, {}, a);
       reduced.evaluate(t, kind, {}, b);
@@ -81,15 +81,15 @@ class KeyReductionTest : public SceneTest {
 };
 
 TEST_F(KeyReductionTest, NoCurveDeviatesBeyondTheToleranceAndEndsStay) {
-  for (const Shape shape : {Shape::Scalar, Shape::Vector, Shape::Rotation})
-    for (const Interpolation kind : {Interpolation::Constant, Interpolation::Linear, Interpolation::Cubic})
-      for (const bool partial : {false, true}) {
+  for (Shape const shape : {Shape::Scalar, Shape::Vector, Shape::Rotation})
+    for (Interpolation const kind : {Interpolation::Constant, Interpolation::Linear, Interpolation::Cubic})
+      for (bool const partial : {false, true}) {
         if (partial && shape != Shape::Vector) continue;
         int64 removed = 0;
         for (int round = 0; round < 60; ++round) {
-          const KeyTrack track = randomCurve(shape, partial);
-          const double tolerance = std::pow(10, uniform(-4, -0.5));
-          const KeyTrack reduced =
+          KeyTrack const track = randomCurve(shape, partial);
+          double const tolerance = std::pow(10, uniform(-4, -0.5));
+          KeyTrack const reduced =
               reducedBy(track, {.interpolation = kind, .tolerance = tolerance, .framePeriod = kPeriod});
           removed += track.count() - reduced.count();
           ASSERT_LE(farthest(track, reduced, kind), tolerance * (1 + 1e-9)) << static_cast<int>(kind);
@@ -97,7 +97,7 @@ TEST_F(KeyReductionTest, NoCurveDeviatesBeyondTheToleranceAndEndsStay) {
           ASSERT_EQ(reduced.at(0).components, track.at(0).components);
           ASSERT_EQ(reduced.timeAt(reduced.count() - 1), track.timeAt(track.count() - 1));
           for (int64 i = 0; i + 1 < track.count(); ++i) {
-            const int64 next = track.timeAt(i + 1);
+            int64 const next = track.timeAt(i + 1);
             if (track.timeAt(i) >= (next - 1) / kPeriod * kPeriod || next <= 0) continue;
             ASSERT_GE(reduced.find(track.timeAt(i)), 0) << "before a gap";
             ASSERT_GE(reduced.find(next), 0) << "after a gap";
@@ -110,13 +110,13 @@ TEST_F(KeyReductionTest, NoCurveDeviatesBeyondTheToleranceAndEndsStay) {
 TEST_F(KeyReductionTest, WhatIsSimpleIsFoundOut) {
   KeyTrack line(Shape::Scalar), steps(Shape::Scalar), arc(Shape::Rotation), parabola(Shape::Scalar);
   for (int64 i = 0; i <= 1000; ++i) {
-    const auto x = static_cast<double>(i);
+    auto const x = static_cast<double>(i);
     line.set(i * kPeriod, {3 * x - 7});
     steps.set(i * kPeriod, {std::floor(x / 100)});
     arc.set(i * kPeriod, valuesOf(Shape::Rotation, {0, 0.003 * x, 0}));
     parabola.set(i * kPeriod, {1e-3 * x * x});
   }
-  const auto left = [](KeyTrack const& track, Interpolation kind, double tolerance) {
+  auto const left = [](KeyTrack const& track, Interpolation kind, double tolerance) {
     return reducedBy(track, {.interpolation = kind, .tolerance = tolerance, .framePeriod = kPeriod}).count();
   };
   EXPECT_EQ(left(line, Interpolation::Linear, 1e-9), 2);
@@ -134,10 +134,10 @@ TEST_F(KeyReductionTest, OnlyKeysThatMayGoDo) {
   KeyTrack line(Shape::Scalar);
   for (int64 i = 0; i <= 20; ++i) line.set(i * kPeriod, {2.0 * static_cast<double>(i)});
   line.select(4 * kPeriod, 9 * kPeriod);
-  const ReductionRule rule{.tolerance = 1e-9, .framePeriod = kPeriod, .mayGo = [](KeyTrack::Key const& key) {
+  ReductionRule const rule{.tolerance = 1e-9, .framePeriod = kPeriod, .mayGo = [](KeyTrack::Key const& key) {
                              return key.time % 300 != 0;
                            }};
-  const KeyTrack reduced = reducedBy(line, rule);
+  KeyTrack const reduced = reducedBy(line, rule);
   EXPECT_EQ(reduced.count(), 8);
   EXPECT_EQ(reduced.countSelected(), 2) << "what stays keeps its selection";
 }
@@ -150,12 +150,12 @@ class ReduceChannelTest : public SceneTest {
   void fill(Vec3Controller* channel, std::string const& seen, double bend = 0) {
     for (size_t i = 0; i < seen.size(); ++i)
       if (seen[i] != ' ') {
-        const auto x = static_cast<double>(i);
+        auto const x = static_cast<double>(i);
         channel->setKey(static_cast<int64>(i) * kFrame, {x, bend * x * x, 0}, KeyTrack::kAll);
       }
   }
   static int reduceAll(Controller* channel, ReductionTolerances const& by) {
-    const HTimeRange all[] = {HTimeRange::forever()};
+    HTimeRange const all[] = {HTimeRange::forever()};
     return channel->reduceKeys(all, by);
   }
   // x: a key, -: a bridge, blank: no data.
@@ -193,7 +193,7 @@ TEST_F(ReduceChannelTest, ThinningOpensNoGapAndClosesNone) {
 TEST_F(ReduceChannelTest, ReducedCurvesCanBeReducedFurther) {
   fill(m_channel, std::string(200, 'x'), 0.01);
   EXPECT_GT(reduceAll(m_channel, m_tolerances), 100);
-  const int left = m_channel->getNumKeys();
+  int const left = m_channel->getNumKeys();
   EXPECT_GT(reduceAll(m_channel, {.length = 1, .angle = 0, .ofRange = 0}), left / 3);
   EXPECT_EQ(data(m_channel, 201).find(' '), 200u);
 }
@@ -213,11 +213,11 @@ TEST_F(ReduceChannelTest, RangesThatHoldEveryKeyAndSelectionOfAllAreAll) {
     m_channel->deleteKeys(HTimeRange::forever(), KeyTrack::kAll, true);
     fill(m_channel, "xxxxxxxxxxxxx  xxxxxxxxx", 0.05);
     m_channel->selectKeys(HTimeRange::forever(), KeyTrack::kAll);
-    const HTimeRange ranges[] = {{0, 6 * kFrame}, {6 * kFrame + 1, 40 * kFrame}};
-    const int removed = way == 0   ? reduceAll(m_channel, m_tolerances)
+    HTimeRange const ranges[] = {{0, 6 * kFrame}, {6 * kFrame + 1, 40 * kFrame}};
+    int const removed = way == 0   ? reduceAll(m_channel, m_tolerances)
                         : way == 1 ? m_channel->reduceKeys(ranges, m_tolerances)
                                    : m_channel->reduceSelectedKeys(m_tolerances);
-    const std::string left = keys(m_channel, 24);
+    std::string const left = keys(m_channel, 24);
     EXPECT_EQ(left.substr(12, 4), "x  x");
     EXPECT_EQ(removed, 22 - m_channel->getNumKeys());
     if (way == 0) wanted = left;
@@ -230,9 +230,9 @@ TEST_F(ReduceChannelTest, ToleranceGoesByTheKindOfChannel) {
   auto* scale = m_marker->getScaleChannel();
   auto* whole = static_cast<IntController*>(m_marker->addChannel("Count", DataSource::IntProperty));
   whole->setInterpType(static_cast<int>(Interpolation::Linear));
-  const auto wobble = [&](double end) {
+  auto const wobble = [&](double end) {
     for (int i = 0; i < 10; ++i) {
-      const Vec3 value(i == 9 ? end : 0.05 * (i % 2), 0, 0);
+      Vec3 const value(i == 9 ? end : 0.05 * (i % 2), 0, 0);
       m_channel->setKey(i * kFrame, value, KeyTrack::kAll);
       scale->setKey(i * kFrame, value, KeyTrack::kAll);
       whole->setKey(i * kFrame, i == 9 ? static_cast<int>(end) : i % 2, KeyTrack::kAll);

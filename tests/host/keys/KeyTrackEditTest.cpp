@@ -62,7 +62,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
   // Mixes values that repeat, that floats hold, and that only doubles hold.
   Values values() {
     Values v{};
-    const int64 kind = upTo(3);
+    int64 const kind = upTo(3);
     for (size_t c = 0; c < static_cast<size_t>(GetParam().shape); ++c)
       v[c] = kind < 2    ? 2.5
              : kind == 2 ? static_cast<double>(upTo(1000)) / 8
@@ -71,18 +71,18 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
   }
 
   void setOne(int64 at) {
-    const Values v = values();
-    const unsigned m = mask();
+    Values const v = values();
+    unsigned const m = mask();
     track.set(at, v, m);
     model.set(at, v, m);
   }
 
   void appendRun() {
-    const int64 n = upTo(GetParam().limits.leafKeys * 3), period = 1 + upTo(3);
-    const int64 start = (model.keys.empty() ? 0 : model.keys.back().time) + 1 + upTo(4);
+    int64 const n = upTo(GetParam().limits.leafKeys * 3), period = 1 + upTo(3);
+    int64 const start = (model.keys.empty() ? 0 : model.keys.back().time) + 1 + upTo(4);
     std::vector<double> flat;
     for (int64 i = 0; i < n; ++i) {
-      const Values v = values();
+      Values const v = values();
       flat.insert(flat.end(), v.begin(), v.begin() + track.width());
       model.set(start + i * period, v, 7);
     }
@@ -91,14 +91,14 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
 
   void eraseOne() {
     if (model.keys.empty()) return;
-    const int64 i = oneIn(3) ? 0 : oneIn(3) ? model.size() - 1 : upTo(model.size() - 1), t = model.at(i).time;
-    const unsigned m = mask();
+    int64 const i = oneIn(3) ? 0 : oneIn(3) ? model.size() - 1 : upTo(model.size() - 1), t = model.at(i).time;
+    unsigned const m = mask();
     ASSERT_EQ(track.erase(i, m), model.eraseRange(t, t, m));
   }
 
   void changeRange() {
-    const int64 first = time(), last = first + (oneIn(12) ? GetParam().span : upTo(GetParam().span / 24));
-    const unsigned m = mask();
+    int64 const first = time(), last = first + (oneIn(12) ? GetParam().span : upTo(GetParam().span / 24));
+    unsigned const m = mask();
     switch (upTo(11)) {
       case 0:
         ASSERT_EQ(track.eraseRange(first, last, m), model.eraseRange(first, last, m));
@@ -123,7 +123,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
         return deleteRange(first, first + upTo(7), m);
       case 9:
       case 10: {
-        const bool on = !oneIn(4);
+        bool const on = !oneIn(4);
         on ? track.bridge(first, last, m) : track.unbridge(first, last, m);
         model.bridge(first, last, m, on);
         break;
@@ -139,20 +139,20 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
   template <class Gone>
   void compareData(Gone gone) {
     ASSERT_STREQ(track.checkInvariants(), "");
-    const KeyTrackModel before = model;
-    const KeyTrack curve = std::exchange(m_before, KeyTrack(GetParam().shape));
+    KeyTrackModel const before = model;
+    KeyTrack const curve = std::exchange(m_before, KeyTrack(GetParam().shape));
     model.keys.clear();
     track.forEach(0, track.count(), [&](Key const& key) { model.keys.push_back(key); });
-    const int64 end = before.keys.empty() ? -1 : before.keys.back().time;
-    const std::vector<unsigned> had = before.dataAt(0, end, kFrame), has = model.dataAt(0, end, kFrame);
+    int64 const end = before.keys.empty() ? -1 : before.keys.back().time;
+    std::vector<unsigned> const had = before.dataAt(0, end, kFrame), has = model.dataAt(0, end, kFrame);
     for (size_t i = 0; i < had.size(); ++i)
       if (had[i] != has[i] || oneIn(8)) {
-        const int64 t = static_cast<int64>(i) * kFrame;
+        int64 const t = static_cast<int64>(i) * kFrame;
         ASSERT_EQ(has[i], had[i] & ~gone(before, t)) << "at " << t;
       }
     for (Key const& key : model.keys) {
-      const int64 old = before.find(key.time);
-      const unsigned added = key.components & ~(old < 0 ? 0u : before.at(old).components);
+      int64 const old = before.find(key.time);
+      unsigned const added = key.components & ~(old < 0 ? 0u : before.at(old).components);
       ASSERT_TRUE(added == 0 || key.time % kFrame == 0);
       Values expected{};
       curve.evaluate(key.time, kBridgeEnds.interpolation, {}, expected);
@@ -179,9 +179,9 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
     compareData([&](KeyTrackModel const& before, int64 t) {
       unsigned lost = 0;
       for (unsigned c = 1; c < 8; c *= 2) {
-        const int64 next = before.nextHolder(before.lowerBound(t) - 1, c);
-        const int64 last = before.walk(before.lowerBound(t + 1), -1, &Key::components, c);
-        const auto chosen = [&](int64 i) {
+        int64 const next = before.nextHolder(before.lowerBound(t) - 1, c);
+        int64 const last = before.walk(before.lowerBound(t + 1), -1, &Key::components, c);
+        auto const chosen = [&](int64 i) {
           return i >= 0 && (before.at(i).selected & c & before.normal(mask)) != 0;
         };
         if (chosen(next) && chosen(last)) lost |= c;
@@ -192,11 +192,11 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
 
   void thin() {
     std::vector<unsigned char> lost(model.keys.size());
-    const bool much = oneIn(2);
+    bool const much = oneIn(2);
     for (unsigned char& each : lost)
       if (oneIn(much ? 3 : 40)) each = static_cast<unsigned char>(model.normal(mask()));
     for (unsigned c = 1; c < 8; c *= 2)
-      if (const int64 last = model.walk(model.size(), -1, &Key::components, c); last >= 0)
+      if (int64 const last = model.walk(model.size(), -1, &Key::components, c); last >= 0)
         lost[static_cast<size_t>(last)] = 0;
     ASSERT_EQ(track.thin(lost), model.thin(lost));
   }
@@ -205,7 +205,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
     if (model.keys.empty()) return;
     Key& key = model.at(upTo(model.size() - 1));
     track.restoreNone(key.time);
-    const Values fresh = values();
+    Values const fresh = values();
     for (size_t c = 0; c < static_cast<size_t>(GetParam().shape); ++c)
       if (GetParam().shape != Shape::Vector || key.components >> c & 1) key.values[c] = fresh[c];
     key.selected = key.components;
@@ -214,19 +214,19 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
 
   void setSelected() {
     if (model.keys.empty()) return;
-    const int64 i = upTo(model.size() - 1);
-    const unsigned flags = mask();
+    int64 const i = upTo(model.size() - 1);
+    unsigned const flags = mask();
     track.setSelected(i, flags);
     model.at(i).selected = static_cast<unsigned char>(model.normal(flags) & model.at(i).components);
   }
 
   void step() {
-    const int64 what = upTo(99);
-    const bool large = model.size() > GetParam().span / 2;
+    int64 const what = upTo(99);
+    bool const large = model.size() > GetParam().span / 2;
     if (what < 40) {
       setOne(time());
     } else if (what < 45 && !large) {
-      const int64 start = time();  // a row of neighbours, as recording over a stretch writes them
+      int64 const start = time();  // a row of neighbours, as recording over a stretch writes them
       for (int64 i = upTo(20); i >= 0; --i) setOne(start + i);
     } else if (what < 47 && !large) {
       appendRun();
@@ -242,21 +242,21 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
   }
 
   void compareRanges() {
-    const unsigned mask = 1 + static_cast<unsigned>(upTo(6));
-    const bool all = oneIn(2);
-    const DataRanges ranges(track, kFrame, mask, all ? DataRanges::Where::All : DataRanges::Where::Any);
-    const int64 first = time() - 7, last = first + upTo(GetParam().span / 2);
-    const unsigned wanted = model.normal(mask);
+    unsigned const mask = 1 + static_cast<unsigned>(upTo(6));
+    bool const all = oneIn(2);
+    DataRanges const ranges(track, kFrame, mask, all ? DataRanges::Where::All : DataRanges::Where::Any);
+    int64 const first = time() - 7, last = first + upTo(GetParam().span / 2);
+    unsigned const wanted = model.normal(mask);
     // With room for the runs that reach beyond the range.
-    const int64 from = -10 * kFrame, to = GetParam().span * 3 + 100;
-    const std::vector<unsigned> data = model.dataAt(from, to, kFrame);
-    const auto hasData = [&](int64 frameTime) {
+    int64 const from = -10 * kFrame, to = GetParam().span * 3 + 100;
+    std::vector<unsigned> const data = model.dataAt(from, to, kFrame);
+    auto const hasData = [&](int64 frameTime) {
       if (frameTime < from || frameTime > to) return false;
-      const unsigned here = data[static_cast<size_t>((frameTime - from) / kFrame)] & wanted;
+      unsigned const here = data[static_cast<size_t>((frameTime - from) / kFrame)] & wanted;
       return all ? here == wanted : here != 0;
     };
     std::vector<int64> seen, missing, expectedSeen, expectedMissing;
-    const auto collectInto = [](std::vector<int64>& into) {
+    auto const collectInto = [](std::vector<int64>& into) {
       return [&into](int64 start, int64 end) {
         ASSERT_TRUE(into.empty() || start > into.back() + kFrame) << "runs that touch";
         for (; start <= end; start += kFrame) into.push_back(start);
@@ -268,9 +268,9 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
       (hasData(t) ? expectedSeen : expectedMissing).push_back(t);
     ASSERT_EQ(seen, expectedSeen) << "components " << wanted;
     ASSERT_EQ(missing, expectedMissing);
-    const unsigned any = model.dataAt(first, first, 1).front() & wanted;
+    unsigned const any = model.dataAt(first, first, 1).front() & wanted;
     ASSERT_EQ(ranges.hasDataAt(first), all ? any == wanted : any != 0);
-    const HTimeRange gap = ranges.nextGap(first, last), range = ranges.nextRange(first, last);
+    HTimeRange const gap = ranges.nextGap(first, last), range = ranges.nextRange(first, last);
     ASSERT_EQ(gap.isEmpty(), missing.empty());
     ASSERT_EQ(range.isEmpty(), seen.empty());
     ASSERT_TRUE(gap.isEmpty() || (gap.getStart() == missing.front() && !hasData(gap.getEnd())));
@@ -288,7 +288,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
     for (unsigned m = 0; m < 8; ++m) {
       ASSERT_EQ(track.countHolding(m), model.countHolding(m)) << m;
       ASSERT_EQ(track.countSelected(m), model.countSelected(m)) << m;
-      const int64 i = upTo(model.size() + 3) - 2;
+      int64 const i = upTo(model.size() + 3) - 2;
       ASSERT_EQ(track.nextHolding(i, m), model.walk(i, 1, &Key::components, m)) << i << " " << m;
       ASSERT_EQ(track.nextSelected(i, m), model.walk(i, 1, &Key::selected, m)) << i << " " << m;
       ASSERT_EQ(track.previousHolding(i, m), model.walk(i, -1, &Key::components, m)) << i << " " << m;
@@ -297,7 +297,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
       ASSERT_EQ(track.previousUnselected(i, m), model.walk(i, -1, &Key::selected, m, false)) << i << " " << m;
     }
     for (int n = 0; n < 4; ++n) {
-      const int64 t = time() - 2;
+      int64 const t = time() - 2;
       ASSERT_EQ(track.find(t), model.find(t));
       ASSERT_EQ(track.lowerBound(t), model.lowerBound(t));
     }
@@ -309,7 +309,7 @@ class KeyTrackEdits : public testing::TestWithParam<Setup> {
       }
     }
     if (model.keys.empty()) return;
-    const int64 i = upTo(model.size() - 1);
+    int64 const i = upTo(model.size() - 1);
     int64 k = i;
     track.forEach(i, std::min(i + 20, model.size()),
                   [&](Key const& key) { ASSERT_EQ(key.time, model.at(k++).time); });

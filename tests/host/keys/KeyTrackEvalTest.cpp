@@ -24,7 +24,7 @@ double scalarAt(KeyTrack const& track, int64 time, Interpolation interpolation) 
 template <class Curve>
 KeyTrack sample(std::vector<int64> const& times, Curve curve) {
   KeyTrack track(Shape::Scalar);
-  for (const int64 t : times) track.set(t, {curve(static_cast<double>(t))});
+  for (int64 const t : times) track.set(t, {curve(static_cast<double>(t))});
   return track;
 }
 
@@ -33,7 +33,7 @@ double angleAboutZ(Values const& q) { return 2 * std::atan2(q[2], q[3]); }
 
 TEST(KeyTrackEval, EmptyTrackHasTheDefaults) {
   Values out{};
-  for (const Interpolation kind : kAllKinds) {
+  for (Interpolation const kind : kAllKinds) {
     KeyTrack(Shape::Vector).evaluate(5, kind, {1, 2, 3}, out);
     EXPECT_EQ(out, (Values{1, 2, 3}));
     EXPECT_EQ(KeyTrack(Shape::Scalar).evaluateComponent(5, kind, 0, 8), 8);
@@ -42,8 +42,8 @@ TEST(KeyTrackEval, EmptyTrackHasTheDefaults) {
 
 TEST(KeyTrackEval, TheEndsHoldAndKeysAreMet) {
   KeyTrack track(Shape::Scalar);
-  for (const auto& [time, value] : {std::pair{10, 1.0}, {20, 3.0}, {50, -2.0}}) track.set(time, {value});
-  for (const Interpolation kind : kAllKinds) {
+  for (auto const& [time, value] : {std::pair{10, 1.0}, {20, 3.0}, {50, -2.0}}) track.set(time, {value});
+  for (Interpolation const kind : kAllKinds) {
     EXPECT_EQ(scalarAt(track, -1000, kind), 1);
     EXPECT_EQ(scalarAt(track, 10, kind), 1);
     EXPECT_EQ(scalarAt(track, 20, kind), 3);
@@ -75,10 +75,10 @@ TEST(KeyTrackEval, TheWholeTimeLine) {
 }
 
 TEST(KeyTrackEval, CubicOverUnevenTimes) {
-  const std::vector<int64> times = {0, 10, 14, 40, 41, 60};
-  const auto line = [](double t) { return 3 - 0.25 * t; };
-  const auto parabola = [](double t) { return 0.5 * t * t - 3 * t + 1; };
-  const KeyTrack lines = sample(times, line), parabolas = sample(times, parabola);
+  std::vector<int64> const times = {0, 10, 14, 40, 41, 60};
+  auto const line = [](double t) { return 3 - 0.25 * t; };
+  auto const parabola = [](double t) { return 0.5 * t * t - 3 * t + 1; };
+  KeyTrack const lines = sample(times, line), parabolas = sample(times, parabola);
   for (int64 t = 0; t <= 60; ++t) {
     EXPECT_NEAR(scalarAt(lines, t, kCubic), line(static_cast<double>(t)), 1e-12);
     if (t >= 10 && t <= 41) {
@@ -87,7 +87,7 @@ TEST(KeyTrackEval, CubicOverUnevenTimes) {
   }
   // Keys 0, 0, 8, 8 one tick apart times 10: in the middle of the first span the slopes are 0 and 4 per span,
   // which bends the curve by -(4 - 0) / 8; the middle span is symmetric.
-  const KeyTrack step = sample({0, 10, 20, 30}, [](double t) { return t < 15 ? 0.0 : 8.0; });
+  KeyTrack const step = sample({0, 10, 20, 30}, [](double t) { return t < 15 ? 0.0 : 8.0; });
   EXPECT_NEAR(scalarAt(step, 5, kCubic), -0.5, 1e-12);
   EXPECT_NEAR(scalarAt(step, 15, kCubic), 4, 1e-12);
 }
@@ -105,7 +105,7 @@ TEST(KeyTrackEval, SlerpTakesTheShorterArc) {
   Values flipped = aboutZ(1.0);  // the same rotation
   for (double& v : flipped) v = -v;
   track.set(100, flipped);
-  for (const Interpolation kind : {kLinear, kCubic}) {
+  for (Interpolation const kind : {kLinear, kCubic}) {
     track.evaluate(50, kind, {}, out);
     EXPECT_NEAR(std::abs(out[2] * aboutZ(0.6)[2] + out[3] * aboutZ(0.6)[3]), 1, 1e-12);
   }
@@ -131,7 +131,7 @@ TEST(KeyTrackEval, SquadAboutOneAxisIsTheCubicOfTheAngle) {
   Values out{};
   for (int64 t = 0; t < time; t += 7) {
     turns.evaluate(t, kCubic, {}, out);
-    const double expected = scalarAt(angles, t, kCubic);
+    double const expected = scalarAt(angles, t, kCubic);
     EXPECT_NEAR(std::remainder(angleAboutZ(out) - expected, 2 * std::acos(-1.0)), 0, 1e-9) << t;
     EXPECT_NEAR(out[0] * out[0] + out[1] * out[1] + out[2] * out[2] + out[3] * out[3], 1, 1e-12);
   }
@@ -139,23 +139,23 @@ TEST(KeyTrackEval, SquadAboutOneAxisIsTheCubicOfTheAngle) {
 
 TEST(KeyTrackEval, SquadIsSmoothAtTheKeys) {
   KeyTrack track(Shape::Rotation);
-  const Values keys[] = {
+  Values const keys[] = {
       {0.1, 0.2, 0.3, 0.9}, {0.3, 0.1, 0.2, 0.9}, {0.0, 0.4, 0.1, 0.8}, {-0.2, 0.3, 0.3, 0.9}};
-  const int64 times[] = {0, 1'000'000, 4'000'000, 5'000'000};
+  int64 const times[] = {0, 1'000'000, 4'000'000, 5'000'000};
   for (size_t i = 0; i < 4; ++i) {
     Values q = keys[i];
-    const double length = std::sqrt(q[0] * q[0] + q[1] * q[1] + q[2] * q[2] + q[3] * q[3]);
+    double const length = std::sqrt(q[0] * q[0] + q[1] * q[1] + q[2] * q[2] + q[3] * q[3]);
     for (double& v : q) v /= length;
     track.set(times[i], q);
   }
-  for (const int64 t : {times[1], times[2]}) {
+  for (int64 const t : {times[1], times[2]}) {
     Values before{}, at{}, after{};
     track.evaluate(t - 100, kCubic, {}, before);
     track.evaluate(t, kCubic, {}, at);
     track.evaluate(t + 100, kCubic, {}, after);
     double speed = 0;
     for (size_t c = 0; c < 4; ++c) {
-      const double arriving = (at[c] - before[c]) / 100, leaving = (after[c] - at[c]) / 100;
+      double const arriving = (at[c] - before[c]) / 100, leaving = (after[c] - at[c]) / 100;
       EXPECT_NEAR(arriving, leaving, 1e-10) << "component " << c << " at " << t;
       speed += std::abs(leaving);
     }
@@ -167,10 +167,10 @@ TEST(KeyTrackEval, SquadIsSmoothAtTheKeys) {
 KeyTrack partialTrack(std::mt19937& random) {
   KeyTrack track(Shape::Vector, {6, 4});
   for (int i = 0; i < 900; ++i) {
-    const int64 time = static_cast<int64>(random() % 20'000);
-    const auto value = [&] { return static_cast<double>(random() % 10'000) / 7; };
+    int64 const time = static_cast<int64>(random() % 20'000);
+    auto const value = [&] { return static_cast<double>(random() % 10'000) / 7; };
     // z is rare, so that its neighbours lie leaves away
-    const unsigned mask = i % 100 == 0 ? 4 : 1 + random() % 3;
+    unsigned const mask = i % 100 == 0 ? 4 : 1 + random() % 3;
     track.set(time, {value(), value(), value()}, mask);
   }
   return track;
@@ -178,7 +178,7 @@ KeyTrack partialTrack(std::mt19937& random) {
 
 TEST(KeyTrackEval, EachComponentComesFromTheKeysThatHoldIt) {
   std::mt19937 random(11);
-  const KeyTrack track = partialTrack(random);
+  KeyTrack const track = partialTrack(random);
   KeyTrack::Cursor cursor;
   for (int c = 0; c < 3; ++c) {
     KeyTrack alone(Shape::Scalar);
@@ -186,7 +186,7 @@ TEST(KeyTrackEval, EachComponentComesFromTheKeysThatHoldIt) {
       if (key.components >> c & 1) alone.set(key.time, {key.values[static_cast<size_t>(c)]});
     });
     ASSERT_EQ(alone.count(), track.countHolding(1u << c));
-    for (const Interpolation kind : kAllKinds) {
+    for (Interpolation const kind : kAllKinds) {
       for (int64 t = -50; t < 20'050; t += 13) {
         Values whole{};
         track.evaluate(t, kind, {}, whole, &cursor);
@@ -209,26 +209,26 @@ class EvaluationModes : public testing::TestWithParam<std::tuple<Shape, KeyTrack
 
   // Values that repeat, that floats hold, and that only doubles hold.
   Values randomValues() {
-    const auto x = static_cast<double>(upTo(6000)) / (upTo(1) ? 1024 : 1000);
+    auto const x = static_cast<double>(upTo(6000)) / (upTo(1) ? 1024 : 1000);
     if (m_track.shape() == Shape::Rotation) return upTo(2) ? aboutZ(x) : aboutZ(1);
     return upTo(2) ? Values{x, 1.0 / 3, 2 * x} : Values{1, 2, 3};
   }
 
   void appendRun() {
-    const int64 last = m_track.empty() ? 0 : m_track.timeAt(m_track.count() - 1), period = 1 + upTo(5);
-    const Values repeated = randomValues();
+    int64 const last = m_track.empty() ? 0 : m_track.timeAt(m_track.count() - 1), period = 1 + upTo(5);
+    Values const repeated = randomValues();
     std::vector<double> flat;
-    const bool repeats = upTo(1), step = upTo(1);
+    bool const repeats = upTo(1), step = upTo(1);
     int64 n = upTo(400);
     for (int64 i = 0; i < n; ++i) {
-      const Values v = repeats && (!step || i < n / 2) ? repeated : randomValues();
+      Values const v = repeats && (!step || i < n / 2) ? repeated : randomValues();
       flat.insert(flat.end(), v.begin(), v.begin() + m_track.width());
     }
     if (last < 4000) m_track.append(last + 1 + upTo(9), period, flat.data(), n);
   }
 
   void edit() {
-    const int64 what = upTo(99);
+    int64 const what = upTo(99);
     if (what < 8) m_track.set(upTo(4000), randomValues(), 1 + static_cast<unsigned>(upTo(6)));
     if (what == 8 && !m_track.empty())
       m_track.erase(upTo(m_track.count() - 1), 1 + static_cast<unsigned>(upTo(6)));
@@ -241,9 +241,9 @@ class EvaluationModes : public testing::TestWithParam<std::tuple<Shape, KeyTrack
   }
 
   void compareSamples(SampleTimes const& times, Interpolation kind) {
-    const Values defaults = {1, 2, 3, 4};
-    const unsigned mask = upTo(2) ? 7 : static_cast<unsigned>(upTo(7));
-    const ptrdiff_t stride = m_track.width() + upTo(2);
+    Values const defaults = {1, 2, 3, 4};
+    unsigned const mask = upTo(2) ? 7 : static_cast<unsigned>(upTo(7));
+    ptrdiff_t const stride = m_track.width() + upTo(2);
     constexpr double kUntouched = 99;
     std::vector<double> sampled(static_cast<size_t>(times.count() * stride), kUntouched);
     m_track.sample(times, kind, defaults, mask, sampled.data(), stride);
@@ -251,7 +251,7 @@ class EvaluationModes : public testing::TestWithParam<std::tuple<Shape, KeyTrack
       Values single{};
       m_track.evaluate(times[i], kind, defaults, single);
       for (int c = 0; c < stride; ++c) {
-        const bool wanted =
+        bool const wanted =
             c < m_track.width() && (m_track.shape() == Shape::Vector ? mask >> c & 1 : mask != 0);
         ASSERT_NEAR(sampled[static_cast<size_t>(i * stride + c)],
                     wanted ? single[static_cast<size_t>(c)] : kUntouched, 1e-12)
@@ -261,13 +261,13 @@ class EvaluationModes : public testing::TestWithParam<std::tuple<Shape, KeyTrack
   }
 
   void compareSamples(Interpolation kind) {
-    const int64 start = upTo(4500) - 200;
+    int64 const start = upTo(4500) - 200;
     compareSamples(SampleTimes(start, 1 + (upTo(1) ? upTo(11) : upTo(900)), upTo(300)), kind);
     if (!m_track.empty()) {  // at the keys, as far as a run has this period
       compareSamples(SampleTimes(m_track.timeAt(upTo(m_track.count() - 1)), 1 + upTo(5), upTo(300)), kind);
     }
     std::vector<int64> times;
-    const int64 most = upTo(1) ? 3 : 300;
+    int64 const most = upTo(1) ? 3 : 300;
     for (int64 n = upTo(100), time = start; n > 0; --n) times.push_back(time += upTo(most));
     compareSamples(SampleTimes(times), kind);
   }
@@ -281,7 +281,7 @@ TEST_P(EvaluationModes, AgreeWhateverWasEdited) {
   int64 time = 0;
   for (int step = 0; step < 12'000; ++step) {
     edit();
-    const Interpolation kind = kAllKinds[upTo(2)];
+    Interpolation const kind = kAllKinds[upTo(2)];
     time = upTo(99) > 95 ? upTo(4200) - 100 : time + upTo(3);
     Values with{}, without{};
     m_track.evaluate(time, kind, {1, 2, 3, 4}, with, &cursor);

@@ -25,7 +25,7 @@ class KeyTrackModel {
     return std::count_if(keys.begin(), keys.end(), [time](Key const& k) { return k.time < time; });
   }
   int64 find(int64 time) const {
-    const int64 i = lowerBound(time);
+    int64 const i = lowerBound(time);
     return i < size() && at(i).time == time ? i : -1;
   }
   int64 countHolding(unsigned mask) const {
@@ -88,7 +88,7 @@ class KeyTrackModel {
   template <class Change>
   int64 edit(int64 first, int64 last, Change change) {
     int64 changed = 0;
-    const std::vector<Key> before = keys;
+    std::vector<Key> const before = keys;
     for (Key& key : keys)
       if (key.time >= first && key.time <= last) changed += change(key);
     for (unsigned c = 1; c < 8; c *= 2) {
@@ -125,7 +125,7 @@ class KeyTrackModel {
 
   void bridge(int64 first, int64 last, unsigned mask, bool on) {
     edit(first, last, [mask = normal(mask), on](Key& k) {
-      const auto bits = static_cast<unsigned char>(mask & k.components);
+      auto const bits = static_cast<unsigned char>(mask & k.components);
       k.bridges = static_cast<unsigned char>(on ? k.bridges | bits : k.bridges & ~bits);
       return true;
     });
@@ -145,7 +145,7 @@ class KeyTrackModel {
   }
   int64 deselect(int64 first, int64 last, unsigned mask) {
     return edit(first, last, [mask = normal(mask)](Key& k) {
-      const bool had = (k.selected & mask) != 0;
+      bool const had = (k.selected & mask) != 0;
       k.selected &= static_cast<unsigned char>(~mask);
       return had;
     });

@@ -30,7 +30,7 @@ std::vector<double> randomDoubles(int64 n) {
 }
 
 Values valuesOf(std::vector<double> const& flat, int64 i) {
-  const double* v = flat.data() + i * 3;
+  double const* v = flat.data() + i * 3;
   return {v[0], v[1], v[2]};
 }
 
@@ -41,15 +41,15 @@ KeyTrack denseTrack(std::vector<double> const& flat) {
 }
 
 TEST(KeyTrack, DenseKeysAreCompactHoweverTheyCome) {
-  const std::vector<double> flat = randomDoubles(kKeys * 3);
-  const KeyTrack bulk = denseTrack(flat);
+  std::vector<double> const flat = randomDoubles(kKeys * 3);
+  KeyTrack const bulk = denseTrack(flat);
   KeyTrack forward(Shape::Vector), backward(Shape::Vector), pieces(Shape::Vector);
   for (int64 i = 0; i < kKeys; ++i) forward.set(i * kFramePeriod, valuesOf(flat, i));
   for (int64 i = kKeys - 1; i >= 0; --i) backward.set(i * kFramePeriod, valuesOf(flat, i));
   for (int64 i = 0, n = 1; i < kKeys; i += n, n = std::min<int64>(n * 2 % 1001, kKeys - i))
     pieces.append(i * kFramePeriod, kFramePeriod, flat.data() + i * 3, n);
 
-  for (const KeyTrack* track : std::initializer_list<const KeyTrack*>{&bulk, &forward, &backward, &pieces}) {
+  for (KeyTrack const* track : std::initializer_list<KeyTrack const*>{&bulk, &forward, &backward, &pieces}) {
     EXPECT_STREQ(track->checkInvariants(), "");
     EXPECT_LE(bytesPerKey(*track), 26);
     EXPECT_TRUE(*track == bulk);
@@ -63,17 +63,17 @@ TEST(KeyTrack, FloatsAndRepeatedValuesTakeLess) {
   EXPECT_LE(bytesPerKey(denseTrack(std::vector<double>(kKeys * 3, 0.1))), 2);
 
   // Nothing is lost: signed zeros, not-a-numbers, and doubles just beside a float.
-  const std::vector<double> odd = {0.0, -0.0, NAN, 1e-310, 1e300, 0.1, -0.0, 0.0, 1.5, INFINITY, 16777217, 2};
-  const KeyTrack track = denseTrack(odd);
+  std::vector<double> const odd = {0.0, -0.0, NAN, 1e-310, 1e300, 0.1, -0.0, 0.0, 1.5, INFINITY, 16777217, 2};
+  KeyTrack const track = denseTrack(odd);
   for (int64 i = 0; i < track.count(); ++i) {
-    const Values got = track.at(i).values, expected = valuesOf(odd, i);
+    Values const got = track.at(i).values, expected = valuesOf(odd, i);
     EXPECT_EQ(std::memcmp(got.data(), expected.data(), sizeof got), 0) << i;
   }
 }
 
 TEST(KeyTrack, AnEditThatIsTakenBackLeavesNoTrace) {
-  const std::vector<double> flat = randomDoubles(kKeys * 3);
-  const KeyTrack before = denseTrack(flat);
+  std::vector<double> const flat = randomDoubles(kKeys * 3);
+  KeyTrack const before = denseTrack(flat);
   KeyTrack track = before;
   for (int64 i = 5; i < kKeys; i += 97) {
     track.erase(i);
@@ -90,7 +90,7 @@ TEST(KeyTrack, AnEditThatIsTakenBackLeavesNoTrace) {
 }
 
 TEST(KeyTrack, SnapshotsShareUntilOneChanges) {
-  const std::vector<double> flat = randomDoubles(kKeys * 3);
+  std::vector<double> const flat = randomDoubles(kKeys * 3);
   KeyTrack track = denseTrack(flat);
   KeyTrack snapshot = track;
   EXPECT_TRUE(snapshot.sharesAll(track));
@@ -105,7 +105,7 @@ TEST(KeyTrack, SnapshotsShareUntilOneChanges) {
   EXPECT_EQ(track.at(0).values[1], 2);
   EXPECT_EQ(track.at(0).values[0], flat[0]);
 
-  const KeyTrack moved = std::move(track);
+  KeyTrack const moved = std::move(track);
   snapshot.clear();
   EXPECT_TRUE(snapshot.empty());
   EXPECT_EQ(moved.count(), kKeys);
@@ -115,15 +115,15 @@ TEST(KeyTrack, SnapshotsShareUntilOneChanges) {
 TEST(KeyTrack, AMillionKeysDeletedOneByOne) {
   constexpr int64 kMany = 1'000'000;
   KeyTrack full(Shape::Scalar);
-  const std::vector<double> values = randomDoubles(kMany);
+  std::vector<double> const values = randomDoubles(kMany);
   full.append(0, 7, values.data(), kMany);
   std::mt19937_64 random(9);
 
   for (int way = 0; way < 3; ++way) {
     KeyTrack track = full;
-    const int64 mostMemory = track.memoryUse() + track.memoryUse() / 4;
+    int64 const mostMemory = track.memoryUse() + track.memoryUse() / 4;
     for (int64 left = kMany; left > 100; --left) {
-      const int64 any = static_cast<int64>(random() % static_cast<uint64>(left));
+      int64 const any = static_cast<int64>(random() % static_cast<uint64>(left));
       ASSERT_EQ(track.erase(way == 0 ? 0 : way == 1 ? left - 1 : any), 1);
       if (left % 250'000 == 0) {
         ASSERT_STREQ(track.checkInvariants(), "");
@@ -133,7 +133,7 @@ TEST(KeyTrack, AMillionKeysDeletedOneByOne) {
     }
     EXPECT_EQ(track.count(), 100);
     EXPECT_LE(track.memoryUse(), 40'000);
-    const int64 first = way == 0 ? kMany - 100 : 0;
+    int64 const first = way == 0 ? kMany - 100 : 0;
     for (int64 i = 0; way < 2 && i < 100; ++i) {
       ASSERT_EQ(track.timeAt(i), (first + i) * 7);
       ASSERT_EQ(track.at(i).values[0], values[static_cast<size_t>(first + i)]);
@@ -144,8 +144,8 @@ TEST(KeyTrack, AMillionKeysDeletedOneByOne) {
 
 TEST(KeyTrack, ComparesKeysFlagsAndSelection) {
   KeyTrack a(Shape::Vector), b(Shape::Vector);
-  for (const int64 t : {3, 1, 2}) a.set(t, {1, 2, 3});
-  for (const int64 t : {1, 2, 3}) b.set(t, {1, 2, 3});
+  for (int64 const t : {3, 1, 2}) a.set(t, {1, 2, 3});
+  for (int64 const t : {1, 2, 3}) b.set(t, {1, 2, 3});
   EXPECT_TRUE(a == b);
   a.setSelected(1, 2);
   EXPECT_FALSE(a == b);

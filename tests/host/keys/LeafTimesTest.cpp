@@ -19,27 +19,27 @@ class KeyTimesEdits : public testing::TestWithParam<int64> {
   int size() const { return static_cast<int>(m_expected.size()); }
 
   void edit() {
-    const int what = upTo(9);
+    int const what = upTo(9);
     if (what < 4 && size() < kLimit) {
-      const int64 at = time();
-      const auto place = std::lower_bound(m_expected.begin(), m_expected.end(), at);
+      int64 const at = time();
+      auto const place = std::lower_bound(m_expected.begin(), m_expected.end(), at);
       if (place != m_expected.end() && *place == at) return;
       m_times.insert(static_cast<int>(place - m_expected.begin()), at, kLimit);
       m_expected.insert(place, at);
     } else if (what == 4) {
-      const int64 start = (size() > 0 ? m_expected.back() : 0) + (1 + upTo(2)) * GetParam();
-      const int n = std::min(upTo(8), kLimit - size());
+      int64 const start = (size() > 0 ? m_expected.back() : 0) + (1 + upTo(2)) * GetParam();
+      int const n = std::min(upTo(8), kLimit - size());
       if (n == 0 || start > 300 * GetParam()) return;
       m_times.append(start, GetParam() * 2, n, kLimit);
       for (int i = 0; i < n; ++i) m_expected.push_back(start + i * GetParam() * 2);
     } else if (what < 8 && size() > 0) {
-      const int first = upTo(size() - 1), last = std::min(size(), first + 1 + (upTo(5) ? 0 : upTo(9)));
+      int const first = upTo(size() - 1), last = std::min(size(), first + 1 + (upTo(5) ? 0 : upTo(9)));
       m_times.erase(first, last);
       m_expected.erase(m_expected.begin() + first, m_expected.begin() + last);
     } else if (what == 8) {
       m_times.pack();
     } else if (size() > 1) {  // as leaves split and join
-      const int middle = upTo(size());
+      int const middle = upTo(size());
       LeafTimes left, right;
       left.append(m_times, 0, middle);
       right.append(m_times, middle, size());
@@ -57,9 +57,9 @@ class KeyTimesEdits : public testing::TestWithParam<int64> {
     for (int i = 0; i < size(); ++i) ASSERT_EQ(m_times[i], m_expected[static_cast<size_t>(i)]);
     if (m_expected.empty()) return;
     for (int i = 0; i < 4; ++i) {
-      const int64 at = i < 2 ? time() : m_expected[static_cast<size_t>(upTo(size() - 1))] + i - 2;
-      const auto before = std::lower_bound(m_expected.begin(), m_expected.end(), at) - m_expected.begin();
-      const auto after = std::upper_bound(m_expected.begin(), m_expected.end(), at) - m_expected.begin();
+      int64 const at = i < 2 ? time() : m_expected[static_cast<size_t>(upTo(size() - 1))] + i - 2;
+      auto const before = std::lower_bound(m_expected.begin(), m_expected.end(), at) - m_expected.begin();
+      auto const after = std::upper_bound(m_expected.begin(), m_expected.end(), at) - m_expected.begin();
       ASSERT_EQ(m_times.lowerBound(at), before);
       if (after > 0) {
         ASSERT_EQ(m_times.lastAtOrBefore(at), after - 1);
@@ -82,8 +82,8 @@ TEST_P(KeyTimesEdits, MatchThePlainList) {
     LeafTimes packed = m_times;
     packed.pack();
     widths.insert(packed.bytes() / size());
-    const int64 all = m_expected.back() - m_expected.front();
-    const int64 most = all <= 65'535 ? 2 : all <= 4'294'967'295 ? 4 : 8;
+    int64 const all = m_expected.back() - m_expected.front();
+    int64 const most = all <= 65'535 ? 2 : all <= 4'294'967'295 ? 4 : 8;
     ASSERT_LE(packed.bytes(), most * size());
   }
   EXPECT_GE(widths.size(), 2u);  // even, and another

@@ -28,7 +28,7 @@ Vec3 randomVec(double reach) {
 }
 
 TalixRotation randomRotation() {
-  const double xyzw[4] = {uniform(-1, 1), uniform(-1, 1), uniform(-1, 1), uniform(-1, 1)};
+  double const xyzw[4] = {uniform(-1, 1), uniform(-1, 1), uniform(-1, 1), uniform(-1, 1)};
   TalixRotation rotation;
   rotation.setQuaternion(xyzw);
   return rotation;
@@ -43,12 +43,12 @@ M44 aboutAxis(int axis, double angle) {
 
 // The first axis of the order is applied first.
 M44 fromEuler(RotOrder order, Vec3 const& angles) {
-  const auto& [i, j, k] = kAxes[order];
+  auto const& [i, j, k] = kAxes[order];
   return aboutAxis(i, angles[i]) * aboutAxis(j, angles[j]) * aboutAxis(k, angles[k]);
 }
 
 Vec3 turned(Vec3 const& v, M44 const& by) {
-  const Imath::V3d result = Imath::V3d(v.x, v.y, v.z) * by;
+  Imath::V3d const result = Imath::V3d(v.x, v.y, v.z) * by;
   return {result.x, result.y, result.z};
 }
 
@@ -74,7 +74,7 @@ class RotationOrder : public testing::TestWithParam<int> {
 
 TEST_P(RotationOrder, AppliesItsFirstAxisFirst) {
   for (int i = 0; i < 500; ++i) {
-    const Vec3 angles = randomVec(7);
+    Vec3 const angles = randomVec(7);
     TalixRotation rotation;
     rotation.setAsEuler(order(), angles);
     EXPECT_LT(apart(rotation, fromEuler(order(), angles)), 1e-14);
@@ -82,7 +82,7 @@ TEST_P(RotationOrder, AppliesItsFirstAxisFirst) {
 }
 
 TEST_P(RotationOrder, AnglesReadBackWithinTheirRanges) {
-  const auto& [i, j, k] = kAxes[order()];
+  auto const& [i, j, k] = kAxes[order()];
   for (int n = 0; n < 500; ++n) {
     Vec3 angles, read;
     angles[i] = uniform(-kPi, kPi), angles[j] = uniform(-kPi / 2, kPi / 2), angles[k] = uniform(-kPi, kPi);
@@ -95,9 +95,9 @@ TEST_P(RotationOrder, AnglesReadBackWithinTheirRanges) {
 
 // Close to gimbal lock single angles may lose digits, but the three together must not.
 TEST_P(RotationOrder, AnglesGiveTheSameRotationNearGimbalLock) {
-  const auto& [i, j, k] = kAxes[order()];
-  for (const double off : {0.0, 1e-16, 1e-12, 9e-10, 1.1e-9, 3e-9, 1e-7, 1e-4, 0.1}) {
-    for (const double side : {-1.0, 1.0}) {
+  auto const& [i, j, k] = kAxes[order()];
+  for (double const off : {0.0, 1e-16, 1e-12, 9e-10, 1.1e-9, 3e-9, 1e-7, 1e-4, 0.1}) {
+    for (double const side : {-1.0, 1.0}) {
       for (int n = 0; n < 20; ++n) {
         Vec3 angles, read;
         angles[i] = uniform(-kPi, kPi), angles[j] = side * (kPi / 2 - off), angles[k] = uniform(-kPi, kPi);
@@ -120,10 +120,10 @@ TEST_P(RotationOrder, AnglesGiveTheSameRotationNearGimbalLock) {
 TEST_P(RotationOrder, UnrollsToTheNearestEqualAngles) {
   Vec3 former = randomVec(20);
   for (int n = 0; n < 200; ++n) {
-    const TalixRotation rotation = randomRotation();
+    TalixRotation const rotation = randomRotation();
     Vec3 angles;
     rotation.getAsEuler(order(), angles);
-    const Vec3 near = unrolledEuler(order(), angles, former);
+    Vec3 const near = unrolledEuler(order(), angles, former);
     TalixRotation again;
     again.setAsEuler(order(), near);
     EXPECT_LT(apart(rotation, again), 1e-13);
@@ -148,7 +148,7 @@ class RotationJoint : public testing::TestWithParam<int> {
 
 TEST_P(RotationJoint, TurnsAboutItsMajorAxisAndTheCarriedMinorOne) {
   for (int n = 0; n < 200; ++n) {
-    const double a = uniform(-7, 7), b = uniform(-7, 7);
+    double const a = uniform(-7, 7), b = uniform(-7, 7);
     // For row vectors the carried axis comes first.
     EXPECT_LT(apart(joint(a, b), aboutAxis(minor(), b) * aboutAxis(major(), a)), 1e-14);
     TalixRotation hinge;
@@ -160,9 +160,9 @@ TEST_P(RotationJoint, TurnsAboutItsMajorAxisAndTheCarriedMinorOne) {
 TEST_P(RotationJoint, AnglesReadBack) {
   for (int n = 0; n < 400; ++n) {
     // Every second time at quarter turns, where Euler angles would lock.
-    const double unit = n % 2 ? kPi / 2 : 1;
-    const double a = n % 2 ? unit * (n / 2 % 5 - 2) : uniform(-kPi, kPi);
-    const double b = n % 2 ? unit * (n / 10 % 5 - 2) : uniform(-kPi, kPi);
+    double const unit = n % 2 ? kPi / 2 : 1;
+    double const a = n % 2 ? unit * (n / 2 % 5 - 2) : uniform(-kPi, kPi);
+    double const b = n % 2 ? unit * (n / 10 % 5 - 2) : uniform(-kPi, kPi);
     double readA = 0, readB = 0;
     joint(a, b).getAsHardySpicerRotation(readA, readB, major(), minor());
     EXPECT_LT(apart(joint(readA, readB), joint(a, b)), 1e-14);
@@ -179,19 +179,19 @@ TEST_P(RotationJoint, AnglesReadBack) {
 }
 
 TEST_P(RotationJoint, AnglesAreThoseOfTheNearestJointAndHinge) {
-  const auto away = [](TalixRotation const& from, TalixRotation const& to) {
+  auto const away = [](TalixRotation const& from, TalixRotation const& to) {
     Vec3 way;
     (from.inverse() * to).getAsVector(way);
     return way.length();
   };
   for (int n = 0; n < 50; ++n) {
-    const TalixRotation rotation = randomRotation();
+    TalixRotation const rotation = randomRotation();
     double a = 0, b = 0;
     rotation.getAsHardySpicerRotation(a, b, major(), minor());
-    const double left = away(joint(a, b), rotation),
+    double const left = away(joint(a, b), rotation),
                  leftOfHinge = away(joint(rotation.getAsHingeRotation(major()), 0), rotation);
     for (int other = 0; other < 200; ++other) {
-      const double x = uniform(-kPi, kPi), y = uniform(-kPi, kPi);
+      double const x = uniform(-kPi, kPi), y = uniform(-kPi, kPi);
       ASSERT_LE(left, away(joint(x, y), rotation) + 1e-12);
       ASSERT_LE(leftOfHinge, away(joint(x, 0), rotation) + 1e-12);
     }
@@ -202,8 +202,8 @@ INSTANTIATE_TEST_SUITE_P(AllAxes, RotationJoint, testing::Range(0, 9));
 
 TEST(Rotation, ProductTurnsByTheRightFactorFirst) {
   for (int n = 0; n < 200; ++n) {
-    const TalixRotation a = randomRotation(), b = randomRotation(), c = randomRotation();
-    const Vec3 v = randomVec(1000);
+    TalixRotation const a = randomRotation(), b = randomRotation(), c = randomRotation();
+    Vec3 const v = randomVec(1000);
     EXPECT_LT(((a * b).rotate(v) - a.rotate(b.rotate(v))).length(), 1e-9);
     EXPECT_LT(apart((a * b) * c, a * (b * c)), 1e-14);
     EXPECT_LT(apart(a * a.inverse(), TalixRotation()), 1e-14);
@@ -213,10 +213,10 @@ TEST(Rotation, ProductTurnsByTheRightFactorFirst) {
 }
 
 TEST(Rotation, LongProductsStayUnit) {
-  const TalixRotation step(Vec3(0.01, -0.02, 0.03));
+  TalixRotation const step(Vec3(0.01, -0.02, 0.03));
   TalixRotation sum;
   for (int i = 0; i < 100'000; ++i) sum *= step;
-  const double angle = Vec3(0.01, -0.02, 0.03).length() * 100'000;
+  double const angle = Vec3(0.01, -0.02, 0.03).length() * 100'000;
   Vec3 axis(0.01, -0.02, 0.03);
   axis.setLength(std::remainder(angle, 2 * kPi));
   EXPECT_LT(apart(sum, TalixRotation(axis)), 1e-9);
@@ -224,11 +224,11 @@ TEST(Rotation, LongProductsStayUnit) {
 }
 
 TEST(Rotation, VectorHoldsAxisTimesAngle) {
-  for (const double angle : {0.0, 1e-300, 1e-12, 1e-9, 1e-5, 9.9e-5, 1.01e-4, 0.5, 3.0, kPi - 1e-9, kPi}) {
+  for (double const angle : {0.0, 1e-300, 1e-12, 1e-9, 1e-5, 9.9e-5, 1.01e-4, 0.5, 3.0, kPi - 1e-9, kPi}) {
     for (int n = 0; n < 50; ++n) {
       Vec3 axis = randomVec(1), read;
       axis.normalize();
-      const TalixRotation rotation(axis * angle);
+      TalixRotation const rotation(axis * angle);
       EXPECT_LT(apart(rotation, M44().setAxisAngle(Imath::V3d(axis.x, axis.y, axis.z), angle)), 1e-14);
       rotation.getAsVector(read);
       EXPECT_NEAR(read.length(), angle, std::max(angle * 1e-12, 1e-300));
@@ -245,11 +245,11 @@ TEST(Rotation, VectorHoldsAxisTimesAngle) {
 
 TEST(Rotation, SlerpGoesTheShorterArcEvenly) {
   for (int n = 0; n < 200; ++n) {
-    const TalixRotation a = randomRotation();
+    TalixRotation const a = randomRotation();
     Vec3 axis = randomVec(1);
     axis.setLength(uniform(0, kPi - 0.01));
-    const TalixRotation b = a * TalixRotation(axis);
-    for (const double part : {0.0, 0.25, 0.5, 1.0})
+    TalixRotation const b = a * TalixRotation(axis);
+    for (double const part : {0.0, 0.25, 0.5, 1.0})
       EXPECT_LT(apart(TalixRotation::slerp(a, b, part), a * TalixRotation(axis * part)), 1e-12);
   }
 }

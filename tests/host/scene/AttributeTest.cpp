@@ -30,7 +30,7 @@ class AttributeTest : public SceneTest {
 
 TEST_F(AttributeTest, EveryKindCanBeAddedSetAndUnset) {
   for (int type = Attribute::Integer; type <= Attribute::Temperature; ++type) {
-    const HString name("custom" + std::to_string(type));
+    HString const name("custom" + std::to_string(type));
     Attribute* attribute = m_node->addCustomAttribute(
         Attribute::create(static_cast<Attribute::Type>(type), name, labels({"one", "two"})));
     ASSERT_NE(attribute, nullptr);
@@ -39,7 +39,7 @@ TEST_F(AttributeTest, EveryKindCanBeAddedSetAndUnset) {
     EXPECT_EQ(m_node->getAttribute(attribute->getID()), attribute);
     EXPECT_EQ(attribute->getModule(), m_node);
     EXPECT_TRUE(attribute->isCustom() && attribute->canBeUnset() && !attribute->isSet());
-    const Attribute::Value before = attribute->getRawValue();
+    Attribute::Value const before = attribute->getRawValue();
     attribute->store(before, true, true);
     EXPECT_TRUE(attribute->isSet());
     attribute->unset(true, true, true);

@@ -57,7 +57,7 @@ TEST_F(ControllerTest, AChannelNameHasOneKindEverywhere) {
   EXPECT_EQ(other->addChannel("Force", DataSource::FloatProperty), nullptr);
   EXPECT_EQ(other->addChannel("Translation", DataSource::RotProperty), nullptr);
   EXPECT_EQ(other->getChannel("Translation"), nullptr) << "known, but this module has none";
-  const unsigned id = Controller::mapPropertyName("Force");
+  unsigned const id = Controller::mapPropertyName("Force");
   EXPECT_EQ(Controller::mapPropertyId(id | PropertyTable::kY), "Force");
   EXPECT_EQ(Controller::mapToPropertyType(id | PropertyTable::kWhole), DataSource::Vec3Property);
   EXPECT_EQ(m_node->getProperty(id | PropertyTable::kX), channel);
@@ -106,7 +106,7 @@ TEST_F(ControllerTest, LayersAddUp) {
     ASSERT_TRUE(g_db->setActiveLayer(layer));
     length->setKey(0, layer + 1, 7);
     place->setKey(0, Vec3(layer, 1, 0), layer == 1 ? 1 : 7);
-    const TalixRotation own = randomRotation();
+    TalixRotation const own = randomRotation();
     turn->setKey(0, own, 7);
     flag->setKey(0, layer == 2, 7);
     sum += layer + 1;
@@ -120,7 +120,7 @@ TEST_F(ControllerTest, LayersAddUp) {
   // A layer is asked to make the sum right, whatever lies above it.
   for (int layer = 0; layer < 3; ++layer) {
     g_db->setActiveLayer(layer);
-    const TalixRotation wanted = randomRotation();
+    TalixRotation const wanted = randomRotation();
     KeyTrack::Values raw{};
     wanted.getQuaternion(raw.data());
     turn->writeKeyAt(0, turn->solveLayer(0, raw), 7);
@@ -143,7 +143,7 @@ TEST_F(ControllerTest, BlendsAreWeightedMeans) {
   turn->setKey(0, TalixRotation({0.2, 0, 0}), 7);
   g_db->setActiveClip(second);
   length->setKey(0, 20, 7);
-  const double turned[4] = {-std::sin(0.2), 0, 0, -std::cos(0.2)};  // the same rotation's other sign
+  double const turned[4] = {-std::sin(0.2), 0, 0, -std::cos(0.2)};  // the same rotation's other sign
   TalixRotation other;
   other.setQuaternion(turned);
   turn->setKey(0, other, 7);

@@ -25,7 +25,7 @@ TEST_F(IndexTest, BeyondTheEndIsNothing) {
   auto* sources = create<BlendClip>("blend")->getSources();
   EnumAttribute unlabelled;
   Variable list(Variable::IntArray, 2);
-  const std::unique_ptr<CommandOption> option(CommandOption::createInstance("o", 1, Variable::Int, false));
+  std::unique_ptr<CommandOption> const option(CommandOption::createInstance("o", 1, Variable::Int, false));
   HTimeManager const* times = HTimeManager::getInstance();
 
   // Each for a thing with a few entries or none; whether the answer is nothing.
@@ -34,7 +34,7 @@ TEST_F(IndexTest, BeyondTheEndIsNothing) {
     int count;
     std::function<bool(int)> isNothing;
   };
-  const Row rows[] = {
+  Row const rows[] = {
       {"getChild", node->getNumChildren(), [&](int i) { return !node->getChild(i); }},
       {"getNodeChild", node->getNumNodeChildren(), [&](int i) { return !node->getNodeChild(i); }},
       {"getMarkerChild", node->getNumMarkerChildren(), [&](int i) { return !node->getMarkerChild(i); }},
@@ -78,7 +78,7 @@ TEST_F(IndexTest, BeyondTheEndIsNothing) {
       {"getArg", 1, [&](int i) { return option->getArg(i).getType() == Variable::None; }},
   };
   for (Row const& row : rows)
-    for (const int i :
+    for (int const i :
          {row.count, row.count + 1, std::numeric_limits<int>::max(), -2, std::numeric_limits<int>::min()})
       EXPECT_TRUE(row.isNothing(i)) << row.accessor << " " << i << " of " << row.count;
   for (int i : {-1, 3}) EXPECT_TRUE(!node->getChild(i) && !keyed->keyHasComponents(i, 1));

@@ -18,7 +18,7 @@ TEST(OrderedList, AgreesWithAVector) {
     std::vector<Item> items(400);
     std::vector<Item*> model;
     OrderedList<Item, &Item::slot> list;
-    const size_t bias = random() % 5 + 3;  // out of ten: how often one is added
+    size_t const bias = random() % 5 + 3;  // out of ten: how often one is added
     for (int step = 0; step < 2000; ++step) {
       Item* item = &items[random() % items.size()];
       if (list.contains(item)) {
@@ -39,7 +39,7 @@ TEST(OrderedList, AgreesWithAVector) {
       }
       ASSERT_EQ(list.getCount(), static_cast<int>(model.size()));
       if (model.empty()) continue;
-      const size_t i = random() % model.size();
+      size_t const i = random() % model.size();
       ASSERT_EQ(list.at(static_cast<int>(i)), model[i]);
       ASSERT_EQ(list.indexOf(model[i]), static_cast<int>(i));
     }
@@ -58,13 +58,13 @@ TEST_F(MembershipTest, SelectionAgreesWithAModel) {
     modules.push_back(g_db->createModule(HRuntimeClass::findClass(classes[i % 4]), "m", nullptr));
   }
   Module* primary = nullptr;
-  const auto kinds = [&](HRuntimeClass const* type) {
+  auto const kinds = [&](HRuntimeClass const* type) {
     std::vector<Module*> all;
     std::copy_if(model.begin(), model.end(), std::back_inserter(all),
                  [&](Module* m) { return m->isKindOf(type); });
     return all;
   };
-  const auto drop = [&](Module* module) {
+  auto const drop = [&](Module* module) {
     std::erase(model, module);
     if (primary == module) primary = model.empty() ? nullptr : model.back();
   };
@@ -102,7 +102,7 @@ TEST_F(MembershipTest, SelectionAgreesWithAModel) {
     for (int i = 0; i < g_db->getNumSelectedModules(); ++i)
       ASSERT_EQ(g_db->getSelectedModule(i), model[static_cast<size_t>(i)]);
     ASSERT_EQ(g_db->getNumSelectedNodes(), static_cast<int>(kinds(&Node::s_classNode).size()));
-    const auto markers = kinds(&Marker::s_classMarker), bones = kinds(&LabelingBone::s_classLabelingBone),
+    auto const markers = kinds(&Marker::s_classMarker), bones = kinds(&LabelingBone::s_classLabelingBone),
                subjects = kinds(&Character::s_classCharacter);
     ASSERT_EQ(g_db->getNumSelectedMarkers(), static_cast<int>(markers.size()));
     for (size_t i = 0; i < markers.size(); ++i)

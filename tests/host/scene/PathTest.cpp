@@ -21,12 +21,12 @@ class PathTest : public SceneTest {
   // What a path names, by looking at every module.
   static Module* search(std::string const& path, HRuntimeClass const* filter, bool priorityOnly) {
     Module const* priority = g_db->getPriorityModule();
-    const auto fitting = [&](Module const* below) {
+    auto const fitting = [&](Module const* below) {
       std::vector<Module*> found;
       for (int i = 0; i < g_db->getNumModules(); ++i) {
         Module* module = g_db->getModule(i);
-        const std::string full = module->getFullPathString().GetString();
-        const bool fits = path.starts_with('\\') ? full == path : endsWithNames(full, path);
+        std::string const full = module->getFullPathString().GetString();
+        bool const fits = path.starts_with('\\') ? full == path : endsWithNames(full, path);
         if (fits && (!filter || module->isKindOf(filter)) && isAtOrBelow(module, below))
           found.push_back(module);
       }
@@ -41,9 +41,9 @@ class PathTest : public SceneTest {
   static std::string shortest(Module const* module, bool withinPriority) {
     Module const* priority = withinPriority ? g_db->getPriorityModule() : nullptr;
     if (priority && !isAtOrBelow(module, priority)) priority = nullptr;
-    const std::string full = module->getFullPathString().GetString();
+    std::string const full = module->getFullPathString().GetString();
     for (size_t at = full.rfind('\\'); at != std::string::npos; at = at ? full.rfind('\\', at - 1) : at - 1) {
-      const std::string suffix = full.substr(at + 1);
+      std::string const suffix = full.substr(at + 1);
       int fitting = 0;
       for (int i = 0; i < g_db->getNumModules(); ++i)
         fitting += isAtOrBelow(g_db->getModule(i), priority) &&
@@ -55,7 +55,7 @@ class PathTest : public SceneTest {
 
   void edit() {
     static char const* const names[] = {"a", "b", "c", "a_1", "Hips"};
-    const auto some = [&]() { return m_modules.empty() ? nullptr : oneOf(m_modules); };
+    auto const some = [&]() { return m_modules.empty() ? nullptr : oneOf(m_modules); };
     Module* module = some();
     switch (below(9)) {
       case 0:
@@ -99,13 +99,13 @@ TEST_F(PathTest, LookUpAgreesWithASearchOfTheWholeScene) {
       if (below(3)) path = path.substr(1 + below(path.size() - 1));
       if (below(10) == 0) path += "\\";
       HRuntimeClass const* filter = filters[below(4)];
-      const bool priorityOnly = below(2);
+      bool const priorityOnly = below(2);
       ASSERT_EQ(g_db->getModuleWithPath(HString(path), filter, priorityOnly),
                 search(path, filter, priorityOnly))
           << path << " at step " << step;
     }
     Module const* module = oneOf(m_modules);
-    const bool withinPriority = below(2);
+    bool const withinPriority = below(2);
     ASSERT_EQ(module->getMinimumPathString(withinPriority), shortest(module, withinPriority).c_str());
   }
 }
@@ -144,7 +144,7 @@ TEST_F(PathTest, NewNamesAreTheLowestFree) {
   for (int step = 0; step < 4000; ++step) {
     if (below(5) < 3 || modules.empty()) {
       Module* parent = oneOf(parents);
-      const std::string wish = wishes[below(6)];
+      std::string const wish = wishes[below(6)];
       std::set<std::string> taken;
       for (Module* module : modules)
         if (module->getParent() == parent) taken.insert(module->getName().GetString());
@@ -154,7 +154,7 @@ TEST_F(PathTest, NewNamesAreTheLowestFree) {
       ASSERT_EQ(modules.back()->getName(), expected.c_str()) << "step " << step;
       continue;
     }
-    const size_t at = below(modules.size());
+    size_t const at = below(modules.size());
     Module* module = modules[at];
     switch (below(4)) {
       case 0:

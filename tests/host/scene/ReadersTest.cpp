@@ -35,7 +35,7 @@ class ReadersTest : public SceneTest {
 
   // Everything that a thread reads, as numbers.
   std::vector<double> readAll(SceneReader const& reader) const {
-    const SampleTimes times(0, kFrame, kFrames);
+    SampleTimes const times(0, kFrame, kFrames);
     std::vector<double> all(static_cast<size_t>(kFrames * kNodes) * 3);
     reader.readWorld(times, {.positions = all.data()});
     for (Node const* node : nodes) {
@@ -59,11 +59,11 @@ class ReadersTest : public SceneTest {
 };
 
 TEST_F(ReadersTest, AtOnceReadWhatOneReads) {
-  const SceneReader shared(nodes, clip());
-  const std::vector<double> expected = readAll(shared);
+  SceneReader const shared(nodes, clip());
+  std::vector<double> const expected = readAll(shared);
   for (int frame = 0; frame < kFrames; frame += 10)
     for (size_t i = 0; i < kNodes; ++i) {
-      const Vec3 found(&expected[(static_cast<size_t>(frame) * kNodes + i) * 3]);
+      Vec3 const found(&expected[(static_cast<size_t>(frame) * kNodes + i) * 3]);
       ASSERT_LT((found - nodes[i]->getWSPos(frame * kFrame)).length(), 1e-9);
     }
 

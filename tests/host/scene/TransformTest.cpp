@@ -14,7 +14,7 @@ M44 matrixOf(TalixRotation const& rotation) {
   for (int row = 0; row < 3; ++row) {
     Vec3 unit;
     unit[row] = 1;
-    const Vec3 image = rotation.rotate(unit);
+    Vec3 const image = rotation.rotate(unit);
     for (int column = 0; column < 3; ++column) m[row][column] = image[column];
   }
   return m;
@@ -35,7 +35,7 @@ struct Channels {
 };
 
 Frame compose(Frame const& parent, Node const& node, Channels const& own) {
-  const M44 pre = matrixOf(node.getPreRotation()) * M44().setTranslation(imath(node.getPreTranslation()));
+  M44 const pre = matrixOf(node.getPreRotation()) * M44().setTranslation(imath(node.getPreTranslation()));
   M44 local = matrixOf(own.rotation) * M44().setTranslation(imath(own.position)) * pre;
   for (int c = 0; c < 3; ++c) local[3][c] *= parent.scale[c];
   return {local * parent.matrix, scaled(parent.scale, own.scale)};
@@ -44,7 +44,7 @@ Frame compose(Frame const& parent, Node const& node, Channels const& own) {
 // Recursion over all ancestors, nothing cached.
 Frame worldOf(Module const* module, int64 time, bool constant) {
   if (!module) return {};
-  const Frame parent = worldOf(module->getParent(), time, constant);
+  Frame const parent = worldOf(module->getParent(), time, constant);
   auto const* node = objectAs<Node>(module);
   if (!node) return parent;
   return compose(
@@ -55,7 +55,7 @@ Frame worldOf(Module const* module, int64 time, bool constant) {
 
 double apart(Frame const& a, Vec3 const& position, TalixRotation const& rotation, Vec3 const& scale) {
   double most = 0;
-  const M44 turning = matrixOf(rotation);
+  M44 const turning = matrixOf(rotation);
   for (int row = 0; row < 3; ++row)
     for (int c = 0; c < 3; ++c) most = std::max(most, std::abs(a.matrix[row][c] - turning[row][c]));
   for (int c = 0; c < 3; ++c) {
@@ -146,8 +146,8 @@ TEST_F(TransformTest, CachedTransformsEqualFreshOnesWhateverIsEdited) {
   for (int step = 0; step < 3000; ++step) {
     edit();
     // Now and then all at one time, mostly a few at the time before: that is when stale ones would show.
-    const int64 time = step % 3 ? 2 * kFrame : randomTime();
-    const size_t readers = step % 50 ? 6 : m_nodes.size();
+    int64 const time = step % 3 ? 2 * kFrame : randomTime();
+    size_t const readers = step % 50 ? 6 : m_nodes.size();
     for (size_t i = 0; i < readers; ++i) {
       Node const* node = readers == m_nodes.size() ? m_nodes[i] : oneOf(m_nodes);
       ASSERT_LT(apart(worldOf(node, time, false), node->getWSPos(time), node->getWSRot(time),
@@ -200,10 +200,10 @@ TEST_F(TransformTest, SettersReadBack) {
     g_db->setActiveClip(step % 5 ? oneOf(m_clips) : nullptr);
     g_db->setActiveLayer(static_cast<int>(below(2)));
     Node* node = oneOf(m_nodes);
-    const int64 time = randomTime();
-    const Vec3 position = randomVec(500), scale = Vec3(2, 2, 2) + randomVec(1);
-    const TalixRotation rotation = randomRotation();
-    const auto near = [](TalixRotation const& a, TalixRotation const& b) {
+    int64 const time = randomTime();
+    Vec3 const position = randomVec(500), scale = Vec3(2, 2, 2) + randomVec(1);
+    TalixRotation const rotation = randomRotation();
+    auto const near = [](TalixRotation const& a, TalixRotation const& b) {
       Vec3 way;
       (a.inverse() * b).getAsVector(way);
       return way.length();
@@ -245,10 +245,10 @@ TEST_F(TransformTest, OneFrameSeenFromAnother) {
   for (int i = 0; i < 300; ++i) edit();
   for (int i = 0; i < 100; ++i) {
     Node *node = oneOf(m_nodes), *space = oneOf(m_nodes);
-    const int64 time = randomTime();
-    const Transform seen{node->getPosInSpaceOfNode(time, space), node->getRotInSpaceOfNode(time, space),
+    int64 const time = randomTime();
+    Transform const seen{node->getPosInSpaceOfNode(time, space), node->getRotInSpaceOfNode(time, space),
                          node->getScaleInSpaceOfNode(time, space)};
-    const Transform back = space->getWorldTransform(time) * seen;
+    Transform const back = space->getWorldTransform(time) * seen;
     EXPECT_LT((back.position - node->getWSPos(time)).length(), 1e-7);
     EXPECT_LT((back.rotation.rotate({1, 2, 3}) - node->getWSRot(time).rotate({1, 2, 3})).length(), 1e-9);
     EXPECT_LT((back.scale - node->getWSScale(time)).length(), 1e-9);
@@ -261,7 +261,7 @@ TEST_F(TransformTest, PreTransformsInTheWorld) {
   build(20);
   for (int i = 0; i < 50; ++i) {
     Node* node = oneOf(m_nodes);
-    const TalixRotation wanted = randomRotation(), before = node->getConstWSRot();
+    TalixRotation const wanted = randomRotation(), before = node->getConstWSRot();
     node->setPreTranslationWS({7, 8, 9});
     node->setPreRotationWS(wanted);
     EXPECT_LT((node->getPreTranslationWS() - Vec3(7, 8, 9)).length(), 1e-9);

@@ -22,13 +22,13 @@ class ProfileTest : public testing::Test, private LogSink {
  private:
   void write(LogLevel, std::string_view text) override { m_log += std::string(text) + "\n"; }
 
-  const talix_tests::TempFolder m_folder;
+  talix_tests::TempFolder const m_folder;
   LogSink* m_former;
 };
 
 TEST_F(ProfileTest, IsKeptInItsFileBesideWhatOthersWrite) {
   HInterface one, other;
-  const std::string path = file("new/folder/profile.ini");
+  std::string const path = file("new/folder/profile.ini");
   EXPECT_TRUE(one.loadProfile(path));
   EXPECT_TRUE(other.loadProfile(path));
   EXPECT_TRUE(one.writeProfileDouble("Reduction", "LengthMM", 0.25));

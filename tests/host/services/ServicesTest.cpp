@@ -101,9 +101,9 @@ TEST_F(EventTest, AreSubmittedFromAnyThread) {
   g_eventManager->deliverQueued();
   ASSERT_EQ(m_numbers.size(), size_t{kThreads * kEach});
   std::vector<int> next(kThreads);
-  for (const int number : m_numbers) ASSERT_EQ(number % kEach, next[static_cast<size_t>(number / kEach)]++);
+  for (int const number : m_numbers) ASSERT_EQ(number % kEach, next[static_cast<size_t>(number / kEach)]++);
   EXPECT_TRUE(m_refreshes >= 1 && m_refreshes <= kThreads * kEach);
-  const int before = m_refreshes;
+  int const before = m_refreshes;
   HEventManager::safeSubmit(Refresh());
   g_eventManager->deliverQueued();
   EXPECT_EQ(m_refreshes, before + 1) << "none is thought pending for ever";

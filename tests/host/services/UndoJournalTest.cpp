@@ -33,9 +33,9 @@ class UndoTest : public SceneTest {
   template <class Edit>
   void discarded(Edit edit) {
     HTimeManager& time = *g_db->getTimeManager();
-    const int64 now = time.getTime();
+    int64 const now = time.getTime();
     Module* priority = g_db->getPriorityModule();
-    const int keys = g_db->getClipboardManager()->getNumControllerKeys();
+    int const keys = g_db->getClipboardManager()->getNumControllerKeys();
     journal().beginStep();
     edit();
     time.setTime(anyTime(), true);
@@ -62,7 +62,7 @@ class UndoTest : public SceneTest {
   }
 
   Module* anyModule() {
-    const int count = g_db->getNumModules();
+    int const count = g_db->getNumModules();
     return count ? g_db->getModule(static_cast<int>(below(static_cast<size_t>(count)))) : nullptr;
   }
   template <class T>
@@ -88,8 +88,8 @@ class UndoTest : public SceneTest {
 
   void editKeys(Controller& channel) {
     if (!channel.isEditable()) return;
-    const HTimeRange range(anyTime(), anyTime());
-    const auto mask = static_cast<unsigned>(1 + below(7));
+    HTimeRange const range(anyTime(), anyTime());
+    auto const mask = static_cast<unsigned>(1 + below(7));
     channel.beginDataEdit(range);
     switch (below(7)) {
       case 6: {
@@ -121,8 +121,8 @@ class UndoTest : public SceneTest {
   }
 
   void editModule(Module& module) {
-    const auto editAnyChannel = [&] {
-      if (const auto count = static_cast<size_t>(module.getNumChannels()))
+    auto const editAnyChannel = [&] {
+      if (auto const count = static_cast<size_t>(module.getNumChannels()))
         editKeys(*module.getChannel(static_cast<int>(below(count))));
     };
     switch (below(12)) {
@@ -204,7 +204,7 @@ class UndoTest : public SceneTest {
         return;
       case 7:
         if (NLEClip* clip = g_db->getActiveClip()) {
-          const int layer = below(2) ? clip->addLayer()
+          int const layer = below(2) ? clip->addLayer()
                                      : static_cast<int>(below(static_cast<size_t>(clip->getNumLayers())));
           g_db->setActiveLayer(layer);
           clip->setLayerLocked(layer, below(4) == 0);
@@ -227,7 +227,7 @@ class NaiveState {
     put("", "ActiveClip", name(g_db->getActiveClip()));
     put("", "ActiveLayer", std::to_string(g_db->getActiveLayer()));
     put("", "UpAxis", std::to_string(g_db->getUpAxis()));
-    const HTimeRange range = g_db->getTimeManager()->getPlayRange();
+    HTimeRange const range = g_db->getTimeManager()->getPlayRange();
     put("", "PlayRange", std::to_string(range.getStart()) + " " + std::to_string(range.getEnd()));
     for (int i = 0; i < g_db->getNumActiveProperties(); ++i) {
       m_texts["0 attribute ActiveProperties"] +=
@@ -245,8 +245,8 @@ class NaiveState {
       if (!after.m_modules.contains(id)) lines.insert(id + " removed " + state);
     for (auto const& [id, state] : after.m_modules)
       if (!before.m_modules.contains(id)) lines.insert(id + " created " + state);
-    const auto stays = [&](std::string const& key) {
-      const std::string id = key.substr(0, key.find(' '));
+    auto const stays = [&](std::string const& key) {
+      std::string const id = key.substr(0, key.find(' '));
       return id == "0" || (before.m_modules.contains(id) && after.m_modules.contains(id));
     };
     std::map<std::string, std::pair<std::string, std::string>> texts;
@@ -266,9 +266,9 @@ class NaiveState {
                                             "parent", "attribute", "default", "selection"};
     std::set<std::string> lines;
     for (SceneChange const& change : changes) {
-      const std::string id = std::to_string(change.id.getNumber());
+      std::string const id = std::to_string(change.id.getNumber());
       std::string line = id + " " + kinds[static_cast<int>(change.kind)] + " ";
-      const bool whole =
+      bool const whole =
           change.kind == SceneChange::Kind::removed || change.kind == SceneChange::Kind::created;
       line += whole && change.name.IsEmpty() ? change.path.GetString() : change.name.GetString();
       if (change.kind == SceneChange::Kind::keys)
@@ -288,7 +288,7 @@ class NaiveState {
     std::istringstream words(key);
     std::string id, kind, what;
     words >> id >> kind >> what;
-    const size_t dot = what.find('.');
+    size_t const dot = what.find('.');
     return (kind == "default" || dot != what.npos) &&
            !before.m_texts.contains(id + " created " + what.substr(0, dot));
   }
@@ -310,7 +310,7 @@ class NaiveState {
     for (auto const& [time, key] : before)
       if (!after.contains(time)) times.insert(time), ++removed;
     for (auto const& [time, key] : after) {
-      const auto known = before.find(time);
+      auto const known = before.find(time);
       if (known != before.end() && known->second == key) continue;
       times.insert(time);
       if (known == before.end()) {
@@ -324,7 +324,7 @@ class NaiveState {
         for (size_t i = 3; i < 7; ++i) dot += former[i] * key[i];
         largest = std::max(largest, 2 * std::acos(std::min(1.0, std::abs(dot))));
       } else {
-        const unsigned both = static_cast<unsigned>(former[0]) & static_cast<unsigned>(key[0]);
+        unsigned const both = static_cast<unsigned>(former[0]) & static_cast<unsigned>(key[0]);
         for (size_t i = 3; i < key.size(); ++i)
           if (both >> (i - 3) & 1) largest = std::max(largest, std::abs(key[i] - former[i]));
       }
@@ -336,7 +336,7 @@ class NaiveState {
     m_texts[(id.empty() ? "0" : id) + " attribute " + what] = text;
   }
   void add(Module const& module) {
-    const std::string id = name(&module);
+    std::string const id = name(&module);
     m_modules[id] = module.getFullPathString().GetString();
     m_texts[id + " renamed "] = module.getName().GetString();
     m_texts[id + " parent "] = name(module.getParent());
@@ -365,7 +365,7 @@ class NaiveState {
     }
   }
   void add(std::string const& id, Controller const& channel) {
-    const std::string own = channel.getName().GetString();
+    std::string const own = channel.getName().GetString();
     m_texts[id + " created " + own] = "there";
     put(id, own + ".Interpolation", std::to_string(static_cast<int>(channel.getInterpolation())));
     put(id, own + ".Locked", channel.isLocked() ? "true" : "false");
@@ -394,14 +394,14 @@ TEST_F(UndoTest, RandomEditsComeAndGo) {
     std::vector<std::string> states{SceneText().write()};
     int position = 0;
     for (int round = 0; round < 250; ++round) {
-      const std::string when = "seed " + std::to_string(seed) + ", round " + std::to_string(round);
+      std::string const when = "seed " + std::to_string(seed) + ", round " + std::to_string(round);
       if (below(6) == 0) {
         for (size_t n = below(12); n > 0 && undo(); --n) --position;
         for (size_t n = below(12); n > 0 && redo(); --n) ++position;
         expectScene(states[static_cast<size_t>(position)], when);
       }
-      const NaiveState before;
-      const auto edit = [this] {
+      NaiveState const before;
+      auto const edit = [this] {
         for (size_t n = 1 + below(4); n > 0; --n) editScene();
       };
       if (below(8) == 0) {
@@ -411,11 +411,11 @@ TEST_F(UndoTest, RandomEditsComeAndGo) {
       }
       step([&] {
         edit();
-        const auto expected = NaiveState::difference(before, NaiveState());
+        auto const expected = NaiveState::difference(before, NaiveState());
         ASSERT_EQ(NaiveState::linesOf(journal().getChanges()), expected) << when;
       });
-      const std::string after = SceneText().write();
-      const std::string difference = firstDifference(states[static_cast<size_t>(position)], after);
+      std::string const after = SceneText().write();
+      std::string const difference = firstDifference(states[static_cast<size_t>(position)], after);
       if (journal().getNumUndoSteps() == position) {
         ASSERT_EQ(difference, "") << "no step was left, " << when;
         continue;
@@ -437,7 +437,7 @@ TEST_F(UndoTest, AStepOfOneKeyIsSmallAndAMillionKeysAreSwapped) {
   create<Clip>("clip");
   auto* marker = create<Marker>("marker");
   Vec3Controller& channel = *marker->getTranslationChannel();
-  const auto setKey = [&](int64 frame) {
+  auto const setKey = [&](int64 frame) {
     channel.beginDataEdit(HTimeRange(frame, frame));
     channel.setKey(frame * kFrame, {1, 2, static_cast<double>(frame)}, KeyTrack::kAll);
     channel.endDataEdit();
@@ -463,9 +463,9 @@ TEST_F(UndoTest, AStepOfOneKeyIsSmallAndAMillionKeysAreSwapped) {
 
 TEST_F(UndoTest, TheOldestStepsMakeRoom) {
   auto* node = create<Node>("node");
-  const auto rename = [&](int i) { node->setName(HString("name" + std::to_string(i))); };
+  auto const rename = [&](int i) { node->setName(HString("name" + std::to_string(i))); };
   step([&] { rename(100); });
-  const int64 one = journal().getMemoryUse();
+  int64 const one = journal().getMemoryUse();
   journal().setMemoryLimit(one * 10);
   for (int i = 101; i < 200; ++i) step([&] { rename(i); });
   EXPECT_LE(journal().getMemoryUse(), one * 10);

@@ -21,10 +21,10 @@ HString timecode(ETimecodeStandard standard, int64 frame) {
 }
 
 TEST(FrameRate, UsualRatesHaveWholeTicks) {
-  for (const double rate : {23.976, 24.0, 25.0, 29.97, 30.0, 48.0, 50.0, 59.94, 60.0, 100.0, 120.0, 240.0}) {
-    const bool ntsc = rate != static_cast<int>(rate);
-    const double exact = ntsc ? std::round(rate) * 1000 / 1001 : rate;
-    const double ticks = static_cast<double>(kTicksPerSecond) / exact;
+  for (double const rate : {23.976, 24.0, 25.0, 29.97, 30.0, 48.0, 50.0, 59.94, 60.0, 100.0, 120.0, 240.0}) {
+    bool const ntsc = rate != static_cast<int>(rate);
+    double const exact = ntsc ? std::round(rate) * 1000 / 1001 : rate;
+    double const ticks = static_cast<double>(kTicksPerSecond) / exact;
     EXPECT_NEAR(static_cast<double>(ticksPerFrameAt(exact)), ticks, 1e-6) << rate;
     EXPECT_NEAR(ticks, std::round(ticks), 1e-6) << rate;
   }
@@ -34,7 +34,7 @@ TEST(FrameRate, UsualRatesHaveWholeTicks) {
 
 TEST(FrameRate, RefusesRatesThatCannotBe) {
   HFrameRate rate;
-  for (const double bad : {0.0, -1.0, 2000.1, std::numeric_limits<double>::infinity(),
+  for (double const bad : {0.0, -1.0, 2000.1, std::numeric_limits<double>::infinity(),
                            std::numeric_limits<double>::quiet_NaN()}) {
     rate.setFrameRate(bad);
     EXPECT_EQ(rate.getFrameRate(), 120);
@@ -62,10 +62,10 @@ TEST(FrameRate, StandardsHaveNamesAndRates) {
 
 // Counts timecode up frame by frame, as a clock would, for a whole day.
 TEST(DropFrame, RightAtEveryFrameAroundEveryMinute) {
-  const HFrameRate rate = rateOf(NTSC_DROP);
+  HFrameRate const rate = rateOf(NTSC_DROP);
   int64 frame = 0;
   for (int minute = 0; minute < 24 * 60; ++minute) {
-    const int first = minute % 10 ? 2 : 0;
+    int const first = minute % 10 ? 2 : 0;
     for (int number = first; number < 1800; ++number, ++frame) {
       if (number > 3 && number < 1797) continue;
       HString expected;
@@ -103,7 +103,7 @@ TEST(Timecode, OfOtherStandards) {
   HFrameRate half;
   half.setFrameRate(0.5);
   EXPECT_EQ(half.timecodeFromFrame(3), "00:00:03:00");
-  for (const int64 frame : {std::numeric_limits<int64>::min(), std::numeric_limits<int64>::max()})
+  for (int64 const frame : {std::numeric_limits<int64>::min(), std::numeric_limits<int64>::max()})
     EXPECT_GT(timecode(NTSC_DROP, frame).GetLength(), 12);
 }
 
@@ -135,7 +135,7 @@ TEST(TimeManager, FramesAndTicks) {
   EXPECT_EQ(time.getTimeFromFrameDouble(std::numeric_limits<double>::quiet_NaN()), 0);
   std::mt19937_64 random(5);
   for (int i = 0; i < 1000; ++i) {
-    const auto frame = static_cast<int>(random());
+    auto const frame = static_cast<int>(random());
     EXPECT_EQ(time.getFrame(time.getTime(frame)), frame);
     EXPECT_EQ(time.getTimeFromFrameDouble(frame), time.getTime(frame));
     EXPECT_EQ(time.getFrameDouble(time.getTime(frame)), frame);
@@ -152,18 +152,18 @@ TEST(TimeManager, RoundsToFrameBoundariesFromAnOrigin) {
   using enum HTimeManager::ERoundDirection;
   std::mt19937_64 random(6);
   for (int i = 0; i < 2000; ++i) {
-    const int64 origin = static_cast<int64>(random() % 1000) - 500;
-    const int64 t = static_cast<int64>(random() % (20 * k120)) - 10 * k120;
-    const int64 down = time.frameTime(t, RoundDown, origin), up = time.frameTime(t, RoundUp, origin);
+    int64 const origin = static_cast<int64>(random() % 1000) - 500;
+    int64 const t = static_cast<int64>(random() % (20 * k120)) - 10 * k120;
+    int64 const down = time.frameTime(t, RoundDown, origin), up = time.frameTime(t, RoundUp, origin);
     EXPECT_EQ((down - origin) % k120, 0);
     EXPECT_TRUE(down <= t && t < down + k120);
     EXPECT_EQ(up, t == down ? down : down + k120);
     EXPECT_EQ(time.frameTime(t, RoundNearest, origin), t - down < k120 - (t - down) ? down : up);
   }
   EXPECT_EQ(time.frameTime(k120 / 2, RoundNearest, 0), k120) << "half a frame goes up";
-  for (const int64 end : {-kForever, kForever})
-    for (const int64 origin : {-kForever, int64{0}, kForever})
-      for (const auto direction : {RoundDown, RoundNearest, RoundUp})
+  for (int64 const end : {-kForever, kForever})
+    for (int64 const origin : {-kForever, int64{0}, kForever})
+      for (auto const direction : {RoundDown, RoundNearest, RoundUp})
         EXPECT_LE(std::abs(time.frameTime(end, direction, origin)), kForever);
 }
 
@@ -230,14 +230,14 @@ TEST(TimeManager, SelectedRangesStaySortedAndDisjoint) {
     HTimeManager time;
     std::vector<bool> held(200);
     for (int i = 0; i < 12; ++i) {
-      const auto start = static_cast<int64>(random() % 190),
+      auto const start = static_cast<int64>(random() % 190),
                  end = start + static_cast<int64>(random() % 10) - 2;
       time.addSelectedTimeRange({start, end});
       for (int64 t = start; t <= end; ++t) held[static_cast<size_t>(t)] = true;
     }
     std::vector<bool> read(200);
     for (int i = 0; i < time.getNumSelectedRanges(); ++i) {
-      const HTimeRange range = time.getSelectedTimeRange(i);
+      HTimeRange const range = time.getSelectedTimeRange(i);
       ASSERT_FALSE(range.isEmpty());
       if (i > 0) {
         ASSERT_LT(time.getSelectedTimeRange(i - 1).getEnd(), range.getStart());

@@ -17,12 +17,12 @@ constexpr double kRadians = std::numbers::pi / 180;
 
 // Every key is at its frame, of unit length, and no further from the key before than its negative would be.
 TEST(BvhReader, QuaternionsRunOnSmoothly) {
-  for (const char* file : {"gesture_01.bvh", "jump_01.bvh", "mixed_order_01.bvh", "yxz_01.bvh"}) {
-    const Take take = readBVH(dataFile(file));
-    const int64 period = ticksPerFrameAt(take.rate);
-    for (const TakeJoint& joint : take.joints)
+  for (char const* file : {"gesture_01.bvh", "jump_01.bvh", "mixed_order_01.bvh", "yxz_01.bvh"}) {
+    Take const take = readBVH(dataFile(file));
+    int64 const period = ticksPerFrameAt(take.rate);
+    for (TakeJoint const& joint : take.joints)
       for (int64 i = 0; i < joint.rotations.count(); ++i) {
-        const KeyTrack::Key key = joint.rotations.at(i),
+        KeyTrack::Key const key = joint.rotations.at(i),
                             before = joint.rotations.at(std::max<int64>(i - 1, 0));
         double length = 0, dot = 0;
         for (size_t c = 0; c < 4; ++c)
@@ -37,13 +37,13 @@ TEST(BvhReader, QuaternionsRunOnSmoothly) {
 using Matrix3 = std::array<std::array<double, 3>, 3>;
 
 Matrix3 turn(char axis, double degrees) {
-  const double c = std::cos(degrees * kRadians), s = std::sin(degrees * kRadians);
+  double const c = std::cos(degrees * kRadians), s = std::sin(degrees * kRadians);
   if (axis == 'X') return {{{1, 0, 0}, {0, c, -s}, {0, s, c}}};
   if (axis == 'Y') return {{{c, 0, s}, {0, 1, 0}, {-s, 0, c}}};
   return {{{c, -s, 0}, {s, c, 0}, {0, 0, 1}}};
 }
 
-Matrix3 operator*(const Matrix3& a, const Matrix3& b) {
+Matrix3 operator*(Matrix3 const& a, Matrix3 const& b) {
   Matrix3 product{};
   for (size_t row = 0; row < 3; ++row)
     for (size_t column = 0; column < 3; ++column)
@@ -51,18 +51,18 @@ Matrix3 operator*(const Matrix3& a, const Matrix3& b) {
   return product;
 }
 
-TalixRotation rotationAt(const TakeJoint& joint, int64 frame) {
+TalixRotation rotationAt(TakeJoint const& joint, int64 frame) {
   TalixRotation rotation;
   rotation.setQuaternion(joint.rotations.at(frame).values.data());
   return rotation;
 }
 
-void expectRotation(const TakeJoint& joint, int64 frame, const Matrix3& expected) {
-  const TalixRotation rotation = rotationAt(joint, frame);
+void expectRotation(TakeJoint const& joint, int64 frame, Matrix3 const& expected) {
+  TalixRotation const rotation = rotationAt(joint, frame);
   for (int column = 0; column < 3; ++column) {
     Vec3 unit;
     unit[column] = 1;
-    const Vec3 image = rotation.rotate(unit);
+    Vec3 const image = rotation.rotate(unit);
     for (int row = 0; row < 3; ++row)
       EXPECT_NEAR(image[row], expected[static_cast<size_t>(row)][static_cast<size_t>(column)], 1e-12)
           << joint.name << " row " << row << " column " << column;
@@ -70,48 +70,48 @@ void expectRotation(const TakeJoint& joint, int64 frame, const Matrix3& expected
 }
 
 // A skeleton of one joint with these channels and rows.
-std::string oneJoint(const std::string& channels, const std::string& rows, int frames = 1) {
+std::string oneJoint(std::string const& channels, std::string const& rows, int frames = 1) {
   return "HIERARCHY\nROOT a\n{\n OFFSET 1 2 3\n CHANNELS " + channels +
          "\n}\nMOTION\nFrames: " + std::to_string(frames) + "\nFrame Time: 0.01\n" + rows;
 }
 
-Take readWith(const ReadOptions& options, const std::string& text) {
-  const TempFolder folder;
+Take readWith(ReadOptions const& options, std::string const& text) {
+  TempFolder const folder;
   return readBVH(folder.file("take.bvh", text), options);
 }
-Take read(const std::string& text) { return readWith({}, text); }
+Take read(std::string const& text) { return readWith({}, text); }
 
 TEST(BvhRotations, EveryOrderMatchesItsEulerAngles) {
-  for (const std::string order : {"XYZ", "XZY", "YXZ", "YZX", "ZXY", "ZYX"}) {
+  for (std::string const order : {"XYZ", "XZY", "YXZ", "YZX", "ZXY", "ZYX"}) {
     // Channels name the axis that turns last first.
     std::string channels = "3", row;
-    const Vec3 degrees(20, -50, 75);
+    Vec3 const degrees(20, -50, 75);
     for (auto axis = order.rbegin(); axis != order.rend(); ++axis) {
       channels += std::string(" ") + *axis + "rotation";
       row += std::to_string(degrees[*axis - 'X']) + " ";
     }
-    const Take take = read(oneJoint(channels, row));
+    Take const take = read(oneJoint(channels, row));
     Vec3 angles;
-    const auto rotationOrder = static_cast<TalixRotation::RotOrder>(take.joints[0].rotationOrder);
+    auto const rotationOrder = static_cast<TalixRotation::RotOrder>(take.joints[0].rotationOrder);
     rotationAt(take.joints[0], 0).getAsEuler(rotationOrder, angles);
     for (int axis = 0; axis < 3; ++axis) EXPECT_NEAR(angles[axis], degrees[axis] * kRadians, 1e-12) << order;
   }
 }
 
 TEST(BvhRotations, FewerOrRepeatedAxesStillCompose) {
-  const Take two = read(oneJoint("2 Zrotation Xrotation", "100 170"));
+  Take const two = read(oneJoint("2 Zrotation Xrotation", "100 170"));
   expectRotation(two.joints[0], 0, turn('Z', 100) * turn('X', 170));
   EXPECT_EQ(two.joints[0].rotationOrder, TalixRotation::XYZ);
-  const Take one = read(oneJoint("1 Yrotation", "-120"));
+  Take const one = read(oneJoint("1 Yrotation", "-120"));
   expectRotation(one.joints[0], 0, turn('Y', -120));
   EXPECT_EQ(one.joints[0].rotationOrder, TalixRotation::YXZ);
-  const Take repeated = read(oneJoint("3 Zrotation Xrotation Zrotation", "10 20 30"));
+  Take const repeated = read(oneJoint("3 Zrotation Xrotation Zrotation", "10 20 30"));
   expectRotation(repeated.joints[0], 0, turn('Z', 10) * turn('X', 20) * turn('Z', 30));
 }
 
 TEST(BvhText, UnitScalesOffsetsAndPositions) {
-  const std::string text = oneJoint("3 Xposition Yposition Zposition", "4 5 6");
-  const Take inches = readWith({.unit = "in"}, text);
+  std::string const text = oneJoint("3 Xposition Yposition Zposition", "4 5 6");
+  Take const inches = readWith({.unit = "in"}, text);
   EXPECT_EQ(inches.fileUnit, "in");
   EXPECT_FALSE(inches.unitAssumed);
   EXPECT_EQ(inches.joints[0].offset, Vec3(25.4, 50.8, 3 * 25.4));
@@ -122,8 +122,8 @@ TEST(BvhText, UnitScalesOffsetsAndPositions) {
 }
 
 TEST(BvhReader, DamagedFilesGiveATakeOrAnError) {
-  const auto reader = [](const std::string& path) { return readBVH(path); };
-  const std::string small = readText(dataFile("frametime_precise_01.bvh"));
+  auto const reader = [](std::string const& path) { return readBVH(path); };
+  std::string const small = readText(dataFile("frametime_precise_01.bvh"));
   expectSurvivesDamage(small, ".bvh", 1, 1500, reader);
   expectSurvivesDamage(readText(dataFile("two_frames_01.bvh")), ".bvh", 17, 500, reader);
 }

@@ -17,11 +17,11 @@ using testing::HasSubstr;
 constexpr double kPi = std::numbers::pi;
 
 TEST(BvhWriter, KeepsRealTakes) {
-  const TempFolder folder;
-  for (const char* file : {"pose_t_01.bvh", "walk_hand_01.bvh", "mixed_order_01.bvh", "yxz_01.bvh",
+  TempFolder const folder;
+  for (char const* file : {"pose_t_01.bvh", "walk_hand_01.bvh", "mixed_order_01.bvh", "yxz_01.bvh",
                            "frametime_precise_01.bvh", "no_endsite_01.bvh", "jump_01.bvh"})
-    for (const char* unit : {"", "m", "in"}) {
-      const Take take = readBVH(dataFile(file), {.unit = unit});
+    for (char const* unit : {"", "m", "in"}) {
+      Take const take = readBVH(dataFile(file), {.unit = unit});
       std::vector<TakeNote> notes;
       writeBVH(take, folder.path("copy.bvh"), notes);
       EXPECT_EQ(
@@ -31,7 +31,7 @@ TEST(BvhWriter, KeepsRealTakes) {
     }
 }
 
-TakeJoint joint(const std::string& name, int parent) {
+TakeJoint joint(std::string const& name, int parent) {
   TakeJoint made;
   made.name = name;
   made.parent = parent;
@@ -50,8 +50,8 @@ Take takeOf(std::vector<TakeJoint> joints) {
   return take;
 }
 
-std::string written(const Take& take, std::string* notes = nullptr) {
-  const TempFolder folder;
+std::string written(Take const& take, std::string* notes = nullptr) {
+  TempFolder const folder;
   std::vector<TakeNote> list;
   writeTake(take, folder.path("out.BVH"), list);
   if (notes) *notes = notesOf(list);
@@ -97,9 +97,9 @@ TEST(BvhWriter, UsualChannelsWhereAJointNamesNone) {
 TEST(BvhWriter, SiblingsKeepTheirOrderHoweverTheListIsSorted) {
   Take take = takeOf({joint("r", -1), joint("s", -1), joint("a", 0), joint("b", 0), joint("aa", 2)});
   take.joints[2].endSite = true;  // it has a child, so it is written as a joint
-  const std::string text = written(take);
+  std::string const text = written(take);
   size_t at = 0;
-  for (const char* name : {"ROOT r\n", "JOINT a\n", "JOINT aa\n", "JOINT b\n", "ROOT s\n"}) {
+  for (char const* name : {"ROOT r\n", "JOINT a\n", "JOINT aa\n", "JOINT b\n", "ROOT s\n"}) {
     ASSERT_NE(text.find(name, at), std::string::npos) << name << text;
     at = text.find(name, at);
   }
@@ -141,14 +141,14 @@ TEST(BvhWriter, SaysWhatItCannotHold) {
   take.up = Axis::Z;
   std::string notes;
   written(take, &notes);
-  for (const char* text :
+  for (char const* text :
        {"BVH holds no points; 2 left out", "no computed outputs; 1 left", "no analog channels; 4 left",
         "no events; 5 left", "names of end sites; 1 left", "the first frame was 1", "the lengths are in mm",
         "BVH names no up axis; up is z", "2 keys between or outside the frames",
         "\"a{b\" was written as \"a_b\"", "the channels of \"a{b\" were replaced by the usual ones"})
     EXPECT_THAT(notes, HasSubstr(text));
 
-  const TempFolder folder;
+  TempFolder const folder;
   std::vector<TakeNote> list;
   EXPECT_THAT(errorOf([&] { writeBVH(Take(), folder.path("x.bvh"), list); }),
               HasSubstr("BVH holds joints only"));
@@ -163,8 +163,8 @@ TEST(BvhWriter, SaysWhatItCannotHold) {
 // jump and make the same rotation.
 TEST(EulerFilter, FollowsWithoutJumps) {
   for (int order = 0; order < 6; ++order) {
-    const auto rotationOrder = static_cast<TalixRotation::RotOrder>(order);
-    const int middle = kOrderAxes[order][1];
+    auto const rotationOrder = static_cast<TalixRotation::RotOrder>(order);
+    int const middle = kOrderAxes[order][1];
     EulerFilter unroller(order, true);
     Vec3 before;
     for (int frame = 0; frame <= 720; ++frame) {
@@ -174,7 +174,7 @@ TEST(EulerFilter, FollowsWithoutJumps) {
       rotation.setAsEuler(rotationOrder, angles);
       double q[4], p[4];
       rotation.getQuaternion(q);
-      const Vec3 got = unroller.next(q);
+      Vec3 const got = unroller.next(q);
       again.setAsEuler(rotationOrder, got);
       again.getQuaternion(p);
       EXPECT_NEAR(std::abs(q[0] * p[0] + q[1] * p[1] + q[2] * p[2] + q[3] * p[3]), 1, 1e-14)
@@ -194,7 +194,7 @@ TEST(EulerFilter, FollowsWithoutJumps) {
     double q[4];
     rotation.setAsEuler(TalixRotation::XYZ, Vec3(0.3, frame == 0 ? 1.0 : kPi / 2, frame * 0.1));
     rotation.getQuaternion(q);
-    const Vec3 got = unroller.next(q);
+    Vec3 const got = unroller.next(q);
     EXPECT_NEAR(got.x, 0.3, 1e-7);
     EXPECT_NEAR(got.z, frame * 0.1, 1e-7);
   }

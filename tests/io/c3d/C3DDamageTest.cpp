@@ -11,30 +11,30 @@ namespace {
 class C3DDamage : public testing::Test {
  protected:
   // Reads the bytes as a file; what is read must be sound, an error must name the file. Returns the error.
-  std::string outcome(const std::string& bytes) {
+  std::string outcome(std::string const& bytes) {
     folder.file("damaged.c3d", bytes);
     try {
-      const Take take = readC3D(path);
-      for (const TakePoint& point : take.points) {
+      Take const take = readC3D(path);
+      for (TakePoint const& point : take.points) {
         EXPECT_STREQ(point.positions.checkInvariants(), "");
         EXPECT_TRUE(point.residuals.empty() || point.residuals.count() == point.positions.count());
         EXPECT_TRUE(point.cameras.empty() || point.cameras.size() == static_cast<size_t>(take.frameCount));
       }
       return {};
-    } catch (const FileError& error) {
+    } catch (FileError const& error) {
       EXPECT_EQ(std::string(error.what()).find(path), 0u) << error.what();
       return error.what();
     }
   }
 
-  const TempFolder folder;
-  const std::string path = folder.path("damaged.c3d");
+  TempFolder const folder;
+  std::string const path = folder.path("damaged.c3d");
 };
 
 TEST_F(C3DDamage, SaysWhereTheDataEnds) {
-  const std::string bytes = readText(dataFile("walkset_a_le_real.c3d"));
+  std::string const bytes = readText(dataFile("walkset_a_le_real.c3d"));
   // Frames of 26 points and 16 * 4 samples from block 11 on.
-  const size_t frame = (26 * 4 + 64) * 4, data = 10 * 512;
+  size_t const frame = (26 * 4 + 64) * 4, data = 10 * 512;
   EXPECT_EQ(
       outcome(bytes.substr(0, data + 300 * frame + 5)),
       path + ", offset " + std::to_string(data + 300 * frame + 5) +
@@ -59,9 +59,9 @@ TEST_F(C3DDamage, SaysWhatIsNoC3DFile) {
 }
 
 TEST_F(C3DDamage, SaysWhereParametersLeadAstray) {
-  const std::string bytes = SmallC3D().bytes();
+  std::string const bytes = SmallC3D().bytes();
   // The first record is the group POINT: two bytes, the name, then the next-record offset.
-  const size_t link = 512 + 4 + 2 + 5;
+  size_t const link = 512 + 4 + 2 + 5;
   std::string damaged = bytes;
   damaged[link] = 2;
   EXPECT_NE(
@@ -81,7 +81,7 @@ TEST_F(C3DDamage, GivesATakeOrAnError) {
   small.set("ANALOG", integers("USED", {1}));
   small.set("EVENT", integers("USED", {1}));
   small.set("EVENT", C3DParameter{"TIMES", C3DParameter::Type::Real, {2, 1}, {}, {0, 1}});
-  const auto reader = [](const std::string& file) { return readC3D(file); };
+  auto const reader = [](std::string const& file) { return readC3D(file); };
   expectSurvivesDamage(small.bytes(), ".c3d", 3, 2000, reader);
   expectSurvivesDamage(readText(dataFile("single_frame_01.c3d")), ".c3d", 1, 2000, reader);
   expectSurvivesDamage(readText(dataFile("gait_results_events_01.c3d")).substr(0, 6144 + 448), ".c3d", 101,

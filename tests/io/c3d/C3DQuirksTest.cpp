@@ -24,19 +24,19 @@ class C3DQuirks : public testing::Test {
     return errorOf([this] { readC3D(path); });
   }
   // One frame of each fourth value, for two points that stand still.
-  void setFourths(const std::vector<int>& fourths) {
+  void setFourths(std::vector<int> const& fourths) {
     file.data.clear();
-    for (const int fourth : fourths)
+    for (int const fourth : fourths)
       for (int point = 0; point < 2; ++point)
-        for (const int value : {10, 20, 30, fourth}) appendC3DWord(file.data, static_cast<unsigned>(value));
+        for (int const value : {10, 20, 30, fourth}) appendC3DWord(file.data, static_cast<unsigned>(value));
   }
 
-  const TempFolder folder;
-  const std::string path = folder.path("small.c3d");
+  TempFolder const folder;
+  std::string const path = folder.path("small.c3d");
   SmallC3D file;
 };
 
-C3DParameter texts(const std::string& name, int length, const std::vector<std::string>& values) {
+C3DParameter texts(std::string const& name, int length, std::vector<std::string> const& values) {
   C3DParameter parameter{name, C3DParameter::Type::Text, {length, static_cast<int>(values.size())}, {}, {}};
   for (std::string value : values) {
     value.resize(static_cast<size_t>(length), ' ');
@@ -46,9 +46,9 @@ C3DParameter texts(const std::string& name, int length, const std::vector<std::s
 }
 
 TEST_F(C3DQuirks, ScalesIntegersAndKeepsTheirFrames) {
-  const Take take = read();
+  Take const take = read();
   EXPECT_FALSE(hasNote(take.notes, kWarning, "")) << take.notes.back().text;
-  const KeyTrack& positions = take.points[1].positions;
+  KeyTrack const& positions = take.points[1].positions;
   ASSERT_EQ(positions.count(), 4);
   EXPECT_EQ(positions.timeAt(0), ticksPerFrameAt(100));
   // Values count up by 8 in a frame; point 1 starts at 4.
@@ -57,8 +57,8 @@ TEST_F(C3DQuirks, ScalesIntegersAndKeepsTheirFrames) {
 
 TEST_F(C3DQuirks, PartsTheFourthValueIntoResidualAndCameras) {
   setFourths({0, 3, -1, 0x7f05});
-  const Take take = read();
-  const TakePoint& point = take.points[0];
+  Take const take = read();
+  TakePoint const& point = take.points[0];
   ASSERT_EQ(point.positions.count(), 3);
   ASSERT_EQ(point.residuals.count(), 3);
   EXPECT_EQ(point.residuals.at(0).values[0], 0);
@@ -72,14 +72,14 @@ TEST_F(C3DQuirks, PartsTheFourthValueIntoResidualAndCameras) {
 
 TEST_F(C3DQuirks, TakesOriginAsDataAndWarns) {
   file.data.assign(4 * 16, '\0');
-  const Take take = read();
+  Take const take = read();
   EXPECT_EQ(take.points[0].positions.count(), 4);
   EXPECT_TRUE(hasNote(take.notes, kWarning, "8 of 8 point-frames lie at exactly 0, 0, 0"));
 }
 
 TEST_F(C3DQuirks, AssumesMillimetresAndZUp) {
   file.set("POINT", text("UNITS", "furlong"));
-  const Take take = read();
+  Take const take = read();
   EXPECT_TRUE(take.unitAssumed);
   EXPECT_TRUE(take.upAssumed);
   EXPECT_EQ(take.fileUnit, "furlong");
@@ -114,7 +114,7 @@ TEST_F(C3DQuirks, ReadsOutputsOfGroupsThatTheFileNames) {
   file.set("POINT", text("SWAY_UNITS", "%"));
   file.set("POINT", C3DParameter{"TYPE_GROUPS", C3DParameter::Type::Text, {5, 2, 1}, "SWAYSSWAY ", {}});
   file.set("POINT", text("UNITS", "m"));
-  const Take take = read();
+  Take const take = read();
   ASSERT_EQ(take.outputs.size(), 1u);
   EXPECT_EQ(take.outputs[0].kind, "SWAYS");
   EXPECT_EQ(take.outputs[0].unit, "%");
@@ -208,7 +208,7 @@ TEST_F(C3DQuirks, FindsTheDataWhereOnePlaceIsWrong) {
   file.headerLast = 100;
   file.set("POINT", integers("FRAMES", {100}));
   file.set("POINT", integers("DATA_START", {4}));
-  const Take take = read();
+  Take const take = read();
   EXPECT_EQ(take.points[1].positions.at(0).values[0], 2);
   EXPECT_TRUE(hasNote(take.notes, kWarning, "data start differ"));
 }
@@ -227,9 +227,9 @@ TEST_F(C3DQuirks, TakesTheFirstFrameOfACountThatAgreesElseTheHeaders) {
 TEST_F(C3DQuirks, LooksForNoDataInsideTheParameters) {
   file.frames = file.headerLast = 32;  // a whole block
   file.set("POINT", integers("DATA_START", {2}));
-  const size_t fromParametersOn = file.bytes().size() - kC3DBlock;
+  size_t const fromParametersOn = file.bytes().size() - kC3DBlock;
   file.set("POINT", integers("FRAMES", {static_cast<double>(fromParametersOn / 16)}));
-  const Take take = read();
+  Take const take = read();
   EXPECT_EQ(take.frameCount, 32);
   EXPECT_EQ(take.points[1].positions.at(0).values[0], 2);
 }
@@ -238,8 +238,8 @@ TEST_F(C3DQuirks, AnyScaleBelowZeroMeansFloats) {
   file.scale = -0.0005;
   file.set("POINT", reals("SCALE", {file.scale}));
   for (int frame = 0; frame < 4; ++frame)
-    for (const double value : {1.5, -2.5, 1000.0, 3.0, 4.25, 5.0, 6.0, -1.0}) appendC3DReal(file.data, value);
-  const Take take = read();
+    for (double const value : {1.5, -2.5, 1000.0, 3.0, 4.25, 5.0, 6.0, -1.0}) appendC3DReal(file.data, value);
+  Take const take = read();
   EXPECT_EQ(take.variant, "Intel, float");
   ASSERT_EQ(take.points[0].positions.count(), 4);
   EXPECT_EQ(take.points[0].positions.at(3).values, (KeyTrack::Values{1.5, -2.5, 1000, 0}));
@@ -262,13 +262,13 @@ TEST_F(C3DQuirks, MergesEventsOfHeaderAndGroup) {
   file.set("EVENT", C3DParameter{"TIMES", C3DParameter::Type::Real, {2, 2}, {}, {0, 1.5, 2, 0.25}});
   file.set("EVENT", C3DParameter{"TIMES2", C3DParameter::Type::Real, {2, 1}, {}, {3, 0}});
   std::string bytes = file.bytes(), events;
-  for (const unsigned word : {12345u, 2u, 0u}) appendC3DWord(events, word);
+  for (unsigned const word : {12345u, 2u, 0u}) appendC3DWord(events, word);
   appendC3DReal(events, 1.5);
   appendC3DReal(events, 7);
   bytes.replace(298, events.size(), events);
   bytes.replace(396, 8, "FootJUMP");
   folder.file("small.c3d", bytes);
-  const Take take = readC3D(path);
+  Take const take = readC3D(path);
   ASSERT_EQ(take.events.size(), 4u);
   EXPECT_EQ(take.events[1].seconds, 120.25);
   EXPECT_EQ(take.events[2].label, "Late");
@@ -283,7 +283,7 @@ TEST_F(C3DQuirks, AssumesARateWhereTheFileHasNone) {
   std::string bytes = file.bytes();
   bytes.replace(20, 4, std::string(4, '\0'));
   folder.file("small.c3d", bytes);
-  const Take take = readC3D(path);
+  Take const take = readC3D(path);
   EXPECT_EQ(take.rate, Take().rate);
   EXPECT_TRUE(hasNote(take.notes, kWarning, "no usable frame rate"));
 }

@@ -9,25 +9,25 @@ namespace talix {
 namespace {
 
 TEST(C3DReader, LoadsAllNumberFormsOfOneTrialAlike) {
-  const Take first = readC3D(dataFile("walkset_a_le_int.c3d"));
-  for (const char* other : {"walkset_a_be_int", "walkset_a_vax_int", "walkset_a_layout_padafter"})
+  Take const first = readC3D(dataFile("walkset_a_le_int.c3d"));
+  for (char const* other : {"walkset_a_be_int", "walkset_a_vax_int", "walkset_a_layout_padafter"})
     EXPECT_EQ(differenceOf(first, readC3D(dataFile(std::string(other) + ".c3d")), 1e-12), "");
-  const Take real = readC3D(dataFile("walkset_a_le_real.c3d"));
-  for (const char* other : {"walkset_a_be_real", "walkset_a_vax_real"})
+  Take const real = readC3D(dataFile("walkset_a_le_real.c3d"));
+  for (char const* other : {"walkset_a_be_real", "walkset_a_vax_real"})
     EXPECT_EQ(differenceOf(real, readC3D(dataFile(std::string(other) + ".c3d")), 1e-12), "");
   // A coordinate's step is 1/12 mm in the integer files.
   EXPECT_EQ(differenceOf(first, real, 0.09), "");
 }
 
 TEST(C3DReader, ConvertsLengthsToMillimetres) {
-  const std::string file = dataFile("push_nan_01.c3d");
-  const Take take = readC3D(file), asFeet = readC3D(file, {"ft"}), asMillimetres = readC3D(file, {"mm"});
+  std::string const file = dataFile("push_nan_01.c3d");
+  Take const take = readC3D(file), asFeet = readC3D(file, {"ft"}), asMillimetres = readC3D(file, {"mm"});
   EXPECT_EQ(take.unitInMillimetres, 1000);
   EXPECT_TRUE(hasNote(take.notes, TakeNote::Level::Info, "6384 point-frames hold no numbers"));
   EXPECT_TRUE(hasNote(asFeet.notes, TakeNote::Level::Info, "read as ft"));
   for (size_t i = 0; i < take.points.size(); ++i) {
     if (take.points[i].positions.empty()) continue;
-    const double x = asMillimetres.points[i].positions.at(0).values[0];
+    double const x = asMillimetres.points[i].positions.at(0).values[0];
     EXPECT_NEAR(take.points[i].positions.at(0).values[0], 1000 * x, 1e-9);
     EXPECT_NEAR(asFeet.points[i].positions.at(0).values[0], 304.8 * x, 1e-9);
   }

@@ -5,8 +5,8 @@
 
 namespace talix {
 
-bool hasNote(const std::vector<TakeNote>& notes, TakeNote::Level level, const std::string& part) {
-  for (const TakeNote& note : notes)
+bool hasNote(std::vector<TakeNote> const& notes, TakeNote::Level level, std::string const& part) {
+  for (TakeNote const& note : notes)
     if (note.level == level && note.text.find(part) != std::string::npos) return true;
   return false;
 }
@@ -20,10 +20,10 @@ SmallC3D::SmallC3D() {
   set("POINT", text("UNITS", "mm"));
 }
 
-void SmallC3D::set(const std::string& group, const C3DParameter& parameter) {
+void SmallC3D::set(std::string const& group, C3DParameter const& parameter) {
   for (C3DGroup& candidate : parameters.groups) {
     if (candidate.name != group) continue;
-    std::erase_if(candidate.parameters, [&](const C3DParameter& old) { return old.name == parameter.name; });
+    std::erase_if(candidate.parameters, [&](C3DParameter const& old) { return old.name == parameter.name; });
     candidate.parameters.push_back(parameter);
     return;
   }
@@ -31,10 +31,10 @@ void SmallC3D::set(const std::string& group, const C3DParameter& parameter) {
 }
 
 std::string SmallC3D::bytes() const {
-  const std::string section = c3dParameterSection(parameters);
-  const size_t dataBlock = 2 + section.size() / kC3DBlock;
+  std::string const section = c3dParameterSection(parameters);
+  size_t const dataBlock = 2 + section.size() / kC3DBlock;
   std::string all = "\x02\x50";
-  for (const int word : {2, channels * samplesPerFrame, headerFirst, headerLast, 0})
+  for (int const word : {2, channels * samplesPerFrame, headerFirst, headerLast, 0})
     appendC3DWord(all, static_cast<unsigned>(word));
   appendC3DReal(all, scale);
   appendC3DWord(all,
@@ -51,19 +51,19 @@ std::string SmallC3D::bytes() const {
   return all + values;
 }
 
-C3DParameter integers(const std::string& name, const std::vector<double>& values) {
+C3DParameter integers(std::string const& name, std::vector<double> const& values) {
   return {name, C3DParameter::Type::Integer, {static_cast<int>(values.size())}, {}, values};
 }
 
-C3DParameter reals(const std::string& name, const std::vector<double>& values) {
+C3DParameter reals(std::string const& name, std::vector<double> const& values) {
   return {name, C3DParameter::Type::Real, {static_cast<int>(values.size())}, {}, values};
 }
 
-C3DParameter text(const std::string& name, const std::string& value) {
+C3DParameter text(std::string const& name, std::string const& value) {
   return {name, C3DParameter::Type::Text, {static_cast<int>(value.size())}, value, {}};
 }
 
-Take movingPoints(int points, int64 frames, const std::function<bool(int, int64)>& seen) {
+Take movingPoints(int points, int64 frames, std::function<bool(int, int64)> const& seen) {
   Take take;
   take.rate = 100;
   take.firstFrame = 1;
@@ -73,7 +73,7 @@ Take movingPoints(int points, int64 frames, const std::function<bool(int, int64)
     point.label = "M" + std::to_string(p);
     for (int64 f = 0; f < frames; ++f) {
       if (!seen(p, f)) continue;
-      const double x = static_cast<double>(f % 1000), y = p;
+      double const x = static_cast<double>(f % 1000), y = p;
       point.positions.set((f + take.firstFrame) * ticksPerFrameAt(take.rate), {x, y, 0.25 * x + 1});
     }
     take.points.push_back(std::move(point));

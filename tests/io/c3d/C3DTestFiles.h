@@ -11,7 +11,7 @@
 
 namespace talix {
 
-bool hasNote(const std::vector<TakeNote>& notes, TakeNote::Level level, const std::string& part);
+bool hasNote(std::vector<TakeNote> const& notes, TakeNote::Level level, std::string const& part);
 
 // An Intel file with integer coordinates and two points, made by hand. Change what is of interest, then take
 // its bytes.
@@ -26,15 +26,15 @@ struct SmallC3D {
   std::string data;  // two-byte integers; frames of points and analog samples, all counting up, by default
 
   SmallC3D();
-  void set(const std::string& group, const C3DParameter& parameter);  // adds or replaces
+  void set(std::string const& group, C3DParameter const& parameter);  // adds or replaces
   std::string bytes() const;
 };
 
-C3DParameter integers(const std::string& name, const std::vector<double>& values);
-C3DParameter reals(const std::string& name, const std::vector<double>& values);
-C3DParameter text(const std::string& name, const std::string& value);
+C3DParameter integers(std::string const& name, std::vector<double> const& values);
+C3DParameter reals(std::string const& name, std::vector<double> const& values);
+C3DParameter text(std::string const& name, std::string const& value);
 
 // A take of labelled points that are seen at all frames but those that `seen` denies.
-Take movingPoints(int points, int64 frames, const std::function<bool(int, int64)>& seen);
+Take movingPoints(int points, int64 frames, std::function<bool(int, int64)> const& seen);
 
 }  // namespace talix

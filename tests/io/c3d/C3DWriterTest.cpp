@@ -10,24 +10,24 @@
 namespace talix {
 namespace {
 
-const auto kAlways = [](int, int64) { return true; };
+auto const kAlways = [](int, int64) { return true; };
 
-Take writtenAndRead(const Take& take, std::vector<TakeNote>& notes) {
-  const TempFolder folder;
+Take writtenAndRead(Take const& take, std::vector<TakeNote>& notes) {
+  TempFolder const folder;
   writeC3D(take, folder.path("written.c3d"), notes);
   return readC3D(folder.path("written.c3d"));
 }
 
 TEST(C3DWriter, KeepsRealTakes) {
-  for (const char* file : {"walkset_a_le_int", "walkset_a_vax_real", "gait_results_events_01", "push_nan_01",
+  for (char const* file : {"walkset_a_le_int", "walkset_a_vax_real", "gait_results_events_01", "push_nan_01",
                            "single_frame_01", "malformed_paramoffset_01"}) {
-    const Take take = readC3D(dataFile(file + std::string(".c3d")));
+    Take const take = readC3D(dataFile(file + std::string(".c3d")));
     std::vector<TakeNote> notes;
-    const Take again = writtenAndRead(take, notes);
+    Take const again = writtenAndRead(take, notes);
     EXPECT_EQ(differenceOf(take, again, 1e-6), "") << file;
     EXPECT_EQ(again.variant, "Intel, float");
     EXPECT_TRUE(notes.empty()) << notes[0].text;
-    for (const TakeNote& note : again.notes) EXPECT_EQ(note.level, TakeNote::Level::Info) << note.text;
+    for (TakeNote const& note : again.notes) EXPECT_EQ(note.level, TakeNote::Level::Info) << note.text;
     // What has become four-byte reals once stays as it is.
     EXPECT_EQ(differenceOf(again, writtenAndRead(again, notes), 1e-15), "") << file;
   }
@@ -48,19 +48,19 @@ TEST(C3DWriter, KeepsMoreThan255PointsAndEvents) {
 }
 
 TEST(C3DWriter, KeepsFrameNumbersAndCountsBeyond16Bits) {
-  for (const int64 first : {int64{0}, int64{1}, int64{500}, int64{70'000}})
-    for (const int64 frames :
+  for (int64 const first : {int64{0}, int64{1}, int64{500}, int64{70'000}})
+    for (int64 const frames :
          {int64{40'000}, int64{65'535}, int64{65'536}, int64{65'536 + 90}, int64{140'000}}) {
       Take take = movingPoints(1, frames, [](int, int64 f) { return f % 100 != 7; });
       KeyTrack& positions = take.points[0].positions;
       KeyTrack moved(KeyTrack::Shape::Vector);
-      positions.forEach(0, positions.count(), [&](const KeyTrack::Key& key) {
+      positions.forEach(0, positions.count(), [&](KeyTrack::Key const& key) {
         moved.set(key.time + (first - 1) * ticksPerFrameAt(take.rate), key.values);
       });
       positions = moved;
       take.firstFrame = first;
       std::vector<TakeNote> notes;
-      const Take again = writtenAndRead(take, notes);
+      Take const again = writtenAndRead(take, notes);
       EXPECT_TRUE(notes.empty());
       EXPECT_EQ(differenceOf(take, again, 0), "");
       EXPECT_FALSE(hasNote(again.notes, TakeNote::Level::Warning, "")) << again.notes.back().text;
@@ -72,7 +72,7 @@ TEST(C3DWriter, KeepsGapsResidualsAndCameras) {
   take.fileUnit = "cm";
   take.unitInMillimetres = 10;
   TakePoint& point = take.points[1];
-  point.positions.forEach(0, point.positions.count(), [&](const KeyTrack::Key& key) {
+  point.positions.forEach(0, point.positions.count(), [&](KeyTrack::Key const& key) {
     point.residuals.set(key.time, {0.25 * static_cast<double>(key.time / ticksPerFrameAt(100) % 7)});
   });
   point.cameras.assign(300, 0);
@@ -86,7 +86,7 @@ TEST(C3DWriter, KeepsGapsResidualsAndCameras) {
 
 TEST(C3DWriter, TellsWhatIsNotWritten) {
   Take take = movingPoints(2, 10, kAlways);
-  const int64 period = ticksPerFrameAt(100);
+  int64 const period = ticksPerFrameAt(100);
   KeyTrack& positions = take.points[0].positions;
   positions.set(3 * period + 1, {1, 2, 3});
   positions.set(3 * period + 2, {1, 2, 3});
@@ -97,8 +97,8 @@ TEST(C3DWriter, TellsWhatIsNotWritten) {
   take.analogRate = 250;
   take.analog.resize(3);
   std::vector<TakeNote> notes;
-  const Take again = writtenAndRead(take, notes);
-  for (const char* text : {"2 keys of M0 lie between frames", "1 keys of M0 lie outside the take's frames",
+  Take const again = writtenAndRead(take, notes);
+  for (char const* text : {"2 keys of M0 lie between frames", "1 keys of M0 lie outside the take's frames",
                            "1 keys of M0 have no value on some axes", "2 joints are not written",
                            "3 analog channels are not written", "1 positions are no numbers"})
     EXPECT_TRUE(hasNote(notes, TakeNote::Level::Warning, text)) << text;
@@ -117,7 +117,7 @@ TEST(C3DWriter, ReplacesMissingSamplesAndLowFrameNumbersWithANote) {
   take.analog.resize(1);
   take.analog[0].samples.set(-3 * ticksPerFrameAt(200), {7.5});
   std::vector<TakeNote> notes;
-  const Take again = writtenAndRead(take, notes);
+  Take const again = writtenAndRead(take, notes);
   EXPECT_TRUE(hasNote(notes, TakeNote::Level::Warning, "frame -2 is written as frame 1"));
   EXPECT_TRUE(hasNote(notes, TakeNote::Level::Warning, "7 analog samples are missing"));
   ASSERT_EQ(again.points[0].positions.count(), 1);
@@ -127,8 +127,8 @@ TEST(C3DWriter, ReplacesMissingSamplesAndLowFrameNumbersWithANote) {
 }
 
 TEST(C3DWriter, LeavesTheOldFileWhenTheTakeIsImpossible) {
-  const TempFolder folder;
-  const std::string path = folder.file("kept.c3d", "old");
+  TempFolder const folder;
+  std::string const path = folder.file("kept.c3d", "old");
   Take take = movingPoints(1, 2, kAlways);
   take.rate = 0;
   std::vector<TakeNote> notes;

@@ -11,12 +11,12 @@ SceneTest::SceneTest() {
 
 SceneTest::~SceneTest() { g_db->newScene(); }
 
-void SceneTest::open(const Take& take, int up) {
+void SceneTest::open(Take const& take, int up) {
   m_notes.clear();
   importTake(take, "folder/" + take.name + ".c3d", up, *g_db, m_notes);
 }
 
-void SceneTest::openFile(const std::string& name, int up) {
+void SceneTest::openFile(std::string const& name, int up) {
   m_notes.clear();
   importTake(readTake(dataFile(name)), dataFile(name), up, *g_db, m_notes);
 }
@@ -28,13 +28,13 @@ Take SceneTest::save() {
 
 std::string SceneTest::notes() const { return notesOf(m_notes); }
 
-bool SceneTest::warned(const std::string& text) const {
-  for (const TakeNote& note : m_notes)
+bool SceneTest::warned(std::string const& text) const {
+  for (TakeNote const& note : m_notes)
     if (note.level == TakeNote::Level::Warning && note.text.find(text) != std::string::npos) return true;
   return false;
 }
 
-Take smallTake(const std::string& name, int64 frames, int64 first) {
+Take smallTake(std::string const& name, int64 frames, int64 first) {
   Take take;
   take.format = "C3D";
   take.name = name;
@@ -44,12 +44,12 @@ Take smallTake(const std::string& name, int64 frames, int64 first) {
   return take;
 }
 
-TakePoint& addPoint(Take& take, const std::string& subject, const std::string& label, const Vec3& start,
-                    const std::string& seen) {
+TakePoint& addPoint(Take& take, std::string const& subject, std::string const& label, Vec3 const& start,
+                    std::string const& seen) {
   TakePoint& point = take.points.emplace_back();
   point.subject = subject;
   point.label = label;
-  const int64 period = ticksPerFrameAt(take.rate);
+  int64 const period = ticksPerFrameAt(take.rate);
   for (int64 i = 0; i < take.frameCount; ++i)
     if (seen.empty() || seen[static_cast<size_t>(i)] != ' ')
       point.positions.set((take.firstFrame + i) * period,

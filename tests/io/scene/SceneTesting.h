@@ -17,30 +17,30 @@ class SceneTest : public testing::Test {
   ~SceneTest() override;
 
   // Takes a take into the scene as if it came from "folder/NAME.c3d".
-  void open(const Take& take, int up = -1);
-  void openFile(const std::string& name, int up = -1);
+  void open(Take const& take, int up = -1);
+  void openFile(std::string const& name, int up = -1);
   Take save();
 
   // By full path; fails the test when there is no such module of that class.
   template <class T>
-  T* at(const std::string& path) {
+  T* at(std::string const& path) {
     auto* found = objectAs<T>(g_db->getModuleWithPath(path, &T::staticClass(), false));
     EXPECT_NE(found, nullptr) << path;
     return found;
   }
-  bool has(const std::string& path) { return g_db->getModuleWithPath(path, nullptr, false) != nullptr; }
+  bool has(std::string const& path) { return g_db->getModuleWithPath(path, nullptr, false) != nullptr; }
 
   std::string notes() const;  // since the last call of open or save
-  bool warned(const std::string& text) const;
+  bool warned(std::string const& text) const;
 
  private:
   std::vector<TakeNote> m_notes;
 };
 
 // A take of `frames` frames at 100 a second from frame `first` on; its points are added with addPoint.
-Take smallTake(const std::string& name, int64 frames = 5, int64 first = 1);
+Take smallTake(std::string const& name, int64 frames = 5, int64 first = 1);
 // Frame i lies at start + (i, 0, 0); no key where `seen` holds a blank.
-TakePoint& addPoint(Take& take, const std::string& subject, const std::string& label, const Vec3& start,
-                    const std::string& seen = "");
+TakePoint& addPoint(Take& take, std::string const& subject, std::string const& label, Vec3 const& start,
+                    std::string const& seen = "");
 
 }  // namespace talix

@@ -15,13 +15,13 @@ class TakeExportTest : public SceneTest {
  protected:
   int64 at100(int64 frame) const { return frame * ticksPerFrameAt(100); }
   // A blank for each of the frames 1 to 5 without a position.
-  std::string seen(const KeyTrack& track) const {
+  std::string seen(KeyTrack const& track) const {
     std::string text;
     for (int64 frame = 1; frame <= 5; ++frame) text += track.find(at100(frame)) >= 0 ? 'x' : ' ';
     return text;
   }
   KeyTrack onlyPoint() {
-    const Take take = save();
+    Take const take = save();
     EXPECT_EQ(take.points.size(), 1u);
     return take.points.at(0).positions;
   }
@@ -36,7 +36,7 @@ TEST_F(TakeExportTest, LayersAndPartialKeysAreEvaluated) {
   KeyTrack raised(KeyTrack::Shape::Vector);
   raised.set(at100(3), {0, 0, 7});
   channel->setTrack(g_db->getActiveClip(), 1, raised);
-  const KeyTrack made = onlyPoint();
+  KeyTrack const made = onlyPoint();
   EXPECT_EQ(seen(made), "xx xx");
   EXPECT_EQ(Vec3(made.at(3).values.data()), Vec3(4, 0, 7));
 
@@ -79,9 +79,9 @@ TEST_F(TakeExportTest, AClipKeepsItsOwnFrames) {
   open(first);
   open(second);
   EXPECT_EQ(differenceOf(second, save()), "");
-  const auto* marker = at<Marker>("\\Bob\\M");
-  for (const int frame : {5, 6, 7, 8, 9, 13, 14, 15, 16, 17}) {
-    const bool isSeen = (frame >= 6 && frame <= 8) || (frame >= 14 && frame <= 16);
+  auto const* marker = at<Marker>("\\Bob\\M");
+  for (int const frame : {5, 6, 7, 8, 9, 13, 14, 15, 16, 17}) {
+    bool const isSeen = (frame >= 6 && frame <= 8) || (frame >= 14 && frame <= 16);
     EXPECT_EQ(!marker->getOccludedChannel()->getValue(at100(frame)), isSeen) << frame;
   }
 
@@ -92,9 +92,9 @@ TEST_F(TakeExportTest, AClipKeepsItsOwnFrames) {
 
   // Thinned, its samples come back.
   auto* channel = at<AnalogDevice>("\\Analog")->getChannel("emg");
-  const HTimeRange all[] = {HTimeRange::forever()};
+  HTimeRange const all[] = {HTimeRange::forever()};
   EXPECT_EQ(channel->reduceKeys(all, {.length = 0, .angle = 0, .ofRange = 1e-9}), 14);
-  const KeyTrack samples = save().analog.at(0).samples;
+  KeyTrack const samples = save().analog.at(0).samples;
   ASSERT_EQ(samples.count(), 24);
   for (int64 i = 0; i < 24; ++i) EXPECT_NEAR(samples.at(i).values[0], static_cast<double>(i % 5), 1e-9);
 }
@@ -106,7 +106,7 @@ TEST_F(TakeExportTest, OnlyWhatBelongsToTheActiveClipGoesOut) {
   addPoint(second, "Bob", "never seen", {}, "     ");
   open(first);
   open(second);
-  const Take made = save();
+  Take const made = save();
   EXPECT_EQ(differenceOf(second, made), "");
   g_db->setActiveClip(g_db->getHeadClip());
   EXPECT_EQ(differenceOf(first, save()), "");
@@ -116,7 +116,7 @@ TEST_F(TakeExportTest, WithoutAClipDefaultValuesLastThroughTheRange) {
   auto* bob = g_db->createModule(&Character::staticClass(), "Bob", nullptr);
   static_cast<Node*>(g_db->createModule(&Marker::staticClass(), "M", bob))->setConstLocalPos({1, 2, 3});
   HTimeManager::getInstance()->setAnimRange(HTimeRange(0, 4 * ticksPerFrameAt(120)), true);
-  const Take take = save();
+  Take const take = save();
   EXPECT_EQ(take.frameCount, 5);
   ASSERT_EQ(take.points.size(), 1u);
   EXPECT_EQ(take.points[0].subject, "Bob");
@@ -141,9 +141,9 @@ TEST_F(TakeExportTest, MarkersBelowMovingBonesAreInTheWorld) {
   auto* head = at<SolvingBone>("\\two_frames_01\\Hips\\Chest\\Neck\\Head");
   auto* marker = static_cast<Marker*>(g_db->createModule(&Marker::staticClass(), "Top", head));
   marker->setLocalPos(0, {0, 100, 0});
-  const Take made = save();
+  Take const made = save();
   ASSERT_EQ(made.points.size(), 1u);
-  const Vec3 world = marker->getWSPos(0);
+  Vec3 const world = marker->getWSPos(0);
   EXPECT_LT((Vec3(made.points[0].positions.at(0).values.data()) - world).length(), 1e-9);
   EXPECT_GT((world - Vec3(0, 100, 0)).length(), 1);
 }
@@ -151,11 +151,11 @@ TEST_F(TakeExportTest, MarkersBelowMovingBonesAreInTheWorld) {
 TEST_F(TakeExportTest, ChangedBonesGetTheChannelsThatTheyNeed) {
   openFile("two_frames_01.bvh");
   auto* chest = at<SolvingBone>("\\two_frames_01\\Hips\\Chest");
-  const size_t index = 1;
+  size_t const index = 1;
   EXPECT_EQ(save().joints[index].channels.size(), 3u);
-  const Vec3 offset = chest->getPreTranslation();
+  Vec3 const offset = chest->getPreTranslation();
   chest->setLocalPos(0, {1, 0, 0});
-  const Take moved = save();
+  Take const moved = save();
   EXPECT_TRUE(moved.joints[index].channels.empty());
   EXPECT_EQ(moved.joints[index].translations.count(), moved.frameCount);
   EXPECT_EQ(Vec3(moved.joints[index].translations.at(1).values.data()), offset + Vec3(1, 0, 0));

@@ -18,24 +18,24 @@ using testing::Not;
 class TakeImportTest : public SceneTest {
  protected:
   // The marker's keys in the active clip.
-  const KeyTrack& keysOf(const std::string& path) {
+  KeyTrack const& keysOf(std::string const& path) {
     return *at<Marker>(path)->getTranslationChannel()->findTrack(g_db->getActiveClip(), 0);
   }
   int clips() const { return g_db->getNumClips(); }
 };
 
-Vec3 firstPosition(const KeyTrack& track) { return Vec3(track.at(0).values.data()); }
+Vec3 firstPosition(KeyTrack const& track) { return Vec3(track.at(0).values.data()); }
 
 MATCHER_P3(Near, x, y, z, "") { return (arg - Vec3(x, y, z)).length() < 1e-9; }
 
 // Hips with a leg that ends; each joint of both turns, the hips move too.
-Take skeletonTake(const std::string& name) {
+Take skeletonTake(std::string const& name) {
   Take take = smallTake(name, 2, 0);
   take.format = "BVH";
   take.up = Axis::Y;
   take.joints.resize(3);
-  const char* names[] = {"Hips", "Leg", "Leg_end"};
-  const int64 period = ticksPerFrameAt(take.rate);
+  char const* names[] = {"Hips", "Leg", "Leg_end"};
+  int64 const period = ticksPerFrameAt(take.rate);
   for (int i = 0; i < 3; ++i) {
     TakeJoint& joint = take.joints[static_cast<size_t>(i)];
     joint.name = names[i];
@@ -94,7 +94,7 @@ TEST_F(TakeImportTest, LaterTakesGiveTheirMotionToWhatIsThere) {
   EXPECT_EQ(g_db->getMarkers().getCount(), 4);
   EXPECT_EQ(firstPosition(keysOf("\\Bob\\LFHD")), Vec3(3, 0, 0));
   EXPECT_EQ(firstPosition(keysOf("\\Bob\\CLAV")), Vec3(5, 0, 0));
-  const Controller& channel = *at<Marker>("\\Bob\\LFHD")->getTranslationChannel();
+  Controller const& channel = *at<Marker>("\\Bob\\LFHD")->getTranslationChannel();
   EXPECT_EQ(firstPosition(*channel.findTrack(g_db->getHeadClip(), 0)), Vec3(1, 0, 0));
   EXPECT_FALSE(at<Marker>("\\Bob\\RFHD")->getTranslationChannel()->hasKeysInClip(g_db->getActiveClip()));
 }
@@ -120,8 +120,8 @@ TEST_F(TakeImportTest, TheFirstTakeSetsTheTimeLaterOnesKeepTheirs) {
   addPoint(first, "A", "M", {});
   addPoint(second, "A", "M", {});
   open(first);
-  const HTimeManager& time = *HTimeManager::getInstance();
-  const int64 period = ticksPerFrameAt(25);
+  HTimeManager const& time = *HTimeManager::getInstance();
+  int64 const period = ticksPerFrameAt(25);
   EXPECT_EQ(time.getFrameRate().getTimecodeStandard(), PAL);
   EXPECT_EQ(time.getAnimRange(), HTimeRange(3 * period, 7 * period));
   EXPECT_EQ(time.getPlayRange(), time.getAnimRange());
@@ -149,13 +149,13 @@ TEST_F(TakeImportTest, OtherUpAxesAreTurnedToTheScenes) {
 }
 
 TEST(UpAxisConversion, AllTurnsAreProperAndAgreeWithTheirRotation) {
-  const Vec3 units[] = {{1, 0, 0}, {0, 1, 0}, {0, 0, 1}};
+  Vec3 const units[] = {{1, 0, 0}, {0, 1, 0}, {0, 0, 1}};
   for (int from = 0; from < 3; ++from)
     for (int to = 0; to < 3; ++to) {
-      const UpAxisConversion turn(from, to);
+      UpAxisConversion const turn(from, to);
       EXPECT_EQ(turn(units[from]), units[to]);
       EXPECT_EQ(turn(units[0]).cross(turn(units[1])), turn(units[2]));
-      const Vec3 v(1, 2, 3);
+      Vec3 const v(1, 2, 3);
       EXPECT_LT((turn.rotation().rotate(v) - turn(v)).length(), 1e-12);
     }
 }
@@ -168,7 +168,7 @@ TEST_F(TakeImportTest, MarkersBelowAMovedSubjectKeepTheirPlaceInTheWorld) {
   Take take = smallTake("walk");
   addPoint(take, "Bob", "LFHD", {1, 2, 3});
   open(take);
-  const int64 third = 3 * ticksPerFrameAt(100);
+  int64 const third = 3 * ticksPerFrameAt(100);
   EXPECT_THAT(at<Marker>("\\Bob\\LFHD")->getWSPos(third), Near(3.0, 2.0, 3.0));
   EXPECT_THAT(Vec3(save().points[0].positions.at(2).values.data()), Near(3.0, 2.0, 3.0));
 }
@@ -189,12 +189,12 @@ TEST_F(TakeImportTest, JointsBecomeBonesWithTheOffsetAsPreTranslation) {
 
 TEST_F(TakeImportTest, TurnedSkeletonsMoveAsTheirFileTurned) {
   open(skeletonTake("walk"));
-  const int64 time = ticksPerFrameAt(100);
-  const Node* end = at<Node>("\\walk\\Hips\\Leg\\Leg_end");
-  const Vec3 inFile = end->getWSPos(time);
+  int64 const time = ticksPerFrameAt(100);
+  Node const* end = at<Node>("\\walk\\Hips\\Leg\\Leg_end");
+  Vec3 const inFile = end->getWSPos(time);
   g_db->newScene();
   open(skeletonTake("walk"), 2);
-  const Vec3 turned = UpAxisConversion(1, 2)(inFile);
+  Vec3 const turned = UpAxisConversion(1, 2)(inFile);
   EXPECT_THAT(at<Node>("\\walk\\Hips\\Leg\\Leg_end")->getWSPos(time), Near(turned.x, turned.y, turned.z));
   // The keys are the file's.
   EXPECT_EQ(at<SolvingBone>("\\walk\\Hips")->getLocalPos(0), Vec3(5, 50, 0));
@@ -210,7 +210,7 @@ TEST_F(TakeImportTest, TurnedSkeletonsMoveAsTheirFileTurned) {
 TEST_F(TakeImportTest, ChannelsOfDevicesGetNamesThatCanStand) {
   Take take = smallTake("walk");
   take.analogRate = 100;
-  for (const char* name : {"Force.Fx", "Translation", "Force.Fx", "Name", ""}) {
+  for (char const* name : {"Force.Fx", "Translation", "Force.Fx", "Name", ""}) {
     TakeAnalogChannel& channel = take.analog.emplace_back();
     channel.name = name;
     channel.unit = "N";
@@ -220,11 +220,11 @@ TEST_F(TakeImportTest, ChannelsOfDevicesGetNamesThatCanStand) {
   output.name = "Force_Fx";
   output.values.set(ticksPerFrameAt(100), {1, 2, 3});
   open(take);
-  const auto* analog = at<AnalogDevice>("\\Analog");
+  auto const* analog = at<AnalogDevice>("\\Analog");
   // The vector came first and has the name everywhere.
   EXPECT_EQ(at<AnalogDevice>("\\Outputs")->getChannel("Force_Fx")->getPropertyType(),
             DataSource::Vec3Property);
-  for (const char* name : {"Force_Fx_1", "Force_Fx_2", "Translation_1", "Name_1", "channel"})
+  for (char const* name : {"Force_Fx_1", "Force_Fx_2", "Translation_1", "Name_1", "channel"})
     EXPECT_NE(analog->getChannel(name), nullptr) << name;
   EXPECT_THAT(notes(), HasSubstr("the channel \"Translation\" of Analog became \"Translation_1\""));
   EXPECT_EQ(differenceOf(take, save()), "");
@@ -243,7 +243,7 @@ TEST_F(TakeImportTest, ATakeThatCannotComeInLeavesTheSceneAsItWas) {
   PropertyTable& table = PropertyTable::getInstance();
   for (int i = 0; table.add("n" + std::to_string(i), DataSource::IntProperty); ++i) {
   }
-  const int before = g_db->getNumModules();
+  int const before = g_db->getNumModules();
   take.analog.emplace_back().name = "EMG";
   EXPECT_THAT(errorOf([&] { open(take); }), HasSubstr("no channel name left for \"EMG\""));
   EXPECT_EQ(g_db->getNumModules(), before);

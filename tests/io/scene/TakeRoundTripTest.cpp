@@ -12,8 +12,8 @@ class TakeRoundTrip : public SceneTest {};
 
 std::vector<std::string> takeFiles() {
   std::vector<std::string> names;
-  for (const auto& entry : std::filesystem::directory_iterator(dataFile(""))) {
-    const std::string name = entry.path().filename().string(), suffix = entry.path().extension().string();
+  for (auto const& entry : std::filesystem::directory_iterator(dataFile(""))) {
+    std::string const name = entry.path().filename().string(), suffix = entry.path().extension().string();
     if (suffix == ".c3d" || suffix == ".bvh" || suffix == ".trc") names.push_back(name);
   }
   return names;
@@ -21,13 +21,13 @@ std::vector<std::string> takeFiles() {
 
 TEST_F(TakeRoundTrip, EveryRealTakeComesBackAsItWasRead) {
   int read = 0;
-  for (const std::string& name : takeFiles()) {
+  for (std::string const& name : takeFiles()) {
     Take take;
     if (!errorOf([&] { take = readTake(dataFile(name)); }).empty()) continue;
     g_db->newScene();
     HTimeManager::getInstance()->reset();
     open(take);
-    const Take made = save();
+    Take const made = save();
     EXPECT_EQ(differenceOf(take, made), "") << name;
     EXPECT_EQ(made.format + " " + made.name, take.format + " " + take.name);
     for (size_t i = 0; i < take.analog.size(); ++i)
@@ -41,9 +41,9 @@ TEST_F(TakeRoundTrip, EveryRealTakeComesBackAsItWasRead) {
 
 TEST_F(TakeRoundTrip, KeysAreSharedNotCopied) {
   openFile("walkset_a_le_real.c3d");
-  const Take made = save();
+  Take const made = save();
   ASSERT_EQ(made.points.size(), 26u);
-  const auto* marker = at<Marker>("\\walkset_a_le_real\\" + made.points[0].label);
+  auto const* marker = at<Marker>("\\walkset_a_le_real\\" + made.points[0].label);
   EXPECT_TRUE(made.points[0].positions.sharesAll(
       *marker->getTranslationChannel()->findTrack(g_db->getActiveClip(), 0)));
 }

@@ -43,13 +43,13 @@ class DistanceTest : public SceneTest {
 
 TEST_F(DistanceTest, StatisticsAreThoseOfTheFramesInTheRanges) {
   for (int round = 0; round < 200; ++round) {
-    const int64 step = kFrame * static_cast<int64>(1 + below(3));
-    const bool keysOnly = below(2);
+    int64 const step = kFrame * static_cast<int64>(1 + below(3));
+    bool const keysOnly = below(2);
     Ranges ranges;
     std::vector<double> all;
     for (size_t i = below(4); i > 0; --i) {
       // Ends on and off the frames; now and then an empty range.
-      const int64 start = static_cast<int64>(below(60)) * kFrame / 2 - 22 * kFrame;
+      int64 const start = static_cast<int64>(below(60)) * kFrame / 2 - 22 * kFrame;
       ranges.add(HTimeRange(start, start + static_cast<int64>(below(40)) * kFrame / 2 - kFrame));
       for (int64 time = -60 * kFrame; time < 60 * kFrame; time += step)
         if (ranges[ranges.getCount() - 1].contains(time) &&
@@ -58,7 +58,7 @@ TEST_F(DistanceTest, StatisticsAreThoseOfTheFramesInTheRanges) {
     }
     double sum = 0, squares = 0, least = 0, greatest = 0;
     for (double d : all) sum += d;
-    const double mean = all.empty() ? 0 : sum / static_cast<double>(all.size());
+    double const mean = all.empty() ? 0 : sum / static_cast<double>(all.size());
     for (double d : all) squares += (d - mean) * (d - mean);
     if (!all.empty()) {
       least = *std::min_element(all.begin(), all.end());
@@ -69,14 +69,14 @@ TEST_F(DistanceTest, StatisticsAreThoseOfTheFramesInTheRanges) {
     EXPECT_NEAR(DistanceUtils::getMaxDistance(m_a, m_b, ranges, keysOnly, step), greatest, 1e-9);
     EXPECT_NEAR(DistanceUtils::getDistanceRange(m_a, m_b, ranges, keysOnly, step), greatest - least, 1e-9);
     if (step == kFrame) {
-      const double deviation = all.empty() ? 0 : std::sqrt(squares / static_cast<double>(all.size()));
+      double const deviation = all.empty() ? 0 : std::sqrt(squares / static_cast<double>(all.size()));
       EXPECT_NEAR(DistanceUtils::getDistanceSD(m_a, m_b, ranges, keysOnly), deviation, 1e-9);
     }
   }
 }
 
 TEST_F(DistanceTest, WholeTimeLineCostsOnlyTheKeysWhereTheyAreAMust) {
-  const HTimeRange all = HTimeRange::forever(), some(-50 * kFrame, 50 * kFrame);
+  HTimeRange const all = HTimeRange::forever(), some(-50 * kFrame, 50 * kFrame);
   EXPECT_EQ(DistanceUtils::getMaxDistance(m_a, m_b, all, true, kFrame),
             DistanceUtils::getMaxDistance(m_a, m_b, some, true, kFrame));
   EXPECT_GT(DistanceUtils::getDistanceSD(m_a, m_b, all, true), 0);

@@ -9,13 +9,13 @@ class DuplicationTest : public SceneTest {
  protected:
   // Every kind of custom attribute and channel, references and lines to any module of the scene.
   void furnish(Module* module, std::vector<Module*>& scene) {
-    const auto labels = std::make_shared<std::vector<HString> const>(std::vector<HString>{"l", "r", "t"});
+    auto const labels = std::make_shared<std::vector<HString> const>(std::vector<HString>{"l", "r", "t"});
     for (int kind = Attribute::Integer; kind <= Attribute::Temperature; ++kind) {
-      const auto type = static_cast<Attribute::Type>(kind);
-      const HString name = "Custom" + std::to_string(kind);
+      auto const type = static_cast<Attribute::Type>(kind);
+      HString const name = "Custom" + std::to_string(kind);
       module->addCustomAttribute(Attribute::create(type, name, labels));
     }
-    const auto at = [&](Attribute::Type type) {
+    auto const at = [&](Attribute::Type type) {
       return module->getAttribute(("Custom" + std::to_string(type)).c_str());
     };
     auto* number = static_cast<IntAttribute*>(at(Attribute::Integer));
@@ -98,7 +98,7 @@ TEST_F(DuplicationTest, CopiesOfRandomScenes) {
     std::map<Module*, Module*> copies;
     for (int i = 0; i < g_db->getNumSelectedModules(); ++i)
       copies[originals[static_cast<size_t>(i)]] = g_db->getSelectedModule(i);
-    const auto counterpart = [&](Module* module) {
+    auto const counterpart = [&](Module* module) {
       return copies.contains(module) ? copies[module] : module;
     };
     EXPECT_EQ(g_db->getPrimarySelectedModule(), copies[primary]);
@@ -107,7 +107,7 @@ TEST_F(DuplicationTest, CopiesOfRandomScenes) {
       ASSERT_EQ(copy->getRuntimeClass(), original->getRuntimeClass());
       EXPECT_NE(copy->getID(), original->getID());
       EXPECT_EQ(copy->getParent(), counterpart(original->getParent()));
-      const std::string path = copy->getFullPathString().GetString();
+      std::string const path = copy->getFullPathString().GetString();
       EXPECT_TRUE(copy->getName().GetString().starts_with(original->getName().GetString()));
       for (int i = 0; copy->getParent() && i < copy->getParent()->getNumChildren(); ++i) {
         Module* sibling = copy->getParent()->getChild(i);

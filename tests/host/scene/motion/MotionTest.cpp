@@ -25,7 +25,7 @@ double angleBetween(TalixRotation const& a, TalixRotation const& b) {
 // The greatest difference of two transforms, in units of what is allowed: at times that must be exact, and
 // between.
 double apart(Transform const& a, Transform const& b, bool exact) {
-  const double length = exact ? 1e-9 * (1 + a.position.length()) : 0.0100001;
+  double const length = exact ? 1e-9 * (1 + a.position.length()) : 0.0100001;
   return std::max({(a.position - b.position).length() / length,
                    angleBetween(a.rotation, b.rotation) / (exact ? 1e-9 : 0.0100001 * kDegree),
                    exact ? (a.scale - b.scale).length() / 1e-9 : 0});
@@ -75,9 +75,9 @@ class MotionTest : public SceneTest {
       channel(node, i)->setInterpType(kinds > 1 && below(3) == 0 ? static_cast<int>(below(kinds)) : 1);
       if (below(3) == 0) continue;
       KeyTrack track(Controller::shapeOf(channel(node, i)->getPropertyType()));
-      const size_t keys = 1 + below(8);
+      size_t const keys = 1 + below(8);
       for (size_t k = 0; k < keys; ++k) {
-        const int64 time = static_cast<int64>(below(4 * kMotionFrames)) * kFrame / 4;
+        int64 const time = static_cast<int64>(below(4 * kMotionFrames)) * kFrame / 4;
         track.set(time, randomValues(i), below(4) || i == 1 || objectAs<Marker>(node) ? 7 : 1u << below(3));
         if (below(3) == 0) track.select(time, time, 7);
         if (below(2)) track.bridge(time, time);
@@ -87,8 +87,8 @@ class MotionTest : public SceneTest {
   }
 
   void build(int round) {
-    const bool scaled = round % 2;
-    const auto kinds = 1 + static_cast<size_t>(round % 3);
+    bool const scaled = round % 2;
+    auto const kinds = 1 + static_cast<size_t>(round % 3);
     g_db->newScene();
     m_nodes.clear();
     for (int i = 0; i < 8; ++i) {
@@ -162,8 +162,8 @@ class MotionTest : public SceneTest {
   std::vector<Sample> sampled(std::vector<Node*> const& nodes, Node* target, HTimeRange const& range) {
     std::vector<Sample> samples;
     NLEClip* active = g_db->getActiveClip();
-    const int layer = g_db->getActiveLayer();
-    const auto add = [&](NLEClip* clip, Node* node, int64 time, bool exact) {
+    int const layer = g_db->getActiveLayer();
+    auto const add = [&](NLEClip* clip, Node* node, int64 time, bool exact) {
       if (!clip || (range.contains(time) && hasData(node, clip, time)))
         samples.push_back({clip, time, node, exact, node->getWorldTransform(time)});
     };
@@ -173,7 +173,7 @@ class MotionTest : public SceneTest {
         std::set<int64> exact;
         collectKeyTimes(exact, node, clip);
         collectKeyTimes(exact, target, clip);
-        for (const int64 time : exact) add(clip, node, time, true);
+        for (int64 const time : exact) add(clip, node, time, true);
         for (int i = -2; i < kMotionFrames + 2; ++i) add(clip, node, i * kFrame, false);
       }
     }
@@ -187,10 +187,10 @@ class MotionTest : public SceneTest {
   double checked(std::vector<Sample> const& samples, std::string const& where, double between = 1) {
     double most = 0;
     NLEClip* active = g_db->getActiveClip();
-    const int layer = g_db->getActiveLayer();
+    int const layer = g_db->getActiveLayer();
     for (Sample const& sample : samples) {
       g_db->setActiveClip(sample.clip);
-      const double far = apart(sample.world, sample.node->getWorldTransform(sample.time), sample.exact) /
+      double const far = apart(sample.world, sample.node->getWorldTransform(sample.time), sample.exact) /
                          (sample.exact ? 1 : between);
       EXPECT_LT(far, 1) << where << (sample.exact ? ", exactly" : "") << " at "
                         << static_cast<double>(sample.time) / kFrame << " in "
@@ -213,8 +213,8 @@ TEST_F(MotionTest, TheWorldStaysAsItIsInAllClips) {
     std::vector<Node*> nodes;
     Node* target;
     choose(1 + below(4), nodes, target);
-    const auto before = sampled(nodes, target, HTimeRange::forever());
-    const MotionScope scope(*g_db);
+    auto const before = sampled(nodes, target, HTimeRange::forever());
+    MotionScope const scope(*g_db);
     for (Node* node : nodes) {
       ASSERT_TRUE(node->parentAdjust(target, HTimeRange::forever()));
       hang(node, target);
@@ -225,7 +225,7 @@ TEST_F(MotionTest, TheWorldStaysAsItIsInAllClips) {
 
 // Inside selected ranges the world stays as it is, outside the node stays as it is below its parent.
 TEST_F(MotionTest, RangesAreKeptAloneAndOnce) {
-  const Warnings quiet;
+  Warnings const quiet;
   for (int round = 0; round < 300 && !HasFailure(); ++round) {
     build(round);
     Clip* clip = m_clips.back();
@@ -236,16 +236,16 @@ TEST_F(MotionTest, RangesAreKeptAloneAndOnce) {
     std::set<int64> times;
     collectKeyTimes(times, node, clip);
     collectKeyTimes(times, target, clip);
-    const int first = times.empty() ? 0 : static_cast<int>((*times.begin() + kFrame - 1) / kFrame),
+    int const first = times.empty() ? 0 : static_cast<int>((*times.begin() + kFrame - 1) / kFrame),
               last = times.empty() ? kMotionFrames : static_cast<int>(*times.rbegin() / kFrame);
     std::vector<HTimeRange> ranges;
     for (int at = first + static_cast<int>(below(10)); at <= last;) {
-      const int end = std::min(last, at + 1 + static_cast<int>(below(11)));
+      int const end = std::min(last, at + 1 + static_cast<int>(below(11)));
       ranges.emplace_back(at * kFrame, end * kFrame);
       at = end + 1 + static_cast<int>(below(10));
     }
     // What one range lets the curve around it deviate, the next ones keep.
-    const auto limit = static_cast<double>(ranges.size() + 1);
+    auto const limit = static_cast<double>(ranges.size() + 1);
     m_clips = {clip};
     std::vector<Sample> world;
     for (HTimeRange const& range : ranges)
@@ -253,7 +253,7 @@ TEST_F(MotionTest, RangesAreKeptAloneAndOnce) {
         // Keeping one range may change a cubic curve between the frames of the next.
         if (sample.clip && (!sample.exact || round % 3 < 2)) world.push_back(sample);
     std::map<int64, Transform> local;
-    const auto localOf = [&](int64 time) {
+    auto const localOf = [&](int64 time) {
       return Transform{node->getLocalPos(time), node->getLocalRot(time), node->getLocalScale(time)};
     };
     for (int64 time = first * kFrame; time <= last * kFrame; time += kFrame)
@@ -262,7 +262,7 @@ TEST_F(MotionTest, RangesAreKeptAloneAndOnce) {
                        [&](HTimeRange const& range) { return range.contains(time); }))
         local[time] = localOf(time);
 
-    const MotionScope scope(*g_db);
+    MotionScope const scope(*g_db);
     for (HTimeRange const& range : ranges) ASSERT_TRUE(node->parentAdjust(target, range));
     hang(node, target);
     checked(world, "round " + std::to_string(round), limit);
@@ -281,10 +281,10 @@ TEST_F(MotionTest, LocksAndBlends) {
     choose(2, nodes, target);
     if (nodes[0]->isDescendedFrom(nodes[1]) || nodes[1]->isDescendedFrom(nodes[0])) continue;
     auto* clip = m_clips[below(m_clips.size())];
-    const size_t lock = below(4), which = below(2);
-    const auto before = sampled({nodes[1]}, target, HTimeRange::forever());
-    const KeyTrack* track = channel(nodes[0], which)->findTrack(clip, 0);
-    const KeyTrack was =
+    size_t const lock = below(4), which = below(2);
+    auto const before = sampled({nodes[1]}, target, HTimeRange::forever());
+    KeyTrack const* track = channel(nodes[0], which)->findTrack(clip, 0);
+    KeyTrack const was =
         track ? *track : KeyTrack(which == 0 ? KeyTrack::Shape::Vector : KeyTrack::Shape::Rotation);
     if (lock == 0) channel(nodes[0], which)->setLocked(true);
     if (lock == 1)
@@ -293,7 +293,7 @@ TEST_F(MotionTest, LocksAndBlends) {
       static_cast<BoolAttribute*>(clip->getAttribute("Locked"))->setValue(true, true, true, true, true);
     if (lock == 3) g_db->setActiveClip(create<BlendClip>("blend"));
     Warnings warnings;
-    const bool kept = nodes[0]->parentAdjust(target, HTimeRange::forever());
+    bool const kept = nodes[0]->parentAdjust(target, HTimeRange::forever());
     EXPECT_EQ(warnings.texts.size(), kept ? 0u : 1u) << "round " << round;
     hang(nodes[0], target);
     if (lock < 3) {
@@ -316,10 +316,10 @@ TEST_F(MotionTest, KeysAreOnlyAddedWhereTheyAreNeeded) {
   from->setConstLocalRot(TalixRotation({1, 0, 0}), true);
   to->setConstLocalPos({0, 70, 0});
   still->setConstLocalPos({9, 0, 0});
-  for (const int frame : {0, 10, 40}) sparse->setLocalPos(frame * kFrame, {10.0 * frame, 5, 0});
+  for (int const frame : {0, 10, 40}) sparse->setLocalPos(frame * kFrame, {10.0 * frame, 5, 0});
   sparse->getTranslationChannel()->selectKeys(HTimeRange(10 * kFrame, 10 * kFrame), 7);
   for (Node* node : {sparse, still}) {
-    const Vec3 before = node->getWSPos(7 * kFrame);
+    Vec3 const before = node->getWSPos(7 * kFrame);
     ASSERT_TRUE(node->parentAdjust(to, HTimeRange::forever()));
     hang(node, to);
     EXPECT_LT((node->getWSPos(7 * kFrame) - before).length(), 1e-9);
@@ -342,7 +342,7 @@ TEST_F(MotionTest, KeysAreOnlyAddedWhereTheyAreNeeded) {
 }
 
 TEST_F(MotionTest, TargetsBelowAndValuesBeyondWhatANumberHolds) {
-  const Warnings quiet;
+  Warnings const quiet;
   create<Clip>("take");
   auto *from = create<Node>("from"), *node = create<Node>("node"), *child = create<Node>("child", node);
   EXPECT_FALSE(node->parentAdjust(child, HTimeRange::forever()));
@@ -366,7 +366,7 @@ TEST_F(MotionTest, RemovedSubjects) {
       if (!node->getParent()) hang(node, subject);
       if (objectAs<Marker>(node)) markers.push_back(node);
     }
-    const auto before = sampled(markers, nullptr, HTimeRange::forever());
+    auto const before = sampled(markers, nullptr, HTimeRange::forever());
     ASSERT_TRUE(g_db->getSubjectManager()->removeSubject(subject, true, true, true));
     EXPECT_FALSE(setup->isInScene());
     checked(before, "round " + std::to_string(round));
@@ -380,7 +380,7 @@ TEST_F(MotionTest, WhatStaysAndWhatGoesWithASubject) {
   auto *a = create<Marker>("a", one), *b = create<Marker>("two:b", two), *c = create<Marker>("c", a);
   auto* other = create<Marker>("one:a");
   for (int i = 0; i < 9; ++i) a->setLocalPos(i * kFrame, randomVec(30));
-  const KeyTrack track = *a->getTranslationChannel()->findTrack(clip, 0);
+  KeyTrack const track = *a->getTranslationChannel()->findTrack(clip, 0);
   a->addConnectingLine(MarkerConnection(bone));
   b->addConnectingLine(MarkerConnection(a));
   a->setSelected(true);
@@ -417,22 +417,22 @@ TEST_F(MotionTest, ReadersAgreeWithNodes) {
     nodes.push_back(nodes[1]);
     for (NLEClip* clip : shown) {
       g_db->setActiveClip(clip);
-      const SampleTimes times(-kFrame, kFrame / 3 * (1 + round % 4), 200);
+      SampleTimes const times(-kFrame, kFrame / 3 * (1 + round % 4), 200);
       std::vector<double> matrices(16 * 200 * nodes.size());
-      const SceneReader reader(nodes, clip);
+      SceneReader const reader(nodes, clip);
       SceneReader::Arrays arrays;
       arrays.matrices = matrices.data();
       reader.readWorld(times, arrays);
-      const std::vector<Transform> worlds = reader.readWorld(times);
+      std::vector<Transform> const worlds = reader.readWorld(times);
       for (size_t k = 0; k < worlds.size(); ++k) {
-        const int64 time = times[static_cast<int64>(k / nodes.size())];
-        const Transform ought = nodes[k % nodes.size()]->getWorldTransform(time);
+        int64 const time = times[static_cast<int64>(k / nodes.size())];
+        Transform const ought = nodes[k % nodes.size()]->getWorldTransform(time);
         ASSERT_LT((worlds[k].position - ought.position).length(), 1e-12 * (1 + ought.position.length()));
         ASSERT_LT(angleBetween(worlds[k].rotation, ought.rotation), 1e-7);
         ASSERT_LT((worlds[k].scale - ought.scale).length(), 1e-12 * (1 + ought.scale.length()));
         double const* m = matrices.data() + 16 * k;
-        const Vec3 point = randomVec(10), moved = (ought * Transform{point, {}, {1, 1, 1}}).position;
-        const Vec3 byMatrix(m[0] * point.x + m[1] * point.y + m[2] * point.z + m[3],
+        Vec3 const point = randomVec(10), moved = (ought * Transform{point, {}, {1, 1, 1}}).position;
+        Vec3 const byMatrix(m[0] * point.x + m[1] * point.y + m[2] * point.z + m[3],
                             m[4] * point.x + m[5] * point.y + m[6] * point.z + m[7],
                             m[8] * point.x + m[9] * point.y + m[10] * point.z + m[11]);
         ASSERT_LT((byMatrix - moved).length(), 1e-11 * (1 + moved.length()));
