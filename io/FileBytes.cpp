@@ -47,7 +47,8 @@ FileBytes::~FileBytes() {
   if (m_data) ::munmap(const_cast<char*>(m_data), m_size);
 }
 
-void FileBytes::release(size_t offset) const {
+void FileBytes::passed(size_t offset) const {
+  m_progress.tell(offset, m_size);
   size_t const page = static_cast<size_t>(::sysconf(_SC_PAGESIZE));
   size_t const whole = offset / page * page;
   if (whole) ::madvise(const_cast<char*>(m_data), whole, MADV_DONTNEED);

@@ -6,6 +6,8 @@
 #include <string>
 #include <string_view>
 
+#include "io/FileProgress.h"
+
 namespace talix {
 
 // A file's content, mapped read-only, so that reading it takes no memory of its own. Throws FileError when
@@ -19,13 +21,15 @@ class FileBytes {
 
   std::string_view view() const { return {m_data, m_size}; }
   std::string const& path() const { return m_path; }
-  // Lets the system take back the pages before `offset`, which will not be read again soon.
-  void release(size_t offset) const;
+  // All before `offset` has been read: lets the system take those pages back, and tells how far it is. Throws
+  // FileError when the user has cancelled.
+  void passed(size_t offset) const;
 
  private:
   std::string m_path;
   char const* m_data = nullptr;
   size_t m_size = 0;
+  mutable FileProgress m_progress{"Opening", m_path};
 };
 
 // Writes a file under a temporary name in the same folder and renames it once `write` has returned and all is

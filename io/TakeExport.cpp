@@ -53,7 +53,7 @@ FrameGrid framesToSave(Database const& scene, std::vector<TakeNote>& notes) {
   return grid;
 }
 
-void recallFile(Take& take, NLEClip const& clip) {
+void recallFile(TakeInfo& take, NLEClip const& clip) {
   take.name = fileMetadata::text(clip, fileMetadata::kFileName);
   if (take.name.empty()) take.name = clip.getName().GetString();
   take.format = fileMetadata::text(clip, fileMetadata::kFileFormat);
@@ -68,9 +68,9 @@ void recallFile(Take& take, NLEClip const& clip) {
 
 }  // namespace
 
-Take exportTake(Database& scene, std::vector<TakeNote>& notes) {
+TakeSource exportTake(Database& scene, std::vector<TakeNote>& notes) {
   FrameGrid const grid = framesToSave(scene, notes);
-  Take take;
+  TakeSource take;
   auto const* clip = objectAs<Clip>(scene.getActiveClip());
   take.rate = clip && clip->getFileTime().rate > 0 ? clip->getFileTime().rate
                                                    : scene.getTimeManager()->getFrameRate().getFrameRate();
@@ -79,7 +79,7 @@ Take exportTake(Database& scene, std::vector<TakeNote>& notes) {
   if (scene.getUpAxis() >= 0) take.up = static_cast<Axis>(scene.getUpAxis());
   if (NLEClip const* active = scene.getActiveClip()) recallFile(take, *active);
 
-  TakeExport out{scene, FrameSampler(scene, grid), take, notes};
+  TakeExport out{scene, std::make_shared<FrameSampler>(scene, grid), take, notes};
   exportPoints(out);
   exportDevices(out);
   exportJoints(out);

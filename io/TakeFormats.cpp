@@ -49,7 +49,7 @@ Take readTake(std::string const& path, ReadOptions const& options) {
 
 namespace {
 
-using Writer = void (*)(Take const&, std::string const&, std::vector<TakeNote>&);
+using Writer = void (*)(TakeSource const&, std::string const&, std::vector<TakeNote>&);
 
 Writer writerFor(std::string const& path) {
   Format const format = formatBySuffix(path);
@@ -68,7 +68,7 @@ void checkTakeTarget(std::string const& path) {
     throw FileError(path, "cannot be written: there is no such folder");
 }
 
-void writeTake(Take const& take, std::string const& path, std::vector<TakeNote>& notes) {
+void writeTake(TakeSource const& take, std::string const& path, std::vector<TakeNote>& notes) {
   writerFor(path)(take, path, notes);
 }
 

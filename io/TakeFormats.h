@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "io/Take.h"
+#include "io/TakeSource.h"
 
 namespace talix {
 
@@ -22,8 +22,8 @@ Take readC3D(std::string const& path, ReadOptions const& = {});
 Take readBVH(std::string const& path, ReadOptions const& = {});
 Take readTRC(std::string const& path, ReadOptions const& = {});
 
-void writeC3D(Take const&, std::string const& path, std::vector<TakeNote>& notes);
-void writeBVH(Take const&, std::string const& path, std::vector<TakeNote>& notes);
+void writeC3D(TakeSource const&, std::string const& path, std::vector<TakeNote>& notes);
+void writeBVH(TakeSource const&, std::string const& path, std::vector<TakeNote>& notes);
 
 // By content and suffix. Throws FileError naming the formats when the file is of none.
 Take readTake(std::string const& path, ReadOptions const& = {});
@@ -31,7 +31,7 @@ Take readTake(std::string const& path, ReadOptions const& = {});
 // suffix is of no format that is written. For asking before long work.
 void checkTakeTarget(std::string const& path);
 // By suffix (.c3d, .bvh).
-void writeTake(Take const&, std::string const& path, std::vector<TakeNote>& notes);
+void writeTake(TakeSource const&, std::string const& path, std::vector<TakeNote>& notes);
 
 // How many millimetres a length unit is; accepts the usual spellings ("mm", "Meters", "inch"); 0 when
 // unknown.

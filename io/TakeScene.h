@@ -4,7 +4,7 @@
 #include <vector>
 
 #include "host/scene/Database.h"
-#include "io/Take.h"
+#include "io/TakeSource.h"
 
 namespace talix {
 
@@ -17,8 +17,9 @@ namespace talix {
 // scene as it was, when the take cannot be added (32nd clip, channel kinds that clash beyond mending).
 void importTake(Take take, std::string const& path, int up, Database& scene, std::vector<TakeNote>& notes);
 
-// The active clip of the scene (the default values when none is active) as a take over the animation range,
-// one value a frame. What a take cannot hold is added to `notes` as a warning.
-Take exportTake(Database& scene, std::vector<TakeNote>& notes);
+// The active clip of the scene (the default values when none is active) as a take over the frames that saving
+// takes, one value a frame. It reads from the scene, which must outlive it and stay as it is meanwhile. What
+// a take cannot hold is added to `notes` as a warning.
+TakeSource exportTake(Database& scene, std::vector<TakeNote>& notes);
 
 }  // namespace talix

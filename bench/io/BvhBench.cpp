@@ -85,7 +85,7 @@ void writeBvh(benchmark::State& state) {
   Take const take = talix::readBVH(file.path());
   for (auto _ : state) {
     std::vector<talix::TakeNote> notes;
-    talix::writeBVH(take, out.path(), notes);
+    talix::writeBVH(talix::sourceOf(take), out.path(), notes);
   }
   countBytes(state, out.path());
 }

@@ -40,7 +40,7 @@ struct LongFile {
     std::string pattern = (std::filesystem::temp_directory_path() / "c3dbenchXXXXXX").string();
     path = std::filesystem::path(::mkdtemp(pattern.data())) / "long.c3d";
     std::vector<TakeNote> notes;
-    writeC3D(longTake(), path.string(), notes);
+    writeC3D(sourceOf(longTake()), path.string(), notes);
   }
   ~LongFile() { std::filesystem::remove_all(path.parent_path()); }
 };
@@ -61,7 +61,7 @@ void writeLongC3D(benchmark::State& state) {
   Take const take = longTake();
   for (auto _ : state) {
     std::vector<TakeNote> notes;
-    writeC3D(take, file.path.string(), notes);
+    writeC3D(sourceOf(take), file.path.string(), notes);
   }
   state.SetBytesProcessed(state.iterations() * static_cast<int64>(std::filesystem::file_size(file.path)));
 }

@@ -124,7 +124,7 @@ class MotionReader {
         }
       }
       for (JointMotion& joint : joints) joint.flush(first * ticksPerFrame, ticksPerFrame);
-      m_bytes.release(m_scanner.offset());
+      m_bytes.passed(m_scanner.offset());
     }
     if (!m_scanner.atEnd())
       failCount("the motion goes on with " + shown(m_scanner.peekWord()) + " after them");

@@ -6,6 +6,7 @@
 
 #include "io/FileBytes.h"
 #include "io/FileError.h"
+#include "io/FileProgress.h"
 #include "io/TakeFormats.h"
 #include "io/TextScanner.h"
 #include "io/bvh/BvhChannels.h"
@@ -39,16 +40,16 @@ std::string fileName(std::string const& name) {
   return result.empty() ? "joint" : result;
 }
 
-std::vector<BvhChannel> usualChannels(TakeJoint const& joint) {
+std::vector<BvhChannel> usualChannels(JointSource const& joint) {
   std::vector<BvhChannel> channels;
-  if (joint.parent < 0 || !joint.translations.empty())
+  if (joint.parent < 0 || joint.translations)
     for (int axis = 0; axis < 3; ++axis) channels.push_back({false, axis});
   for (int turn = 2; turn >= 0; --turn) channels.push_back({true, kOrderAxes[joint.rotationOrder][turn]});
   return channels;
 }
 
 // The channels that the joint names; empty when it names none, or some that cannot be written.
-std::vector<BvhChannel> namedChannels(TakeJoint const& joint) {
+std::vector<BvhChannel> namedChannels(JointSource const& joint) {
   std::vector<BvhChannel> channels;
   for (std::string const& name : joint.channels) {
     auto const channel = bvhChannel(name);
@@ -62,58 +63,62 @@ std::vector<BvhChannel> namedChannels(TakeJoint const& joint) {
 // One joint of the file: its channels and where its values come from.
 class JointWriter {
  public:
-  JointWriter(TakeJoint const& joint, std::vector<BvhChannel> channels, double millimetres)
+  JointWriter(JointSource const& joint, std::vector<BvhChannel> channels, double millimetres)
       : m_joint(joint),
         m_channels(std::move(channels)),
         m_millimetres(millimetres),
+        m_places(joint.translations.get(), 3),
+        m_turns(joint.rotations.get(), 4),
         m_unroller(rotationOrderOf(rotationAxes(m_channels)), rotationAxes(m_channels).size() == 3) {
     for (BvhChannel const& channel : m_channels)
       (channel.isRotation ? m_written[channel.axis] : m_moves) = true;
   }
 
-  TakeJoint const& joint() const { return m_joint; }
+  JointSource const& joint() const { return m_joint; }
   std::vector<BvhChannel> const& channels() const { return m_channels; }
   bool moves() const { return m_moves; }
   bool turns() const { return m_written[0] || m_written[1] || m_written[2]; }
   // The largest angle, in radians, about an axis that has no channel.
   double lostTurn() const { return m_lostTurn; }
 
-  void appendFrame(std::string& row, int64 time) {
-    KeyTrack::Values place{}, turn{};
-    if (m_moves)
-      m_joint.translations.evaluate(time, Interpolation::Linear,
-                                    {m_joint.offset.x, m_joint.offset.y, m_joint.offset.z}, place,
-                                    &m_placeCursor);
-    m_joint.rotations.evaluate(time, Interpolation::Linear, {0, 0, 0, 1}, turn, &m_turnCursor);
-    Vec3 const angles = turns() ? m_unroller.next(turn.data()) : Vec3();
+  void read(SampleTimes const& times) {
+    if (m_moves) m_places.read(times);
+    m_turns.read(times);
+  }
+
+  // By its index in the block that was read.
+  void appendFrame(std::string& row, int64 i) {
+    constexpr double kUnturned[] = {0, 0, 0, 1};
+    double const *place = m_moves ? m_places.at(i) : nullptr, *turn = m_turns.at(i);
+    Vec3 const angles = turns() ? m_unroller.next(turn ? turn : kUnturned) : Vec3();
     for (int axis = 0; axis < 3; ++axis)
       if (!m_written[axis]) m_lostTurn = std::max(m_lostTurn, std::abs(angles[axis]));
     for (BvhChannel const& channel : m_channels) {
       if (!row.empty()) row += ' ';
-      appendNumber(row, channel.isRotation ? angles[channel.axis] * (180 / std::numbers::pi)
-                                           : place[static_cast<size_t>(channel.axis)] / m_millimetres);
+      appendNumber(row, channel.isRotation
+                            ? angles[channel.axis] * (180 / std::numbers::pi)
+                            : (place ? place : &m_joint.offset.x)[channel.axis] / m_millimetres);
     }
   }
 
  private:
-  TakeJoint const& m_joint;
+  JointSource const& m_joint;
   std::vector<BvhChannel> m_channels;
   double m_millimetres;
   bool m_written[3] = {};  // rotation channels, by axis
   bool m_moves = false;
   double m_lostTurn = 0;
+  SampleBlock m_places, m_turns;
   EulerFilter m_unroller;
-  KeyTrack::Cursor m_placeCursor, m_turnCursor;
 };
 
 class BvhWriter {
  public:
-  BvhWriter(Take const& take, std::string const& path, std::vector<TakeNote>& notes)
+  BvhWriter(TakeSource const& take, std::string const& path, std::vector<TakeNote>& notes)
       : m_take(take), m_path(path), m_notes(notes) {
     if (take.joints.empty()) throw FileError(path, "BVH holds joints only, and the take has none");
     if (!(take.rate > 0) || !(take.unitInMillimetres > 0))
       throw FileError(path, "the take has no rate or no unit");
-    m_period = ticksPerFrameAt(take.rate);
     m_children.resize(take.joints.size());
     for (size_t i = 0; i < take.joints.size(); ++i) {
       int const parent = take.joints[i].parent;
@@ -132,9 +137,9 @@ class BvhWriter {
 
  private:
   bool isEndSite(size_t i) const {
-    TakeJoint const& joint = m_take.joints[i];
-    return joint.endSite && joint.parent >= 0 && m_children[i].empty() && joint.translations.empty() &&
-           joint.rotations.empty();
+    JointSource const& joint = m_take.joints[i];
+    return joint.endSite && joint.parent >= 0 && m_children[i].empty() && !joint.translations &&
+           !joint.rotations;
   }
 
   // Depth first without recursion: a joint's closing brace waits on the stack below its children.
@@ -165,7 +170,7 @@ class BvhWriter {
   }
 
   void openJoint(size_t index, std::string const& indent) {
-    TakeJoint const& joint = m_take.joints[index];
+    JointSource const& joint = m_take.joints[index];
     bool const endSite = isEndSite(index);
     std::string const name = fileName(joint.name);
     if (!endSite && name != joint.name)
@@ -188,7 +193,7 @@ class BvhWriter {
     m_joints.emplace_back(joint, channels, m_take.unitInMillimetres);
   }
 
-  std::vector<BvhChannel> channelsOf(TakeJoint const& joint) {
+  std::vector<BvhChannel> channelsOf(JointSource const& joint) {
     auto channels = namedChannels(joint);
     if (!channels.empty()) return channels;
     if (!joint.channels.empty())
@@ -201,10 +206,18 @@ class BvhWriter {
     out << m_hierarchy << "MOTION\nFrames: " << row << "\nFrame Time: ";
     char digits[32];
     out.write(digits, std::to_chars(digits, std::end(digits), 1 / m_take.rate).ptr - digits) << '\n';
-    for (int64 i = 0; i < m_take.frameCount; ++i) {
-      row.clear();
-      for (JointWriter& joint : m_joints) joint.appendFrame(row, (m_take.firstFrame + i) * m_period);
-      out << row << '\n';
+    FileProgress progress("Saving", m_path);
+    SampleTimes const frames = m_take.frameTimes();
+    int64 const length = SampleBlock::lengthFor(7 * m_joints.size());
+    for (int64 first = 0; first < frames.count(); first += length) {
+      progress.tell(static_cast<uint64>(first), static_cast<uint64>(frames.count()));
+      int64 const count = std::min(length, frames.count() - first);
+      for (JointWriter& joint : m_joints) joint.read(frames.part(first, count));
+      for (int64 i = 0; i < count; ++i) {
+        row.clear();
+        for (JointWriter& joint : m_joints) joint.appendFrame(row, i);
+        out << row << '\n';
+      }
     }
   }
 
@@ -226,10 +239,11 @@ class BvhWriter {
       warn("BVH names no length unit; the lengths are in " + m_take.fileUnit);
     if (m_take.up != Axis::Y)
       warn(std::string("BVH names no up axis; up is ") + (m_take.up == Axis::Z ? "z" : "x"));
-    size_t leftOut = 0, tracks = 0;
+    int64 leftOut = 0;
+    size_t tracks = 0;
     for (JointWriter const& joint : m_joints) {
       leftOut += keysOffFrames(joint.joint().translations) + keysOffFrames(joint.joint().rotations);
-      tracks += (!joint.moves() && !joint.joint().translations.empty());
+      tracks += !joint.moves() && joint.joint().translations;
     }
     if (leftOut)
       warn("BVH holds whole frames only; " + std::to_string(leftOut) +
@@ -239,28 +253,22 @@ class BvhWriter {
            " joints move but have no position channels; their translations were left out");
   }
 
-  size_t keysOffFrames(KeyTrack const& track) const {
-    int64 const first = m_take.firstFrame * m_period,
-                last = (m_take.firstFrame + m_take.frameCount - 1) * m_period;
-    size_t count = 0;
-    track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
-      count += key.time < first || key.time > last || key.time % m_period != 0;
-    });
-    return count;
+  int64 keysOffFrames(SampleSourcePtr const& source) const {
+    if (!source) return 0;
+    SampleSource::LeftOut const left = source->leftOut(m_take.frameTimes());
+    return left.between + left.outside;
   }
 
   void warnOfLostTurns() {
     constexpr double kVisible = 1e-6;
     for (JointWriter const& joint : m_joints)
-      if ((joint.turns() && joint.lostTurn() > kVisible) ||
-          (!joint.turns() && !joint.joint().rotations.empty()))
+      if ((joint.turns() && joint.lostTurn() > kVisible) || (!joint.turns() && joint.joint().rotations))
         warn(shown(joint.joint().name) + " turns about an axis that has no channel; that turn was left out");
   }
 
-  Take const& m_take;
+  TakeSource const& m_take;
   std::string const& m_path;
   std::vector<TakeNote>& m_notes;
-  int64 m_period = 0;
   std::vector<std::vector<size_t>> m_children;  // by joint
   std::string m_hierarchy;
   std::vector<JointWriter> m_joints;  // in the order of the file
@@ -269,7 +277,7 @@ class BvhWriter {
 
 }  // namespace
 
-void writeBVH(Take const& take, std::string const& path, std::vector<TakeNote>& notes) {
+void writeBVH(TakeSource const& take, std::string const& path, std::vector<TakeNote>& notes) {
   BvhWriter(take, path, notes).write();
 }
 

@@ -62,7 +62,7 @@ class DataReader {
       char const* samples = at + points.size() * 4 * Values::kBytes;
       for (size_t i = 0; i < analog.size(); ++i)
         readChannel(samples + i * Values::kBytes, first, frames, analog[i]);
-      m_file.release(offset);
+      m_file.passed(offset);
     }
     return m_counts;
   }

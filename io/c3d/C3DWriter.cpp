@@ -5,6 +5,7 @@
 #include "host/time/Ticks.h"
 #include "io/FileBytes.h"
 #include "io/FileError.h"
+#include "io/FileProgress.h"
 #include "io/TakeFormats.h"
 #include "io/c3d/C3DBytes.h"
 #include "io/c3d/C3DDataWriter.h"
@@ -28,7 +29,7 @@ double asReal(double value) { return static_cast<float>(value); }
 
 class Writer {
  public:
-  Writer(Take const& take, std::string const& path, std::vector<TakeNote>& notes)
+  Writer(TakeSource const& take, std::string const& path, std::vector<TakeNote>& notes)
       : m_take(take), m_path(path), m_notes(notes) {}
 
   void write() {
@@ -44,9 +45,12 @@ class Writer {
     addC3DEvents(m_take.events, m_parameters, m_notes);
     std::string const head = headAndParameters();
     C3DDataLosses losses;
+    FileProgress progress("Saving", m_path);
     writeFileAtomically(m_path, [&](std::ostream& out) {
       out << head;
-      losses = writeC3DData(m_take, m_plan, out);
+      losses = writeC3DData(m_take, m_plan, out, [&](int64 frame) {
+        progress.tell(static_cast<uint64>(frame), static_cast<uint64>(m_take.frameCount));
+      });
     });
     tellLosses(losses);
   }
@@ -72,8 +76,7 @@ class Writer {
   }
 
   void planFrames() {
-    int64 const period = ticksPerFrameAt(m_take.rate);
-    m_plan.frames = {m_take.firstFrame * period, period, m_take.frameCount};
+    m_plan.frames = m_take.frameTimes();
     m_first = m_take.firstFrame;
     if (m_first >= 0) return;
     m_first = 1;
@@ -92,9 +95,9 @@ class Writer {
       return;
     }
     m_plan.withAnalog = true;
-    m_samplesPerFrame = std::llround(ratio);
-    m_plan.samples = {m_plan.frames.start, ticksPerFrameAt(m_take.analogRate),
-                      m_take.frameCount * m_samplesPerFrame};
+    m_plan.samplesPerFrame = std::llround(ratio);
+    m_plan.samples = {m_plan.frames[0], ticksPerFrameAt(m_take.analogRate),
+                      m_take.frameCount * m_plan.samplesPerFrame};
   }
 
   void planScale() {
@@ -102,7 +105,7 @@ class Writer {
     m_unitName = unit > 0 ? m_take.fileUnit : "mm";
     m_plan.unit = unit > 0 ? unit : 1;
     bool exact = true;
-    m_plan.residualStep = c3dResidualStep(m_take, exact);
+    m_plan.residualStep = c3dResidualStep(m_take, m_plan.frames, exact);
     if (!exact)
       note(TakeNote::Level::Info,
            "residuals are written in steps of " + std::to_string(m_plan.residualStep) + " mm");
@@ -112,22 +115,19 @@ class Writer {
     if (!m_take.joints.empty())
       warn("C3D cannot hold skeletons: " + std::to_string(m_take.joints.size()) + " joints are not written");
     for (size_t i = 0; i < m_take.points.size(); ++i) {
-      TakePoint const& point = m_take.points[i];
-      tellLeftOver(point.positions, m_plan.frames, "keys of " + labelOf(i));
-      tellLeftOver(point.residuals, m_plan.frames, "residuals of " + labelOf(i));
-      if (std::any_of(point.cameras.begin(), point.cameras.end(),
-                      [](unsigned char mask) { return mask > 0x7f; }))
-        warn("C3D holds seven cameras: the eighth of " + labelOf(i) + " is not written");
+      tellLeftOut(m_take.points[i].positions, m_plan.frames, "keys of " + labelOf(i));
+      tellLeftOut(m_take.points[i].residuals, m_plan.frames, "residuals of " + labelOf(i));
     }
-    for (ModelOutput const& output : m_take.outputs)
-      tellLeftOver(output.values, m_plan.frames, "keys of " + output.name);
+    for (ModelOutputSource const& output : m_take.outputs)
+      tellLeftOut(output.values, m_plan.frames, "keys of " + output.name);
     if (!m_plan.withAnalog) return;
-    for (TakeAnalogChannel const& channel : m_take.analog)
-      tellLeftOver(channel.samples, m_plan.samples, "samples of " + channel.name);
+    for (AnalogSource const& channel : m_take.analog)
+      tellLeftOut(channel.samples, m_plan.samples, "samples of " + channel.name);
   }
 
-  void tellLeftOver(KeyTrack const& track, C3DGrid const& grid, std::string const& what) {
-    C3DLeftOver const left = c3dLeftOver(track, grid);
+  void tellLeftOut(SampleSourcePtr const& source, SampleTimes const& times, std::string const& what) {
+    if (!source) return;
+    SampleSource::LeftOut const left = source->leftOut(times);
     auto const tell = [&](int64 count, char const* why) {
       if (count) warn(std::to_string(count) + " " + what + " " + why + " and are not written");
     };
@@ -140,12 +140,14 @@ class Writer {
     if (losses.positions)
       warn(std::to_string(losses.positions) +
            " positions are no numbers that C3D can hold; written as not seen");
+    for (size_t const point : losses.camerasOf)
+      warn("C3D holds seven cameras: the eighth of " + labelOf(point) + " is not written");
     if (losses.samples) warn(std::to_string(losses.samples) + " analog samples are missing; written as 0");
   }
 
   // An unlabelled point gets a label that is read back as none.
   std::string labelOf(size_t point) const {
-    TakePoint const& p = m_take.points[point];
+    PointSource const& p = m_take.points[point];
     return p.label.empty() ? "*" + std::to_string(point + 1) : fullLabel(p.subject, p.label);
   }
 
@@ -155,7 +157,7 @@ class Writer {
       labels.push_back(labelOf(i));
       descriptions.push_back(m_take.points[i].description);
     }
-    for (ModelOutput const& output : m_take.outputs) {
+    for (ModelOutputSource const& output : m_take.outputs) {
       labels.push_back(output.name);
       descriptions.emplace_back();
     }
@@ -181,7 +183,7 @@ class Writer {
   void addOutputs(C3DGroupWriter& group) {
     std::map<std::string, std::vector<std::string>> labels;
     std::map<std::string, std::string> units;
-    for (ModelOutput const& output : m_take.outputs) {
+    for (ModelOutputSource const& output : m_take.outputs) {
       std::string const kind = output.kind.empty() ? "SCALARS" : output.kind;
       labels[kind].push_back(output.name);
       auto const [unit, first] = units.emplace(kind, output.unit);
@@ -203,10 +205,10 @@ class Writer {
     C3DGroupWriter group(m_parameters, "ANALOG", "Analog channels", m_notes);
     group.number("USED", Type::Integer, static_cast<double>(channelCount()));
     group.number("GEN_SCALE", Type::Real, 1);
-    group.number("RATE", Type::Real, m_take.rate * static_cast<double>(m_samplesPerFrame));
+    group.number("RATE", Type::Real, m_take.rate * static_cast<double>(m_plan.samplesPerFrame));
     if (channelCount() == 0) return;
     std::vector<std::string> names, units, descriptions;
-    for (TakeAnalogChannel const& channel : m_take.analog) {
+    for (AnalogSource const& channel : m_take.analog) {
       names.push_back(channel.name);
       units.push_back(channel.unit);
       descriptions.push_back(channel.description);
@@ -231,7 +233,7 @@ class Writer {
 
   void makeSubjects() {
     std::vector<std::string> names, prefixes;
-    for (TakePoint const& point : m_take.points)
+    for (PointSource const& point : m_take.points)
       if (!point.subject.empty() && std::find(names.begin(), names.end(), point.subject) == names.end()) {
         names.push_back(point.subject);
         prefixes.push_back(point.subject + ":");
@@ -262,31 +264,30 @@ class Writer {
     int64 const first = m_take.frameCount ? m_first : 1;
     std::string bytes = "\x02\x50";
     appendC3DWord(bytes, word(static_cast<int64>(pointCount())));
-    appendC3DWord(bytes, word(static_cast<int64>(channelCount()) * m_samplesPerFrame));
+    appendC3DWord(bytes, word(static_cast<int64>(channelCount()) * m_plan.samplesPerFrame));
     appendC3DWord(bytes, word(first));
     appendC3DWord(bytes, word(first + m_take.frameCount - 1));
     appendC3DWord(bytes, 0);  // longest gap that was filled
     appendC3DReal(bytes, -m_plan.residualStep / m_plan.unit);
     appendC3DWord(bytes, static_cast<unsigned>(dataBlock));
-    appendC3DWord(bytes, word(m_samplesPerFrame));
+    appendC3DWord(bytes, word(m_plan.samplesPerFrame));
     appendC3DReal(bytes, m_take.rate);
     bytes.resize(kC3DBlock, '\0');
     return bytes;
   }
 
-  Take const& m_take;
+  TakeSource const& m_take;
   std::string const& m_path;
   std::vector<TakeNote>& m_notes;
   C3DDataPlan m_plan;
-  int64 m_first = 1;            // frame number in the file
-  int64 m_samplesPerFrame = 1;  // of each analog channel
+  int64 m_first = 1;  // frame number in the file
   std::string m_unitName;
   C3DParameters m_parameters;
 };
 
 }  // namespace
 
-void writeC3D(Take const& take, std::string const& path, std::vector<TakeNote>& notes) {
+void writeC3D(TakeSource const& take, std::string const& path, std::vector<TakeNote>& notes) {
   Writer(take, path, notes).write();
 }
 

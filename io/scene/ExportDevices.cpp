@@ -1,3 +1,4 @@
+#include <cmath>
 #include <unordered_map>
 
 #include "host/scene/Devices.h"
@@ -26,7 +27,8 @@ class DeviceExport {
  public:
   explicit DeviceExport(TakeExport& out)
       : m_out(out),
-        m_sampler(out.sampler),
+        m_sampler(*out.sampler),
+        m_samples(sampleTimes()),
         m_analog(metadataOf(m_sampler.clip(), fileMetadata::kAnalogChannels, 6)),
         m_outputs(metadataOf(m_sampler.clip(), fileMetadata::kOutputs, 4)) {}
 
@@ -51,7 +53,7 @@ class DeviceExport {
 
  private:
   void addOutput(Controller const& channel) {
-    ModelOutput output;
+    ModelOutputSource output;
     output.name = channel.getName().GetString();
     output.kind = "SCALARS";
     if (auto const known = m_outputs.find(output.name); known != m_outputs.end()) {
@@ -60,13 +62,12 @@ class DeviceExport {
       output.name = known->second[1];
     }
     m_out.keysLeftOut += m_sampler.keysOffGrid(channel);
-    KeyTrack const* track = m_sampler.asItIs(channel);
-    output.values = track ? *track : m_sampler.sampleWhere(m_sampler.framesWithData(channel), channel);
+    output.values = channelSource(m_out.sampler, channel, {&channel});
     m_out.take.outputs.push_back(std::move(output));
   }
 
   void addAnalog(Controller const& channel) {
-    TakeAnalogChannel analog;
+    AnalogSource analog;
     analog.name = channel.getName().GetString();
     if (auto const known = m_analog.find(analog.name); known != m_analog.end()) {
       fileMetadata::Record const& record = known->second;
@@ -76,34 +77,9 @@ class DeviceExport {
       analog.offset = fileMetadata::textNumber(record[5]);
       analog.name = record[1];
     }
-    analog.samples = samples(channel);
+    m_out.keysLeftOut += m_sampler.keysOff(channel, m_samples);
+    analog.samples = channelSource(m_out.sampler, channel, {&channel});
     m_out.take.analog.push_back(std::move(analog));
-  }
-
-  // The keys inside the range, wherever they lie: devices sample faster than cameras. Where keys were taken
-  // out of a track that bridges over them, its samples.
-  KeyTrack samples(Controller const& channel) {
-    KeyTrack const* lowest = m_sampler.dataTrack(channel);
-    if (lowest && lowest->bridgesAny()) return samplesOfBridged(channel);
-    if (!lowest) return m_sampler.clip() ? KeyTrack(KeyTrack::Shape::Scalar) : m_sampler.everyFrame(channel);
-    KeyTrack track = *lowest;
-    FrameGrid const& grid = m_sampler.grid();
-    m_out.keysLeftOut += track.eraseRange(-kForever, grid.start() - 1);
-    m_out.keysLeftOut += track.eraseRange(grid.end() + grid.period, kForever);
-    if (isLayered(channel)) addLayers(track, channel);
-    track.deselect(-kForever, kForever);
-    return track;
-  }
-
-  KeyTrack samplesOfBridged(Controller const& channel) {
-    FrameGrid const& frames = m_sampler.grid();
-    FrameGrid grid;
-    grid.period = channel.getDataPeriod(*m_sampler.clip());
-    grid.firstFrame = frames.start() / grid.period;
-    grid.count = frames.count * (frames.period / grid.period);
-    FrameSampler const sampler(m_out.scene, grid);
-    m_out.keysLeftOut += sampler.keysOffGrid(channel);
-    return sampler.sampleWhere(sampler.framesWithData(channel), channel);
   }
 
   double analogRate() const {
@@ -112,27 +88,17 @@ class DeviceExport {
     return rate > 0 ? rate : m_out.take.rate;
   }
 
-  bool isLayered(Controller const& channel) const {
-    NLEClip const* clip = m_sampler.clip();
-    int layers = 0;
-    for (int layer = 0; layer < clip->getNumLayers(); ++layer) {
-      KeyTrack const* track = channel.findTrack(clip, layer);
-      layers += track && !track->empty() ? 1 : 0;
-    }
-    return layers > 1 || !channel.findTrack(clip, 0) || channel.findTrack(clip, 0)->empty();
-  }
-
-  void addLayers(KeyTrack& track, Controller const& channel) const {
-    Controller::Values values{};
-    for (int64 i = 0; i < track.count(); ++i) {
-      int64 const time = track.timeAt(i);
-      channel.evaluate(time, values);
-      track.set(time, values);
-    }
+  // Devices sample faster than cameras.
+  SampleTimes sampleTimes() const {
+    FrameGrid const& frames = m_sampler.grid();
+    double const perFrame = analogRate() / m_out.take.rate;
+    return {frames.start(), ticksPerFrameAt(analogRate()),
+            std::llround(static_cast<double>(frames.count) * perFrame)};
   }
 
   TakeExport& m_out;
   FrameSampler const& m_sampler;
+  SampleTimes m_samples;
   MetadataByChannel m_analog, m_outputs;
 };
 

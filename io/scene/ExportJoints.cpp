@@ -29,7 +29,7 @@ bool isJointBelow(Module const* module, bool parentIsJoint) {
 
 class JointExport {
  public:
-  explicit JointExport(TakeExport& out) : m_out(out), m_sampler(out.sampler) {}
+  explicit JointExport(TakeExport& out) : m_out(out), m_sampler(*out.sampler), m_world(out.sampler) {}
 
   void addSkeleton(Node const& root) {
     std::vector<Node const*> nodes;
@@ -67,8 +67,8 @@ class JointExport {
            m_sampler.belongsToClip(*node.getRotationChannel());
   }
 
-  TakeJoint joint(Node const& node, int parent, bool isLast) {
-    TakeJoint result;
+  JointSource joint(Node const& node, int parent, bool isLast) {
+    JointSource result;
     result.name = node.getName().GetString();
     result.parent = parent;
     result.endSite = isPlainNode(&node) && parent >= 0 && isLast &&
@@ -86,7 +86,7 @@ class JointExport {
     return result;
   }
 
-  void setBelowParent(TakeJoint& result, Node const& node) const {
+  void setBelowParent(JointSource& result, Node const& node) const {
     Vec3 const offset = node.getPreTranslation();
     TalixRotation const before = node.getPreRotation();
     bool const turns = !isNoRotation(before);
@@ -97,45 +97,32 @@ class JointExport {
         result.offset = offset + before.rotate(node.getConstLocalPos());
         return;
       }
-      result.translations = m_sampler.everyFrame(translation);
-      if (turns || !(offset == Vec3()))
-        result.translations.transform([&](double* values) {
-          Vec3 const moved(values);
-          (offset + (turns ? before.rotate(moved) : moved)).getValue(values);
-        });
+      result.translations = channelSource(m_out.sampler, translation, {}, [=](double* values) {
+        Vec3 const moved(values);
+        (offset + (turns ? before.rotate(moved) : moved)).getValue(values);
+      });
     }
     Controller const& rotation = *node.getRotationChannel();
     if (result.endSite ||
         (!m_sampler.mayChange(rotation) && !turns && isNoRotation(node.getConstLocalRot(true))))
       return;
-    result.rotations = m_sampler.everyFrame(rotation);
-    if (turns)
-      result.rotations.transform([&](double* values) {
-        TalixRotation own;
-        own.setQuaternion(values);
-        (before * own).getQuaternion(values);
-      });
+    result.rotations = channelSource(m_out.sampler, rotation, {}, [=](double* values) {
+      if (!turns) return;
+      TalixRotation own;
+      own.setQuaternion(values);
+      (before * own).getQuaternion(values);
+    });
   }
 
   // A root joint below something that is not simply the world: where it is in the world, frame by frame.
-  void setInWorld(TakeJoint& result, Node const& node) const {
-    FrameGrid const& grid = m_sampler.grid();
-    FrameRun positions(KeyTrack::Shape::Vector, grid), rotations(KeyTrack::Shape::Rotation, grid);
-    for (int64 i = 0; i < grid.count; ++i) {
-      int64 const time = grid.start() + i * grid.period;
-      Transform const world = node.getWorldTransform(time);
-      double quaternion[4];
-      world.rotation.getQuaternion(quaternion);
-      positions.add(i, &world.position.x);
-      rotations.add(i, quaternion);
-    }
+  void setInWorld(JointSource& result, Node const& node) {
     result.offset = node.getPreTranslationInSpaceOfNode(nullptr);
-    result.translations = positions.take();
-    result.rotations = rotations.take();
+    result.translations = m_world.positions(node, nullptr);
+    result.rotations = m_world.rotations(node);
   }
 
   // The file's channels, as long as they are what the joint needs.
-  std::vector<std::string> channels(TakeJoint const& result, Node const& node) const {
+  std::vector<std::string> channels(JointSource const& result, Node const& node) const {
     std::istringstream words(fileMetadata::text(node, fileMetadata::kFileChannels));
     std::vector<std::string> names;
     std::vector<BvhChannel> known;
@@ -146,13 +133,14 @@ class JointExport {
     }
     std::vector<int> const axes = rotationAxes(known);
     bool const moves = axes.size() < known.size();
-    if (!moves && !result.translations.empty()) return {};
-    if (axes.empty() ? !result.rotations.empty() : rotationOrderOf(axes) != result.rotationOrder) return {};
+    if (!moves && result.translations) return {};
+    if (axes.empty() ? result.rotations != nullptr : rotationOrderOf(axes) != result.rotationOrder) return {};
     return names;
   }
 
   TakeExport& m_out;
   FrameSampler const& m_sampler;
+  WorldSources m_world;
   int64 m_scaled = 0;
 };
 

@@ -42,72 +42,34 @@ std::string subjectOf(Marker const& marker) {
 
 class PointExport {
  public:
-  explicit PointExport(TakeExport& out) : m_out(out), m_sampler(out.sampler) {}
+  explicit PointExport(TakeExport& out) : m_out(out), m_sampler(*out.sampler), m_world(out.sampler) {}
 
   void add(Marker const& marker) {
     Controller const& translation = *marker.getTranslationChannel();
     if (!m_sampler.belongsToClip(translation)) return;
-    TakePoint point;
+    PointSource point;
     point.label = marker.getName().GetString();
     if (marker.isUnlabeled() && standsForNoName(point.label)) point.label.clear();
     point.subject = subjectOf(marker);
     point.description = fileMetadata::text(marker, fileMetadata::kDescription);
     m_out.keysLeftOut += m_sampler.keysOffGrid(translation);
 
-    std::vector<bool> const frames = m_sampler.framesWithData(translation);
-    point.positions = positions(marker, frames);
-    if (m_sampler.hasKeys(*marker.getResidualChannel())) point.residuals = residuals(marker, frames);
-    point.cameras = cameras(marker);
+    Controller const& residual = *marker.getResidualChannel();
+    bool const inWorld = !hasPreTransform(marker) && isWorldSpace(m_sampler, marker.getNodeParent());
+    point.positions = inWorld ? channelSource(m_out.sampler, translation, {&translation})
+                              : m_world.positions(marker, &translation);
+    if (m_sampler.hasKeys(residual))
+      point.residuals = channelSource(m_out.sampler, residual, {&residual, &translation});
+    Controller const* cameras = marker.getChannel("Cameras");
+    if (cameras && cameras->getPropertyType() == DataSource::IntProperty && m_sampler.dataTrack(*cameras))
+      point.cameras = channelSource(m_out.sampler, *cameras, {cameras});
     m_out.take.points.push_back(std::move(point));
   }
 
  private:
-  KeyTrack positions(Marker const& marker, std::vector<bool> const& frames) const {
-    Controller const& translation = *marker.getTranslationChannel();
-    if (!hasPreTransform(marker) && isWorldSpace(m_sampler, marker.getNodeParent())) {
-      KeyTrack const* track = m_sampler.asItIs(translation);
-      auto const seen = std::count(frames.begin(), frames.end(), true);
-      return track && track->count() == seen ? *track : m_sampler.sampleWhere(frames, translation);
-    }
-    FrameGrid const& grid = m_sampler.grid();
-    FrameRun run(KeyTrack::Shape::Vector, grid);
-    for (int64 i = 0; i < grid.count; ++i) {
-      if (!frames[static_cast<size_t>(i)]) continue;
-      Vec3 const position = marker.getWSPos(grid.start() + i * grid.period);
-      run.add(i, &position.x);
-    }
-    return run.take();
-  }
-
-  // Where there is a position, and a residual was recorded.
-  KeyTrack residuals(Marker const& marker, std::vector<bool> const& positioned) const {
-    Controller const& residual = *marker.getResidualChannel();
-    std::vector<bool> frames = m_sampler.framesWithData(residual);
-    bool allPositioned = true;
-    for (size_t i = 0; i < frames.size(); ++i) {
-      allPositioned = allPositioned && (positioned[i] || !frames[i]);
-      frames[i] = frames[i] && positioned[i];
-    }
-    KeyTrack const* track = allPositioned ? m_sampler.asItIs(residual) : nullptr;
-    return track ? *track : m_sampler.sampleWhere(frames, residual);
-  }
-
-  std::vector<unsigned char> cameras(Marker const& marker) const {
-    Controller const* channel = marker.getChannel("Cameras");
-    KeyTrack const* track = channel ? m_sampler.dataTrack(*channel) : nullptr;
-    if (!track || channel->getPropertyType() != DataSource::IntProperty) return {};
-    FrameGrid const& grid = m_sampler.grid();
-    KeyTrack const known = m_sampler.sampleWhere(m_sampler.framesWithData(*channel), *channel);
-    std::vector<unsigned char> masks(static_cast<size_t>(grid.count));
-    known.forEach(0, known.count(), [&](KeyTrack::Key const& key) {
-      masks[static_cast<size_t>((key.time - grid.start()) / grid.period)] =
-          static_cast<unsigned char>(std::lround(key.values[0]));
-    });
-    return masks;
-  }
-
   TakeExport& m_out;
   FrameSampler const& m_sampler;
+  WorldSources m_world;
 };
 
 }  // namespace

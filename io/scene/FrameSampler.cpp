@@ -17,25 +17,6 @@ bool hasTrack(Controller const& channel, NLEClip const& clip) {
 
 }  // namespace
 
-void FrameRun::add(int64 frame, double const* values) {
-  if (m_count > 0 && frame != m_first + m_count) flush();
-  if (m_count == 0) m_first = frame;
-  m_values.insert(m_values.end(), values, values + m_track.width());
-  ++m_count;
-}
-
-KeyTrack FrameRun::take() {
-  flush();
-  return std::move(m_track);
-}
-
-void FrameRun::flush() {
-  if (m_count > 0)
-    m_track.append(m_grid.start() + m_first * m_grid.period, m_grid.period, m_values.data(), m_count);
-  m_values.clear();
-  m_count = 0;
-}
-
 FrameSampler::FrameSampler(Database const& scene, FrameGrid const& grid) : m_scene(scene), m_grid(grid) {
   NLEClip const* active = scene.getActiveClip();
   m_blends = active && !active->holdsKeys();
@@ -56,49 +37,42 @@ bool FrameSampler::mayChange(Controller const& channel) const {
   return false;
 }
 
-KeyTrack const* FrameSampler::asItIs(Controller const& channel) const {
-  KeyTrack const* lowest = dataTrack(channel);
-  if (!lowest || lowest != channel.findTrack(m_clip, 0)) return nullptr;
-  for (int layer = 1; layer < m_clip->getNumLayers(); ++layer)
-    if (KeyTrack const* track = channel.findTrack(m_clip, layer); track && !track->empty()) return nullptr;
-  if (lowest->countHolding(1) != lowest->count() || lowest->countHolding(2) != lowest->count() ||
-      lowest->countHolding(4) != lowest->count() || lowest->countSelected() > 0 || lowest->bridgesAny())
-    return nullptr;
-  return keysOffGrid(channel) == 0 ? lowest : nullptr;
-}
+NLEClip const* FrameSampler::shown() const { return m_scene.getActiveClip(); }
 
-KeyTrack FrameSampler::sampleWhere(std::vector<bool> const& frames, Controller const& channel) const {
-  FrameRun run(Controller::shapeOf(channel.getPropertyType()), m_grid);
-  Controller::Values values{};
-  for (int64 i = 0; i < m_grid.count; ++i) {
-    if (!frames[static_cast<size_t>(i)]) continue;
-    channel.evaluate(m_grid.start() + i * m_grid.period, values);
-    run.add(i, values.data());
-  }
-  return run.take();
-}
-
-KeyTrack FrameSampler::everyFrame(Controller const& channel) const {
-  if (KeyTrack const* track = asItIs(channel); track && track->count() == m_grid.count) return *track;
-  return sampleWhere(std::vector<bool>(static_cast<size_t>(m_grid.count), true), channel);
-}
-
-std::vector<bool> FrameSampler::framesWithData(Controller const& channel) const {
-  std::vector<bool> frames(static_cast<size_t>(m_grid.count), m_clip == nullptr);
+void FrameSampler::markGaps(Controller const& channel, SampleTimes const& times, bool* known) const {
+  if (!m_clip || times.count() == 0) return;
   KeyTrack const* track = dataTrack(channel);
-  if (!track || m_grid.count == 0) return frames;
-  DataRanges(*track, m_grid.period).visitRanges(m_grid.start(), m_grid.end(), [&](int64 start, int64 end) {
-    std::fill(frames.begin() + (start - m_grid.start()) / m_grid.period,
-              frames.begin() + (end - m_grid.start()) / m_grid.period + 1, true);
+  if (!track) return void(std::fill_n(known, times.count(), false));
+  int64 const start = times[0], period = times.period();
+  DataRanges const data(*track, period);
+  if (start % period != 0) {
+    // Times of an odd rate, which lie at no multiple of their period.
+    for (int64 i = 0; i < times.count(); ++i) known[i] = known[i] && data.hasDataAt(times[i]);
+    return;
+  }
+  data.visitGaps(start, times[times.count() - 1], [&](int64 first, int64 last) {
+    std::fill(known + (first - start) / period, known + (last - start) / period + 1, false);
   });
-  return frames;
 }
 
-int64 FrameSampler::keysOffGrid(Controller const& channel) const {
+void FrameSampler::sample(Controller const& channel, SampleTimes const& times, double* values) const {
+  if (!m_blends) return channel.sample(m_clip, times, values);
+  auto const width = static_cast<size_t>(Controller::shapeOf(channel.getPropertyType()));
+  Controller::Values each{};
+  for (int64 i = 0; i < times.count(); ++i, values += width) {
+    channel.evaluate(times[i], each);
+    std::copy_n(each.data(), width, values);
+  }
+}
+
+int64 FrameSampler::keysOff(Controller const& channel, SampleTimes const& times) const {
   KeyTrack const* track = dataTrack(channel);
   if (!track) return 0;
   int64 off = 0;
-  track->forEach(0, track->count(), [&](KeyTrack::Key const& key) { off += !m_grid.contains(key.time); });
+  track->forEach(0, track->count(), [&](KeyTrack::Key const& key) {
+    int64 const fromStart = key.time - times[0];
+    off += fromStart < 0 || fromStart % times.period() != 0 || fromStart / times.period() >= times.count();
+  });
   return off;
 }
 

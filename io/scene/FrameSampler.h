@@ -1,11 +1,11 @@
-// Channels of the scene as tracks with one key at each frame of a range: what take formats hold.
+// Channels of the scene at the frames of a take: which of them belong to it, where they have data, and their
+// values.
 #pragma once
 
-#include <functional>
-#include <string>
+#include <memory>
 
+#include "host/keys/SampleTimes.h"
 #include "host/scene/Database.h"
-#include "io/Take.h"
 
 namespace talix {
 
@@ -17,24 +17,6 @@ struct FrameGrid {
 
   int64 start() const { return firstFrame * period; }
   int64 end() const { return start() + (count - 1) * period; }
-  bool contains(int64 time) const { return time >= start() && time <= end() && time % period == 0; }
-};
-
-// Appends values frame by frame; runs go to the track whole.
-class FrameRun {
- public:
-  FrameRun(KeyTrack::Shape shape, FrameGrid const& grid) : m_track(shape), m_grid(grid) {}
-
-  void add(int64 frame, double const* values);
-  KeyTrack take();
-
- private:
-  void flush();
-
-  KeyTrack m_track;
-  FrameGrid const& m_grid;
-  int64 m_first = 0, m_count = 0;
-  std::vector<double> m_values;
 };
 
 class FrameSampler {
@@ -44,6 +26,8 @@ class FrameSampler {
 
   FrameGrid const& grid() const { return m_grid; }
   NLEClip const* clip() const { return m_clip; }
+  // What the scene shows: the clip, or a blend of several; null: the default values.
+  NLEClip const* shown() const;
 
   // Whether a channel has to do with the clip: it has a track there, or in no clip at all.
   bool belongsToClip(Controller const&) const;
@@ -52,22 +36,18 @@ class FrameSampler {
   // Whether the channel may change over time: keys in the clip, or an active blend.
   bool mayChange(Controller const&) const;
 
-  // The keys that tell where a channel has data in the clip; null: none.
+  // The keys that tell where the channel has data in the clip; null: none.
   KeyTrack const* dataTrack(Controller const& channel) const { return channel.findDataTrack(m_clip); }
-  // That track, when it alone makes the channel's values and its keys, all whole and at frames, are all data;
-  // else null.
-  KeyTrack const* asItIs(Controller const&) const;
+  // Sets known[i] to false where the channel has no data at times[i].
+  void markGaps(Controller const&, SampleTimes const& times, bool* known) const;
+  // The values that the scene shows at these times, as KeyTrack holds them.
+  void sample(Controller const&, SampleTimes const& times, double* values) const;
 
-  // A value at the frames that have data.
-  KeyTrack sampleWhere(std::vector<bool> const& frames, Controller const&) const;
-  // A value at every frame: the channel's own track where that is what it holds.
-  KeyTrack everyFrame(Controller const&) const;
-
-  // The frames at which any component of a channel has data.
-  std::vector<bool> framesWithData(Controller const&) const;
-
-  // How many keys lie at no frame of the grid; sampled channels lose them.
-  int64 keysOffGrid(Controller const&) const;
+  // How many keys lie at none of these times: those that sampling loses.
+  int64 keysOff(Controller const&, SampleTimes const& times) const;
+  int64 keysOffGrid(Controller const& channel) const {
+    return keysOff(channel, SampleTimes(m_grid.start(), m_grid.period, m_grid.count));
+  }
 
  private:
   Database const& m_scene;
@@ -75,5 +55,7 @@ class FrameSampler {
   NLEClip const* m_clip = nullptr;  // null: every frame counts
   bool m_blends = false;
 };
+// Shared by all sources that read through it.
+using FrameSamplerPtr = std::shared_ptr<FrameSampler const>;
 
 }  // namespace talix

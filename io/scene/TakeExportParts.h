@@ -4,15 +4,15 @@
 #include <string>
 #include <vector>
 
-#include "io/scene/FrameSampler.h"
+#include "io/scene/SceneSources.h"
 
 namespace talix {
 
 // What the parts share and count.
 struct TakeExport {
   Database& scene;
-  FrameSampler sampler;
-  Take& take;
+  FrameSamplerPtr sampler;
+  TakeSource& take;
   std::vector<TakeNote>& notes;
   int64 keysLeftOut = 0;  // between frames, or outside the range
 

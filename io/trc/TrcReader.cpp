@@ -59,13 +59,13 @@ class RowReader {
   }
 
   void read() {
-    constexpr int64 kRowsToRelease = 1024;
+    constexpr int64 kRowsInBlock = 1024;
     std::string_view row;
     while (takeFilledLine(m_scanner, row, m_line)) {
       if (m_rows == 0 && takeCoordinateNames(row)) continue;
       if (m_rows == 0) alignWith(row);
       readRow(row);
-      if (++m_rows % kRowsToRelease == 0) m_bytes.release(m_scanner.offset());
+      if (++m_rows % kRowsInBlock == 0) m_bytes.passed(m_scanner.offset());
     }
     if (m_rows == 0) m_scanner.fail("a row of data expected; the file ends after its header");
     for (size_t i = 0; i < m_runs.size(); ++i) m_runs[i].flush(m_take.points[i], m_ticks);

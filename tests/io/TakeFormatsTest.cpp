@@ -36,10 +36,10 @@ TEST(TakeFormats, WritesBySuffixOnly) {
   TempFolder const folder;
   std::vector<TakeNote> notes;
   Take const take = readTake(dataFile("frametime_precise_01.bvh"));
-  EXPECT_THAT(errorOf([&] { writeTake(take, folder.path("a.trc"), notes); }),
+  EXPECT_THAT(errorOf([&] { writeTake(sourceOf(take), folder.path("a.trc"), notes); }),
               HasSubstr("a.trc: takes are written as"));
-  writeTake(take, folder.path("a.bvh"), notes);
-  writeTake(readTake(dataFile("nan_case_01.trc")), folder.path("b.C3D"), notes);
+  writeTake(sourceOf(take), folder.path("a.bvh"), notes);
+  writeTake(sourceOf(readTake(dataFile("nan_case_01.trc"))), folder.path("b.C3D"), notes);
   EXPECT_EQ(readTake(folder.path("b.C3D")).points.size(), 14u);
   EXPECT_EQ(readTake(folder.path("a.bvh")).joints.size(), take.joints.size());
 }

@@ -23,7 +23,7 @@ TEST(BvhWriter, KeepsRealTakes) {
     for (char const* unit : {"", "m", "in"}) {
       Take const take = readBVH(dataFile(file), {.unit = unit});
       std::vector<TakeNote> notes;
-      writeBVH(take, folder.path("copy.bvh"), notes);
+      writeBVH(sourceOf(take), folder.path("copy.bvh"), notes);
       EXPECT_EQ(
           notesOf(notes),
           *unit ? "warning: BVH names no length unit; the lengths are in " + std::string(unit) + "\n" : "");
@@ -53,7 +53,7 @@ Take takeOf(std::vector<TakeJoint> joints) {
 std::string written(Take const& take, std::string* notes = nullptr) {
   TempFolder const folder;
   std::vector<TakeNote> list;
-  writeTake(take, folder.path("out.BVH"), list);
+  writeTake(sourceOf(take), folder.path("out.BVH"), list);
   if (notes) *notes = notesOf(list);
   return readText(folder.path("out.BVH"));
 }
@@ -150,11 +150,11 @@ TEST(BvhWriter, SaysWhatItCannotHold) {
 
   TempFolder const folder;
   std::vector<TakeNote> list;
-  EXPECT_THAT(errorOf([&] { writeBVH(Take(), folder.path("x.bvh"), list); }),
+  EXPECT_THAT(errorOf([&] { writeBVH(TakeSource(), folder.path("x.bvh"), list); }),
               HasSubstr("BVH holds joints only"));
-  EXPECT_THAT(errorOf([&] { writeBVH(takeOf({joint("a", 0)}), folder.path("x.bvh"), list); }),
+  EXPECT_THAT(errorOf([&] { writeBVH(sourceOf(takeOf({joint("a", 0)})), folder.path("x.bvh"), list); }),
               HasSubstr("joint \"a\" comes before its parent"));
-  EXPECT_THAT(errorOf([&] { writeBVH(takeOf({joint("a", -1)}), folder.path("none/x.bvh"), list); }),
+  EXPECT_THAT(errorOf([&] { writeBVH(sourceOf(takeOf({joint("a", -1)})), folder.path("none/x.bvh"), list); }),
               HasSubstr("none/x.bvh: cannot be written"));
   EXPECT_TRUE(std::filesystem::is_empty(folder.path("")));
 }

@@ -14,7 +14,7 @@ auto const kAlways = [](int, int64) { return true; };
 
 Take writtenAndRead(Take const& take, std::vector<TakeNote>& notes) {
   TempFolder const folder;
-  writeC3D(take, folder.path("written.c3d"), notes);
+  writeC3D(sourceOf(take), folder.path("written.c3d"), notes);
   return readC3D(folder.path("written.c3d"));
 }
 
@@ -132,10 +132,10 @@ TEST(C3DWriter, LeavesTheOldFileWhenTheTakeIsImpossible) {
   Take take = movingPoints(1, 2, kAlways);
   take.rate = 0;
   std::vector<TakeNote> notes;
-  EXPECT_THROW(writeC3D(take, path, notes), FileError);
+  EXPECT_THROW(writeC3D(sourceOf(take), path, notes), FileError);
   take.rate = 100;
   take.points.resize(65'536);
-  EXPECT_THROW(writeC3D(take, path, notes), FileError);
+  EXPECT_THROW(writeC3D(sourceOf(take), path, notes), FileError);
   EXPECT_EQ(readText(path), "old");
 }
 

@@ -1,8 +1,60 @@
 #include "tests/io/scene/SceneTesting.h"
 
+#include <cmath>
+
 #include "tests/io/TakeTesting.h"
 
 namespace talix {
+
+namespace {
+
+// The values of a source where it has some.
+KeyTrack tracked(SampleSourcePtr const& source, KeyTrack::Shape shape, SampleTimes const& times) {
+  KeyTrack track(shape);
+  SampleBlock block(source.get(), track.width());
+  constexpr int64 kLength = 100;  // several blocks even in short takes
+  for (int64 first = 0; source && first < times.count(); first += kLength) {
+    SampleTimes const part = times.part(first, std::min(kLength, times.count() - first));
+    block.read(part);
+    for (int64 i = 0; i < part.count(); ++i) {
+      KeyTrack::Values values{};
+      if (!block.at(i)) continue;
+      std::copy_n(block.at(i), track.width(), values.data());
+      track.set(part[i], values);
+    }
+  }
+  return track;
+}
+
+// All that a writer could pull.
+Take collected(TakeSource const& source) {
+  using enum KeyTrack::Shape;
+  Take take{source, {}, {}, {}, {}, {}, {}};
+  SampleTimes const frames = source.frameTimes();
+  int64 const perFrame = std::llround(source.analogRate / source.rate);
+  SampleTimes const samples(frames[0], perFrame ? ticksPerFrameAt(source.analogRate) : 1,
+                            perFrame * frames.count());
+  for (PointSource const& point : source.points) {
+    TakePoint& made = take.points.emplace_back(TakePoint{
+        point, tracked(point.positions, Vector, frames), tracked(point.residuals, Scalar, frames), {}});
+    KeyTrack const masks = tracked(point.cameras, Scalar, frames);
+    masks.forEach(0, masks.count(), [&](KeyTrack::Key const& key) {
+      made.cameras.resize(static_cast<size_t>(frames.count()));
+      made.cameras[static_cast<size_t>((key.time - frames[0]) / frames.period())] =
+          static_cast<unsigned char>(std::lround(key.values[0]));
+    });
+  }
+  for (ModelOutputSource const& output : source.outputs)
+    take.outputs.push_back({output, tracked(output.values, Vector, frames)});
+  for (AnalogSource const& channel : source.analog)
+    take.analog.push_back({channel, tracked(channel.samples, Scalar, samples)});
+  for (JointSource const& joint : source.joints)
+    take.joints.push_back(
+        {joint, tracked(joint.translations, Vector, frames), tracked(joint.rotations, Rotation, frames)});
+  return take;
+}
+
+}  // namespace
 
 SceneTest::SceneTest() {
   g_db->newScene();
@@ -23,7 +75,7 @@ void SceneTest::openFile(std::string const& name, int up) {
 
 Take SceneTest::save() {
   m_notes.clear();
-  return exportTake(*g_db, m_notes);
+  return collected(exportTake(*g_db, m_notes));
 }
 
 std::string SceneTest::notes() const { return notesOf(m_notes); }

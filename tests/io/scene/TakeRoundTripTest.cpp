@@ -39,15 +39,6 @@ TEST_F(TakeRoundTrip, EveryRealTakeComesBackAsItWasRead) {
   EXPECT_GE(read, 30);
 }
 
-TEST_F(TakeRoundTrip, KeysAreSharedNotCopied) {
-  openFile("walkset_a_le_real.c3d");
-  Take const made = save();
-  ASSERT_EQ(made.points.size(), 26u);
-  auto const* marker = at<Marker>("\\walkset_a_le_real\\" + made.points[0].label);
-  EXPECT_TRUE(made.points[0].positions.sharesAll(
-      *marker->getTranslationChannel()->findTrack(g_db->getActiveClip(), 0)));
-}
-
 }  // namespace
 
 }  // namespace talix
