@@ -92,8 +92,8 @@ class MotionKeeper::ClipMotion {
  private:
   bool contains(int64 time) const { return m_keeper.m_range.contains(time); }
   bool hasData(int64 time) const { return !m_measured || (m_data && m_data->hasDataAt(time)); }
-  int64 frameAtOrBefore(int64 time) const { return (time / m_period - (time % m_period < 0)) * m_period; }
-  int64 frameAfter(int64 time) const { return frameAtOrBefore(time) + m_period; }
+  int64 frameStart(int64 time) const { return frameAtOrBefore(time, m_period) * m_period; }
+  int64 nextFrameStart(int64 time) const { return frameStart(time) + m_period; }
 
   void collectTimes(MotionScope::Relation const& relation);
   Goals goalsAt(KeyTimes times) const;
@@ -162,7 +162,7 @@ void MotionKeeper::ClipMotion::collectTimes(MotionScope::Relation const& relatio
 }
 
 MotionKeeper::Goals const& MotionKeeper::ClipMotion::goalsAtFrames() const {
-  int64 const first = frameAfter(m_goals.times.front()), last = frameAtOrBefore(m_goals.times.back());
+  int64 const first = nextFrameStart(m_goals.times.front()), last = frameStart(m_goals.times.back());
   if (m_frames.times.empty() && first <= last && (last - first) / m_period < kMostFrames) {
     KeyTimes frames;
     for (int64 time = first; time <= last; time += m_period) frames.push_back(time);
@@ -256,7 +256,7 @@ std::vector<Values> MotionKeeper::ClipMotion::valuesAt(Part part, Goals const& g
 std::vector<HTimeRange> MotionKeeper::ClipMotion::spansOf(KeyTimes const& limits) const {
   std::vector<HTimeRange> spans;
   for (size_t i = 1; i < limits.size(); ++i)
-    if (frameAfter(limits[i - 1]) < limits[i]) spans.emplace_back(limits[i - 1], limits[i]);
+    if (nextFrameStart(limits[i - 1]) < limits[i]) spans.emplace_back(limits[i - 1], limits[i]);
   return spans;
 }
 
@@ -268,7 +268,7 @@ std::vector<bool> MotionKeeper::ClipMotion::deviating(Part part, KeyTrack const*
   KeyTimes times;
   std::vector<std::pair<size_t, double>> probes;  // span, and how much of the tolerance counts
   for (size_t i = 0; i < spans.size(); ++i) {
-    int64 const first = frameAfter(spans[i].getStart()), last = frameAtOrBefore(spans[i].getEnd() - 1);
+    int64 const first = nextFrameStart(spans[i].getStart()), last = frameStart(spans[i].getEnd() - 1);
     int64 const step = all ? 1 : 1 + (last - first) / m_period / kProbes;
     // Between the probes it may be a little more.
     for (int64 time = first; time <= last; time += step * m_period)
@@ -322,11 +322,11 @@ KeyTimes MotionKeeper::ClipMotion::keysNeeded(Part part, std::vector<Values> con
 void MotionKeeper::ClipMotion::holdOutside(Part part, KeyTrack& track) const {
   int64 const start = m_keeper.m_range.getStart(), end = m_keeper.m_range.getEnd();
   int64 const first = m_motion.getStart(), last = m_motion.getEnd();
-  bool const startsAll = !m_motion.isEmpty() && first >= start && frameAtOrBefore(first) <= start;
-  bool const endsAll = !m_motion.isEmpty() && last <= end && frameAfter(last) > end;
+  bool const startsAll = !m_motion.isEmpty() && first >= start && frameStart(first) <= start;
+  bool const endsAll = !m_motion.isEmpty() && last <= end && nextFrameStart(last) > end;
   KeyTimes beside;
-  if (hasEnd(start) && !startsAll) beside.push_back(frameAtOrBefore(start - 1));
-  if (hasEnd(end) && !endsAll) beside.push_back(frameAfter(end));
+  if (hasEnd(start) && !startsAll) beside.push_back(frameStart(start - 1));
+  if (hasEnd(end) && !endsAll) beside.push_back(nextFrameStart(end));
   // Where a marker was not seen there, what lies outside begins at its next key.
   for (int64& time : beside) {
     if (hasData(time)) continue;
@@ -348,7 +348,7 @@ void MotionKeeper::ClipMotion::refine(Part part, KeyTrack& track) const {
     KeyTimes added;
     for (size_t i = 0; i < spans.size(); ++i) {
       if (!deviates[i]) continue;
-      int64 const first = frameAfter(spans[i].getStart()), last = frameAtOrBefore(spans[i].getEnd() - 1);
+      int64 const first = nextFrameStart(spans[i].getStart()), last = frameStart(spans[i].getEnd() - 1);
       added.push_back(first + (last - first) / m_period / 2 * m_period);
     }
     if (added.empty()) return;
