@@ -1,7 +1,5 @@
 #include "host/scene/Constraints.h"
 
-#include <cmath>
-
 H_DEFINE_ABSTRACT_CLASS(ConstraintBase);
 H_DEFINE_ABSTRACT_CLASS(PositionConstraintBase);
 H_DEFINE_CLASS(LabelingConstraint);
@@ -43,7 +41,7 @@ Vec3 PositionConstraintBase::getConstraintOffsetWS(int64 time) const {
 }
 
 bool PositionConstraintBase::setConstraintOffset(Vec3 const& offset) {
-  if (!std::isfinite(offset.x) || !std::isfinite(offset.y) || !std::isfinite(offset.z)) return false;
+  if (!isFinite(offset)) return false;
   m_offset->setValue(offset, true, true, true, true);
   return true;
 }
