@@ -36,8 +36,8 @@ void PositionConstraintBase::setUp() {
 Vec3 PositionConstraintBase::getConstraintOffsetWS(int64 time) const {
   BaseBone const* target = getTarget();
   if (!target) return getConstraintOffset();
-  Transform const frame = target->getWorldTransform(time);
-  return frame.position + frame.rotation.rotate(scaled(getConstraintOffset(), frame.scale));
+  Transform const space = target->getWorldTransform(time);
+  return space.position + space.rotation.rotate(scaled(getConstraintOffset(), space.scale));
 }
 
 bool PositionConstraintBase::setConstraintOffset(Vec3 const& offset) {
