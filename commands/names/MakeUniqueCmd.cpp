@@ -53,7 +53,7 @@ class PathNumbers {
   }
   size_t ofParent(Module const& module) { return module.getParent() ? of(*module.getParent()) : kRoot; }
 
-  // The first number above `number` for which ABOVE\\BASE_NUMBER names no module.
+  // The first number above `number` for which ABOVE\BASE_NUMBER names no module.
   int64 freeNumber(size_t above, std::string const& base, int64 number) {
     Next& next = m_next[{above, base}];
     auto const isTaken = [&](int64 candidate) {
