@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "commands/Targets.h"
+#include "host/command/Targets.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/HTimeManager.h"
 
@@ -13,16 +13,14 @@ bool readWrite(Given const& given, Args const& args, WriteOptions const& which, 
   write.world = options.has(which.world);
   write.byDefault = options.has(which.byDefault);
   write.preTransform = options.has(which.preTransform);
-  write.node = nodeAt(args[0].getStringValue(-1), "%s is not a valid path to a node in the scene.");
+  write.node = moduleAt<Node>(args[0].getStringValue(-1), "%s is not a valid path to a node in the scene.");
   write.vector = args[1].getVecValue(-1);
   return write.node && areFinite(write.vector, command);
 }
 
 bool areFinite(Vec3 const& values, char const* command) {
   // The length as well: a rotation vector is taken by it.
-  if (std::isfinite(values.x) && std::isfinite(values.y) && std::isfinite(values.z) &&
-      std::isfinite(values.length()))
-    return true;
+  if (isFinite(values) && std::isfinite(values.length())) return true;
   Command::logError("%s needs finite numbers.", command);
   return false;
 }
