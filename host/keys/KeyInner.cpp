@@ -1,6 +1,8 @@
 #include "host/keys/KeyInner.h"
 
 #include <algorithm>
+#include <new>
+#include <utility>
 
 void KeyNodeRef::destroy(KeyNode* node) {
   if (node->isLeaf()) {
@@ -48,19 +50,18 @@ void KeyInner::place(int i, KeyNodeRef child) {
   m_children[at(i)] = std::move(child);
 }
 
-KeyNodeRef KeyInner::insert(int i, KeyNodeRef child) {
+KeyNodeRef KeyInner::insert(int i, KeyNodeRef child, KeyNodeRef spare) noexcept {
   if (full()) {
     // Keys that arrive in order, from either end, leave full nodes behind; others halve them.
     int const from = i == m_size ? i : i == 1 ? 1 : m_size / 2;
-    auto* right = new KeyInner(level(), m_fanout);
-    KeyNodeRef sibling(right);
-    moveTail(from, *right);
+    auto& right = asInner(*spare.get());
+    moveTail(from, right);
     if (i >= from) {
-      right->insert(i - from, std::move(child));
+      right.insert(i - from, std::move(child), {});
     } else {
-      insert(i, std::move(child));
+      insert(i, std::move(child), {});
     }
-    return sibling;
+    return spare;
   }
   for (int k = m_size; k > i; --k) {
     m_firstTimes[at(k)] = m_firstTimes[at(k - 1)];
@@ -80,7 +81,7 @@ void KeyInner::moveTail(int from, KeyInner& to) {
   m_size = std::min(m_size, from);
 }
 
-void KeyInner::mend(int first, int last, bool tightly) {
+int KeyInner::closeGaps(int first) noexcept {
   int kept = first;
   for (int k = first; k < m_size; ++k) {
     if (!m_children[at(k)]) continue;
@@ -91,16 +92,17 @@ void KeyInner::mend(int first, int last, bool tightly) {
     }
     ++kept;
   }
-  last -= m_size - kept;
-  m_size = kept;
+  return std::exchange(m_size, kept) - kept;
+}
 
+void KeyInner::mend(int first, int last, bool tightly) noexcept {
+  last -= closeGaps(first);
   for (int i = std::max(first - 1, 0); i + 1 < m_size && i <= last;) {
-    if (joins(i, tightly)) {
-      join(i);
+    if (joins(i, tightly) && join(i)) {
       --last;
-      continue;
+    } else {
+      ++i;
     }
-    ++i;
   }
 }
 
@@ -115,12 +117,17 @@ bool KeyInner::joins(int i, bool tightly) const {
   return room(asInner(child(i)).size(), asInner(child(i + 1)).size(), m_fanout);
 }
 
-void KeyInner::join(int i) {
+// False, and all is as it was, when there is no memory for it: small neighbours do as well.
+bool KeyInner::join(int i) {
   KeyNodeRef& left = m_children[at(i)];
   KeyNodeRef const right = m_children[at(i + 1)];
-  left.own();
+  try {
+    left.own();
+    if (left->isLeaf()) asLeaf(*left.get()).append(asLeaf(*right.get()), 0, asLeaf(*right.get()).size());
+  } catch (std::bad_alloc const&) {
+    return false;
+  }
   if (left->isLeaf()) {
-    asLeaf(*left.get()).append(asLeaf(*right.get()), 0, asLeaf(*right.get()).size());
     asLeaf(*left.get()).pack();
   } else {
     auto& to = asInner(*left.get());
@@ -129,6 +136,7 @@ void KeyInner::join(int i) {
   }
   m_keys[at(i)] = left->counts.keys;
   remove(i + 1);
+  return true;
 }
 
 void KeyInner::remove(int i) {

@@ -30,18 +30,21 @@ class KeyInner final : public KeyNode {
 
   // To be called after child i has changed; `before` are the counts that it had.
   void childChanged(int i, KeyCounts const& before);
-  // Adds a child at position i. A full node splits: returns the new node to its right.
-  KeyNodeRef insert(int i, KeyNodeRef child);
-  // Removes the empty references among the children first to last, then joins neighbours around there: small
-  // ones, or with `tightly` all that fit one node.
-  void mend(int first, int last, bool tightly);
+  // Adds a child at position i. A full node splits: `spare`, an empty node of the same level, becomes the one
+  // to its right and is returned.
+  KeyNodeRef insert(int i, KeyNodeRef child, KeyNodeRef spare) noexcept;
+  // Removes the empty references among the children from `first` on; returns how many there were.
+  int closeGaps(int first) noexcept;
+  // The same among the children first to last, then joins neighbours around there as far as there is memory
+  // for it: small ones, or with `tightly` all that fit one node.
+  void mend(int first, int last, bool tightly) noexcept;
 
  private:
   static size_t at(int i) { return static_cast<size_t>(i); }
   void place(int i, KeyNodeRef child);
   void moveTail(int from, KeyInner& to);
   bool joins(int i, bool tightly) const;
-  void join(int i);
+  bool join(int i);
   void remove(int i);
 
   int m_fanout;

@@ -87,16 +87,19 @@ class KeyLeaf final : public KeyNode {
     return scan<-1, false>(m_selection, 0, slot, mask);
   }
 
+  // Edits that throw for lack of memory leave the leaf as it was.
   void insert(int slot, int64 time, double const* values, KeyFlags const& flags);
   // n whole keys after the last one. The leaf must have room for them.
   void append(int64 start, int64 period, double const* values, int n);
   void append(KeyLeaf const& from, int first, int last);
-  void write(int slot, double const* values, unsigned mask);
+  // The values of the components of the mask, and all flags.
+  void write(int slot, double const* values, unsigned mask, KeyFlags const& flags);
   void erase(int first, int last);
   // Leaves the n ascending slots; cheaper than erasing the others run by run.
   void keep(int const* slots, int n);
-  // To be called when an edit of many keys is done: gives back the room that it left.
-  void pack();
+  // To be called when an edit of many keys is done: gives back the room that it left, if there is memory for
+  // it.
+  void pack() noexcept;
   void setFlags(int slot, KeyFlags const& flags);
   // To be called when a series of setFlags is done.
   void dropIdleFlags();
@@ -123,10 +126,15 @@ class KeyLeaf final : public KeyNode {
     return -1;
   }
 
+  template <class Add>
+  void addWholly(int slot, int n, Add add);
   void insertValues(int slot, double const* values, int n);
   void insertFlags(int slot, KeyFlags const& flags, int n);
+  void spellOutFlags(KeyFlags const& toBe);
   void appendBits(Column& column, Column const& from, unsigned absent, int first, int n);
   void insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n);
+  template <class T, class ValueAt>
+  void become(Form form, KeyColumn<T>& column, int n, ValueAt valueAt);
   void spellOutValues(bool asFloats);
   void widen();
   void setValues(double const* values, int n);

@@ -16,8 +16,10 @@
 //
 // Copying a track is a snapshot and costs one reference; the copies part at the first change of either.
 // Unless a comment says otherwise an operation is logarithmic in the number of keys, plus one leaf.
-// Times are ticks. Masks: 1 x, 2 y, 4 z, 7 all; one-valued and rotation tracks know only "all" (any non-zero
-// mask). A key is whole when it holds every component.
+//
+// Where memory runs out, set() leaves the track as it was; other edits may have changed some of their keys,
+// but for bridges (3) the invariants hold. Times are ticks. Masks: 1 x, 2 y, 4 z, 7 all; one-valued and
+// rotation tracks know only "all" (any non-zero mask). A key is whole when it holds every component.
 #pragma once
 
 #include <array>
@@ -215,6 +217,7 @@ class KeyTrack {
   struct Place;     // a key: its leaf, slot and index
   struct LeafEdit;  // what a range edit does to the leaves that it touches
   class Sampler;    // sample() on one curve: all components, or one that is keyed alone
+  class Spares;     // nodes for splits
 
   unsigned normal(unsigned mask) const { return m_shape == Shape::Vector ? mask & kAll : mask ? kAll : 0; }
   void changed();
@@ -228,10 +231,11 @@ class KeyTrack {
                   Values& values, Cursor const*) const;
 
   void put(Key const& key);
-  KeyNodeRef setBelow(KeyNodeRef& node, Key const& key);
-  KeyNodeRef setInLeaf(KeyNodeRef& node, Key const& key);
-  KeyNodeRef appendBelow(KeyNodeRef& node, int64 start, int64 period, double const* values, int n);
-  void growRoot(KeyNodeRef sibling);
+  template <class AddTo>
+  void addKeys(int64 time, AddTo addTo);
+  template <class AddTo>
+  static KeyNodeRef addBelow(KeyNodeRef& node, int64 time, Spares& spares, AddTo& addTo);
+  KeyNodeRef setInLeaf(KeyNodeRef& node, Key const& key, Spares& spares);
   int64 edit(int64 firstIndex, int64 lastIndex, LeafEdit&);
   int64 editTimes(int64 first, int64 last, LeafEdit&);
   void editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit&);

@@ -96,13 +96,11 @@ struct KeyTrack::LeafEdit {
 
       if (slot + 1 < runEnd) leaf.erase(slot + 1, runEnd);
       runEnd = slot;
-      if (gone != 0) {
-        constexpr Values kAbsent{};
-        leaf.write(slot, kAbsent.data(), gone);
-      }
-      leaf.setFlags(
-          slot, {now.components & ~gone, (now.bridges & ~gone) | (kind == Kind::Thin ? bridged[slot] : 0u),
-                 now.selected & ~gone});
+      KeyFlags const left{now.components & ~gone,
+                          (now.bridges & ~gone) | (kind == Kind::Thin ? bridged[slot] : 0u),
+                          now.selected & ~gone};
+      constexpr Values kAbsent{};
+      gone ? leaf.write(slot, kAbsent.data(), gone, left) : leaf.setFlags(slot, left);
     }
     if (first < runEnd) leaf.erase(first, runEnd);
     leaf.dropIdleFlags();
@@ -115,13 +113,28 @@ void KeyTrack::changed() {
   m_version = last.fetch_add(1, std::memory_order_relaxed) + 1;
 }
 
-void KeyTrack::growRoot(KeyNodeRef sibling) {
-  auto* root = new KeyInner(m_root->level() + 1, m_limits.fanout);
-  KeyNodeRef fresh(root);
-  root->insert(0, std::move(m_root));
-  root->insert(1, std::move(sibling));
-  m_root = std::move(fresh);
-}
+// The inner nodes that splits use up, made before anything changes, so that nothing can fail after that.
+class KeyTrack::Spares {
+ public:
+  // To be told of each inner node on the way down to a leaf: full ones split as well when that does. The
+  // track grows a root when all are full.
+  void pass(KeyInner const& node) { m_needed = node.full() ? m_needed + 1 : 0; }
+  // To be called before the leaf splits.
+  void make(int fanout) {
+    m_nodes.reserve(static_cast<size_t>(m_needed));
+    for (int level = m_needed; level > 0; --level) m_nodes.emplace_back(new KeyInner(level, fanout));
+  }
+  // From the lowest level up.
+  KeyNodeRef take() noexcept {
+    KeyNodeRef node = std::move(m_nodes.back());
+    m_nodes.pop_back();
+    return node;
+  }
+
+ private:
+  int m_needed = 1;
+  std::vector<KeyNodeRef> m_nodes;
+};
 
 void KeyTrack::set(int64 time, Values const& values, unsigned mask) {
   mask = normal(mask);
@@ -135,25 +148,42 @@ void KeyTrack::set(int64 time, Values const& values, unsigned mask) {
 // Adds the key's components to what the track holds at its time; components that it holds already keep their
 // bridges.
 void KeyTrack::put(Key const& key) {
+  addKeys(key.time, [&](KeyNodeRef& leaf, Spares& spares) { return setInLeaf(leaf, key, spares); });
+}
+
+// Lets addTo(leaf, spares) add keys to the leaf that a time falls into, all or, when it throws, none. It
+// returns a new leaf to the right of it when it had to split, for which it makes the spares.
+template <class AddTo>
+void KeyTrack::addKeys(int64 time, AddTo addTo) {
   changed();
-  if (!m_root) m_root = KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
-  if (KeyNodeRef sibling = setBelow(m_root, key)) growRoot(std::move(sibling));
+  Spares spares;
+  KeyNodeRef root = m_root ? KeyNodeRef() : KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
+  KeyNodeRef sibling = addBelow(m_root ? m_root : root, time, spares, addTo);
+  if (!m_root) m_root = std::move(root);
+  if (!sibling) return;
+  KeyNodeRef grown = spares.take();
+  asInner(*grown.get()).insert(0, std::move(m_root), {});
+  asInner(*grown.get()).insert(1, std::move(sibling), {});
+  m_root = std::move(grown);
 }
 
 // Returns the new node to the right when the node had to split.
-KeyNodeRef KeyTrack::setBelow(KeyNodeRef& node, Key const& key) {
-  if (node->isLeaf()) return setInLeaf(node, key);
+template <class AddTo>
+KeyNodeRef KeyTrack::addBelow(KeyNodeRef& node, int64 time, Spares& spares, AddTo& addTo) {
+  if (node->isLeaf()) return addTo(node, spares);
   node.own();
   auto& inner = asInner(*node.get());
-  int const i = inner.childAtTime(key.time);
+  spares.pass(inner);
+  int const i = inner.childAtTime(time);
   KeyNodeRef& child = inner.childRef(i);
   KeyCounts const before = child->counts;
-  KeyNodeRef sibling = setBelow(child, key);
+  KeyNodeRef sibling = addBelow(child, time, spares, addTo);
   inner.childChanged(i, before);
-  return sibling ? inner.insert(i + 1, std::move(sibling)) : KeyNodeRef();
+  if (!sibling) return sibling;
+  return inner.insert(i + 1, std::move(sibling), inner.full() ? spares.take() : KeyNodeRef());
 }
 
-KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key) {
+KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key, Spares& spares) {
   auto const insertInto = [&](KeyLeaf& leaf, int slot) {
     Values held{};
     for (size_t c = 0; c < held.size(); ++c)
@@ -170,9 +200,9 @@ KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key) {
     auto& leaf = asLeaf(*node.get());
     if (present) {
       KeyFlags const held = leaf.flags(slot);
-      leaf.write(slot, key.values.data(), key.components);
-      leaf.setFlags(slot, {held.components | key.components, held.bridges | (key.bridges & ~held.components),
-                           held.selected | key.selected});
+      leaf.write(slot, key.values.data(), key.components,
+                 {held.components | key.components, held.bridges | (key.bridges & ~held.components),
+                  held.selected | key.selected});
       leaf.dropIdleFlags();
     } else {
       insertInto(leaf, slot);
@@ -180,70 +210,48 @@ KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key) {
     return {};
   }
 
-  // Keys that arrive in order, from either end, leave full leaves behind; others halve them.
-  auto* fresh = new KeyLeaf(width(), m_limits.leafKeys);
-  KeyNodeRef sibling(fresh);
-  if (slot == 0 || slot == size) {
-    insertInto(*fresh, 0);
-    if (slot == 0) std::swap(node, sibling);
-    return sibling;
-  }
-  node.own();
-  auto& left = asLeaf(*node.get());
+  // Keys that arrive in order, from either end, leave full leaves behind; others halve them. The half that
+  // the key goes to becomes a leaf of its own. Erasing an end of the other one needs no memory.
+  spares.make(m_limits.fanout);
   int const half = size / 2;
-  fresh->append(left, half, size);
-  left.erase(half, size);
-  if (slot <= half) {
-    insertInto(left, slot);
-  } else {
-    insertInto(*fresh, slot - half);
+  bool const toLeft = slot <= half;
+  int const first = slot == size ? size : toLeft ? 0 : half;
+  int const last = slot == 0 ? 0 : toLeft ? half : size;
+  auto* leaf = new KeyLeaf(width(), m_limits.leafKeys);
+  KeyNodeRef fresh(leaf);
+  if (first < last) {
+    node.own();
+    leaf->append(asLeaf(*node.get()), first, last);
   }
-  return sibling;
+  insertInto(*leaf, slot - first);
+  if (first < last) asLeaf(*node.get()).erase(first, last);
+  if (toLeft) std::swap(node, fresh);
+  return fresh;
 }
 
 void KeyTrack::append(int64 start, int64 period, double const* values, int64 n) {
   if (n <= 0) return;
   assert((n == 1 || period > 0) && (empty() || start > timeAt(count() - 1)));
-  changed();
   while (n > 0) {
-    Place const last = placeAt(count() - 1);
-    int64 const used = last && !last.leaf->full() ? last.leaf->size() : 0;
-    int const some = static_cast<int>(std::min(n, m_limits.leafKeys - used));
-    KeyNodeRef sibling;
-    if (m_root) {
-      sibling = appendBelow(m_root, start, period, values, some);
-    } else {
-      auto* leaf = new KeyLeaf(width(), m_limits.leafKeys);
-      m_root = KeyNodeRef(leaf);
-      leaf->append(start, period, values, some);
-    }
-    if (sibling) growRoot(std::move(sibling));
+    int some = 0;
+    addKeys(start, [&](KeyNodeRef& node, Spares& spares) {
+      bool const splits = asLeaf(*node.get()).full();
+      some =
+          static_cast<int>(std::min<int64>(n, m_limits.leafKeys - (splits ? 0 : asLeaf(*node.get()).size())));
+      KeyNodeRef sibling;
+      if (splits) {
+        spares.make(m_limits.fanout);
+        sibling = KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
+      } else {
+        node.own();
+      }
+      asLeaf(*(splits ? sibling : node).get()).append(start, period, values, some);
+      return sibling;
+    });
     start += period * some;
     values += static_cast<int64>(some) * width();
     n -= some;
   }
-}
-
-// Appends n keys, which fit the last leaf or, when that is full, a new one.
-KeyNodeRef KeyTrack::appendBelow(KeyNodeRef& node, int64 start, int64 period, double const* values, int n) {
-  if (node->isLeaf()) {
-    if (asLeaf(*node.get()).full()) {
-      auto* fresh = new KeyLeaf(width(), m_limits.leafKeys);
-      fresh->append(start, period, values, n);
-      return KeyNodeRef(fresh);
-    }
-    node.own();
-    asLeaf(*node.get()).append(start, period, values, n);
-    return {};
-  }
-  node.own();
-  auto& inner = asInner(*node.get());
-  int const i = inner.size() - 1;
-  KeyNodeRef& child = inner.childRef(i);
-  KeyCounts const before = child->counts;
-  KeyNodeRef sibling = appendBelow(child, start, period, values, n);
-  inner.childChanged(i, before);
-  return sibling ? inner.insert(i + 1, std::move(sibling)) : KeyNodeRef();
 }
 
 int64 KeyTrack::edit(int64 firstIndex, int64 lastIndex, LeafEdit& what) {
@@ -260,7 +268,8 @@ int64 KeyTrack::edit(int64 firstIndex, int64 lastIndex, LeafEdit& what) {
   return what.affected;
 }
 
-// Edits the keys with the indices [first, last) of the node; a node that loses all of them becomes null.
+// Edits the keys with the indices [first, last) of the node; a node that loses all of them becomes null. When
+// it throws, some keys are edited and others are not, and the nodes are as whole as ever.
 void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& what) {
   if (what.skips(*node.get())) return;
   if (what.dropsWhole() && first == 0 && last == node->counts.keys) {
@@ -289,7 +298,13 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
     int64 const keys = inner.keys(i);
     KeyNodeRef& child = inner.childRef(i);
     KeyCounts const counts = child->counts;
-    editBelow(child, std::max<int64>(first - before, 0), std::min(last - before, keys), what);
+    try {
+      editBelow(child, std::max<int64>(first - before, 0), std::min(last - before, keys), what);
+    } catch (...) {
+      inner.childChanged(i, counts);
+      inner.closeGaps(firstChild);
+      throw;
+    }
     inner.childChanged(i, counts);
     before += keys;
   }
