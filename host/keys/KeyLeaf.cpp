@@ -79,7 +79,7 @@ void KeyLeaf::append(int64 start, int64 period, double const* values, int n) {
     insertFlags(size(), {}, n);
     m_times.append(start, period, n, m_limit);
   });
-  for (int i = 0; i < n; ++i) counts.count({}, 1);
+  counts.count({}, n);
 }
 
 void KeyLeaf::append(KeyLeaf const& from, int first, int last) {
@@ -92,7 +92,7 @@ void KeyLeaf::append(KeyLeaf const& from, int first, int last) {
     appendBits(m_selection, from.m_selection, 0, first, n);
     m_times.append(from.m_times, first, last);
   });
-  for (int slot = first; slot < last; ++slot) counts.count(from.flags(slot), 1);
+  countRange(from, first, last, 1);
 }
 
 void KeyLeaf::write(int slot, double const* values, unsigned mask, KeyFlags const& flags) {
@@ -110,7 +110,7 @@ void KeyLeaf::erase(int first, int last) {
   m_times.erase(first, last);
   if (m_form == Form::Double) m_doubles.erase(first * m_width, last * m_width);
   if (m_form == Form::Float) m_floats.erase(first * m_width, last * m_width);
-  for (int slot = first; slot < last; ++slot) counts.count(flags(slot), -1);
+  countRange(*this, first, last, -1);
   if (!plain()) m_flags.erase(first, last);
   if (!m_selection.empty()) m_selection.erase(first, last);
   dropIdleFlags();
@@ -118,7 +118,8 @@ void KeyLeaf::erase(int first, int last) {
 
 void KeyLeaf::keep(int const* slots, int n) {
   KeyCounts left;
-  for (int i = 0; i < n; ++i) left.count(flags(slots[i]), 1);
+  if (plain() && m_selection.empty()) left.count({}, n);
+  for (int i = 0; left.keys < n; ++i) left.count(flags(slots[i]), 1);
   m_times.keep(slots, n);
   counts = left;
   if (m_form == Form::Double) m_doubles.keep(slots, n, m_width);
@@ -126,6 +127,35 @@ void KeyLeaf::keep(int const* slots, int n) {
   if (!plain()) m_flags.keep(slots, n, 1);
   if (!m_selection.empty()) m_selection.keep(slots, n, 1);
   dropIdleFlags();
+}
+
+// Counts keys of a leaf here: once more (by 1) or less (by -1).
+void KeyLeaf::countRange(KeyLeaf const& of, int first, int last, int by) {
+  if (of.plain() && of.m_selection.empty()) return counts.count({}, by * (last - first));
+  for (int slot = first; slot < last; ++slot) counts.count(of.flags(slot), by);
+}
+
+int KeyLeaf::mark(Mark what, bool on, unsigned mask, int first, int last) {
+  bool const bridges = what == Mark::Bridged;
+  int const shift = bridges ? kBridgeShift : 0;
+  if (on) spellOutFlags({kWhole, bridges ? mask : 0, bridges ? 0 : mask});
+  Column& column = bridges ? m_flags : m_selection;
+  if (column.empty()) return 0;
+  int touchedKeys = 0, keys = 0, byComponent[3] = {};  // keys that are marked, or no longer are
+  unsigned char* bits = column.data();
+  for (int slot = first; slot < last; ++slot) {
+    unsigned const now = bits[slot] >> shift & kWhole, touched = mask & (on ? components(slot) : now);
+    unsigned const then = on ? now | touched : now & ~touched, turned = now ^ then;
+    bits[slot] = static_cast<unsigned char>(bits[slot] ^ turned << shift);
+    touchedKeys += touched != 0;
+    keys += (now == 0) != (then == 0);
+    for (int c = 0; c < 3; ++c) byComponent[c] += static_cast<int>(turned >> c & 1);
+  }
+  int const by = on ? 1 : -1;
+  if (!bridges) counts.selected += by * keys;
+  for (int c = 0; c < 3; ++c) (bridges ? counts.bridging : counts.selectedOn)[c] += by * byComponent[c];
+  dropIdleFlags();
+  return touchedKeys;
 }
 
 void KeyLeaf::pack() noexcept {

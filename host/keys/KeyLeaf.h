@@ -103,6 +103,10 @@ class KeyLeaf final : public KeyNode {
   void setFlags(int slot, KeyFlags const& flags);
   // To be called when a series of setFlags is done.
   void dropIdleFlags();
+  // Marks the components of the mask that keys hold in [first, last), or takes the mark away. Returns how
+  // many keys hold (had marked) any of them.
+  enum class Mark { Selected, Bridged };
+  int mark(Mark what, bool on, unsigned mask, int first, int last);
   // Replaces the values of the whole keys in [first, last) by change(values). One call may serve for all keys
   // that have equal values.
   void transform(int first, int last, void (*change)(void*, double*), void* context);
@@ -131,6 +135,7 @@ class KeyLeaf final : public KeyNode {
   void insertValues(int slot, double const* values, int n);
   void insertFlags(int slot, KeyFlags const& flags, int n);
   void spellOutFlags(KeyFlags const& toBe);
+  void countRange(KeyLeaf const& of, int first, int last, int by);
   void appendBits(Column& column, Column const& from, unsigned absent, int first, int n);
   void insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n);
   template <class T, class ValueAt>

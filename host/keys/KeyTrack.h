@@ -217,7 +217,8 @@ class KeyTrack {
   struct Place;     // a key: its leaf, slot and index
   struct LeafEdit;  // what a range edit does to the leaves that it touches
   class Sampler;    // sample() on one curve: all components, or one that is keyed alone
-  class Spares;     // nodes for splits
+  class Path;       // from the root to a leaf
+  struct Added;     // what came into a leaf
 
   unsigned normal(unsigned mask) const { return m_shape == Shape::Vector ? mask & kAll : mask ? kAll : 0; }
   void changed();
@@ -233,11 +234,10 @@ class KeyTrack {
   void put(Key const& key);
   template <class AddTo>
   void addKeys(int64 time, AddTo addTo);
-  template <class AddTo>
-  static KeyNodeRef addBelow(KeyNodeRef& node, int64 time, Spares& spares, AddTo& addTo);
-  KeyNodeRef setInLeaf(KeyNodeRef& node, Key const& key, Spares& spares);
+  Added setInLeaf(Path& path, Key const& key);
   int64 edit(int64 firstIndex, int64 lastIndex, LeafEdit&);
   int64 editTimes(int64 first, int64 last, LeafEdit&);
+  void editOne(int64 index, LeafEdit&);
   void editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit&);
   void endBridge(int64 index, unsigned part);  // -1: no key
   // What deleteRange does with the keys that are put at the ends of bridges, with values of `curve`.
