@@ -231,10 +231,10 @@ class KeyTrack {
   void evaluateAt(int64 time, Interpolation, unsigned mask, Place const& base, Values const& defaults,
                   Values& values, Cursor const*) const;
 
-  void put(Key const& key);
+  void put(int64 time, Values const& values, KeyFlags const& flags);
   template <class AddTo>
-  void addKeys(int64 time, AddTo addTo);
-  Added setInLeaf(Path& path, Key const& key);
+  void addKeys(int64 time, AddTo const& addTo);
+  void setInLeaf(Path& path, int64 time, Values const& values, KeyFlags const& flags, Added& added);
   int64 edit(int64 firstIndex, int64 lastIndex, LeafEdit&);
   int64 editTimes(int64 first, int64 last, LeafEdit&);
   void editOne(int64 index, LeafEdit&);

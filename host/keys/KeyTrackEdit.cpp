@@ -157,7 +157,7 @@ class KeyTrack::Path {
     for (int level = needed; level > 0; --level) m_spares.emplace_back(new KeyInner(level, fanout));
   }
   // Brings the nodes above up to date after keys were added from a time on.
-  void finishAdding(KeyNodeRef& root, int64 time, Added added) noexcept {
+  void finishAdding(KeyNodeRef& root, int64 time, Added& added) noexcept {
     if (added.replaces && added.flags == added.flagsBefore) return;
     KeyNodeRef& sibling = added.sibling;
     for (int k = m_size - 1; k >= 0; --k) {
@@ -215,57 +215,53 @@ class KeyTrack::Path {
 void KeyTrack::set(int64 time, Values const& values, unsigned mask) {
   mask = normal(mask);
   if (mask == 0) return;
-  Key key{.time = time, .values = values};
-  key.components = static_cast<unsigned char>(mask);
-  key.bridges = static_cast<unsigned char>(bridgedAt(time, mask));
-  put(key);
+  put(time, values, {.components = mask, .bridges = bridgedAt(time, mask)});
 }
 
-// Adds the key's components to what the track holds at its time; components that it holds already keep their
+// Adds the components to what the track holds at the time; components that it holds already keep their
 // bridges.
-void KeyTrack::put(Key const& key) {
-  addKeys(key.time, [&](Path& path) { return setInLeaf(path, key); });
+void KeyTrack::put(int64 time, Values const& values, KeyFlags const& flags) {
+  addKeys(time, [&](Path& path, Added& added) { setInLeaf(path, time, values, flags, added); });
 }
 
-// Lets addTo(path) add keys to the leaf that a time falls into, all or, when it throws, none. Before it
-// splits the leaf it makes the spares for that.
+// Lets addTo(path, added) add keys to the leaf that a time falls into, all or, when it throws, none. Before
+// it splits the leaf it makes the spares for that.
 template <class AddTo>
-void KeyTrack::addKeys(int64 time, AddTo addTo) {
+void KeyTrack::addKeys(int64 time, AddTo const& addTo) {
   changed();
   KeyNodeRef fresh = m_root ? KeyNodeRef() : KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
   KeyNodeRef& root = m_root ? m_root : fresh;
   Path path(root, [time](KeyInner const& inner) { return inner.childAtTime(time); });
-  path.finishAdding(root, time, addTo(path));
+  Added added;
+  addTo(path, added);
+  path.finishAdding(root, time, added);
   if (fresh) m_root = std::move(fresh);
 }
 
-KeyTrack::Added KeyTrack::setInLeaf(Path& path, Key const& key) {
+void KeyTrack::setInLeaf(Path& path, int64 time, Values const& values, KeyFlags const& flags, Added& added) {
   KeyNodeRef& node = path.leaf();
-  KeyFlags const flags{key.components, key.bridges, key.selected};
   auto const insertInto = [&](KeyLeaf& leaf, int slot) {
     Values held{};
     for (size_t c = 0; c < held.size(); ++c)
-      if (m_shape != Shape::Vector || key.components >> c & 1) held[c] = key.values[c];
-    leaf.insert(slot, key.time, held.data(), flags);
+      if (m_shape != Shape::Vector || flags.components >> c & 1) held[c] = values[c];
+    leaf.insert(slot, time, held.data(), flags);
   };
 
   auto const& old = asLeaf(*node.get());
   int const size = old.size();
-  int const slot = size == 0 ? 0 : old.lowerBound(key.time);
-  bool const present = slot < size && old.time(slot) == key.time;
+  int const slot = size == 0 ? 0 : old.lowerBound(time);
+  bool const present = slot < size && old.time(slot) == time;
   if (present || !old.full()) {
     node.own();
     auto& leaf = asLeaf(*node.get());
-    if (!present) {
-      insertInto(leaf, slot);
-      return {.flags = flags};
-    }
-    KeyFlags const held = leaf.flags(slot);
-    KeyFlags const all{held.components | flags.components, held.bridges | (flags.bridges & ~held.components),
-                       held.selected | flags.selected};
-    leaf.write(slot, key.values.data(), flags.components, all);
-    leaf.dropIdleFlags();
-    return {.flags = all, .replaces = true, .flagsBefore = held};
+    added.flags = flags;
+    if (!present) return insertInto(leaf, slot);
+    KeyFlags const held = added.flagsBefore = leaf.flags(slot);
+    added.replaces = true;
+    added.flags = {held.components | flags.components, held.bridges | (flags.bridges & ~held.components),
+                   held.selected | flags.selected};
+    leaf.write(slot, values.data(), flags.components, added.flags);
+    return leaf.dropIdleFlags();
   }
 
   // Keys that arrive in order, from either end, leave full leaves behind; others halve them. The half that
@@ -284,7 +280,8 @@ KeyTrack::Added KeyTrack::setInLeaf(Path& path, Key const& key) {
   insertInto(*leaf, slot - first);
   if (first < last) asLeaf(*node.get()).erase(first, last);
   if (toLeft) std::swap(node, fresh);
-  return {.sibling = std::move(fresh), .flags = flags};
+  added.flags = flags;
+  added.sibling = std::move(fresh);
 }
 
 void KeyTrack::append(int64 start, int64 period, double const* values, int64 n) {
@@ -292,12 +289,12 @@ void KeyTrack::append(int64 start, int64 period, double const* values, int64 n) 
   assert((n == 1 || period > 0) && (empty() || start > timeAt(count() - 1)));
   while (n > 0) {
     int some = 0;
-    addKeys(start, [&](Path& path) {
+    addKeys(start, [&](Path& path, Added& added) {
       KeyNodeRef& node = path.leaf();
       bool const splits = asLeaf(*node.get()).full();
       some =
           static_cast<int>(std::min<int64>(n, m_limits.leafKeys - (splits ? 0 : asLeaf(*node.get()).size())));
-      Added added{.keys = some};
+      added.keys = some;
       if (splits) {
         path.makeSpares(m_limits.fanout);
         added.sibling = KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
@@ -305,7 +302,6 @@ void KeyTrack::append(int64 start, int64 period, double const* values, int64 n) 
         node.own();
       }
       asLeaf(*(splits ? added.sibling : node).get()).append(start, period, values, some);
-      return added;
     });
     start += period * some;
     values += static_cast<int64>(some) * width();
@@ -512,7 +508,7 @@ void KeyTrack::unbridge(int64 first, int64 last, unsigned mask) {
 
 void KeyTrack::restore(Key const& key) {
   restoreNone(key.time);
-  put(key);
+  put(key.time, key.values, {key.components, key.bridges, key.selected});
 }
 
 void KeyTrack::restoreNone(int64 time) {
