@@ -1,4 +1,5 @@
 // Several scenes in one process: each does what it would do alone, and belongs to one thread at a time.
+#include <boost/json/object.hpp>
 #include <functional>
 #include <future>
 #include <gtest/gtest.h>
