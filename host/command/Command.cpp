@@ -2,7 +2,6 @@
 
 #include <cstdarg>
 
-#include "host/base/ItemAt.h"
 #include "host/base/Log.h"
 #include "host/base/Text.h"
 
@@ -41,10 +40,9 @@ int Command::getOptionSyntax(char const* name, int& argCount, Variable::VarType&
 
 bool Command::isUndoable() const { return true; }
 
-CommandOption const& Command::getOption(int i) const {
+CommandOption const& Command::noOption() {
   static CommandOption const& nothing = *CommandOption::createInstance("", 0, Variable::None, false);
-  CommandOption const* option = itemAt(m_options, i);
-  return option ? *option : nothing;
+  return nothing;
 }
 
 bool Command::unref() {

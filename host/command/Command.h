@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "host/base/HObject.h"
+#include "host/base/ItemAt.h"
 #include "host/base/TArray.h"
 #include "host/command/CommandOption.h"
 
@@ -47,7 +48,11 @@ class Command : public HObject {
   HString const& getPurpose() const { return m_purpose; }
 
   int getNumOptions() const { return static_cast<int>(m_options.size()); }
-  CommandOption const& getOption(int i) const;  // one without a name beyond them
+  // One without a name beyond them.
+  CommandOption const& getOption(int i) const {
+    CommandOption const* option = itemAt(m_options, i);
+    return option ? *option : noOption();
+  }
 
   void ref() { ++m_references; }
   // Lets go of one reference; with the last the command is destroyed, and the result is true.
@@ -67,6 +72,8 @@ class Command : public HObject {
 
  private:
   HString m_name, m_displayName, m_category, m_subCategory, m_purpose;
+  static CommandOption const& noOption();
+
   std::vector<std::unique_ptr<CommandOption>> m_options;
   int m_references = 1;
 };

@@ -1,5 +1,6 @@
 #include "host/services/HEvent.h"
 
+#include <algorithm>
 #include <typeinfo>
 
 HSmartEventStaticDataStore HSmartEvent::s_staticData;
@@ -14,7 +15,10 @@ void HEventManager::safeSubmit(HEvent const& event) { g_eventManager->submit(eve
 void HEventManager::submit(HEvent const& event) {
   if (!event.mayJoinAnother()) {
     HLock lock(HSmartEvent::s_staticData.section);
-    if (!HSmartEvent::s_staticData.pending.emplace(this, typeid(event)).second) return;
+    auto& pending = HSmartEvent::s_staticData.pending;
+    std::pair<HEventManager const*, std::type_index> const entry(this, typeid(event));
+    if (std::find(pending.begin(), pending.end(), entry) != pending.end()) return;
+    pending.push_back(entry);
   }
   HLock lock(m_section);
   m_queue.push_back(event.clone());
@@ -39,7 +43,8 @@ void HEventManager::deliverQueued() {
     if (!event->mayJoinAnother()) {
       HLock lock(HSmartEvent::s_staticData.section);
       HEvent const& known = *event;
-      HSmartEvent::s_staticData.pending.erase({this, typeid(known)});
+      std::erase(HSmartEvent::s_staticData.pending,
+                 std::pair<HEventManager const*, std::type_index>(this, typeid(known)));
     }
     submitImmediate(*event);
   }

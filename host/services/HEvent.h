@@ -5,7 +5,6 @@
 #include <deque>
 #include <functional>
 #include <memory>
-#include <set>
 #include <typeindex>
 #include <utility>
 #include <vector>
@@ -23,10 +22,10 @@ class HEvent {
 
 class HEventManager;
 
-// The classes of which an event waits in a manager's queue.
+// The classes of which an event waits in a manager's queue: few, so that they are looked through.
 struct HSmartEventStaticDataStore {
   HCriticalSection section;
-  std::set<std::pair<HEventManager const*, std::type_index>> pending;
+  std::vector<std::pair<HEventManager const*, std::type_index>> pending;
 };
 
 class HSmartEvent : public HEvent {
