@@ -124,7 +124,7 @@ class SceneText {
     m_out << "\n";
     for (NLEClip* clip = m_scene.getHeadClip(); clip; clip = clip->getNext())
       for (int layer = 0; layer < clip->getNumLayers(); ++layer)
-        if (KeyTrack const* track = channel.findTrack(clip, layer); track && !track->empty())
+        if (KeyTrack const* track = channel.findTrack(clip, layer))
           writeKeys(*track, name(clip) + " " + std::to_string(layer));
   }
   void writeKeys(KeyTrack const& track, std::string const& where) {

@@ -191,6 +191,7 @@ class Controller : public DataSource {
     KeyTrack track;
     mutable KeyTrack::Cursor cursor{};
     uint64 undoMark = 0;
+    uint64 madeInStep = 0;        // the undo step, 0: none was open
     KeyChange* change = nullptr;  // that of the undo step in undoMark
   };
   ClipTrack const* find(NLEClip const* clip, int layer) const;
@@ -203,6 +204,8 @@ class Controller : public DataSource {
   KeyTrack* trackToDelete(NLEClip* clip, int layer, int64 first, int64 last);
   KeyTrack::BridgeEnds bridgeEnds() const;
   // The same for all keys, with keys at other times.
+  template <class Record>
+  KeyTrack& recordedTrack(NLEClip* clip, int layer, Record record);
   KeyTrack& replaceTrack(NLEClip* clip, int layer);
   ClipTrack& clipTrack(NLEClip* clip, int layer);
   void dropTrack(NLEClip const* clip, int layer);

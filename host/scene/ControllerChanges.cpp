@@ -70,8 +70,10 @@ struct Controller::KeyChange : UndoChange {
     return found ? found->memoryAlone() : 0;
   }
 
-  // A track that has lost its keys goes, so that none stays behind for a clip that leaves the scene next.
+  // A track that the other state does not have goes, so that none stays behind for a clip that leaves the
+  // scene next. One without keys may be there: that of a marker that was never seen in a take.
   void swap() override {
+    bool const exists = channel.findTrack(clip, layer) != nullptr;
     KeyTrack& present = track();
     if (snapshot) std::swap(*snapshot, present);
     for (Slot& slot : keys) {
@@ -79,7 +81,8 @@ struct Controller::KeyChange : UndoChange {
       slot.putInto(present);
       slot = now;
     }
-    if (present.empty()) channel.dropTrack(clip, layer);
+    if (!existed && present.empty()) channel.dropTrack(clip, layer);
+    existed = exists;
   }
   bool isVoid() const override {
     KeyTrack const none(shapeOf(channel.getPropertyType()));
@@ -98,7 +101,7 @@ struct Controller::KeyChange : UndoChange {
   bool isSmall() const override { return !snapshot; }
   void pack(PackedStep& step) const override {
     step.putTrack({&channel, clip, layer});
-    step.put(static_cast<unsigned char>(keys.size()));
+    step.put(static_cast<unsigned char>(keys.size() | (existed ? kExisted : 0)));
     for (Slot const& slot : keys) {
       step.put(slot.key.time);
       step.put(static_cast<unsigned short>(slot.key.components | slot.key.selected << 3 |
@@ -107,7 +110,9 @@ struct Controller::KeyChange : UndoChange {
     }
   }
   void unpack(PackedStep& step) {
-    size_t left = step.take<unsigned char>();
+    auto const head = step.take<unsigned char>();
+    existed = head & kExisted;
+    size_t left = head & ~kExisted;
     keys.reserve(left);
     for (; left > 0; --left) {
       Slot slot;
@@ -130,9 +135,13 @@ struct Controller::KeyChange : UndoChange {
     for (auto slot = keys.rbegin(); slot != keys.rend(); ++slot) slot->putInto(before);
   }
 
+  static constexpr unsigned kExisted = 0x80;  // beside the number of keys
+  static_assert(kKeysBeforeSnapshot < kExisted);
+
   Controller& channel;
   NLEClip* clip;
   int layer;
+  bool existed = true;  // whether the other state has the track at all
   std::vector<Slot> keys;
   std::unique_ptr<KeyTrack> snapshot;  // in place of keys
 };
@@ -146,7 +155,9 @@ std::unique_ptr<UndoChange> Controller::unpackKeys(TrackName const& track, Packe
 Controller::ClipTrack& Controller::clipTrack(NLEClip* clip, int layer) {
   for (ClipTrack& track : m_tracks)
     if (track.clip == clip && track.layer == layer) return track;
-  return m_tracks.emplace_back(ClipTrack{clip, layer, KeyTrack(shapeOf(getPropertyType()))});
+  ClipTrack& made = m_tracks.emplace_back(ClipTrack{clip, layer, KeyTrack(shapeOf(getPropertyType()))});
+  if (m_module) made.madeInStep = m_module->journal().getStep();
+  return made;
 }
 
 void Controller::dropTrack(NLEClip const* clip, int layer) {
@@ -155,16 +166,32 @@ void Controller::dropTrack(NLEClip const* clip, int layer) {
 
 Controller::KeyChange* Controller::changeOf(ClipTrack& track) {
   if (!m_module || !m_module->isRecorded()) return nullptr;
-  if (auto* change = m_module->journal().addOnce<KeyChange>(track.undoMark, *this, track.clip, track.layer))
+  UndoJournal& journal = m_module->journal();
+  if (auto* change = journal.addOnce<KeyChange>(track.undoMark, *this, track.clip, track.layer)) {
+    change->existed = track.madeInStep != journal.getStep();
     track.change = change;
+  }
   return track.change;
 }
 
-KeyTrack* Controller::editTrack(NLEClip* clip, int layer, int64 first, int64 last) {
+// A track that is made for an edit which then cannot be recorded does not stay.
+template <class Record>
+KeyTrack& Controller::recordedTrack(NLEClip* clip, int layer, Record record) {
   checkEdit();
+  bool const isNew = !findTrack(clip, layer);
   ClipTrack& track = clipTrack(clip, layer);
-  if (KeyChange* change = changeOf(track)) change->note(track.track, first, last);
-  return &track.track;
+  try {
+    if (KeyChange* change = changeOf(track)) record(*change, track.track);
+  } catch (...) {
+    if (isNew) dropTrack(clip, layer);
+    throw;
+  }
+  return track.track;
+}
+
+KeyTrack* Controller::editTrack(NLEClip* clip, int layer, int64 first, int64 last) {
+  return &recordedTrack(clip, layer,
+                        [=](KeyChange& change, KeyTrack const& track) { change.note(track, first, last); });
 }
 
 KeyTrack* Controller::trackToDelete(NLEClip* clip, int layer, int64 first, int64 last) {
@@ -182,11 +209,9 @@ KeyTrack* Controller::trackToDelete(NLEClip* clip, int layer, int64 first, int64
 }
 
 KeyTrack& Controller::replaceTrack(NLEClip* clip, int layer) {
-  checkEdit();
-  ClipTrack& track = clipTrack(clip, layer);
-  KeyChange* change = changeOf(track);
-  if (change && !change->snapshot) change->takeSnapshot(track.track);
-  return track.track;
+  return recordedTrack(clip, layer, [](KeyChange& change, KeyTrack const& track) {
+    if (!change.snapshot) change.takeSnapshot(track);
+  });
 }
 
 KeyTrack* Controller::editTrack(int64 first, int64 last) {
