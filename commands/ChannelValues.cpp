@@ -4,6 +4,8 @@
 #include <climits>
 #include <cmath>
 
+#include "host/command/Angles.h"
+
 bool readVector(Args const& args, int component, Vec3& value) {
   int const count = args.getCount();
   if (component >= 0) {

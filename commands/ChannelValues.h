@@ -1,11 +1,9 @@
 // Values that scripts give after a property's name: their shapes, and how they meet the value that is there.
 #pragma once
 
-#include "host/command/ScriptCommand.h"
+#include "host/command/Arguments.h"
 #include "host/math/TalixRotation.h"
 #include "host/scene/ControllerKinds.h"
-
-inline constexpr double kRadiansPerDegree = 0.017453292519943295;
 
 // How a given value meets the present one.
 struct Change {
@@ -32,9 +30,6 @@ int64 integerFrom(Variable const& number);
 // False for another shape than a channel of that kind takes.
 [[nodiscard]] bool readValue(Args const& args, DataSource::PropertyType kind, int component,
                              ChannelValue& value);
-inline bool hasComponents(DataSource::PropertyType kind) {
-  return kind == DataSource::Vec3Property || kind == DataSource::RotProperty;
-}
 
 // Calls work(channel) with the channel as its own kind.
 template <class Work>
@@ -72,9 +67,6 @@ Vec3 changed(Vec3 const& current, Vec3 const& given, Change const& change);
 // Angles by axis in radians, counted in an order.
 TalixRotation changed(TalixRotation const& current, Vec3 const& angles, Change const& change,
                       TalixRotation::RotOrder order);
-inline bool changed(bool current, Variable::BoolType given) {
-  return given == Variable::Toggle ? !current : given == Variable::True;
-}
 
 // Whether a channel or an attribute can hold a result: numbers are finite, integers have 32 bits.
 bool canBeHeld(double value);

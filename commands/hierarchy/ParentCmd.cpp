@@ -1,8 +1,8 @@
 #include "commands/hierarchy/Adjusting.h"
+#include "host/command/Targets.h"
 #include "host/scene/Bones.h"
 #include "host/scene/Character.h"
 #include "host/scene/Constraints.h"
-#include "host/scene/Database.h"
 #include "host/scene/Setups.h"
 #include "host/scene/motion/MotionScope.h"
 #include "host/services/OperationStack.h"
@@ -74,11 +74,8 @@ bool ParentCmd::execute(Given const& given, Args const&, Variable&) {
     logError("Must have at least 2 Modules selected");
     return false;
   }
-  Module* parent = g_db->getPrimarySelectedModule();
-  if (!parent) {
-    logError("No primary selected Module.");
-    return false;
-  }
+  Module* parent = primaryModule("No primary selected Module.");
+  if (!parent) return false;
   Adjusting const adjusting = Adjusting::from<ParentCmd>(given);
   Node* target = objectAs<Node>(parent) ? static_cast<Node*>(parent) : parent->getNodeParent();
 

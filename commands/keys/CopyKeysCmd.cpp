@@ -1,6 +1,6 @@
-#include "commands/Angles.h"
 #include "commands/keys/KeyClipboard.h"
 #include "commands/keys/KeyTargets.h"
+#include "host/command/Angles.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/Node.h"

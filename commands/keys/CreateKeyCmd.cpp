@@ -1,8 +1,8 @@
+#include "host/command/ChannelName.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
-#include "host/scene/PropertyTable.h"
 
 namespace {
 
@@ -20,7 +20,7 @@ class CreateKeyCmd final : public ScriptCommand<CreateKeyCmd> {
 
 // The components that an active property selects: all when it names all, else the first that it names.
 unsigned selectedMask(unsigned id) {
-  unsigned const bits = id >> 28 & 7;
+  unsigned const bits = markedComponents(id);
   return bits == 7 ? bits : bits & ~(bits - 1);
 }
 

@@ -1,7 +1,5 @@
-#include "commands/Targets.h"
 #include "commands/keys/KeyTargets.h"
 #include "host/scene/DataEdit.h"
-#include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 
 namespace {
@@ -93,12 +91,9 @@ bool CutKeysCmd::execute(Given const& given, Args const&, Variable&) {
     logWarning("No items selected for key cutting");
     return true;
   }
-  Module const* onMod = nullptr;
-  for (CommandOption const& option : given)
-    if (option.getIndex() == info.option("onMod") &&
-        !(onMod = moduleAt(option.getArg(0).getStringValue(-1),
-                           "%s is not a valid path to a module in the scene")))
-      return false;
+  Module* onMod = nullptr;
+  if (!readOnMod(given, info.option("onMod"), "%s is not a valid path to a module in the scene", onMod))
+    return false;
   GivenOptions const options(given);
   bool const all = options.has(info.option("all")), ranges = options.has(info.option("ranges")),
              allLayers = options.has(info.option("allLayers"));
@@ -106,10 +101,7 @@ bool CutKeysCmd::execute(Given const& given, Args const&, Variable&) {
     logWarning("Option -allLayers must be specified with -all or -ranges options. Ignoring");
 
   KeyCut cut(all, ranges, allLayers);
-  if (onMod)
-    cut.cut(*onMod);
-  else
-    for (int i = 0; i < g_db->getNumSelectedModules(); ++i) cut.cut(*g_db->getSelectedModule(i));
+  eachTarget(onMod, [&](Module const& module) { cut.cut(module); });
   cut.report();
   return true;
 }

@@ -1,7 +1,7 @@
 #include <algorithm>
 #include <vector>
 
-#include "commands/Arguments.h"
+#include "host/command/Arguments.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"

@@ -20,8 +20,7 @@ class GetKeysCmd final : public ScriptCommand<GetKeysCmd> {
 bool holds(KeyTrack::Key const& key, unsigned mask) { return (key.components & mask) == mask; }
 
 bool GetKeysCmd::execute(Given const& given, Args const& args, Variable& result) {
-  constexpr KeyQueryTexts texts = {.noKeys = "No keys on Base Clip",
-                                   .badPath = "%s is not a valid unique path to a Module in the scene."};
+  constexpr KeyQueryTexts texts = {.noKeys = "No keys on Base Clip"};
   return queryKeys(args, given, info.option("onMod"), texts, [&](Controller const& channel, unsigned mask) {
     return answer(result, framesOf(channel, mask, holds));
   });

@@ -18,8 +18,7 @@ class GetNumKeysCmd final : public ScriptCommand<GetNumKeysCmd> {
 };
 
 bool GetNumKeysCmd::execute(Given const& given, Args const& args, Variable& result) {
-  constexpr KeyQueryTexts texts = {.noKeys = "No keys on Base Clip",
-                                   .badPath = "%s is not a valid unique path to a Module in the scene."};
+  constexpr KeyQueryTexts texts = {.noKeys = "No keys on Base Clip"};
   bool const selected = GivenOptions(given).has(info.option("s"));
   return queryKeys(args, given, info.option("onMod"), texts, [&](Controller const& channel, unsigned mask) {
     if (mask == KeyTrack::kAll || isOneValued(channel))

@@ -1,6 +1,5 @@
-#include "commands/ChannelName.h"
-#include "commands/Targets.h"
 #include "commands/keys/KeyTargets.h"
+#include "host/command/Frames.h"
 #include "host/scene/HTimeManager.h"
 
 namespace {
@@ -38,7 +37,9 @@ bool HasKeysCmd::timeAsked(Given const& given, int64& time) {
     if (!isFrame && option.getIndex() != info.option("seconds")) continue;
     int64 const start = manager->getAnimRange().getStart();
     int64 const origin = isFrame ? 0 : manager->frameTime(start, HTimeManager::RoundDown, 0);
-    if (!timeOfFrame(option.getArg(0).getIntValue(-1), origin, time)) return false;
+    auto const asked = timeOfWholeFrame(option.getArg(0).getIntValue(-1), origin);
+    if (!asked) return false;
+    time = *asked;
   }
   return true;
 }

@@ -1,26 +1,8 @@
 #include "commands/keys/KeyTargets.h"
 
 #include <climits>
-#include <cstdlib>
 
-#include "commands/ChannelName.h"
-#include "commands/Targets.h"
-#include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
-
-namespace {
-
-Module* onModOrPrimary(Given const& given, int onMod, char const* badPath) {
-  Module* module = nullptr;
-  for (CommandOption const& option : given)
-    if (option.getIndex() == onMod && !(module = moduleAt(option.getArg(0).getStringValue(-1), badPath)))
-      return nullptr;
-  if (!module) module = g_db->getPrimarySelectedModule();
-  if (!module) Command::logError("No primary selected Module.");
-  return module;
-}
-
-}  // namespace
 
 bool hasKeysToList(KeyQueryTexts const& texts) {
   if (g_db->getActiveClip()) return true;
@@ -30,7 +12,7 @@ bool hasKeysToList(KeyQueryTexts const& texts) {
 
 ChannelComponents channelNamed(HString const& name, Given const& given, int onMod,
                                KeyQueryTexts const& texts) {
-  Module const* module = onModOrPrimary(given, onMod, texts.badPath);
+  Module const* module = onModOrPrimary(given, onMod, texts.badPath, "No primary selected Module.");
   if (!module) return {};
   ChannelName const wanted = channelNameFrom(name, Suffix::componentCut);
   Controller const* channel = module->getProperty(wanted.name);
@@ -61,14 +43,4 @@ Variable framesOf(Controller const& channel, unsigned mask,
 unsigned componentMask(unsigned id) {
   unsigned const marked = markedComponents(id);
   return marked == 3 || marked == 5 || marked == 6 ? 0 : marked;
-}
-
-bool timeOfFrame(int frame, int64 origin, int64& time) {
-  int64 const ticks = HTimeManager::getInstance()->getTicksPerFrame();
-  if (std::abs(int64{frame}) <= kForever / ticks && std::abs(origin + frame * ticks) <= kForever) {
-    time = origin + frame * ticks;
-    return true;
-  }
-  Command::logError("Frame %d lies beyond the time line.", frame);
-  return false;
 }

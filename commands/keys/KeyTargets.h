@@ -1,10 +1,10 @@
 // What the key commands share: the channel and components that they work on.
 #pragma once
 
-#include "commands/Results.h"
-#include "host/command/ScriptCommand.h"
+#include "host/command/ChannelName.h"
+#include "host/command/Results.h"
+#include "host/command/Targets.h"
 #include "host/scene/Controller.h"
-#include "host/scene/PropertyTable.h"
 
 // --- one channel by name: "-onMod", else the primary selection, and a channel name ---
 
@@ -14,8 +14,8 @@ struct ChannelComponents {
 };
 
 struct KeyQueryTexts {
-  char const* noKeys;   // with no active clip
-  char const* badPath;  // its %s is the path
+  char const* noKeys;                 // with no active clip
+  char const* badPath = kNoModuleAt;  // its %s is the path
 };
 
 // Whether keys can be listed. With no active clip logs `texts.noKeys` as a warning.
@@ -45,14 +45,6 @@ inline bool isOneValued(Controller const& channel) {
 
 // --- active properties ---
 
-// The components that a property id marks: 1 x, 2 y, 4 z.
-inline unsigned markedComponents(unsigned id) { return (id & PropertyTable::kWhole) / PropertyTable::kX; }
-
 // The mask on which keys of an active property are worked on: one component or all. 0: none, since two
 // components are never worked on together.
 unsigned componentMask(unsigned id);
-
-// --- times ---
-
-// The time of a frame counted from a time. False, with a message, beyond the time line.
-bool timeOfFrame(int frame, int64 origin, int64& time);

@@ -1,5 +1,6 @@
 #include "commands/keys/KeyClipboard.h"
 #include "commands/keys/KeyTargets.h"
+#include "host/command/Frames.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
@@ -94,9 +95,10 @@ bool PasteKeysCmd::execute(Given const& given, Args const&, Variable&) {
   }
 
   // Step 2: where to.
-  int64 time = HTimeManager::getInstance()->getTime();
   CommandOption const* frame = GivenOptions(given).find(info.option("useFrame"));
-  if (frame && !timeOfFrame(frame->getArg(0).getIntValue(-1), 0, time)) return false;
+  auto const time = frame ? timeOfWholeFrame(frame->getArg(0).getIntValue(-1))
+                          : std::optional(HTimeManager::getInstance()->getTime());
+  if (!time) return false;
 
   // Step 3: one channel that takes these keys.
   if (!nameOneChannel()) {
@@ -120,7 +122,7 @@ bool PasteKeysCmd::execute(Given const& given, Args const&, Variable&) {
     logInfo("Pasted 0 keys");
     return true;
   }
-  if (!pasteAll(clipboard, *channel, time)) return false;
+  if (!pasteAll(clipboard, *channel, *time)) return false;
   logInfo("Pasted %d keys from the clipboard", count - 1);  // kept: one less than were pasted
   return true;
 }

@@ -4,7 +4,6 @@
 #include "commands/keys/KeyTargets.h"
 #include "host/keys/KeyReduction.h"
 #include "host/scene/DataEdit.h"
-#include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 
 namespace {
@@ -85,7 +84,7 @@ bool ReduceKeysCmd::execute(Given const& given, Args const&, Variable&) {
   }
   GivenOptions const options(given);
   KeyThinning thinning(options.has(info.option("all")), options.has(info.option("ranges")));
-  for (int i = 0; i < g_db->getNumSelectedModules(); ++i) thinning.thin(*g_db->getSelectedModule(i));
+  eachModule(Among::selected, [&](Module const& module) { thinning.thin(module); });
   thinning.report();
   return true;
 }

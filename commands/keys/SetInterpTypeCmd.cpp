@@ -1,6 +1,4 @@
-#include "commands/Targets.h"
-#include "host/command/ScriptCommand.h"
-#include "host/scene/Database.h"
+#include "host/command/Targets.h"
 
 namespace {
 
@@ -40,13 +38,8 @@ bool SetInterpTypeCmd::execute(Given const& given, Args const& args, Variable&) 
     logError("Can't set interp type on the base clip");
     return false;
   }
-  Module const* onMod = nullptr;
-  for (CommandOption const& option : given) {
-    if (option.getName() != "onMod") continue;
-    onMod = moduleAt(option.getArg(0).getStringValue(-1),
-                     "%s is not a valid unique path to a Module in the scene.");
-    if (!onMod) return false;
-  }
+  Module* onMod = nullptr;
+  if (!readOnMod(given, info.option("onMod"), kNoModuleAt, onMod)) return false;
   HString const name = args[0].getStringValue(-1), type = args[1].getStringValue(-1);
   if (name.IsEmpty()) {
     logError("Cannot pass empty string as property name");
@@ -56,10 +49,7 @@ bool SetInterpTypeCmd::execute(Given const& given, Args const& args, Variable&) 
     logError("Cannot pass empty string as interp type");
     return false;
   }
-  if (onMod) return choose(*onMod, name, type);
-  for (int i = 0; i < g_db->getNumSelectedModules(); ++i)
-    if (!choose(*g_db->getSelectedModule(i), name, type)) return false;
-  return true;
+  return eachTarget(onMod, [&](Module const& module) { return choose(module, name, type); });
 }
 
 }  // namespace

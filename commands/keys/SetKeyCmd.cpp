@@ -1,9 +1,9 @@
-#include "commands/Angles.h"
-#include "commands/Candidates.h"
-#include "commands/ChannelName.h"
 #include "commands/ChannelValues.h"
 #include "commands/Events.h"
 #include "commands/keys/KeyTargets.h"
+#include "host/command/Angles.h"
+#include "host/command/Candidates.h"
+#include "host/command/Frames.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/HTimeManager.h"
 
@@ -122,10 +122,10 @@ bool readKeyValue(Args const& args, DataSource::PropertyType kind, NewKey& key) 
 }
 
 // The time of the last "-t", else now.
-bool readTime(GivenOptions const& options, int64& time) {
-  time = HTimeManager::getInstance()->getTime();
+std::optional<int64> readTime(GivenOptions const& options) {
   CommandOption const* frame = options.find(SetKeyCmd::kFrame);
-  return !frame || timeOfFrame(frame->getArg(0).getIntValue(-1), 0, time);
+  return frame ? timeOfWholeFrame(frame->getArg(0).getIntValue(-1))
+               : std::optional(HTimeManager::getInstance()->getTime());
 }
 
 bool writeOnMod(NewKey const& key, Module const& module, unsigned id, char const* typed) {
@@ -155,7 +155,9 @@ bool SetKeyCmd::execute(Given const& given, Args const& args, Variable&) {
   GivenOptions const options(given);
   NewKey key;
   Candidates candidates;
-  if (!readTime(options, key.time) || !candidates.read(given, kCandidates)) return false;
+  auto const time = readTime(options);
+  if (!time || !candidates.read(given, kCandidates)) return false;
+  key.time = *time;
   key.change.relative = options.has(kRelative);
 
   char const* typed = args[0].getStringValue(-1);

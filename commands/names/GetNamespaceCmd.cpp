@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/names/Namespaces.h"
+#include "host/command/Results.h"
 
 namespace {
 

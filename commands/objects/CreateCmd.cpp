@@ -1,11 +1,10 @@
 #include <algorithm>
 #include <optional>
 
-#include "commands/ChannelValues.h"
-#include "host/command/ScriptCommand.h"
+#include "host/command/Angles.h"
+#include "host/command/Targets.h"
 #include "host/scene/CalibrationMgr.h"
 #include "host/scene/Clips.h"
-#include "host/scene/Database.h"
 #include "host/scene/Devices.h"
 
 namespace {
@@ -76,11 +75,8 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
             addSelect = true;
             break;
           case kParent:
-            parent = g_db->getModuleWithPath(arg->getStringValue(-1), nullptr, false);
-            if (!parent) {
-              logError("-parent path of %s is invalid", arg->getStringValue(-1));
-              return false;
-            }
+            parent = moduleAt(arg->getStringValue(-1), "-parent path of %s is invalid");
+            if (!parent) return false;
             break;
           case kPositionOffset:
             g_db->logInfo("-positionOffset is deprecated. It has been replaced with -preTranslation.");
@@ -114,9 +110,7 @@ class CreateCmd final : public ScriptCommand<CreateCmd> {
 
     // kept: only below a given parent, else the offsets are passed over.
     void place(Node& node) const {
-      TalixRotation rotation;
-      rotation.setAsEuler(TalixRotation::XYZ, preRotation * kRadiansPerDegree);
-      node.setPreRotation(rotation, false);
+      node.setPreRotation(rotationFromDegrees(preRotation, TalixRotation::XYZ), false);
       node.setPreTranslation(preTranslation);
     }
   };

@@ -1,7 +1,6 @@
 #include <algorithm>
 
-#include "host/command/ScriptCommand.h"
-#include "host/scene/Database.h"
+#include "host/command/Targets.h"
 
 namespace {
 
@@ -36,15 +35,12 @@ class DeleteCmd final : public ScriptCommand<DeleteCmd> {
 
  private:
   static TSimpleArray<Module*> modulesToDelete(bool all, bool primary) {
-    int const most = std::max(1, all ? g_db->getNumModules() : g_db->getNumSelectedModules());
+    int const most = std::max(1, countModules(all ? Among::all : Among::selected));
     TSimpleArray<Module*> modules(most, most);
-    if (all) {
-      for (int i = 0; i < g_db->getNumModules(); ++i) modules.add(g_db->getModule(i));
-    } else if (primary) {
-      if (Module* module = g_db->getPrimarySelectedModule()) modules.add(module);
-    } else {
-      for (int i = 0; i < g_db->getNumSelectedModules(); ++i) modules.add(g_db->getSelectedModule(i));
-    }
+    if (all || !primary)
+      eachModule(all ? Among::all : Among::selected, [&](Module& module) { modules.add(&module); });
+    else if (Module* module = g_db->getPrimarySelectedModule())
+      modules.add(module);
     return modules;
   }
 };

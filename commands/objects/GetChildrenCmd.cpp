@@ -1,6 +1,5 @@
-#include "commands/Results.h"
-#include "commands/Targets.h"
 #include "commands/objects/SceneQueries.h"
+#include "host/command/Results.h"
 
 namespace {
 

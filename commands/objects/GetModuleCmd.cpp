@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/objects/SceneQueries.h"
+#include "host/command/Results.h"
 
 namespace {
 
@@ -18,12 +18,8 @@ class GetModuleCmd final : public ScriptCommand<GetModuleCmd> {
 };
 
 bool GetModuleCmd::execute(Given const& given, Args const&, Variable& result) {
-  Module const* module = g_db->getPrimarySelectedModule();
-  if (!module) {
-    logError("No module is selected.");
-    return false;
-  }
-  return answer(result, module->getPath(pathType<GetModuleCmd>(given)));
+  Module const* module = primaryModule("No module is selected.");
+  return module && answer(result, module->getPath(pathType<GetModuleCmd>(given)));
 }
 
 }  // namespace

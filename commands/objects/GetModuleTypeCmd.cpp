@@ -1,6 +1,6 @@
-#include "commands/Results.h"
-#include "commands/Targets.h"
+#include "host/command/Results.h"
 #include "host/command/ScriptCommand.h"
+#include "host/command/Targets.h"
 
 namespace {
 

@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/objects/SceneQueries.h"
+#include "host/command/Results.h"
 
 namespace {
 
@@ -32,13 +32,13 @@ bool GetModulesCmd::execute(Given const& given, Args const&, Variable& result) {
   }
   // Kept: only modules of exactly this class, whereas getNumModules counts those of its subclasses too.
   std::vector<Module*> found;
-  auto const collect = [&](Module* module) {
-    if (!type || module->getRuntimeClass() == type) found.push_back(module);
+  auto const collect = [&](Module& module) {
+    if (!type || module.getRuntimeClass() == type) found.push_back(&module);
   };
   if (options.has(kPrimary)) {
-    if (Module* primary = g_db->getPrimarySelectedModule()) collect(primary);
+    if (Module* primary = g_db->getPrimarySelectedModule()) collect(*primary);
   } else {
-    eachModule(options.has(kSelected), collect);
+    eachModule(options.has(kSelected) ? Among::selected : Among::all, collect);
   }
   return answer(result, pathsOf(found, pathType<GetModulesCmd>(given)));
 }

@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/objects/SceneQueries.h"
+#include "host/command/Results.h"
 
 namespace {
 
@@ -27,7 +27,8 @@ bool GetNumModulesCmd::execute(Given const& given, Args const&, Variable& result
     if (!type) return false;
   }
   int count = 0;
-  eachModule(options.has(kSelected), [&](Module const* module) { count += module->isKindOf(type); });
+  eachModule(options.has(kSelected) ? Among::selected : Among::all,
+             [&](Module const& module) { count += module.isKindOf(type); });
   return answer(result, count);
 }
 

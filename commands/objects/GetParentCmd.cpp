@@ -1,6 +1,5 @@
-#include "commands/Results.h"
-#include "commands/Targets.h"
 #include "commands/objects/SceneQueries.h"
+#include "host/command/Results.h"
 
 namespace {
 
@@ -21,8 +20,7 @@ class GetParentCmd final : public ScriptCommand<GetParentCmd> {
 };
 
 bool GetParentCmd::execute(Given const& given, Args const& args, Variable& result) {
-  Module const* module =
-      moduleAt(args[0].getStringValue(-1), "%s is not a valid unique path to a Module in the scene.");
+  Module const* module = moduleAt(args[0].getStringValue(-1));
   if (!module) return false;
   Module const* parent = module->getParent();
   return !parent || answer(result, parent->getPath(pathType<GetParentCmd>(given)));

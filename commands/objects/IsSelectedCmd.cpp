@@ -1,6 +1,6 @@
-#include "commands/Results.h"
-#include "commands/Targets.h"
+#include "host/command/Results.h"
 #include "host/command/ScriptCommand.h"
+#include "host/command/Targets.h"
 
 namespace {
 
@@ -19,8 +19,7 @@ class IsSelectedCmd final : public ScriptCommand<IsSelectedCmd> {
 };
 
 bool IsSelectedCmd::execute(Given const&, Args const& args, Variable& result) {
-  Module const* module =
-      moduleAt(args[0].getStringValue(-1), "%s is not a valid unique path to a Module in the scene.");
+  Module const* module = moduleAt(args[0].getStringValue(-1));
   return module && answer(result, module->isSelected());
 }
 

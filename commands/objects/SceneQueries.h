@@ -1,10 +1,9 @@
-// What the scene queries share: forms of path, types by name, walks over the modules.
+// What the scene queries share: forms of path, types by name.
 #pragma once
 
 #include <vector>
 
-#include "host/command/ScriptCommand.h"
-#include "host/scene/Database.h"
+#include "host/command/Targets.h"
 
 // The form of path that is asked for: the later of "-fullPath" and "-nameOnly" on the line, else the
 // shortest.
@@ -20,15 +19,6 @@ Module::EPathType pathType(Given const& given) {
 
 // The module class of that name. Without one logs so and returns null.
 HRuntimeClass const* moduleTypeNamed(HString const& name);
-
-// Calls visit(module) for the selected modules in their order, or for all in order of creation.
-template <class Visit>
-void eachModule(bool selected, Visit visit) {
-  if (selected)
-    for (int i = 0; i < g_db->getNumSelectedModules(); ++i) visit(g_db->getSelectedModule(i));
-  else
-    for (int i = 0; i < g_db->getNumModules(); ++i) visit(g_db->getModule(i));
-}
 
 // Their paths, as a string array.
 Variable pathsOf(std::vector<Module*> const& modules, Module::EPathType type);

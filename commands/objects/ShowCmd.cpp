@@ -1,4 +1,5 @@
 #include "commands/PendingCommand.h"
+#include "host/command/Arguments.h"
 
 namespace {
 
@@ -13,11 +14,7 @@ class ShowCmd final : public PendingCommand<ShowCmd> {
       .args = {"name1 name2 ..."},
       .options = {{"s"}}};
 
-  bool checkArgSyntax(Args const& args, Given const&) const override {
-    for (Variable const& arg : args)
-      if (arg.getType() != Variable::String && arg.getType() != Variable::StringArray) return false;
-    return true;
-  }
+  bool checkArgSyntax(Args const& args, Given const&) const override { return areTexts(args); }
 };
 
 }  // namespace

@@ -2,8 +2,8 @@
 
 #include <cmath>
 
-#include "commands/Angles.h"
-#include "commands/Targets.h"
+#include "host/command/Angles.h"
+#include "host/command/Targets.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 

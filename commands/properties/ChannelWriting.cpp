@@ -1,6 +1,6 @@
 #include "commands/properties/ChannelWriting.h"
 
-#include "commands/Angles.h"
+#include "host/command/Angles.h"
 #include "host/scene/DataEdit.h"
 
 namespace {

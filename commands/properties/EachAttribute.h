@@ -3,7 +3,7 @@
 
 #include <functional>
 
-#include "commands/Candidates.h"
+#include "host/command/Candidates.h"
 
 struct AttributeTexts {
   char const* noModules;    // "-all" in an empty scene

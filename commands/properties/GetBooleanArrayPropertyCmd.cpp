@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/properties/PropertyReading.h"
+#include "host/command/Results.h"
 
 namespace {
 
@@ -19,7 +19,7 @@ class GetBooleanArrayPropertyCmd final : public ScriptCommand<GetBooleanArrayPro
 };
 
 bool GetBooleanArrayPropertyCmd::execute(Given const&, Args const& args, Variable& result) {
-  Attribute const* attribute = attributeAt(args, "%s is not a valid unique path to a Module in the scene.");
+  Attribute const* attribute = attributeAt(args);
   if (!attribute) return false;
   BitFieldAttribute const* bits = objectAs<BitFieldAttribute>(attribute);
   if (!bits) return redirect(Getter::BooleanArray, *attribute);

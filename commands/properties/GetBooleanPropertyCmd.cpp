@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/properties/PropertyReading.h"
+#include "host/command/Results.h"
 
 namespace {
 
@@ -55,8 +55,7 @@ bool readField(BitFieldAttribute const& bits, Args const& args, Variable& result
 }
 
 bool GetBooleanPropertyCmd::execute(Given const& given, Args const& args, Variable& result) {
-  Module const* module =
-      moduleAt(args[0].getStringValue(-1), "%s is not a valid unique path to a Module in the scene.");
+  Module const* module = moduleAt(args[0].getStringValue(-1));
   if (!module) return false;
   HString const name = args[1].getStringValue(-1);
   DataSource::PropertyType const kind = Controller::mapToPropertyType(name);

@@ -19,8 +19,7 @@ class GetPropertyCmd final : public ScriptCommand<GetPropertyCmd> {
 };
 
 bool GetPropertyCmd::execute(Given const& given, Args const& args, Variable& result) {
-  return readNumber(args, "%s is not a valid unique path to a Module in the scene.",
-                    isByDefault<GetPropertyCmd>(given), result);
+  return readNumber(args, kNoModuleAt, isByDefault<GetPropertyCmd>(given), result);
 }
 
 }  // namespace

@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/properties/PropertyReading.h"
+#include "host/command/Results.h"
 
 namespace {
 
@@ -19,7 +19,7 @@ class GetStringArrayPropertyCmd final : public ScriptCommand<GetStringArrayPrope
 };
 
 bool GetStringArrayPropertyCmd::execute(Given const&, Args const& args, Variable& result) {
-  Attribute const* attribute = attributeAt(args, "%s is not a valid unique path to a Module in the scene.");
+  Attribute const* attribute = attributeAt(args);
   if (!attribute) return false;
   MultiModAttribute const* modules = objectAs<MultiModAttribute>(attribute);
   if (!modules) return redirect(Getter::StringArray, *attribute);

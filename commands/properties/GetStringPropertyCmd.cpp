@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/properties/PropertyReading.h"
+#include "host/command/Results.h"
 
 namespace {
 
@@ -26,7 +26,7 @@ HString pathOf(Module const* module, bool fullPath) {
 }
 
 bool GetStringPropertyCmd::execute(Given const& given, Args const& args, Variable& result) {
-  Attribute const* attribute = attributeAt(args, "%s is not a valid unique path to a Module in the scene.");
+  Attribute const* attribute = attributeAt(args);
   if (!attribute) return false;
   switch (attribute->getType()) {
     case Attribute::Enumeration:

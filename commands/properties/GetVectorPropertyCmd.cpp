@@ -1,6 +1,6 @@
-#include "commands/Angles.h"
-#include "commands/Results.h"
 #include "commands/properties/PropertyReading.h"
+#include "host/command/Angles.h"
+#include "host/command/Results.h"
 
 namespace {
 

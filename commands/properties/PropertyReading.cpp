@@ -1,6 +1,6 @@
 #include "commands/properties/PropertyReading.h"
 
-#include "commands/Results.h"
+#include "host/command/Results.h"
 
 namespace {
 

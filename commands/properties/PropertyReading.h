@@ -2,8 +2,8 @@
 // instead.
 #pragma once
 
-#include "commands/Targets.h"
 #include "host/command/ScriptCommand.h"
+#include "host/command/Targets.h"
 #include "host/scene/HTimeManager.h"
 
 // The getters that send the user elsewhere for kinds of attribute that they do not read.
@@ -16,7 +16,7 @@ bool redirect(Getter getter, Attribute const& attribute);
 Attribute const* attributeNamed(Module const& module, HString const& name);
 // The attribute that the first two arguments, a path and a name, stand for. Null, with a message, when there
 // is no such module or attribute.
-Attribute const* attributeAt(Args const& args, char const* badPath);
+Attribute const* attributeAt(Args const& args, char const* badPath = kNoModuleAt);
 
 // Whether "-c" or "-d" was given, which mean the same: the default value, not that at the current time.
 template <class Getter>

@@ -1,8 +1,8 @@
-#include "commands/ChannelName.h"
 #include "commands/Events.h"
 #include "commands/properties/AttributeWriting.h"
 #include "commands/properties/ChannelWriting.h"
 #include "commands/properties/EachAttribute.h"
+#include "host/command/ChannelName.h"
 
 namespace {
 

@@ -1,4 +1,4 @@
-#include "commands/Results.h"
+#include "host/command/Results.h"
 #include "host/command/ScriptCommand.h"
 #include "host/services/HInterface.h"
 

@@ -1,4 +1,5 @@
 #include "commands/PendingCommand.h"
+#include "host/command/Arguments.h"
 
 namespace {
 
@@ -16,8 +17,7 @@ class GetModuleRangeCmd final : public PendingCommand<GetModuleRangeCmd> {
       .solo = Solo::no};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
-    return args.getCount() == 1 &&
-           (args[0].getType() == Variable::String || args[0].getType() == Variable::StringArray);
+    return args.getCount() == 1 && areTexts(args);
   }
 };
 

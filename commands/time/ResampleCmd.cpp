@@ -1,4 +1,5 @@
 #include "commands/PendingCommand.h"
+#include "host/command/Arguments.h"
 
 namespace {
 
@@ -14,8 +15,7 @@ class ResampleCmd final : public PendingCommand<ResampleCmd> {
       .solo = Solo::no};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
-    return args.getCount() == 2 && args[0].getType() == Variable::String &&
-           (args[1].getType() == Variable::Float || args[1].getType() == Variable::Int);
+    return args.getCount() == 2 && args[0].getType() == Variable::String && isIntOrFloat(args[1]);
   }
 };
 

@@ -1,4 +1,4 @@
-#include "commands/Results.h"
+#include "host/command/Results.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Constraints.h"
 #include "host/scene/Database.h"

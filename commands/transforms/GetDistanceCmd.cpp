@@ -1,6 +1,6 @@
-#include "commands/Results.h"
-#include "commands/Targets.h"
+#include "host/command/Results.h"
 #include "host/command/ScriptCommand.h"
+#include "host/command/Targets.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/motion/DistanceUtils.h"
@@ -57,8 +57,8 @@ bool readPair(Args const& args, Pair& pair) {
     return false;
   }
   constexpr char const* bad = "%s  is not a valid path to a node in the scene.";  // kept: two spaces
-  pair.first = nodeAt(args[0].getStringValue(-1), bad);
-  pair.second = pair.first ? nodeAt(args[1].getStringValue(-1), bad) : nullptr;
+  pair.first = moduleAt<Node>(args[0].getStringValue(-1), bad);
+  pair.second = pair.first ? moduleAt<Node>(args[1].getStringValue(-1), bad) : nullptr;
   return pair.second != nullptr;
 }
 

@@ -1,7 +1,6 @@
-#include "commands/Results.h"
-#include "host/command/ScriptCommand.h"
+#include "host/command/Results.h"
+#include "host/command/Targets.h"
 #include "host/scene/Constraints.h"
-#include "host/scene/Database.h"
 
 namespace {
 
@@ -21,15 +20,11 @@ class GetLabelingClusterOffsetCmd final : public ScriptCommand<GetLabelingCluste
 };
 
 bool GetLabelingClusterOffsetCmd::execute(Given const&, Args const& args, Variable& result) {
-  HString const path = args[0].getStringValue(-1);
-  auto const* cluster = objectAs<LabelingCluster>(
-      g_db->getModuleWithPath(path, &LabelingCluster::s_classLabelingCluster, false));
-  if (!cluster) {
-    // Kept: it speaks of constraints.
-    logError("%s is not a valid path to a LabelingConstraint or SolvingConstraint in the scene",
-             path.GetStr());
-    return false;
-  }
+  auto const* cluster = moduleAt<LabelingCluster>(
+      args[0].getStringValue(-1),
+      // Kept: it speaks of constraints.
+      "%s is not a valid path to a LabelingConstraint or SolvingConstraint in the scene");
+  if (!cluster) return false;
   TSimpleArray<Vec3> const offsets = cluster->getMarkerOffsets();
   Variable list(Variable::VectorArray, offsets.getCount());
   for (int i = 0; i < offsets.getCount(); ++i) list.setValue(offsets[i], i);

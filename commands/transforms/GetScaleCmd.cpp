@@ -1,5 +1,5 @@
-#include "commands/Results.h"
 #include "commands/transforms/TransformReading.h"
+#include "host/command/Results.h"
 
 namespace {
 

@@ -1,5 +1,5 @@
-#include "commands/Arguments.h"
 #include "commands/transforms/TransformWriting.h"
+#include "host/command/Arguments.h"
 #include "host/scene/Bones.h"
 #include "host/scene/Database.h"
 

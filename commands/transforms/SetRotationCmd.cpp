@@ -1,5 +1,5 @@
-#include "commands/ChannelValues.h"
 #include "commands/transforms/TransformWriting.h"
+#include "host/command/Angles.h"
 
 namespace {
 
@@ -22,10 +22,8 @@ class SetRotationCmd final : public ScriptCommand<SetRotationCmd> {
 bool SetRotationCmd::execute(Given const& given, Args const& args, Variable&) {
   TransformWrite write;
   if (!readWrite(given, args, kOptions, info.name, write)) return false;
-  TalixRotation rotation;
   // Kept: XYZ whatever the node's own order, which "getRotation" reads in.
-  rotation.setAsEuler(TalixRotation::XYZ, write.vector * kRadiansPerDegree);
-  return writeRotation(write, rotation);
+  return writeRotation(write, rotationFromDegrees(write.vector, TalixRotation::XYZ));
 }
 
 }  // namespace

@@ -1,6 +1,6 @@
 #include "commands/transforms/TransformReading.h"
 
-#include "commands/Targets.h"
+#include "host/command/Targets.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 
@@ -16,7 +16,7 @@ bool readQuery(Given const& given, Args const& args, QueryOptions const& which, 
       return false;
     }
   }
-  query.node = nodeAt(args[0].getStringValue(-1), texts.badNode);
+  query.node = moduleAt<Node>(args[0].getStringValue(-1), texts.badNode);
   if (!query.node) return false;
 
   GivenOptions const options(given);

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "commands/Targets.h"
+#include "host/command/Targets.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/HTimeManager.h"
 
@@ -13,7 +13,7 @@ bool readWrite(Given const& given, Args const& args, WriteOptions const& which, 
   write.world = options.has(which.world);
   write.byDefault = options.has(which.byDefault);
   write.preTransform = options.has(which.preTransform);
-  write.node = nodeAt(args[0].getStringValue(-1), "%s is not a valid path to a node in the scene.");
+  write.node = moduleAt<Node>(args[0].getStringValue(-1), "%s is not a valid path to a node in the scene.");
   write.vector = args[1].getVecValue(-1);
   return write.node && areFinite(write.vector, command);
 }

@@ -5,20 +5,8 @@
 #include <numeric>
 #include <vector>
 
+#include "host/math/Quaternion.h"
 #include "host/scene/Clips.h"
-
-namespace {
-
-// Hamilton's product of quaternions x y z w, into the first one.
-void multiply(double* a, double const* b) {
-  double const x = a[3] * b[0] + a[0] * b[3] + a[1] * b[2] - a[2] * b[1];
-  double const y = a[3] * b[1] - a[0] * b[2] + a[1] * b[3] + a[2] * b[0];
-  double const z = a[3] * b[2] + a[0] * b[1] - a[1] * b[0] + a[2] * b[3];
-  a[3] = a[3] * b[3] - a[0] * b[0] - a[1] * b[1] - a[2] * b[2];
-  a[0] = x, a[1] = y, a[2] = z;
-}
-
-}  // namespace
 
 int LayeredKeys::width() const { return static_cast<int>(Controller::shapeOf(type)); }
 
@@ -45,7 +33,7 @@ void LayeredKeys::sample(SampleTimes const& times, double* out) const {
     if (type == DataSource::BoolProperty) {
       std::copy(added.begin(), added.end(), out);
     } else if (type == DataSource::RotProperty) {
-      for (size_t i = 0; i < count; ++i) multiply(out + i * each, added.data() + i * each);
+      for (size_t i = 0; i < count * each; i += each) multiplyQuaternions(out + i, added.data() + i, out + i);
     } else {
       for (size_t i = 0; i < count * each; ++i) out[i] += added[i];
     }

@@ -1,13 +1,12 @@
 // Channels of a module by name, and numbers of channels and attributes by name.
 
+#include "host/math/Degrees.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
 #include "host/scene/Node.h"
 #include "host/scene/PropertyTable.h"
 
 namespace {
-
-constexpr double kDegrees = 57.29577951308232;
 
 // Splits "Translation.y" into the channel name and 1; -1 without a component.
 int splitComponent(HString& name) {
@@ -24,11 +23,10 @@ double componentValue(Controller const& channel, int component, bool byDefault, 
   if (auto const* vector = objectAs<Vec3Controller>(&channel))
     return (byDefault ? vector->getConstValue() : vector->getValue(now))[component];
   auto const& rotations = static_cast<RotController const&>(channel);
-  auto const* node = objectAs<Node>(channel.getModule());
   Vec3 angles;
   (byDefault ? rotations.getConstValue() : rotations.getValue(now))
-      .getAsEuler(node ? node->getRotationOrder() : TalixRotation::XYZ, angles);
-  return angles[component] * kDegrees;
+      .getAsEuler(rotationOrderOf(*channel.getModule()), angles);
+  return angles[component] * kDegreesPerRadian;
 }
 
 double scalarValue(Controller const& channel, bool byDefault, int64 now) {

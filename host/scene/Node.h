@@ -151,3 +151,9 @@ class Node : public Module {
   uint32 m_nodeSlot = kNoSlot;
   uint32 m_selectedNodeSlot = kNoSlot;
 };
+
+// The order in which a module's angles are counted; XYZ for one that is no node.
+inline TalixRotation::RotOrder rotationOrderOf(Module const& module) {
+  Node const* node = objectAs<Node>(&module);
+  return node ? node->getRotationOrder() : TalixRotation::XYZ;
+}

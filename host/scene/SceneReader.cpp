@@ -4,6 +4,7 @@
 #include <functional>
 #include <unordered_map>
 
+#include "host/math/Quaternion.h"
 #include "host/scene/Clips.h"
 #include "host/scene/RawValues.h"
 
@@ -45,26 +46,11 @@ namespace {
 constexpr size_t kBlock = 128;
 constexpr size_t kPosition = 0, kRotation = 3, kScale = 7, kWidth = 10;  // of a world transform in doubles
 
-// A rotated vector, by the quaternion x y z w.
-inline void rotate(double const* q, double x, double y, double z, double* out) {
-  double const tx = 2 * (q[1] * z - q[2] * y), ty = 2 * (q[2] * x - q[0] * z), tz = 2 * (q[0] * y - q[1] * x);
-  out[0] = x + q[3] * tx + q[1] * tz - q[2] * ty;
-  out[1] = y + q[3] * ty + q[2] * tx - q[0] * tz;
-  out[2] = z + q[3] * tz + q[0] * ty - q[1] * tx;
-}
-
-inline void multiply(double const* a, double const* b, double* out) {
-  out[0] = a[3] * b[0] + a[0] * b[3] + a[1] * b[2] - a[2] * b[1];
-  out[1] = a[3] * b[1] - a[0] * b[2] + a[1] * b[3] + a[2] * b[0];
-  out[2] = a[3] * b[2] + a[0] * b[1] - a[1] * b[0] + a[2] * b[3];
-  out[3] = a[3] * b[3] - a[0] * b[0] - a[1] * b[1] - a[2] * b[2];
-}
-
 void put(double const* world, double* matrix) {
   double const *q = world + kRotation, *s = world + kScale;
   double column[3];
   for (int c = 0; c < 3; ++c) {
-    rotate(q, c == 0 ? s[0] : 0, c == 1 ? s[1] : 0, c == 2 ? s[2] : 0, column);
+    rotateByQuaternion(q, c == 0 ? s[0] : 0, c == 1 ? s[1] : 0, c == 2 ? s[2] : 0, column);
     for (int r = 0; r < 3; ++r) matrix[4 * r + c] = column[r];
   }
   for (int r = 0; r < 3; ++r) matrix[4 * r + 3] = world[kPosition + static_cast<size_t>(r)];
@@ -279,8 +265,8 @@ class SceneReader::Pass {
       double const *t = translation.at(i), *q = rotation.at(i), *s = scale.at(i);
       double position[3], turned[4];
       if (joint.turned) {
-        rotate(preRotation, t[0], t[1], t[2], position);
-        multiply(preRotation, q, turned);
+        rotateByQuaternion(preRotation, t[0], t[1], t[2], position);
+        multiplyQuaternions(preRotation, q, turned);
         t = position;
         q = turned;
       }
@@ -292,9 +278,9 @@ class SceneReader::Pass {
         continue;
       }
       double const *p = above.at(i), *ps = p + kScale;
-      rotate(p + kRotation, x * ps[0], y * ps[1], z * ps[2], out);
+      rotateByQuaternion(p + kRotation, x * ps[0], y * ps[1], z * ps[2], out);
       for (size_t k = 0; k < 3; ++k) out[k] += p[k], out[kScale + k] = ps[k] * s[k];
-      multiply(p + kRotation, q, out + kRotation);
+      multiplyQuaternions(p + kRotation, q, out + kRotation);
     }
     return result;
   }

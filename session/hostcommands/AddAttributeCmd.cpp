@@ -1,6 +1,7 @@
+#include "host/command/Targets.h"
 #include "host/scene/PropertyTable.h"
-#include "session/hostcommands/Arguments.h"
 #include "session/hostcommands/AttributeValues.h"
+#include "session/hostcommands/NewProperty.h"
 
 namespace talix {
 
@@ -30,7 +31,7 @@ class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
       logError("%s is not a kind of attribute: %s.", kindText.GetStr(), attributeKindNames().c_str());
       return false;
     }
-    if (!isNew(*module, name, "an attribute", PropertyTable::getInstance().obstacleToAttribute(name)))
+    if (!isNewProperty(*module, name, "an attribute", PropertyTable::getInstance().obstacleToAttribute(name)))
       return false;
     std::unique_ptr<Attribute> attribute = makeAttribute(*kind, name, args, 3, *module);
     if (!attribute) return false;

@@ -1,8 +1,9 @@
 #include <algorithm>
 #include <iterator>
 
+#include "host/command/Targets.h"
 #include "host/scene/PropertyTable.h"
-#include "session/hostcommands/Arguments.h"
+#include "session/hostcommands/NewProperty.h"
 
 namespace talix {
 
@@ -33,7 +34,8 @@ class AddChannelCmd final : public ScriptCommand<AddChannelCmd> {
       logError("%s is not a kind of channel: vector, rotation, float, int or bool.", kindText.GetStr());
       return false;
     }
-    if (!isNew(*module, name, "a channel", PropertyTable::getInstance().obstacleToChannel(name, *kind)))
+    if (!isNewProperty(*module, name, "a channel",
+                       PropertyTable::getInstance().obstacleToChannel(name, *kind)))
       return false;
     if (module->addChannel(name, *kind)) return true;
     logError("The channel %s could not be added: there are too many channel names.", name.GetStr());

@@ -4,9 +4,11 @@
 #include <cmath>
 #include <iterator>
 
+#include "host/command/Angles.h"
+#include "host/command/Arguments.h"
+#include "host/command/Frames.h"
+#include "host/command/Targets.h"
 #include "host/scene/HTimeManager.h"
-#include "host/scene/Node.h"
-#include "session/hostcommands/Arguments.h"
 
 namespace talix {
 
@@ -37,7 +39,6 @@ constexpr AttributeKind kAttributeKinds[] = {
 
 enum class Reading { Taken, Misfit, Logged };
 
-bool isNumber(Variable const& value) { return isFrameNumber(value); }
 bool isString(Variable const& value) { return value.getType() == Variable::String; }
 
 Values flattened(Args const& args, int first) {
@@ -55,16 +56,8 @@ Attribute::Labels labelsFrom(Values const& values) {
 
 std::optional<Vec3> vectorFrom(Values const& values) {
   if (values.size() == 1 && values[0].getType() == Variable::Vector) return values[0].getVecValue(-1);
-  if (values.size() != 3 || !std::all_of(values.begin(), values.end(), isNumber)) return {};
+  if (values.size() != 3 || !std::all_of(values.begin(), values.end(), isIntOrFloat)) return {};
   return Vec3(values[0].getFloatValue(-1), values[1].getFloatValue(-1), values[2].getFloatValue(-1));
-}
-
-TalixRotation rotationFrom(Vec3 const& degrees, Module const& module) {
-  constexpr double kRadians = 0.017453292519943295;
-  auto const* node = objectAs<Node>(&module);
-  TalixRotation rotation;
-  rotation.setAsEuler(node ? node->getRotationOrder() : TalixRotation::XYZ, degrees * kRadians);
-  return rotation;
 }
 
 HString linesFrom(Values const& values) {
@@ -82,8 +75,8 @@ Reading takeVector(Attribute& attribute, Values const& values, Module const& mod
   if (attribute.getType() == Attribute::Vector) {
     static_cast<VectorAttribute&>(attribute).setValue(*vector, true, true, true, true);
   } else if (attribute.getType() == Attribute::Rotation) {
-    static_cast<RotationAttribute&>(attribute).setValue(rotationFrom(*vector, module), true, true, true,
-                                                        true);
+    static_cast<RotationAttribute&>(attribute).setValue(rotationFromDegrees(*vector, rotationOrderOf(module)),
+                                                        true, true, true, true);
   } else {
     if (!static_cast<ColorAttribute&>(attribute).setValue(*vector, true, true, true, true))
       return Reading::Misfit;
@@ -94,7 +87,7 @@ Reading takeVector(Attribute& attribute, Values const& values, Module const& mod
 Reading takeTime(TimeAttribute& attribute, Values const& values) {
   if (values.size() != 1) return Reading::Misfit;
   double frame = 0;
-  if (isNumber(values[0]))
+  if (isIntOrFloat(values[0]))
     frame = values[0].getFloatValue(-1);
   else if (!isString(values[0]) ||
            !HTimeManager::getInstance()->framesFromString(values[0].getStringValue(-1), false, frame))
@@ -107,7 +100,8 @@ Reading takeTime(TimeAttribute& attribute, Values const& values) {
 
 Reading takeMatrix(MatrixAttribute& attribute, Values const& values) {
   auto const n = static_cast<uint64>(std::llround(std::sqrt(static_cast<double>(values.size()))));
-  if (n * n != values.size() || !std::all_of(values.begin(), values.end(), isNumber)) return Reading::Misfit;
+  if (n * n != values.size() || !std::all_of(values.begin(), values.end(), isIntOrFloat))
+    return Reading::Misfit;
   Matrix matrix(n);
   for (uint64 i = 0; i < values.size(); ++i) matrix[i / n][i % n] = values[i].getFloatValue(-1);
   attribute.setValue(matrix, true, true, true, true);
@@ -144,7 +138,7 @@ Reading takeScalar(Attribute& attribute, Values const& values) {
       static_cast<TemperatureAttribute&>(attribute).setValue(value.getIntValue(-1), true, true, true, true);
       return Reading::Taken;
     case Attribute::Float:
-      if (!isNumber(value)) return Reading::Misfit;
+      if (!isIntOrFloat(value)) return Reading::Misfit;
       static_cast<FloatAttribute&>(attribute).setValue(value.getFloatValue(-1), true, true, true, true);
       return Reading::Taken;
     case Attribute::String:

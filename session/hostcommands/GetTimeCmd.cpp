@@ -1,3 +1,4 @@
+#include "host/command/Results.h"
 #include "host/command/ScriptCommand.h"
 #include "host/scene/HTimeManager.h"
 
@@ -15,8 +16,7 @@ class GetTimeCmd final : public ScriptCommand<GetTimeCmd> {
 
   bool execute(Given const&, Args const&, Variable& result) override {
     HTimeManager const& times = *HTimeManager::getInstance();
-    result.setValue(times.getFrameDouble(times.getTime()), -1);
-    return true;
+    return answer(result, times.getFrameDouble(times.getTime()));
   }
 };
 

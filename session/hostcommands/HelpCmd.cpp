@@ -1,3 +1,4 @@
+#include "host/command/Results.h"
 #include "host/command/ScriptCommand.h"
 #include "session/CommandHelp.h"
 
@@ -17,18 +18,14 @@ class HelpCmd final : public ScriptCommand<HelpCmd> {
   explicit HelpCmd(CommandRegistry const& registry) : m_registry(registry) {}
 
   bool execute(Given const&, Args const& args, Variable& result) override {
-    if (args.getCount() == 0) {
-      result.setValue(commandList(m_registry).c_str(), -1);
-      return true;
-    }
+    if (args.getCount() == 0) return answer(result, commandList(m_registry).c_str());
     char const* name = args[0].getStringValue(-1);
     CommandRegistry::Entry const* entry = m_registry.find(name);
     if (!entry) {
       logError("Unknown command: %s", name);
       return false;
     }
-    result.setValue(commandPage(*entry).c_str(), -1);
-    return true;
+    return answer(result, commandPage(*entry).c_str());
   }
 
  private:

@@ -1,5 +1,6 @@
-#include "session/hostcommands/Arguments.h"
-
+#include "host/command/Arguments.h"
+#include "host/command/ChannelName.h"
+#include "host/command/Targets.h"
 namespace talix {
 
 namespace {
@@ -24,7 +25,7 @@ class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
     Module* module = moduleAt(args[0].getStringValue(-1));
     if (!module) return false;
     char const* name = args[1].getStringValue(-1);
-    auto const choice = channelNamed(name);
+    auto const choice = channelChoiceFrom(name);
     if (!choice) return false;
     if (choice->mask != 7) {
       logError("%s is a component; channels are locked as a whole.", name);
@@ -35,8 +36,7 @@ class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
       logError("Cannot find property named %s on module %s", name, module->getName().GetStr());
       return false;
     }
-    Variable::BoolType const lock = args[2].getBoolValue(-1);
-    channel->setLocked(lock == Variable::Toggle ? !channel->isLocked() : lock == Variable::True);
+    channel->setLocked(changed(channel->isLocked(), args[2].getBoolValue(-1)));
     return true;
   }
 };

@@ -1,5 +1,6 @@
+#include "host/command/ChannelName.h"
+#include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
-#include "session/hostcommands/Arguments.h"
 
 namespace talix {
 
@@ -23,9 +24,9 @@ class SelectChannelsCmd final : public ScriptCommand<SelectChannelsCmd> {
   bool execute(Given const&, Args const& args, Variable&) override {
     std::vector<unsigned> ids;
     for (Variable const& arg : args) {
-      auto const channel = channelNamed(arg.getStringValue(-1));
+      auto const channel = channelChoiceFrom(arg.getStringValue(-1));
       if (!channel) return false;
-      ids.push_back(channel->id | channel->mask << 28);
+      ids.push_back(channel->property());
     }
     g_db->setActiveProperties(std::move(ids));
     return true;

@@ -1,20 +1,9 @@
-#include <algorithm>
-
-#include "host/scene/Database.h"
-#include "session/hostcommands/Arguments.h"
+#include "host/command/Arguments.h"
+#include "host/command/Targets.h"
 
 namespace talix {
 
 namespace {
-
-bool isText(Variable const& value) {
-  return value.getType() == Variable::String || value.getType() == Variable::StringArray;
-}
-
-void addAll(HRuntimeClass const* type, std::vector<Module*>& modules) {
-  for (int i = 0; i < g_db->getNumModules(); ++i)
-    if (Module* module = g_db->getModule(i); !type || module->isKindOf(type)) modules.push_back(module);
-}
 
 class SelectCmd final : public ScriptCommand<SelectCmd> {
  public:
@@ -38,7 +27,7 @@ class SelectCmd final : public ScriptCommand<SelectCmd> {
                        kPrimary = info.option("primary");
 
   bool checkArgSyntax(Args const& args, Given const& options) const override {
-    return (args.getCount() > 0 || options.getCount() > 0) && std::all_of(args.begin(), args.end(), isText);
+    return (args.getCount() > 0 || options.getCount() > 0) && areTexts(args);
   }
 
   // Everything is looked up before anything changes.
@@ -49,7 +38,10 @@ class SelectCmd final : public ScriptCommand<SelectCmd> {
     int const extent = lastOf(given, kAll, kNone);
     bool const byClass = extent == kAll || (type && args.getCount() == 0 && extent != kNone);
     std::vector<Module*> chosen;
-    if (byClass) addAll(type, chosen);
+    if (byClass)
+      eachModule(Among::all, [&](Module& module) {
+        if (!type || module.isKindOf(type)) chosen.push_back(&module);
+      });
     if (!addNamed(args, type, chosen)) return false;
     bool const setPrimary = options.has(kPrimary);
     HString const primaryPath = options.textOr(kPrimary, "");
@@ -85,8 +77,13 @@ class SelectCmd final : public ScriptCommand<SelectCmd> {
   static bool addNamed(Args const& args, HRuntimeClass const* type, std::vector<Module*>& modules) {
     for (Variable const& arg : args) {
       for (int i = 0; i < arg.getNumItems(); ++i) {
-        Module* module = moduleAt(arg.getStringValue(i), type);
-        if (!module) return false;
+        char const* path = arg.getStringValue(i);
+        Module* module = g_db->getModuleWithPath(path, type, false);
+        if (!module) {
+          logError("%s is not a valid unique path to a %s in the scene.", path,
+                   type ? type->getName() : "Module");
+          return false;
+        }
         modules.push_back(module);
       }
     }

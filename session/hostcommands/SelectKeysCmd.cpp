@@ -1,6 +1,6 @@
-#include "host/scene/Database.h"
-#include "host/scene/PropertyTable.h"
-#include "session/hostcommands/Arguments.h"
+#include "host/command/ChannelName.h"
+#include "host/command/Frames.h"
+#include "host/command/Targets.h"
 
 namespace talix {
 
@@ -53,14 +53,12 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
   // No channels mean all.
   static bool chooseChannels(Args const& args, bool all, std::vector<ChannelChoice>& channels) {
     if (args.getCount() > 0) {
-      auto const channel = channelNamed(args[0].getStringValue(-1));
+      auto const channel = channelChoiceFrom(args[0].getStringValue(-1));
       if (channel) channels.push_back(*channel);
       return channel.has_value();
     }
-    for (int i = 0; !all && i < g_db->getNumActiveProperties(); ++i) {
-      unsigned const id = g_db->getActiveProperty(i);
-      channels.push_back({id & PropertyTable::kIdMask, id >> 28 & 7});
-    }
+    for (int i = 0; !all && i < g_db->getNumActiveProperties(); ++i)
+      channels.push_back(ChannelChoice::of(g_db->getActiveProperty(i)));
     return true;
   }
 
@@ -69,7 +67,7 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
       modules.push_back(moduleAt(options.textOr(kOnMod, "")));
       return modules.front() != nullptr;
     }
-    for (int i = 0; i < g_db->getNumSelectedModules(); ++i) modules.push_back(g_db->getSelectedModule(i));
+    eachModule(Among::selected, [&](Module& module) { modules.push_back(&module); });
     if (modules.empty())
       logError(
           "Please select at least one Module or specify the module to be modified with the -onMod option.");

@@ -1,5 +1,6 @@
+#include "host/command/Arguments.h"
+#include "host/command/Frames.h"
 #include "host/scene/HTimeManager.h"
-#include "session/hostcommands/Arguments.h"
 
 namespace talix {
 
@@ -19,7 +20,7 @@ class SelectTimeCmd final : public ScriptCommand<SelectTimeCmd> {
 
   bool checkArgSyntax(Args const& args, Given const& options) const override {
     if (args.getCount() == 0) return GivenOptions(options).has(kNone);
-    return args.getCount() == 2 && areFrameNumbers(args);
+    return args.getCount() == 2 && areIntsOrFloats(args);
   }
 
   bool execute(Given const& given, Args const& args, Variable&) override {

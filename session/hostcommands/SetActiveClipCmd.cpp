@@ -1,5 +1,4 @@
-#include "host/scene/Database.h"
-#include "session/hostcommands/Arguments.h"
+#include "host/command/Targets.h"
 
 namespace talix {
 
@@ -22,16 +21,13 @@ class SetActiveClipCmd final : public ScriptCommand<SetActiveClipCmd> {
   }
 
   bool execute(Given const&, Args const& args, Variable&) override {
-    Module* clip = nullptr;
+    NLEClip* clip = nullptr;
     if (args.getCount() > 0) {
-      HString const path = args[0].getStringValue(-1);
-      clip = g_db->getModuleWithPath(path, &NLEClip::s_classNLEClip, false);
-      if (!clip) {
-        logError("%s is not a valid unique path to a Clip in the scene.", path.GetStr());
-        return false;
-      }
+      clip = moduleAt<NLEClip>(args[0].getStringValue(-1),
+                               "%s is not a valid unique path to a Clip in the scene.");
+      if (!clip) return false;
     }
-    g_db->setActiveClip(static_cast<NLEClip*>(clip));
+    g_db->setActiveClip(clip);
     return true;
   }
 };

@@ -1,5 +1,6 @@
+#include "host/command/Arguments.h"
+#include "host/command/Frames.h"
 #include "host/scene/HTimeManager.h"
-#include "session/hostcommands/Arguments.h"
 
 namespace talix {
 
@@ -14,7 +15,7 @@ class SetAnimRangeCmd final : public ScriptCommand<SetAnimRangeCmd> {
                                        .args = {"START END", 2, 2}};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
-    return args.getCount() == 2 && areFrameNumbers(args);
+    return args.getCount() == 2 && areIntsOrFloats(args);
   }
 
   bool execute(Given const&, Args const& args, Variable&) override {

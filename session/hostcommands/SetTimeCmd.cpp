@@ -1,5 +1,6 @@
+#include "host/command/Arguments.h"
+#include "host/command/Frames.h"
 #include "host/scene/HTimeManager.h"
-#include "session/hostcommands/Arguments.h"
 
 namespace talix {
 
@@ -15,7 +16,7 @@ class SetTimeCmd final : public ScriptCommand<SetTimeCmd> {
       .args = {"FRAME", 1, 1}};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
-    return args.getCount() == 1 && areFrameNumbers(args);
+    return args.getCount() == 1 && areIntsOrFloats(args);
   }
 
   bool execute(Given const&, Args const& args, Variable&) override {

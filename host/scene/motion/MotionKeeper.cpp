@@ -6,6 +6,7 @@
 
 #include "host/keys/DataRanges.h"
 #include "host/keys/SampleTimes.h"
+#include "host/math/Degrees.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/Editability.h"
@@ -18,7 +19,7 @@ using Values = Controller::Values;
 
 // How far the motion between keys may be off: millimetres, radians, parts of the scale. Beyond 10 km a length
 // has no more digits than kRelative leaves.
-constexpr double kLengthTolerance = 0.01, kAngleTolerance = 0.01 / 57.29577951308232, kScaleTolerance = 1e-5;
+constexpr double kLengthTolerance = 0.01, kAngleTolerance = 0.01 / kDegreesPerRadian, kScaleTolerance = 1e-5;
 constexpr double kRelative = 1e-9;
 // Values that differ by less, relative to their size, are the same.
 constexpr double kSame = 1e-10;

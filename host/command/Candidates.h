@@ -2,8 +2,7 @@
 // of which "-type" leaves those of exactly one class. The database owns them.
 #pragma once
 
-#include "host/command/ScriptCommand.h"
-#include "host/scene/Database.h"
+#include "host/command/Targets.h"
 
 class Candidates {
  public:
@@ -22,19 +21,13 @@ class Candidates {
   // Calls work(module) for each candidate of the class until it returns false; returns whether it never did.
   template <class Work>
   bool each(Work work) const {
-    // Counted anew each time: the work may change the selection.
-    for (int i = 0; i < getCount(); ++i) {
-      Module* module = m_all ? g_db->getModule(i) : g_db->getSelectedModule(i);
-      if (m_class && module->getRuntimeClass() != m_class) continue;
-      if (!work(*module)) return false;
-    }
-    return true;
+    return eachModule(m_among, [&](Module& module) {
+      return (m_class && module.getRuntimeClass() != m_class) || work(module);
+    });
   }
 
  private:
-  int getCount() const { return m_all ? g_db->getNumModules() : g_db->getNumSelectedModules(); }
-
   Module* m_onMod = nullptr;
   HRuntimeClass const* m_class = nullptr;  // null: any
-  bool m_all = false;
+  Among m_among = Among::selected;
 };

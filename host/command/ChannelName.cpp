@@ -1,5 +1,6 @@
-#include "commands/ChannelName.h"
+#include "host/command/ChannelName.h"
 
+#include "host/command/Command.h"
 #include "host/scene/Controller.h"
 
 namespace {
@@ -20,4 +21,23 @@ ChannelName channelNameFrom(HString text, Suffix suffix) {
   int const component = isLetter || suffix == Suffix::anyCut ? componentOf(text[dot + 1]) : -1;
   if (suffix == Suffix::componentCut && component < 0) return {text, -1};
   return {text.Left(static_cast<uint64>(dot)), component};
+}
+
+std::optional<ChannelChoice> channelChoiceFrom(HString const& text) {
+  ChannelName channel{text};
+  Controller::fixChannelStr(channel.name);
+  unsigned id = Controller::mapPropertyName(channel.name);
+  if (id == 0) {
+    channel = channelNameFrom(text, Suffix::componentCut);
+    id = Controller::mapPropertyName(channel.name);
+  }
+  if (id == 0) {
+    Command::logError("Unknown property type: %s", text.GetStr());
+    return {};
+  }
+  if (channel.component >= 0 && !hasComponents(Controller::mapToPropertyType(id))) {
+    Command::logError("%s has no components.", channel.name.GetStr());
+    return {};
+  }
+  return ChannelChoice{id, channel.mask()};
 }

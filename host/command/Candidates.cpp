@@ -1,15 +1,12 @@
-#include "commands/Candidates.h"
-
-#include "commands/Targets.h"
+#include "host/command/Candidates.h"
 
 bool Candidates::read(Given const& given, Options const& options) {
   for (CommandOption const& option : given) {
     int const index = option.getIndex();
     if (index == options.all) {
-      m_all = true;
+      m_among = Among::all;
     } else if (index == options.onMod) {
-      m_onMod = moduleAt(option.getArg(0).getStringValue(-1),
-                         "%s is not a valid unique path to a Module in the scene.");
+      m_onMod = moduleAt(option.getArg(0).getStringValue(-1));
       if (!m_onMod) return false;
     } else if (index == options.type) {
       char const* name = option.getArg(0).getStringValue(-1);
@@ -24,7 +21,7 @@ bool Candidates::read(Given const& given, Options const& options) {
 }
 
 bool Candidates::exist(char const* noModules, char const* noSelection) const {
-  if (getCount() > 0) return true;
-  Command::logError("%s", m_all ? noModules : noSelection);
+  if (countModules(m_among) > 0) return true;
+  Command::logError("%s", m_among == Among::all ? noModules : noSelection);
   return false;
 }
