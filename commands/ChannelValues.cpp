@@ -5,6 +5,7 @@
 #include <cmath>
 
 #include "host/command/Angles.h"
+#include "host/scene/Module.h"
 
 bool readVector(Args const& args, int component, Vec3& value) {
   int const count = args.getCount();
@@ -51,7 +52,10 @@ bool canBeHeld(double value) { return std::isfinite(value); }
 
 bool canBeHeld(int64 value) { return value >= INT_MIN && value <= INT_MAX; }
 
-bool canBeHeld(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
+bool isHeld(bool held, char const* what, Module const& module) {
+  if (!held) Command::logError("The value is too large for %s on %s.", what, module.getName().GetStr());
+  return held;
+}
 
 int nearestInt(double value) {
   return static_cast<int>(std::clamp<double>(std::round(value), INT_MIN, INT_MAX));

@@ -71,5 +71,7 @@ TalixRotation changed(TalixRotation const& current, Vec3 const& angles, Change c
 // Whether a channel or an attribute can hold a result: numbers are finite, integers have 32 bits.
 bool canBeHeld(double value);
 bool canBeHeld(int64 value);
-bool canBeHeld(Vec3 const& value);
+inline bool canBeHeld(Vec3 const& value) { return isFinite(value); }
 inline bool canBeHeld(TalixRotation const&) { return true; }
+// Whether a value was held; else logs that it is too large for what on which module.
+[[nodiscard]] bool isHeld(bool held, char const* what, Module const& module);

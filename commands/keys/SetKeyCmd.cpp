@@ -97,10 +97,7 @@ bool NewKey::writeOn(Controller& channel) const {
     DataEdit const edit(channel, HTimeRange(time - 1, time + 1));
     withKind(channel, [&](auto& typed) { taken = write(typed); });
   }
-  if (!taken)
-    Command::logError("The value is too large for %s on %s.", channel.getName().GetStr(),
-                      channel.getModule()->getName().GetStr());
-  return taken;
+  return isHeld(taken, channel.getName().GetStr(), *channel.getModule());
 }
 
 // Reads the value for a channel of that kind; false, with a message, when it cannot be keyed.

@@ -1,5 +1,4 @@
 #include <charconv>
-#include <map>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -9,7 +8,6 @@
 
 #include "host/command/ScriptCommand.h"
 #include "host/scene/Database.h"
-#include "host/scene/ModulePath.h"
 #include "host/services/OperationStack.h"
 
 namespace {
@@ -34,68 +32,103 @@ NumberedName split(std::string_view name) {
 
 // Numbers full paths: equal numbers, equal paths. The names from the root to a deep module would be written
 // out anew for every module of a chain; so each path is the number of the path above it and a name.
+//
+//  1. Below a module that has a number either all modules have one, or none.
+//  2. None means that it was renamed, to a path that no other module had; so whoever shares a path with a
+//     module that has a number has one, too.
 class PathNumbers {
  public:
+  static constexpr size_t kRoot = 0;
+
+  PathNumbers() {
+    for (int i = 0; i < g_db->getNumModules(); ++i)
+      if (Module const* module = g_db->getModule(i); !module->getParent()) numberFrom(*module, kRoot);
+  }
+
   size_t of(Module const& module) {
-    std::vector<Module const*> unknown;
     Module const* known = &module;
-    for (; known && !m_byModule.contains(known); known = known->getParent()) unknown.push_back(known);
-    size_t path = known ? m_byModule.at(known) : 0;
-    for (auto next = unknown.rbegin(); next != unknown.rend(); ++next) {
-      auto const [entry, isNew] =
-          m_byName.try_emplace({path, (*next)->getName().GetString()}, m_byName.size() + 1);
-      m_byModule[*next] = path = entry->second;
-    }
-    return path;
+    while (!m_byModule.contains(known)) known = known->getParent();
+    if (known != &module) numberBelow(*known);
+    return m_byModule.at(&module);
   }
-  // A module has another name: the paths at and below it are others.
-  void forget(Module const& renamed) {
-    std::vector<Module const*> open{&renamed};
-    while (!open.empty()) {
-      Module const* module = open.back();
-      open.pop_back();
-      if (m_byModule.erase(module) == 0) continue;  // then none below it is known
-      for (int i = 0; i < module->getNumChildren(); ++i) open.push_back(module->getChild(i));
-    }
-  }
+  size_t ofParent(Module const& module) { return module.getParent() ? of(*module.getParent()) : kRoot; }
 
- private:
-  std::unordered_map<Module const*, size_t> m_byModule;
-  std::map<std::pair<size_t, std::string>, size_t> m_byName;
-};
-
-// Remembers which of the paths TEXT_1, TEXT_2, ... were found taken, so that many modules that clash do not
-// all try them again.
-class TakenPaths {
- public:
-  // The first number above `number` whose path names no module.
-  int64 freeNumber(std::string const& text, int64 number) {
-    Next& next = m_next[text];
+  // The first number above `number` for which ABOVE\BASE_NUMBER names no module.
+  int64 freeNumber(size_t above, std::string const& base, int64 number) {
+    Next& next = m_next[{above, base}];
     auto const isTaken = [&](int64 candidate) {
-      HString const path = text + "_" + std::to_string(candidate);
-      return g_db->getModuleWithPath(path, nullptr, false) != nullptr;
+      auto const path = m_byName.find({above, base + "_" + std::to_string(candidate)});
+      return path != m_byName.end() && m_holders[path->second] > 0;
     };
     int64 free = number + 1;
     while (true) {
-      free = behindTaken(next, free);
+      free = afterTaken(next, free);
       if (!isTaken(free)) return free;
       next[free] = free + 1;
     }
   }
 
-  // A module has left this path with all below it: what was taken there may be free.
-  void forget(std::string const& path) {
-    m_next.erase(m_next.lower_bound(path + "\\"), m_next.lower_bound(path + static_cast<char>('\\' + 1)));
-    if (g_db->getModuleWithPath(path, nullptr, false)) return;
-    size_t const mark = path.find_last_not_of("0123456789");
-    if (path[mark] == '_') m_next.erase(path.substr(0, mark));
+  // A module has another name: the paths at and below it are others.
+  void renumber(Module const& renamed) {
+    size_t const above = ofParent(renamed);
+    std::vector<Module const*> open{&renamed};
+    while (!open.empty()) {
+      Module const* module = open.back();
+      open.pop_back();
+      auto const known = m_byModule.find(module);
+      if (known == m_byModule.end()) continue;  // then none below it is known
+      release(known->second);
+      m_byModule.erase(known);
+      for (int i = 0; i < module->getNumChildren(); ++i) open.push_back(module->getChild(i));
+    }
+    number(renamed, above);
   }
 
  private:
-  // For a taken number one further on; following these leads to the next number that is not known as taken.
+  using Path = std::pair<size_t, std::string>;  // the path above, the name
+  struct PathHash {
+    size_t operator()(Path const& path) const {
+      return std::hash<std::string>()(path.second) * 31 + std::hash<size_t>()(path.first);
+    }
+  };
+  // For a taken number one further on; following these leads to the next number that is not known as taken,
+  // so that many modules that clash do not all try the same ones again.
   using Next = std::unordered_map<int64, int64>;
 
-  static int64 behindTaken(Next& next, int64 number) {
+  size_t number(Module const& module, size_t above) {
+    auto const path = m_byName.try_emplace({above, module.getName().GetString()}, m_holders.size()).first;
+    if (path->second == m_holders.size()) {
+      m_holders.push_back(0);
+      m_paths.push_back(&path->first);
+    }
+    ++m_holders[path->second];
+    return m_byModule[&module] = path->second;
+  }
+  void numberFrom(Module const& top, size_t above) {
+    number(top, above);
+    numberBelow(top);
+  }
+  void numberBelow(Module const& top) {
+    std::vector<Module const*> open{&top};
+    while (!open.empty()) {
+      Module const* module = open.back();
+      open.pop_back();
+      size_t const path = m_byModule.at(module);
+      for (int i = 0; i < module->getNumChildren(); ++i) {
+        number(*module->getChild(i), path);
+        open.push_back(module->getChild(i));
+      }
+    }
+  }
+  // One module less has the path: without any its number is free again.
+  void release(size_t path) {
+    if (--m_holders[path] > 0) return;
+    auto const& [above, name] = *m_paths[path];
+    size_t const last = name.find_last_not_of("0123456789");
+    if (last != std::string::npos && name[last] == '_') m_next.erase({above, name.substr(0, last)});
+  }
+
+  static int64 afterTaken(Next& next, int64 number) {
     int64 end = number;
     for (auto found = next.find(end); found != next.end(); found = next.find(end)) end = found->second;
     // The way is short for those who come after.
@@ -104,7 +137,11 @@ class TakenPaths {
     return end;
   }
 
-  std::map<std::string, Next> m_next;  // by text
+  std::unordered_map<Module const*, size_t> m_byModule;
+  std::unordered_map<Path, size_t, PathHash> m_byName;
+  std::vector<int> m_holders{0};                    // by path: how many modules have it
+  std::vector<Path const*> m_paths{nullptr};        // by path
+  std::unordered_map<Path, Next, PathHash> m_next;  // by the path above and the text before the number
 };
 
 class MakeUniqueCmd final : public ScriptCommand<MakeUniqueCmd> {
@@ -117,32 +154,27 @@ class MakeUniqueCmd final : public ScriptCommand<MakeUniqueCmd> {
   bool execute(Given const&, Args const&, Variable&) override {
     std::unordered_set<size_t> seen;
     PathNumbers paths;
-    TakenPaths taken;
     int const count = g_db->getNumModules();
     for (int i = 0; i < count; ++i) {
       if (g_theOperationStack.isCancelled()) return false;
       Module* module = g_db->getModule(i);
       if (seen.insert(paths.of(*module)).second) continue;
-      rename(*module, taken);
-      paths.forget(*module);
+      rename(*module, paths);
     }
     return true;
   }
 
  private:
   // kept: the new path does not count as seen.
-  static void rename(Module& module, TakenPaths& taken) {
-    HString const former = module.getFullPathString(), name = module.getName();
+  static void rename(Module& module, PathNumbers& paths) {
+    HString const name = module.getName();
     auto const [base, number] = split(name.GetString());
-    ModulePath parent(&module);
-    parent.pop();
-    std::string const text = parent.getFullPathString().GetString() + "\\" + std::string(base);
     HString candidate;
-    candidate.Format("%s_%lld", std::string(base).c_str(),
-                     static_cast<long long>(taken.freeNumber(text, number)));
+    int64 const free = paths.freeNumber(paths.ofParent(module), std::string(base), number);
+    candidate.Format("%s_%lld", std::string(base).c_str(), static_cast<long long>(free));
     auto* attribute = static_cast<StringAttribute*>(module.getAttribute("Name"));
     attribute->setValue(candidate, true, true, 0, true, true);
-    taken.forget(former.GetString());
+    paths.renumber(module);
   }
 };
 

@@ -41,7 +41,7 @@ std::vector<NewPlace> placesFor(Node const& bone, double length, bool relative, 
     for (int k = 0; adjust && k < child->getNumNodeChildren(); ++k) {
       Node* grandchild = child->getNodeChild(k);
       Vec3 theirs = grandchild->getPreTranslation();
-      // Below 0 when the bone passes it by: then it lies behind the child.
+      // Below 0 when the bone passes it by: then it lies on the child's other side.
       theirs.setLength(theirs.length() - (wanted - former));
       places.push_back({grandchild, theirs});
     }

@@ -1,3 +1,4 @@
+#include "commands/ChannelValues.h"
 #include "commands/transforms/TransformWriting.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/Marker.h"
@@ -21,33 +22,37 @@ class SetPositionCmd final : public ScriptCommand<SetPositionCmd> {
   bool execute(Given const& given, Args const& args, Variable&) override;
 };
 
-// False when nothing could be written.
+bool mayWrite(TransformWrite const& write) {
+  return write.preTransform ? isFree(obstacleToPreTransform(*write.node), "Pre-translation", *write.node)
+                            : isWritable(*write.node->getTranslationChannel(), write.byDefault);
+}
+
+// False, with a message, when the value cannot be held.
 bool writePosition(TransformWrite const& write) {
   Node& node = *write.node;
-  if (write.preTransform) {
-    if (!isFree(obstacleToPreTransform(node), "Pre-translation", node)) return false;
-    write.world ? node.setPreTranslationWS(write.vector)
-                : static_cast<void>(node.setPreTranslation(write.vector));
-    return true;
-  }
+  Vec3 const& position = write.vector;
+  if (write.preTransform)
+    return isHeld(write.world ? node.setPreTranslationWS(position) : node.setPreTranslation(position),
+                  "Pre-translation", node);
   Controller* channel = node.getTranslationChannel();
-  if (!isWritable(*channel, write.byDefault)) return false;
   if (write.byDefault) {
     DataEdit const edit = DataEdit::ofDefault(*channel);
-    write.world ? node.setConstWSPos(write.vector) : node.setConstLocalPos(write.vector);
-  } else {
-    DataEdit const edit(*channel, write.edited());
-    write.world ? node.setWSPos(write.time, write.vector) : node.setLocalPos(write.time, write.vector);
+    return isHeld(write.world ? node.setConstWSPos(position) : node.setConstLocalPos(position), "Translation",
+                  node);
   }
-  return true;
+  DataEdit const edit(*channel, write.edited());
+  return isHeld(write.world ? node.setWSPos(write.time, position) : node.setLocalPos(write.time, position),
+                "Translation", node);
 }
 
 bool SetPositionCmd::execute(Given const& given, Args const& args, Variable&) {
   TransformWrite write;
   if (!readWrite(given, args, kOptions, info.name, write)) return false;
-  auto* marker = objectAs<Marker>(write.node);
+  if (!mayWrite(write)) return true;
+  if (!writePosition(write)) return false;
   // Kept: whatever the options were.
-  if (writePosition(write) && marker) marker->setFillType(write.time, Marker::EditedByHand, true);
+  if (auto* marker = objectAs<Marker>(write.node))
+    marker->setFillType(write.time, Marker::EditedByHand, true);
   return true;
 }
 

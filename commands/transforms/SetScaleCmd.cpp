@@ -1,3 +1,4 @@
+#include "commands/ChannelValues.h"
 #include "commands/transforms/TransformWriting.h"
 #include "host/scene/DataEdit.h"
 
@@ -33,11 +34,13 @@ bool SetScaleCmd::execute(Given const& given, Args const& args, Variable&) {
   if (write.byDefault) {
     // Kept: the write of the default value stands in the bracket, the one at a time does not.
     DataEdit const edit(node, write.edited());
-    node.setConstLocalScale(write.world ? localScale(node, write.vector, write.time) : write.vector);
-  } else {
-    write.world ? node.setWSScale(write.time, write.vector) : node.setLocalScale(write.time, write.vector);
+    return isHeld(
+        node.setConstLocalScale(write.world ? localScale(node, write.vector, write.time) : write.vector),
+        "Scale", node);
   }
-  return true;
+  return isHeld(
+      write.world ? node.setWSScale(write.time, write.vector) : node.setLocalScale(write.time, write.vector),
+      "Scale", node);
 }
 
 }  // namespace

@@ -20,9 +20,7 @@ bool readWrite(Given const& given, Args const& args, WriteOptions const& which, 
 
 bool areFinite(Vec3 const& values, char const* command) {
   // The length as well: a rotation vector is taken by it.
-  if (std::isfinite(values.x) && std::isfinite(values.y) && std::isfinite(values.z) &&
-      std::isfinite(values.length()))
-    return true;
+  if (isFinite(values) && std::isfinite(values.length())) return true;
   Command::logError("%s needs finite numbers.", command);
   return false;
 }

@@ -2,7 +2,8 @@
 //
 // The host checks the arguments first (checkArgSyntax); execute runs only when they are accepted. It returns
 // true on success and false on failure, after at least one error line; `result` stays unset on failure.
-// Commands are reference-counted and keep no state between runs. Everything happens on the main thread.
+// Commands are reference-counted and keep no state between runs. Everything happens on the thread that
+// holds the scene (SceneScope.h).
 #pragma once
 
 #include <memory>

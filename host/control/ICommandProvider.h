@@ -23,7 +23,7 @@ struct CommandDescription {
 
 class ICommandProvider {
  public:
-  // Appends the names that the provider answers to.
+  // Appends the names that the provider takes.
   virtual void GetCommandNames(std::vector<std::wstring>& names, int unused) const = 0;
   virtual CommandDescription GetCommandDescription(std::wstring const& name) const = 0;
   virtual IResult ExecuteCommand(std::wstring const& name, IParameters const& in, IParameters& out) = 0;

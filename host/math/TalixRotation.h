@@ -37,7 +37,7 @@ class TalixRotation {
   // --- joints: axes are 0 x, 1 y, 2 z ---
   // A universal (Hardy-Spicer) joint turns by `major` about its major axis, which stays with the parent, and
   // then by `minor` about the minor axis, which the first turn carries along: R = R_major * R_minor. Its axes
-  // are those of the frame in which the rotation counts. A local rotation counts after the pre-rotation,
+  // are those of the space in which the rotation counts. A local rotation counts after the pre-rotation,
   // which thus has turned the axes already and changes nothing in the formula; it is part of the host's
   // interface.
   void setAsHardySpicerRotation(double major, double minor, int majorAxis, int minorAxis,

@@ -49,6 +49,8 @@ class Vec3 {
   }
 };
 
+inline bool isFinite(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
+
 constexpr Vec3 operator*(Vec3 const& v, double s) { return {v.x * s, v.y * s, v.z * s}; }
 
 // By component, as scales compose.

@@ -191,9 +191,7 @@ bool Attribute::isInLimits(double value) { return std::isfinite(value); }
 
 bool Attribute::isInLimits(int64 ticks) { return ticks >= -kForever && ticks <= kForever; }
 
-bool Attribute::isInLimits(Vec3 const& v) {
-  return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z);
-}
+bool Attribute::isInLimits(Vec3 const& value) { return isFinite(value); }
 
 bool Attribute::isInLimits(Matrix const& value) {
   for (uint64 row = 0; row < value.rows(); ++row)

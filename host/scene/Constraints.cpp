@@ -1,7 +1,5 @@
 #include "host/scene/Constraints.h"
 
-#include <cmath>
-
 H_DEFINE_ABSTRACT_CLASS(ConstraintBase);
 H_DEFINE_ABSTRACT_CLASS(PositionConstraintBase);
 H_DEFINE_CLASS(LabelingConstraint);
@@ -38,12 +36,12 @@ void PositionConstraintBase::setUp() {
 Vec3 PositionConstraintBase::getConstraintOffsetWS(int64 time) const {
   BaseBone const* target = getTarget();
   if (!target) return getConstraintOffset();
-  Transform const frame = target->getWorldTransform(time);
-  return frame.position + frame.rotation.rotate(scaled(getConstraintOffset(), frame.scale));
+  Transform const space = target->getWorldTransform(time);
+  return space.position + space.rotation.rotate(scaled(getConstraintOffset(), space.scale));
 }
 
 bool PositionConstraintBase::setConstraintOffset(Vec3 const& offset) {
-  if (!std::isfinite(offset.x) || !std::isfinite(offset.y) || !std::isfinite(offset.z)) return false;
+  if (!isFinite(offset)) return false;
   m_offset->setValue(offset, true, true, true, true);
   return true;
 }

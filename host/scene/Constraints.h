@@ -24,9 +24,9 @@ class PositionConstraintBase : public ConstraintBase {
   H_DECLARE_CLASS(PositionConstraintBase, ConstraintBase)
 
  public:
-  // Where the source should lie in the target's frame, in millimetres.
+  // Where the source should lie in the target's space, in millimetres.
   Vec3 getConstraintOffset() const { return m_offset->getValue(); }
-  // The same in world space at a time; without a target the frame is the world.
+  // The same in world space at a time; without a target that space is the world.
   Vec3 getConstraintOffsetWS(int64 time) const;
   // False for an offset that is not finite.
   bool setConstraintOffset(Vec3 const& offset);

@@ -164,8 +164,10 @@ void Module::getModAndDecedents(TSimpleArray<Module*>& out) {
 }
 
 bool Module::addChild(Module* child) {
-  if (!child || child == this || isDescendedFrom(child) || !isInScene() || !m_database->contains(child) ||
-      child->isKindOf(&Character::s_classCharacter))
+  // A module without children has none below it, so that a chain grows at its end in constant time.
+  bool const mayBeAbove = child && child->getNumChildren() > 0;
+  if (!child || child == this || (mayBeAbove && isDescendedFrom(child)) || !isInScene() ||
+      !m_database->contains(child) || child->isKindOf(&Character::s_classCharacter))
     return false;
   if (child->m_parent != this) child->storeParent(this);
   return true;

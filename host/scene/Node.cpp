@@ -1,7 +1,6 @@
 #include "host/scene/Node.h"
 
 #include <algorithm>
-#include <cmath>
 
 #include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/DataEdit.h"
@@ -15,8 +14,6 @@ H_DEFINE_CLASS(Node);
 // --- world transforms and their cache ---
 
 namespace {
-
-bool isFinite(Vec3 const& v) { return std::isfinite(v.x) && std::isfinite(v.y) && std::isfinite(v.z); }
 
 int64 now(Node const& node) { return node.getDatabase()->getTimeManager()->getTime(); }
 
@@ -200,23 +197,29 @@ Vec3 Node::translationFor(Vec3 const& inParent) const {
   return m_preRotation.inverse().rotate(inParent - m_preTranslation);
 }
 
-void Node::writeAt(Controller* channel, int64 time, Controller::Values const& values) {
-  if (obstacleToValue(*channel) != Obstacle::none) return;
-  if (getDatabase()->getActiveClip()) {
-    DataEdit const edit(*channel, HTimeRange(time, time));
-    channel->writeKeyAt(time, channel->solveLayer(time, values), KeyTrack::kAll);
-  } else {
+bool Node::writeAt(Controller* channel, int64 time, Controller::Values const& values) {
+  // Of a rotation three of its four numbers, which are always finite.
+  auto const canBeHeld = [](Controller::Values const& all) { return isFinite(Vec3(all.data())); };
+  if (!canBeHeld(values)) return false;
+  if (obstacleToValue(*channel) != Obstacle::none) return true;
+  if (!getDatabase()->getActiveClip()) {
     DataEdit const edit = DataEdit::ofDefault(*channel);
     channel->setDefaultValues(values);
+    return true;
   }
+  Controller::Values const inLayer = channel->solveLayer(time, values);
+  if (!canBeHeld(inLayer)) return false;
+  DataEdit const edit(*channel, HTimeRange(time, time));
+  channel->writeKeyAt(time, inLayer, KeyTrack::kAll);
+  return true;
 }
 
-void Node::setLocalPos(int64 time, Vec3 const& position) {
-  if (isFinite(position)) writeAt(m_translation, time, rawValues(position));
+bool Node::setLocalPos(int64 time, Vec3 const& position) {
+  return writeAt(m_translation, time, rawValues(position));
 }
 
-void Node::setWSPos(int64 time, Vec3 const& position) {
-  setLocalPos(time, translationFor(positionRelativeTo(parentWorld(time), position)));
+bool Node::setWSPos(int64 time, Vec3 const& position) {
+  return setLocalPos(time, translationFor(positionRelativeTo(parentWorld(time), position)));
 }
 
 void Node::setLocalRot(int64 time, TalixRotation const& rotation) {
@@ -227,18 +230,18 @@ void Node::setWSRot(int64 time, TalixRotation const& rotation) {
   setLocalRot(time, (parentWorld(time).rotation * m_preRotation).inverse() * rotation);
 }
 
-void Node::setLocalScale(int64 time, Vec3 const& scale) {
-  if (isFinite(scale)) writeAt(m_scale, time, rawValues(scale));
+bool Node::setLocalScale(int64 time, Vec3 const& scale) { return writeAt(m_scale, time, rawValues(scale)); }
+
+bool Node::setWSScale(int64 time, Vec3 const& scale) {
+  return setLocalScale(time, quotients(scale, parentWorld(time).scale));
 }
 
-void Node::setWSScale(int64 time, Vec3 const& scale) {
-  setLocalScale(time, quotients(scale, parentWorld(time).scale));
+bool Node::setConstLocalPos(Vec3 const& position) {
+  return m_translation->setConstValue(position, true, false);
 }
 
-void Node::setConstLocalPos(Vec3 const& position) { m_translation->setConstValue(position, true, false); }
-
-void Node::setConstWSPos(Vec3 const& position) {
-  setConstLocalPos(translationFor(positionRelativeTo(constParentWorld(), position)));
+bool Node::setConstWSPos(Vec3 const& position) {
+  return setConstLocalPos(translationFor(positionRelativeTo(constParentWorld(), position)));
 }
 
 void Node::setConstLocalRot(TalixRotation const& rotation, bool withoutPre) {
@@ -249,10 +252,10 @@ void Node::setConstWSRot(TalixRotation const& rotation) {
   setConstLocalRot(constParentWorld().rotation.inverse() * rotation, false);
 }
 
-void Node::setConstLocalScale(Vec3 const& scale) { m_scale->setConstValue(scale, true, false); }
+bool Node::setConstLocalScale(Vec3 const& scale) { return m_scale->setConstValue(scale, true, false); }
 
-void Node::setConstWSScale(Vec3 const& scale) {
-  setConstLocalScale(quotients(scale, constParentWorld().scale));
+bool Node::setConstWSScale(Vec3 const& scale) {
+  return setConstLocalScale(quotients(scale, constParentWorld().scale));
 }
 
 struct Node::PreTransformChange : UndoChange {
@@ -305,6 +308,6 @@ void Node::setPreRotationWS(TalixRotation const& rotation) {
   setPreRotation(parentWorld(now(*this)).rotation.inverse() * rotation, false);
 }
 
-void Node::setPreTranslationWS(Vec3 const& translation) {
-  setPreTranslation(positionRelativeTo(parentWorld(now(*this)), translation));
+bool Node::setPreTranslationWS(Vec3 const& translation) {
+  return setPreTranslation(positionRelativeTo(parentWorld(now(*this)), translation));
 }

@@ -61,23 +61,24 @@ class Node : public Module {
   Vec3 getPreTranslationInSpaceOfNode(Node* space) const;
   TalixRotation getPreRotationInSpaceOfNode(Node* space) const;
 
-  // --- writing
-  // ------------------------------------------------------------------------------------------------- Setters
-  // at a time write a key in the active clip, so that the sum of its layers is right; with no active clip
-  // they write the default value; what is locked stays. World setters find the local value below the present
-  // parent. Setters of default values and pre-transforms write where it is locked, too (Editability.h).
-  virtual void setLocalPos(int64 time, Vec3 const& position);
-  virtual void setWSPos(int64 time, Vec3 const& position);
+  // --- writing ---
+  // Setters at a time write a key in the active clip, so that the sum of its layers is right; with no active
+  // clip they write the default value; what is locked stays. World setters find the local value below the
+  // present parent. Setters of default values and pre-transforms write where it is locked, too
+  // (Editability.h). Positions and scales are written only when what is to be stored is finite, which a far
+  // value below a small parent may not be; else the result is false.
+  virtual bool setLocalPos(int64 time, Vec3 const& position);
+  virtual bool setWSPos(int64 time, Vec3 const& position);
   virtual void setLocalRot(int64 time, TalixRotation const& rotation);
   virtual void setWSRot(int64 time, TalixRotation const& rotation);
-  virtual void setLocalScale(int64 time, Vec3 const& scale);
-  virtual void setWSScale(int64 time, Vec3 const& scale);
-  virtual void setConstLocalPos(Vec3 const& position);
-  virtual void setConstWSPos(Vec3 const& position);
+  virtual bool setLocalScale(int64 time, Vec3 const& scale);
+  virtual bool setWSScale(int64 time, Vec3 const& scale);
+  virtual bool setConstLocalPos(Vec3 const& position);
+  virtual bool setConstWSPos(Vec3 const& position);
   virtual void setConstLocalRot(TalixRotation const& rotation, bool withoutPre);
   virtual void setConstWSRot(TalixRotation const& rotation);
-  virtual void setConstLocalScale(Vec3 const& scale);
-  virtual void setConstWSScale(Vec3 const& scale);
+  virtual bool setConstLocalScale(Vec3 const& scale);
+  virtual bool setConstWSScale(Vec3 const& scale);
 
   // Re-expresses the motion within a range relative to `target` (null: the world) instead of the present node
   // parent, so that the node and all below it stay as they are in the world once it hangs there. The active
@@ -89,12 +90,11 @@ class Node : public Module {
   // value would not be finite. The target and non-finite cases leave the node as it was.
   virtual bool parentAdjust(Node* target, HTimeRange const& range);
 
-  // False for values that are not finite. keepWorld: the default rotation turns so that the node stays as it
-  // is.
+  // keepWorld: the default rotation turns so that the node stays as it is. Always returns true.
   bool setPreRotation(TalixRotation const& rotation, bool keepWorld);
   bool setPreTranslation(Vec3 const& translation);
   void setPreRotationWS(TalixRotation const& rotation);
-  void setPreTranslationWS(Vec3 const& translation);
+  bool setPreTranslationWS(Vec3 const& translation);
 
   // --- connecting lines ---
   bool isConnectedTo(Node const* target) const { return m_lines.leadTo(target); }
@@ -134,7 +134,8 @@ class Node : public Module {
   Transform parentWorld(int64 time) const;
   Transform constParentWorld() const;
   Vec3 translationFor(Vec3 const& inParent) const;
-  void writeAt(Controller* channel, int64 time, Controller::Values const& values);
+  // False, with nothing written, when the channel cannot hold the values.
+  bool writeAt(Controller* channel, int64 time, Controller::Values const& values);
 
   Vec3Controller* m_translation = nullptr;
   RotController* m_rotation = nullptr;

@@ -91,13 +91,13 @@ class TransformTest : public SceneTest {
     Node* node = oneOf(m_nodes);
     switch (below(13)) {
       case 0:
-        return node->setLocalPos(randomTime(), randomVec(100));
+        return void(node->setLocalPos(randomTime(), randomVec(100)));
       case 1:
         return node->setLocalRot(randomTime(), randomRotation());
       case 2:
-        return node->setLocalScale(randomTime(), Vec3(1, 1, 1) + randomVec(0.2));
+        return void(node->setLocalScale(randomTime(), Vec3(1, 1, 1) + randomVec(0.2)));
       case 3:
-        return node->setConstLocalPos(randomVec(100));
+        return void(node->setConstLocalPos(randomVec(100)));
       case 4:
         return node->setConstLocalRot(randomRotation(), below(2));
       case 5:
@@ -125,7 +125,7 @@ class TransformTest : public SceneTest {
       case 10:
         return node->getRotationChannel()->setInterpType(static_cast<int>(below(3)));
       case 11:
-        return node->setWSPos(randomTime(), randomVec(300));
+        return void(node->setWSPos(randomTime(), randomVec(300)));
       case 12: {
         node->beginDataEdit(HTimeRange::forever());
         node->setLocalPos(randomTime(), randomVec(1000));
@@ -281,13 +281,10 @@ TEST_F(TransformTest, FlatAndUnsoundValuesDoNoHarm) {
   EXPECT_EQ(node->getLocalPos(0), Vec3(0, 6, 7)) << "what is squashed lies at 0";
   node->setWSScale(0, {2, 2, 2});
   EXPECT_EQ(node->getLocalScale(0), Vec3(0, 2, 2));
-  node->setLocalPos(0, {nan, 0, 0});
-  node->setConstLocalPos({0, nan, 0});
-  node->setWSPos(0, {0, 0, nan});
+  EXPECT_FALSE(node->setLocalPos(0, {nan, 0, 0}));
+  EXPECT_FALSE(node->setConstLocalPos({0, nan, 0}));
+  EXPECT_FALSE(node->setWSPos(0, {0, 0, nan}));
   EXPECT_EQ(node->getLocalPos(0), Vec3(0, 6, 7));
-  create<Clip>("clip");
-  node->setLocalPos(0, {nan, 0, 0});
-  EXPECT_EQ(node->getTranslationChannel()->getNumKeys(), 0);
   EXPECT_FALSE(node->setPreTranslation({0, nan, 0}));
 }
 
