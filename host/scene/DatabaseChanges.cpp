@@ -5,6 +5,7 @@
 #include "host/scene/ChangeSetBuilder.h"
 #include "host/scene/Database.h"
 #include "host/scene/HTimeManager.h"
+#include "host/scene/PropertyTable.h"
 #include "host/scene/SceneAside.h"
 #include "host/scene/SceneIndex.h"
 #include "host/scene/SubjectManager.h"
