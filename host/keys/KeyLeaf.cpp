@@ -46,36 +46,63 @@ void KeyLeaf::readValues(int slot, int step, int n, int first, int end, double* 
   }
 }
 
+// Lets add() put n keys at a slot, part by part and times last. Where it fails, what the other parts took is
+// taken away again.
+template <class Add>
+void KeyLeaf::addWholly(int slot, int n, Add add) {
+  try {
+    add();
+  } catch (...) {
+    auto const takeBack = [=, this](auto& column, int width) {
+      if (column.size() > size() * width) column.erase(slot * width, (slot + n) * width);
+    };
+    if (m_form == Form::Double) takeBack(m_doubles, m_width);
+    if (m_form == Form::Float) takeBack(m_floats, m_width);
+    takeBack(m_flags, 1);
+    takeBack(m_selection, 1);
+    throw;
+  }
+}
+
 void KeyLeaf::insert(int slot, int64 time, double const* values, KeyFlags const& flags) {
-  insertValues(slot, values, 1);
-  insertFlags(slot, flags, 1);
-  m_times.insert(slot, time, m_limit);
+  addWholly(slot, 1, [&] {
+    insertValues(slot, values, 1);
+    insertFlags(slot, flags, 1);
+    m_times.insert(slot, time, m_limit);
+  });
+  counts.count(flags, 1);
 }
 
 void KeyLeaf::append(int64 start, int64 period, double const* values, int n) {
-  insertValues(size(), values, n);
-  insertFlags(size(), {}, n);
-  m_times.append(start, period, n, m_limit);
+  addWholly(size(), n, [&] {
+    insertValues(size(), values, n);
+    insertFlags(size(), {}, n);
+    m_times.append(start, period, n, m_limit);
+  });
+  counts.count({}, n);
 }
 
 void KeyLeaf::append(KeyLeaf const& from, int first, int last) {
   int const n = last - first;
   std::vector<double> values(static_cast<size_t>(n * m_width));
   from.readValues(first, 1, n, 0, m_width, values.data(), m_width);
-  insertValues(size(), values.data(), n);
-  appendBits(m_flags, from.m_flags, kWhole, first, n);
-  appendBits(m_selection, from.m_selection, 0, first, n);
-  for (int slot = first; slot < last; ++slot) counts.count(from.flags(slot), 1);
-  m_times.append(from.m_times, first, last);
+  addWholly(size(), n, [&] {
+    insertValues(size(), values.data(), n);
+    appendBits(m_flags, from.m_flags, kWhole, first, n);
+    appendBits(m_selection, from.m_selection, 0, first, n);
+    m_times.append(from.m_times, first, last);
+  });
+  countRange(from, first, last, 1);
 }
 
-void KeyLeaf::write(int slot, double const* values, unsigned mask) {
+void KeyLeaf::write(int slot, double const* values, unsigned mask, KeyFlags const& flags) {
   std::array<double, 4> fresh{};
   this->values(slot, fresh.data());
   for (int c = 0; c < m_width; ++c)
     if (m_width != 3 || mask >> c & 1) fresh[static_cast<size_t>(c)] = values[c];
+  spellOutFlags(flags);
   putValues(slot, fresh.data());
-  setFlags(slot, {components(slot) | mask, bridges(slot), selected(slot)});
+  setFlags(slot, flags);
 }
 
 // Times come first: they may need memory for another form, of which there may be none.
@@ -83,7 +110,7 @@ void KeyLeaf::erase(int first, int last) {
   m_times.erase(first, last);
   if (m_form == Form::Double) m_doubles.erase(first * m_width, last * m_width);
   if (m_form == Form::Float) m_floats.erase(first * m_width, last * m_width);
-  for (int slot = first; slot < last; ++slot) counts.count(flags(slot), -1);
+  countRange(*this, first, last, -1);
   if (!plain()) m_flags.erase(first, last);
   if (!m_selection.empty()) m_selection.erase(first, last);
   dropIdleFlags();
@@ -91,17 +118,47 @@ void KeyLeaf::erase(int first, int last) {
 
 void KeyLeaf::keep(int const* slots, int n) {
   KeyCounts left;
-  for (int i = 0; i < n; ++i) left.count(flags(slots[i]), 1);
+  if (plain() && m_selection.empty()) left.count({}, n);
+  for (int i = 0; left.keys < n; ++i) left.count(flags(slots[i]), 1);
+  m_times.keep(slots, n);
   counts = left;
   if (m_form == Form::Double) m_doubles.keep(slots, n, m_width);
   if (m_form == Form::Float) m_floats.keep(slots, n, m_width);
   if (!plain()) m_flags.keep(slots, n, 1);
   if (!m_selection.empty()) m_selection.keep(slots, n, 1);
-  m_times.keep(slots, n);
   dropIdleFlags();
 }
 
-void KeyLeaf::pack() {
+// Counts keys of a leaf here: once more (by 1) or less (by -1).
+void KeyLeaf::countRange(KeyLeaf const& of, int first, int last, int by) {
+  if (of.plain() && of.m_selection.empty()) return counts.count({}, by * (last - first));
+  for (int slot = first; slot < last; ++slot) counts.count(of.flags(slot), by);
+}
+
+int KeyLeaf::mark(Mark what, bool on, unsigned mask, int first, int last) {
+  bool const bridges = what == Mark::Bridged;
+  int const shift = bridges ? kBridgeShift : 0;
+  if (on) spellOutFlags({kWhole, bridges ? mask : 0, bridges ? 0 : mask});
+  Column& column = bridges ? m_flags : m_selection;
+  if (column.empty()) return 0;
+  int touchedKeys = 0, keys = 0, byComponent[3] = {};  // keys that are marked, or no longer are
+  unsigned char* bits = column.data();
+  for (int slot = first; slot < last; ++slot) {
+    unsigned const now = bits[slot] >> shift & kWhole, touched = mask & (on ? components(slot) : now);
+    unsigned const then = on ? now | touched : now & ~touched, turned = now ^ then;
+    bits[slot] = static_cast<unsigned char>(bits[slot] ^ turned << shift);
+    touchedKeys += touched != 0;
+    keys += (now == 0) != (then == 0);
+    for (int c = 0; c < 3; ++c) byComponent[c] += static_cast<int>(turned >> c & 1);
+  }
+  int const by = on ? 1 : -1;
+  if (!bridges) counts.selected += by * keys;
+  for (int c = 0; c < 3; ++c) (bridges ? counts.bridging : counts.selectedOn)[c] += by * byComponent[c];
+  dropIdleFlags();
+  return touchedKeys;
+}
+
+void KeyLeaf::pack() noexcept {
   m_times.pack();
   m_doubles.shrink();
   m_floats.shrink();
@@ -112,14 +169,17 @@ void KeyLeaf::pack() {
 void KeyLeaf::setFlags(int slot, KeyFlags const& fresh) {
   KeyFlags const old = flags(slot);
   if (fresh == old) return;
-  // Columns that have to be written out come first: there may be no memory for them.
-  unsigned const bits = fresh.components | fresh.bridges << kBridgeShift;
-  if (plain() && bits != kWhole) insertBits(m_flags, kWhole, kWhole, 0, 0);
-  if (m_selection.empty() && fresh.selected) insertBits(m_selection, 0, 0, 0, 0);
+  spellOutFlags(fresh);
   counts.count(old, -1);
   counts.count(fresh, 1);
-  if (!plain()) m_flags[slot] = static_cast<unsigned char>(bits);
+  if (!plain()) m_flags[slot] = static_cast<unsigned char>(fresh.components | fresh.bridges << kBridgeShift);
   if (!m_selection.empty()) m_selection[slot] = static_cast<unsigned char>(fresh.selected);
+}
+
+// Writes out the columns that a key with these flags needs, so that nothing else of its edit can fail.
+void KeyLeaf::spellOutFlags(KeyFlags const& toBe) {
+  if (plain() && (toBe.components != kWhole || toBe.bridges)) insertBits(m_flags, kWhole, kWhole, 0, 0);
+  if (m_selection.empty() && toBe.selected) insertBits(m_selection, 0, 0, 0, 0);
 }
 
 void KeyLeaf::dropIdleFlags() {
@@ -143,12 +203,22 @@ void KeyLeaf::transform(int first, int last, void (*change)(void*, double*), voi
 
 // Replaces all values, whose number may change.
 void KeyLeaf::setValues(double const* values, int n) {
+  bool const one = n == 1 || allEqual(values, m_width, n);
+  auto const valueAt = [values](int i) { return values[i]; };
+  if (!one && fitFloats(values, n * m_width)) return become(Form::Float, m_floats, n * m_width, valueAt);
+  become(one ? Form::One : Form::Double, m_doubles, (one ? 1 : n) * m_width, valueAt);
+}
+
+// Replaces all values by n of them in another form.
+template <class T, class ValueAt>
+void KeyLeaf::become(Form form, KeyColumn<T>& column, int n, ValueAt valueAt) {
+  KeyColumn<T> fresh;
+  T* to = fresh.open(0, n, m_limit * m_width);
+  for (int i = 0; i < n; ++i) to[i] = static_cast<T>(valueAt(i));
   m_doubles.clear();
   m_floats.clear();
-  m_form = n == 1 || allEqual(values, m_width, n) ? Form::One
-           : fitFloats(values, n * m_width)       ? Form::Float
-                                                  : Form::Double;
-  addValues(0, values, n);
+  column = std::move(fresh);
+  m_form = form;
 }
 
 void KeyLeaf::insertValues(int slot, double const* values, int n) {
@@ -177,7 +247,6 @@ void KeyLeaf::insertFlags(int slot, KeyFlags const& flags, int n) {
   unsigned const bits = flags.components | flags.bridges << kBridgeShift;
   if (bits != kWhole || !plain()) insertBits(m_flags, kWhole, bits, slot, n);
   if (flags.selected || !m_selection.empty()) insertBits(m_selection, 0, flags.selected, slot, n);
-  for (int i = 0; i < n; ++i) counts.count(flags, 1);
 }
 
 void KeyLeaf::appendBits(Column& column, Column const& from, unsigned absent, int first, int n) {
@@ -212,23 +281,13 @@ void KeyLeaf::putValues(int slot, double const* values) {
 void KeyLeaf::spellOutValues(bool asFloats) {
   std::array<double, 4> one{};
   values(0, one.data());
-  m_doubles.clear();
-  m_form = asFloats ? Form::Float : Form::Double;
+  auto const valueAt = [this, &one](int i) { return one[static_cast<size_t>(i % m_width)]; };
   int const n = size() * m_width;
-  if (asFloats) {
-    float* gap = m_floats.open(0, n, m_limit * m_width);
-    for (int i = 0; i < n; ++i) gap[i] = static_cast<float>(one[static_cast<size_t>(i % m_width)]);
-  } else {
-    double* gap = m_doubles.open(0, n, m_limit * m_width);
-    for (int i = 0; i < n; ++i) gap[i] = one[static_cast<size_t>(i % m_width)];
-  }
+  asFloats ? become(Form::Float, m_floats, n, valueAt) : become(Form::Double, m_doubles, n, valueAt);
 }
 
 void KeyLeaf::widen() {
-  double* gap = m_doubles.open(0, m_floats.size(), m_limit * m_width);
-  for (int i = 0; i < m_floats.size(); ++i) gap[i] = static_cast<double>(m_floats[i]);
-  m_floats.clear();
-  m_form = Form::Double;
+  become(Form::Double, m_doubles, m_floats.size(), [this](int i) { return m_floats[i]; });
 }
 
 int64 KeyLeaf::memoryUse() const {

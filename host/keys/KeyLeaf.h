@@ -87,19 +87,26 @@ class KeyLeaf final : public KeyNode {
     return scan<-1, false>(m_selection, 0, slot, mask);
   }
 
+  // Edits that throw for lack of memory leave the leaf as it was.
   void insert(int slot, int64 time, double const* values, KeyFlags const& flags);
   // n whole keys after the last one. The leaf must have room for them.
   void append(int64 start, int64 period, double const* values, int n);
   void append(KeyLeaf const& from, int first, int last);
-  void write(int slot, double const* values, unsigned mask);
+  // The values of the components of the mask, and all flags.
+  void write(int slot, double const* values, unsigned mask, KeyFlags const& flags);
   void erase(int first, int last);
   // Leaves the n ascending slots; cheaper than erasing the others run by run.
   void keep(int const* slots, int n);
-  // To be called when an edit of many keys is done: gives back the room that it left.
-  void pack();
+  // To be called when an edit of many keys is done: gives back the room that it left, if there is memory for
+  // it.
+  void pack() noexcept;
   void setFlags(int slot, KeyFlags const& flags);
   // To be called when a series of setFlags is done.
   void dropIdleFlags();
+  // Marks the components of the mask that keys hold in [first, last), or takes the mark away. Returns how
+  // many keys hold (had marked) any of them.
+  enum class Mark { Selected, Bridged };
+  int mark(Mark what, bool on, unsigned mask, int first, int last);
   // Replaces the values of the whole keys in [first, last) by change(values). One call may serve for all keys
   // that have equal values.
   void transform(int first, int last, void (*change)(void*, double*), void* context);
@@ -123,10 +130,16 @@ class KeyLeaf final : public KeyNode {
     return -1;
   }
 
+  template <class Add>
+  void addWholly(int slot, int n, Add add);
   void insertValues(int slot, double const* values, int n);
   void insertFlags(int slot, KeyFlags const& flags, int n);
+  void spellOutFlags(KeyFlags const& toBe);
+  void countRange(KeyLeaf const& of, int first, int last, int by);
   void appendBits(Column& column, Column const& from, unsigned absent, int first, int n);
   void insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n);
+  template <class T, class ValueAt>
+  void become(Form form, KeyColumn<T>& column, int n, ValueAt valueAt);
   void spellOutValues(bool asFloats);
   void widen();
   void setValues(double const* values, int n);

@@ -6,6 +6,9 @@
 
 #include <atomic>
 #include <utility>
+#if __has_include(<sys/single_threaded.h>)
+#include <sys/single_threaded.h>
+#endif
 
 #include "host/base/Types.h"
 
@@ -27,8 +30,13 @@ struct KeyCounts {
   int64 selectedOn[3] = {};  // keys selected on the component
   int64 bridging[3] = {};    // keys that bridge the component
 
-  // One more (by 1) or one less (by -1) key with these flags.
+  // `by` keys more with these flags, or less.
   void count(KeyFlags const& flags, int by) {
+    if (flags == KeyFlags()) {
+      keys += by, whole += by;
+      for (int64& each : held) each += by;
+      return;
+    }
     keys += by;
     whole += flags.components == 7 ? by : 0;
     selected += flags.selected ? by : 0;
@@ -108,8 +116,7 @@ class KeyNodeRef {
     return *this;
   }
   ~KeyNodeRef() {
-    if (m_node && (!m_node->isShared() || m_node->m_references.fetch_sub(1, std::memory_order_acq_rel) == 1))
-      destroy(m_node);
+    if (m_node) letGo();
   }
 
   KeyNode* get() const { return m_node; }
@@ -125,8 +132,25 @@ class KeyNodeRef {
   }
 
  private:
+  // Without other threads there is nobody to lock out, and copies of inner nodes count many references.
+  static bool isAlone() {
+#if __has_include(<sys/single_threaded.h>)
+    return __libc_single_threaded;
+#else
+    return false;
+#endif
+  }
   void hold() {
-    if (m_node) m_node->m_references.fetch_add(1, std::memory_order_relaxed);
+    if (!m_node) return;
+    std::atomic<int>& count = m_node->m_references;
+    if (isAlone()) return count.store(count.load(std::memory_order_relaxed) + 1, std::memory_order_relaxed);
+    count.fetch_add(1, std::memory_order_relaxed);
+  }
+  void letGo() {
+    std::atomic<int>& count = m_node->m_references;
+    if (!m_node->isShared()) return destroy(m_node);
+    if (isAlone()) return count.store(count.load(std::memory_order_relaxed) - 1, std::memory_order_relaxed);
+    if (count.fetch_sub(1, std::memory_order_acq_rel) == 1) destroy(m_node);
   }
   static void destroy(KeyNode*);
   static KeyNode* clone(KeyNode const&);

@@ -16,8 +16,10 @@
 //
 // Copying a track is a snapshot and costs one reference; the copies part at the first change of either.
 // Unless a comment says otherwise an operation is logarithmic in the number of keys, plus one leaf.
-// Times are ticks. Masks: 1 x, 2 y, 4 z, 7 all; one-valued and rotation tracks know only "all" (any non-zero
-// mask). A key is whole when it holds every component.
+//
+// Where memory runs out, set() leaves the track as it was; other edits may have changed some of their keys,
+// but for bridges (3) the invariants hold. Times are ticks. Masks: 1 x, 2 y, 4 z, 7 all; one-valued and
+// rotation tracks know only "all" (any non-zero mask). A key is whole when it holds every component.
 #pragma once
 
 #include <array>
@@ -215,6 +217,8 @@ class KeyTrack {
   struct Place;     // a key: its leaf, slot and index
   struct LeafEdit;  // what a range edit does to the leaves that it touches
   class Sampler;    // sample() on one curve: all components, or one that is keyed alone
+  class Path;       // from the root to a leaf
+  struct Added;     // what came into a leaf
 
   unsigned normal(unsigned mask) const { return m_shape == Shape::Vector ? mask & kAll : mask ? kAll : 0; }
   void changed();
@@ -227,13 +231,13 @@ class KeyTrack {
   void evaluateAt(int64 time, Interpolation, unsigned mask, Place const& base, Values const& defaults,
                   Values& values, Cursor const*) const;
 
-  void put(Key const& key);
-  KeyNodeRef setBelow(KeyNodeRef& node, Key const& key);
-  KeyNodeRef setInLeaf(KeyNodeRef& node, Key const& key);
-  KeyNodeRef appendBelow(KeyNodeRef& node, int64 start, int64 period, double const* values, int n);
-  void growRoot(KeyNodeRef sibling);
+  void put(int64 time, Values const& values, KeyFlags const& flags);
+  template <class AddTo>
+  void addKeys(int64 time, AddTo const& addTo);
+  void setInLeaf(Path& path, int64 time, Values const& values, KeyFlags const& flags, Added& added);
   int64 edit(int64 firstIndex, int64 lastIndex, LeafEdit&);
   int64 editTimes(int64 first, int64 last, LeafEdit&);
+  void editOne(int64 index, LeafEdit&);
   void editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit&);
   void endBridge(int64 index, unsigned part);  // -1: no key
   // What deleteRange does with the keys that are put at the ends of bridges, with values of `curve`.

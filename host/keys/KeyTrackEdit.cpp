@@ -1,9 +1,12 @@
 // Edits of the key track. Each copies the shared nodes on its path, changes one leaf or those of a range, and
 // brings the counts above up to date on the way back.
 #include <algorithm>
+#include <array>
 #include <atomic>
 #include <cassert>
+#include <numeric>
 
+#include "host/base/ThreadLocal.h"
 #include "host/keys/KeyTrackPlace.h"
 #include "host/time/Ticks.h"
 
@@ -21,12 +24,12 @@ struct KeyTrack::LeafEdit {
 
   Kind kind;
   unsigned mask;
-  bool many = false;  // more than one key is visited
   int64 affected = 0;
   void (*change)(void*, double*) = nullptr;  // Transform
   void* context = nullptr;
   // Thin: what each key from the next one to be visited loses, and bridges from now on.
   unsigned char const *lost = nullptr, *bridged = nullptr;
+  std::vector<int> kept{};  // slots of the leaf that is edited
 
   bool erases() const { return kind == Kind::Erase || kind == Kind::EraseSelected || kind == Kind::Thin; }
   bool dropsWhole() const { return kind == Kind::Erase && mask == kAll; }
@@ -64,186 +67,246 @@ struct KeyTrack::LeafEdit {
     } else if (erases()) {
       eraseComponents(leaf, first, last);
     } else {
-      changeFlags(leaf, first, last);
+      bool const bridges = kind == Kind::Bridge || kind == Kind::Unbridge;
+      affected += leaf.mark(bridges ? KeyLeaf::Mark::Bridged : KeyLeaf::Mark::Selected,
+                            kind == Kind::Select || kind == Kind::Bridge, mask, first, last);
     }
   }
 
  private:
-  void changeFlags(KeyLeaf& leaf, int first, int last) {
-    bool const adds = kind == Kind::Select || kind == Kind::Bridge;
-    bool const bridges = kind == Kind::Bridge || kind == Kind::Unbridge;
-    for (int slot = first; slot < last; ++slot) {
-      KeyFlags flags = leaf.flags(slot);
-      unsigned& bits = bridges ? flags.bridges : flags.selected;
-      unsigned const touched = mask & (adds ? flags.components : bits);
-      affected += touched != 0;
-      bits = adds ? bits | touched : bits & ~touched;
-      leaf.setFlags(slot, flags);
-    }
-    leaf.dropIdleFlags();
-  }
-
-  // Runs of keys that lose everything go at once, from the back, so that the slots before them stay.
   void eraseComponents(KeyLeaf& leaf, int first, int last) {
-    int runEnd = last;
-    for (int slot = last - 1; slot >= first; --slot) {
+    kept.resize(static_cast<size_t>(first));
+    std::iota(kept.begin(), kept.end(), 0);
+    for (int slot = first; slot < last; ++slot) {
       KeyFlags const now = leaf.flags(slot);
       unsigned const gone = kind == Kind::Thin    ? lost[slot] & now.components
                             : kind == Kind::Erase ? mask & now.components
                                                   : mask & now.selected;
       affected += gone != 0;
       if (gone == now.components) continue;
-
-      if (slot + 1 < runEnd) leaf.erase(slot + 1, runEnd);
-      runEnd = slot;
-      if (gone != 0) {
-        constexpr Values kAbsent{};
-        leaf.write(slot, kAbsent.data(), gone);
-      }
-      leaf.setFlags(
-          slot, {now.components & ~gone, (now.bridges & ~gone) | (kind == Kind::Thin ? bridged[slot] : 0u),
-                 now.selected & ~gone});
+      kept.push_back(slot);
+      unsigned const added = kind == Kind::Thin ? bridged[slot] : 0;
+      KeyFlags const left{now.components & ~gone, (now.bridges & ~gone) | added, now.selected & ~gone};
+      constexpr Values kAbsent{};
+      gone ? leaf.write(slot, kAbsent.data(), gone, left) : leaf.setFlags(slot, left);
     }
-    if (first < runEnd) leaf.erase(first, runEnd);
-    leaf.dropIdleFlags();
     if (kind == Kind::Thin) lost += last, bridged += last;
+    auto const left = static_cast<int>(kept.size());
+    if (left == first) {
+      leaf.erase(first, last);
+    } else if (left < last) {
+      for (int slot = last; slot < leaf.size(); ++slot) kept.push_back(slot);
+      leaf.keep(kept.data(), static_cast<int>(kept.size()));
+    } else {
+      leaf.dropIdleFlags();
+    }
   }
 };
 
-void KeyTrack::changed() {
-  static std::atomic<uint64> last = 0;
-  m_version = last.fetch_add(1, std::memory_order_relaxed) + 1;
+namespace {
+
+// Versions that this thread may give out: threads take them by many at a time.
+TALIX_THREAD_LOCAL uint64 t_version = 0;
+TALIX_THREAD_LOCAL uint64 t_versionsEnd = 0;
+
+}  // namespace
+
+inline void KeyTrack::changed() {
+  if (t_version == t_versionsEnd) {
+    constexpr uint64 kAtATime = 1 << 16;
+    static std::atomic<uint64> s_given = 1;  // 0 is that of new tracks and cursors
+    t_version = s_given.fetch_add(kAtATime, std::memory_order_relaxed);
+    t_versionsEnd = t_version + kAtATime;
+  }
+  m_version = t_version++;
 }
 
-void KeyTrack::growRoot(KeyNodeRef sibling) {
-  auto* root = new KeyInner(m_root->level() + 1, m_limits.fanout);
-  KeyNodeRef fresh(root);
-  root->insert(0, std::move(m_root));
-  root->insert(1, std::move(sibling));
-  m_root = std::move(fresh);
-}
+// Keys that an edit put into a leaf; their flags are the same.
+struct KeyTrack::Added {
+  KeyNodeRef sibling{};  // the new leaf to the right, if any
+  int keys = 1;
+  KeyFlags flags{};
+  bool replaces = false;  // one key that was there
+  KeyFlags flagsBefore{};
+};
+
+// The way from the root to a leaf that is to be edited.
+class KeyTrack::Path {
+ public:
+  // Goes down, taking the child that choose(inner) names, and makes the nodes the track's own on the way.
+  // Ends at the leaf, which the caller makes its own where that is needed.
+  template <class Choose>
+  Path(KeyNodeRef& root, Choose choose) : m_leaf(&root) {
+    while (!(*m_leaf)->isLeaf()) {
+      m_leaf->own();
+      auto& inner = asInner(*m_leaf->get());
+      int const i = choose(inner);
+      m_steps[m_size++] = {&inner, i};
+      m_leaf = &inner.childRef(i);
+    }
+  }
+  KeyNodeRef& leaf() { return *m_leaf; }
+
+  // The inner nodes that a split of the leaf uses up, since full ones above it split as well, and when all
+  // are full the track grows a root. To be made before anything changes, so that nothing can fail after that.
+  void makeSpares(int fanout) {
+    int needed = 0;
+    while (needed < m_size && at(m_size - 1 - needed).inner->full()) ++needed;
+    if (needed == m_size) ++needed;
+    m_spares.reserve(static_cast<size_t>(needed));
+    for (int level = needed; level > 0; --level) m_spares.emplace_back(new KeyInner(level, fanout));
+  }
+  // Brings the nodes above up to date after keys were added from a time on.
+  void finishAdding(KeyNodeRef& root, int64 time, Added& added) noexcept {
+    if (added.replaces && added.flags == added.flagsBefore) return;
+    KeyNodeRef& sibling = added.sibling;
+    for (int k = m_size - 1; k >= 0; --k) {
+      auto const [inner, i] = at(k);
+      inner->counts.count(added.flags, added.keys);
+      if (added.replaces) inner->counts.count(added.flagsBefore, -1);
+      inner->keysAdded(i, time);
+      if (!sibling) continue;
+      inner->counts -= sibling->counts;  // which the insertion adds
+      sibling = inner->insert(i + 1, std::move(sibling), inner->full() ? takeSpare() : KeyNodeRef());
+    }
+    if (!sibling) return;
+    KeyNodeRef grown = takeSpare();
+    asInner(*grown.get()).insert(0, std::move(root), {});
+    asInner(*grown.get()).insert(1, std::move(sibling), {});
+    root = std::move(grown);
+  }
+  // The same after a key was edited; `before`: the leaf's counts. True when no key is left in the tree.
+  bool finishEdit(KeyCounts const& before, bool erases) noexcept {
+    KeyCounts gained = (*m_leaf)->counts;
+    gained -= before;
+    bool emptied = (*m_leaf)->counts.keys == 0, shrunk = erases;
+    for (int k = m_size - 1; k >= 0; --k) {
+      auto const [inner, i] = at(k);
+      if (emptied) inner->childRef(i).reset();
+      inner->childGained(i, gained);
+      int const gone = emptied ? inner->closeGaps(i) : 0;
+      // Only neighbours of one that has become smaller may fit one node now.
+      shrunk = shrunk && (inner->join(i, i - gone, false) || gone > 0);
+      emptied = inner->size() == 0;
+    }
+    return emptied;
+  }
+
+ private:
+  static constexpr int kMaxDepth = 64;  // nodes have two children at least, or nearly so
+  struct Step {
+    KeyInner* inner;
+    int child;
+  };
+  Step& at(int k) { return m_steps[static_cast<size_t>(k)]; }
+  // From the lowest level up.
+  KeyNodeRef takeSpare() noexcept {
+    KeyNodeRef node = std::move(m_spares.back());
+    m_spares.pop_back();
+    return node;
+  }
+
+  std::array<Step, kMaxDepth> m_steps;  // the first m_size
+  int m_size = 0;
+  KeyNodeRef* m_leaf;
+  std::vector<KeyNodeRef> m_spares;
+};
 
 void KeyTrack::set(int64 time, Values const& values, unsigned mask) {
   mask = normal(mask);
   if (mask == 0) return;
-  Key key{.time = time, .values = values};
-  key.components = static_cast<unsigned char>(mask);
-  key.bridges = static_cast<unsigned char>(bridgedAt(time, mask));
-  put(key);
+  put(time, values, {.components = mask, .bridges = bridgedAt(time, mask)});
 }
 
-// Adds the key's components to what the track holds at its time; components that it holds already keep their
+// Adds the components to what the track holds at the time; components that it holds already keep their
 // bridges.
-void KeyTrack::put(Key const& key) {
+void KeyTrack::put(int64 time, Values const& values, KeyFlags const& flags) {
+  addKeys(time, [&](Path& path, Added& added) { setInLeaf(path, time, values, flags, added); });
+}
+
+// Lets addTo(path, added) add keys to the leaf that a time falls into, all or, when it throws, none. Before
+// it splits the leaf it makes the spares for that.
+template <class AddTo>
+void KeyTrack::addKeys(int64 time, AddTo const& addTo) {
   changed();
-  if (!m_root) m_root = KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
-  if (KeyNodeRef sibling = setBelow(m_root, key)) growRoot(std::move(sibling));
+  KeyNodeRef fresh = m_root ? KeyNodeRef() : KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
+  KeyNodeRef& root = m_root ? m_root : fresh;
+  Path path(root, [time](KeyInner const& inner) { return inner.childAtTime(time); });
+  Added added;
+  addTo(path, added);
+  path.finishAdding(root, time, added);
+  if (fresh) m_root = std::move(fresh);
 }
 
-// Returns the new node to the right when the node had to split.
-KeyNodeRef KeyTrack::setBelow(KeyNodeRef& node, Key const& key) {
-  if (node->isLeaf()) return setInLeaf(node, key);
-  node.own();
-  auto& inner = asInner(*node.get());
-  int const i = inner.childAtTime(key.time);
-  KeyNodeRef& child = inner.childRef(i);
-  KeyCounts const before = child->counts;
-  KeyNodeRef sibling = setBelow(child, key);
-  inner.childChanged(i, before);
-  return sibling ? inner.insert(i + 1, std::move(sibling)) : KeyNodeRef();
-}
-
-KeyNodeRef KeyTrack::setInLeaf(KeyNodeRef& node, Key const& key) {
+void KeyTrack::setInLeaf(Path& path, int64 time, Values const& values, KeyFlags const& flags, Added& added) {
+  KeyNodeRef& node = path.leaf();
   auto const insertInto = [&](KeyLeaf& leaf, int slot) {
     Values held{};
     for (size_t c = 0; c < held.size(); ++c)
-      if (m_shape != Shape::Vector || key.components >> c & 1) held[c] = key.values[c];
-    leaf.insert(slot, key.time, held.data(), {key.components, key.bridges, key.selected});
+      if (m_shape != Shape::Vector || flags.components >> c & 1) held[c] = values[c];
+    leaf.insert(slot, time, held.data(), flags);
   };
 
   auto const& old = asLeaf(*node.get());
   int const size = old.size();
-  int const slot = size == 0 ? 0 : old.lowerBound(key.time);
-  bool const present = slot < size && old.time(slot) == key.time;
+  int const slot = size == 0 ? 0 : old.lowerBound(time);
+  bool const present = slot < size && old.time(slot) == time;
   if (present || !old.full()) {
     node.own();
     auto& leaf = asLeaf(*node.get());
-    if (present) {
-      KeyFlags const held = leaf.flags(slot);
-      leaf.write(slot, key.values.data(), key.components);
-      leaf.setFlags(slot, {held.components | key.components, held.bridges | (key.bridges & ~held.components),
-                           held.selected | key.selected});
-      leaf.dropIdleFlags();
-    } else {
-      insertInto(leaf, slot);
-    }
-    return {};
+    added.flags = flags;
+    if (!present) return insertInto(leaf, slot);
+    KeyFlags const held = added.flagsBefore = leaf.flags(slot);
+    added.replaces = true;
+    added.flags = {held.components | flags.components, held.bridges | (flags.bridges & ~held.components),
+                   held.selected | flags.selected};
+    leaf.write(slot, values.data(), flags.components, added.flags);
+    return leaf.dropIdleFlags();
   }
 
-  // Keys that arrive in order, from either end, leave full leaves behind; others halve them.
-  auto* fresh = new KeyLeaf(width(), m_limits.leafKeys);
-  KeyNodeRef sibling(fresh);
-  if (slot == 0 || slot == size) {
-    insertInto(*fresh, 0);
-    if (slot == 0) std::swap(node, sibling);
-    return sibling;
-  }
-  node.own();
-  auto& left = asLeaf(*node.get());
+  // Keys that arrive in order, from either end, leave full leaves behind; others halve them. The half that
+  // the key goes to becomes a leaf of its own. Erasing an end of the other one needs no memory.
+  path.makeSpares(m_limits.fanout);
   int const half = size / 2;
-  fresh->append(left, half, size);
-  left.erase(half, size);
-  if (slot <= half) {
-    insertInto(left, slot);
-  } else {
-    insertInto(*fresh, slot - half);
+  bool const toLeft = slot <= half;
+  int const first = slot == size ? size : toLeft ? 0 : half;
+  int const last = slot == 0 ? 0 : toLeft ? half : size;
+  auto* leaf = new KeyLeaf(width(), m_limits.leafKeys);
+  KeyNodeRef fresh(leaf);
+  if (first < last) {
+    node.own();
+    leaf->append(asLeaf(*node.get()), first, last);
   }
-  return sibling;
+  insertInto(*leaf, slot - first);
+  if (first < last) asLeaf(*node.get()).erase(first, last);
+  if (toLeft) std::swap(node, fresh);
+  added.flags = flags;
+  added.sibling = std::move(fresh);
 }
 
 void KeyTrack::append(int64 start, int64 period, double const* values, int64 n) {
   if (n <= 0) return;
   assert((n == 1 || period > 0) && (empty() || start > timeAt(count() - 1)));
-  changed();
   while (n > 0) {
-    Place const last = placeAt(count() - 1);
-    int64 const used = last && !last.leaf->full() ? last.leaf->size() : 0;
-    int const some = static_cast<int>(std::min(n, m_limits.leafKeys - used));
-    KeyNodeRef sibling;
-    if (m_root) {
-      sibling = appendBelow(m_root, start, period, values, some);
-    } else {
-      auto* leaf = new KeyLeaf(width(), m_limits.leafKeys);
-      m_root = KeyNodeRef(leaf);
-      leaf->append(start, period, values, some);
-    }
-    if (sibling) growRoot(std::move(sibling));
+    int some = 0;
+    addKeys(start, [&](Path& path, Added& added) {
+      KeyNodeRef& node = path.leaf();
+      bool const splits = asLeaf(*node.get()).full();
+      some =
+          static_cast<int>(std::min<int64>(n, m_limits.leafKeys - (splits ? 0 : asLeaf(*node.get()).size())));
+      added.keys = some;
+      if (splits) {
+        path.makeSpares(m_limits.fanout);
+        added.sibling = KeyNodeRef(new KeyLeaf(width(), m_limits.leafKeys));
+      } else {
+        node.own();
+      }
+      asLeaf(*(splits ? added.sibling : node).get()).append(start, period, values, some);
+    });
     start += period * some;
     values += static_cast<int64>(some) * width();
     n -= some;
   }
-}
-
-// Appends n keys, which fit the last leaf or, when that is full, a new one.
-KeyNodeRef KeyTrack::appendBelow(KeyNodeRef& node, int64 start, int64 period, double const* values, int n) {
-  if (node->isLeaf()) {
-    if (asLeaf(*node.get()).full()) {
-      auto* fresh = new KeyLeaf(width(), m_limits.leafKeys);
-      fresh->append(start, period, values, n);
-      return KeyNodeRef(fresh);
-    }
-    node.own();
-    asLeaf(*node.get()).append(start, period, values, n);
-    return {};
-  }
-  node.own();
-  auto& inner = asInner(*node.get());
-  int const i = inner.size() - 1;
-  KeyNodeRef& child = inner.childRef(i);
-  KeyCounts const before = child->counts;
-  KeyNodeRef sibling = appendBelow(child, start, period, values, n);
-  inner.childChanged(i, before);
-  return sibling ? inner.insert(i + 1, std::move(sibling)) : KeyNodeRef();
 }
 
 int64 KeyTrack::edit(int64 firstIndex, int64 lastIndex, LeafEdit& what) {
@@ -251,8 +314,7 @@ int64 KeyTrack::edit(int64 firstIndex, int64 lastIndex, LeafEdit& what) {
   lastIndex = std::min(lastIndex, count());
   if (firstIndex >= lastIndex || what.skips(*m_root.get())) return 0;
   changed();
-  what.many = lastIndex - firstIndex > 1;
-  editBelow(m_root, firstIndex, lastIndex, what);
+  lastIndex - firstIndex == 1 ? editOne(firstIndex, what) : editBelow(m_root, firstIndex, lastIndex, what);
   while (m_root && !m_root->isLeaf() && asInner(*m_root.get()).size() == 1) {
     KeyNodeRef only = asInner(*m_root.get()).childRef(0);
     m_root = std::move(only);
@@ -260,7 +322,17 @@ int64 KeyTrack::edit(int64 firstIndex, int64 lastIndex, LeafEdit& what) {
   return what.affected;
 }
 
-// Edits the keys with the indices [first, last) of the node; a node that loses all of them becomes null.
+void KeyTrack::editOne(int64 index, LeafEdit& what) {
+  Path path(m_root, [&index](KeyInner const& inner) { return inner.childAtIndex(index); });
+  path.leaf().own();
+  auto& leaf = asLeaf(*path.leaf().get());
+  KeyCounts const before = leaf.counts;
+  what.apply(leaf, static_cast<int>(index), static_cast<int>(index) + 1);
+  if (path.finishEdit(before, what.erases())) m_root.reset();
+}
+
+// Edits the keys with the indices [first, last) of the node; a node that loses all of them becomes null. When
+// it throws, some keys are edited and others are not, and the nodes are as whole as ever.
 void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& what) {
   if (what.skips(*node.get())) return;
   if (what.dropsWhole() && first == 0 && last == node->counts.keys) {
@@ -274,7 +346,7 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
     what.apply(leaf, static_cast<int>(first), static_cast<int>(last));
     if (leaf.size() == 0) {
       node.reset();
-    } else if (what.erases() && what.many) {
+    } else if (what.erases()) {
       leaf.pack();
     }
     return;
@@ -288,12 +360,23 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
   for (; i < inner.size() && before < last; ++i) {
     int64 const keys = inner.keys(i);
     KeyNodeRef& child = inner.childRef(i);
-    KeyCounts const counts = child->counts;
-    editBelow(child, std::max<int64>(first - before, 0), std::min(last - before, keys), what);
-    inner.childChanged(i, counts);
+    KeyCounts gained;
+    gained -= child->counts;
+    auto const finish = [&] {
+      if (child) gained += child->counts;
+      inner.childGained(i, gained);
+    };
+    try {
+      editBelow(child, std::max<int64>(first - before, 0), std::min(last - before, keys), what);
+    } catch (...) {
+      finish();
+      inner.closeGaps(firstChild);
+      throw;
+    }
+    finish();
     before += keys;
   }
-  if (what.erases()) inner.mend(firstChild, i - 1, what.many);
+  if (what.erases()) inner.join(firstChild, i - 1 - inner.closeGaps(firstChild), true);
   if (inner.size() == 0) node.reset();
 }
 
@@ -425,7 +508,7 @@ void KeyTrack::unbridge(int64 first, int64 last, unsigned mask) {
 
 void KeyTrack::restore(Key const& key) {
   restoreNone(key.time);
-  put(key);
+  put(key.time, key.values, {key.components, key.bridges, key.selected});
 }
 
 void KeyTrack::restoreNone(int64 time) {

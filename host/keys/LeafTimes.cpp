@@ -156,7 +156,13 @@ void LeafTimes::append(LeafTimes const& from, int first, int last) {
   if (first == last) return;
   int const limit = m_size + last - first;
   if (from.even()) return append(from[first], from.m_unit, last - first, limit);
-  for (int slot = first; slot < last; ++slot) append(from[slot], 0, 1, limit);
+  int const before = m_size;
+  try {
+    for (int slot = first; slot < last; ++slot) append(from[slot], 0, 1, limit);
+  } catch (...) {
+    erase(before, m_size);
+    throw;
+  }
 }
 
 void LeafTimes::erase(int first, int last) {
@@ -199,7 +205,7 @@ void LeafTimes::evenOut() {
   m_column.clear();
 }
 
-void LeafTimes::pack() {
+void LeafTimes::pack() noexcept {
   if (m_form == Form::Long || m_form == Form::Full) {
     // What offsets have in common besides their unit.
     int64 common = 0;
@@ -207,7 +213,11 @@ void LeafTimes::pack() {
       common = std::gcd(common, storedOffset(i) - storedOffset(0));
     int64 const divisor = unit() * common;
     Form const form = smallestFor(static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor));
-    if (form < m_form) convert(form, front(), divisor);
+    try {
+      if (form < m_form) convert(form, front(), divisor);
+    } catch (std::bad_alloc const&) {
+      // The form as it is does as well.
+    }
   }
   m_column.shrink();
 }

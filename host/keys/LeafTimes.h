@@ -38,14 +38,15 @@ class LeafTimes {
   int lastAtOrBefore(int64 time) const;  // the time must not lie before the first one
   void read(int slot, int n, int64* out) const;
 
+  // Edits that throw for lack of memory leave the times as they were.
   void insert(int slot, int64 time, int limit);
   void append(int64 start, int64 period, int n, int limit);
   void append(LeafTimes const& from, int first, int last);
   void erase(int first, int last);
   // Leaves the n ascending slots.
   void keep(int const* slots, int n);
-  // The smallest form, and no room for more.
-  void pack();
+  // The smallest form, and no room for more, as far as there is memory for it.
+  void pack() noexcept;
 
   int64 bytes() const { return m_column.bytes(); }
   bool isWhole() const { return m_column.size() == (even() ? 0 : m_size * words()); }

@@ -67,9 +67,7 @@ KeyTrack& ChangeSetBuilder::keysBefore(Controller& channel, NLEClip* clip, int l
 }
 
 void ChangeSetBuilder::tellNoKeys(Controller& channel) {
-  channel.forEachTrack([&](NLEClip* clip, int layer, KeyTrack const& track) {
-    if (!track.empty()) keysBefore(channel, clip, layer);
-  });
+  channel.forEachTrack([&](NLEClip* clip, int layer, KeyTrack const&) { keysBefore(channel, clip, layer); });
   for (auto& [name, track] : m_tracks)
     if (name.channel == &channel) track.clear();
 }

@@ -422,9 +422,16 @@ void Controller::forgetClip(NLEClip const* clip) {
   storeTracks(std::move(others));
 }
 
+// But for the keys in clips that have left the scene meanwhile.
 void Controller::restore(State const& state) {
   OwnEdit const edit(*this);
-  storeTracks(state.tracks);
+  std::vector<ClipTrack> tracks = state.tracks;
+  std::erase_if(tracks, [this](ClipTrack const& track) {
+    NLEClip const* clip = getDatabase()->getHeadClip();
+    while (clip && clip != track.clip) clip = clip->getNext();
+    return !clip;
+  });
+  storeTracks(std::move(tracks));
   setDefaultValues(state.byDefault);
   setInterpType(static_cast<int>(state.interpolation));
 }

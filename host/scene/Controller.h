@@ -130,7 +130,7 @@ class Controller : public DataSource {
   // clip and layer; null when it has none there.
   KeyTrack const* findTrack(NLEClip const* clip, int layer) const;
   KeyTrack const* findActiveTrack() const;
-  // Calls visit(clip, layer, track) for all tracks, empty ones too.
+  // Calls visit(clip, layer, track) for all tracks, empty ones too. In a scene their clips are in it as well.
   template <class Visit>
   void forEachTrack(Visit visit) const {
     for (ClipTrack const& each : m_tracks) visit(each.clip, each.layer, each.track);
@@ -205,6 +205,7 @@ class Controller : public DataSource {
   // The same for all keys, with keys at other times.
   KeyTrack& replaceTrack(NLEClip* clip, int layer);
   ClipTrack& clipTrack(NLEClip* clip, int layer);
+  void dropTrack(NLEClip const* clip, int layer);
   // The change of a track in this undo step; null when none is to be recorded.
   KeyChange* changeOf(ClipTrack& track);
   // An edit, unless one is open.

@@ -63,20 +63,23 @@ struct Controller::KeyChange : UndoChange {
     std::vector<Slot>().swap(keys);
   }
 
-  // For swapping only: makes a track when there is none, as for a clip that has left the scene.
+  // For swapping only: makes a track when there is none.
   KeyTrack& track() const { return channel.clipTrack(clip, layer).track; }
   int64 memoryNow() const {
     KeyTrack const* found = channel.findTrack(clip, layer);
     return found ? found->memoryAlone() : 0;
   }
 
+  // A track that has lost its keys goes, so that none stays behind for a clip that leaves the scene next.
   void swap() override {
-    if (snapshot) return std::swap(*snapshot, track());
+    KeyTrack& present = track();
+    if (snapshot) std::swap(*snapshot, present);
     for (Slot& slot : keys) {
-      Slot const now(track(), slot.key.time);
-      slot.putInto(track());
+      Slot const now(present, slot.key.time);
+      slot.putInto(present);
       slot = now;
     }
+    if (present.empty()) channel.dropTrack(clip, layer);
   }
   bool isVoid() const override {
     KeyTrack const none(shapeOf(channel.getPropertyType()));
@@ -144,6 +147,10 @@ Controller::ClipTrack& Controller::clipTrack(NLEClip* clip, int layer) {
   for (ClipTrack& track : m_tracks)
     if (track.clip == clip && track.layer == layer) return track;
   return m_tracks.emplace_back(ClipTrack{clip, layer, KeyTrack(shapeOf(getPropertyType()))});
+}
+
+void Controller::dropTrack(NLEClip const* clip, int layer) {
+  std::erase_if(m_tracks, [=](ClipTrack const& track) { return track.clip == clip && track.layer == layer; });
 }
 
 Controller::KeyChange* Controller::changeOf(ClipTrack& track) {

@@ -1,5 +1,7 @@
 // Random edits of key tracks against the plain model, in trees of every depth.
+#include <cstdlib>
 #include <gtest/gtest.h>
+#include <new>
 #include <random>
 #include <sstream>
 #include <string>
@@ -8,6 +10,16 @@
 
 #include "host/keys/DataRanges.h"
 #include "tests/host/keys/KeyTrackModel.h"
+
+// Allocations that succeed before one fails; none fails when it is negative.
+static thread_local long s_allocationsLeft = -1;
+
+[[gnu::noinline]] void* operator new(size_t size) {
+  void* block = s_allocationsLeft >= 0 && s_allocationsLeft-- == 0 ? nullptr : std::malloc(size ? size : 1);
+  return block ? block : throw std::bad_alloc();
+}
+[[gnu::noinline]] void operator delete(void* block) noexcept { std::free(block); }
+[[gnu::noinline]] void operator delete(void* block, size_t) noexcept { std::free(block); }
 
 namespace {
 
@@ -344,6 +356,49 @@ TEST_P(KeyTrackEdits, MatchThePlainModel) {
   }
   ASSERT_FALSE(snapshots.empty());
   for (auto const& [snapshot, then] : snapshots) EXPECT_EQ(difference(snapshot, then), "");
+}
+
+// A set key is there or not; after other edits the tree is whole, and can be put back key by key as undo
+// does.
+TEST_P(KeyTrackEdits, SurviveAnyFailingAllocation) {
+  for (int i = 0; i < GetParam().steps / 16; ++i) {
+    step();
+    int64 const what = upTo(8), first = time(), last = first + upTo(GetParam().span / 3);
+    Values const v = values();
+    unsigned const m = mask();
+    std::vector<double> const flat(static_cast<size_t>(GetParam().limits.leafKeys * 2 * track.width()), 0.1);
+    std::vector<unsigned char> lost(model.keys.size());
+    for (size_t k = 1; k + 1 < lost.size(); k += 2) lost[k] = KeyTrack::kAll;
+    auto const edit = [&] {
+      if (what < 4) return track.set(first, v, m);
+      if (what == 4) return track.append(GetParam().span * 4, 2, flat.data(), GetParam().limits.leafKeys * 2);
+      if (what == 5) return static_cast<void>(track.deleteRange(first, last, m, kBridgeEnds));
+      if (what == 6) return static_cast<void>(track.thin(lost));
+      if (what == 7) return track.bridge(first, last, m);
+      static_cast<void>(track.select(first, last, m));
+    };
+    bool failed = false;
+    for (long n = 0; n == 0 || failed; ++n) {
+      failed = false;
+      s_allocationsLeft = n;
+      try {
+        edit();
+      } catch (std::bad_alloc const&) {
+        failed = true;
+      }
+      s_allocationsLeft = -1;
+      std::string const broken = track.checkInvariants();
+      ASSERT_TRUE(broken.empty() || broken.starts_with("the last key")) << broken << ", edit " << what;
+      if (failed && what < 4) {
+        ASSERT_EQ(difference(track, model), "") << "allocation " << n;
+      }
+      std::vector<int64> times;
+      track.forEach(0, track.count(), [&](Key const& key) { times.push_back(key.time); });
+      for (int64 const each : times) track.restoreNone(each);
+      for (Key const& key : model.keys) track.restore(key);
+      ASSERT_EQ(difference(track, model), "") << "put back, edit " << what;
+    }
+  }
 }
 
 INSTANTIATE_TEST_SUITE_P(Random, KeyTrackEdits,
