@@ -17,3 +17,9 @@ class HControllerSelectionChangedEvent final : public HDontSubmitIfAnotherQueued
     return std::make_unique<HControllerSelectionChangedEvent>();
   }
 };
+
+// Views draw the connecting lines of nodes anew.
+class HConnectionLinesChangedEvent final : public HDontSubmitIfAnotherQueuedEvent {
+ public:
+  std::unique_ptr<HEvent> clone() const override { return std::make_unique<HConnectionLinesChangedEvent>(); }
+};

@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/markers/MarkerConnections.h"
+#include "host/command/Results.h"
+#include "host/scene/Database.h"
 
 namespace {
 
-class GetColorCmd final : public PendingCommand<GetColorCmd> {
+class GetColorCmd final : public ScriptCommand<GetColorCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getColor",
@@ -13,6 +15,16 @@ class GetColorCmd final : public PendingCommand<GetColorCmd> {
       .args = {"selected | primarySelected | default | markerLines", 1, 1, {Variable::String}},
       .returns = Variable::IntArray,
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable& result) override {
+    HString const item = args[0].getStringValue(-1);
+    if (item == "primarySelected") return answerColor(result, Database::getPrimSelModColor());
+    if (item == "selected") return answerColor(result, Database::getSelModColor());
+    if (item == "default") return answerColor(result, Database::getDefaultModColor());
+    if (item == "markerLines") return answerColor(result, MarkerConnection::getDefaultColor());
+    logError("\"%s\" invalid item type", item.GetStr());
+    return false;
+  }
 };
 
 }  // namespace

@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "commands/markers/MarkerConnections.h"
 
 namespace {
 
-class GetMarkerConnectionCmd final : public PendingCommand<GetMarkerConnectionCmd> {
+class GetMarkerConnectionCmd final : public ScriptCommand<GetMarkerConnectionCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getMarkerConnection",
@@ -13,6 +13,12 @@ class GetMarkerConnectionCmd final : public PendingCommand<GetMarkerConnectionCm
       .args = {"\"sourceMarker\" \"targetMarker\"", 2, 2, {Variable::String, Variable::String}},
       .returns = Variable::Bool,
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable& result) override {
+    Marker *source, *target;
+    if (!readMarkers(args, kNoMarkerAt, source, target)) return true;
+    return answer(result, source->isConnectedTo(target) || target->isConnectedTo(source));
+  }
 };
 
 }  // namespace

@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "commands/markers/MarkerConnections.h"
 
 namespace {
 
-class GetMarkerConnectionColorCmd final : public PendingCommand<GetMarkerConnectionColorCmd> {
+class GetMarkerConnectionColorCmd final : public ScriptCommand<GetMarkerConnectionColorCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "getMarkerConnectionColor",
@@ -13,6 +13,16 @@ class GetMarkerConnectionColorCmd final : public PendingCommand<GetMarkerConnect
       .args = {"\"sourceMarker\" \"targetMarker\"", 2, 2, {Variable::String, Variable::String}},
       .returns = Variable::IntArray,
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable& result) override {
+    Marker *source, *target;
+    if (!readMarkers(args, kNoMarkerAt, source, target)) return true;
+    MarkerConnection const* line = source->getConnectionTo(target);
+    if (!line) line = target->getConnectionTo(source);
+    if (line) return answerColor(result, line->getConnectingColor());
+    logWarning("%s and %s are not connected", args[0].getStringValue(-1), args[1].getStringValue(-1));
+    return true;
+  }
 };
 
 }  // namespace

@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/markers/UnlabeledMarkers.h"
+#include "host/command/Targets.h"
+#include "host/scene/motion/MarkerPacker.h"
 
 namespace {
 
-class PackCmd final : public PendingCommand<PackCmd> {
+class PackCmd final : public ScriptCommand<PackCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "pack",
@@ -12,6 +14,33 @@ class PackCmd final : public PendingCommand<PackCmd> {
       .options = {{"minGap", 1, Variable::Int},
                   {"minDistance", 1, Variable::Float},
                   {"marker", 1, Variable::String}}};
+
+  static constexpr int kMinGap = info.option("minGap"), kMinDistance = info.option("minDistance"),
+                       kMarker = info.option("marker");
+
+  bool execute(Given const& given, Args const&, Variable&) override {
+    MarkerPacker packer;
+    Marker* target = nullptr;
+    for (CommandOption const& option : given) {
+      Variable const value = option.getArg(0);
+      if (option.getIndex() == kMinGap) packer.setMinimumGapSize(value.getIntValue(-1));
+      if (option.getIndex() == kMinDistance) packer.setMimimumDistance(value.getFloatValue(-1));
+      if (option.getIndex() != kMarker) continue;
+      target = moduleAt<Marker>(value.getStringValue(-1),
+                                "%s  is not a valid path to a Marker in the scene.");  // kept
+      if (!target) return false;
+      if (!target->isUnlabeled()) {
+        logError("Only unlabeled Markers can be packed.");
+        return false;
+      }
+    }
+    packer.setMarkerList(selectedUnlabeledMarkers());
+    if (int const packed = packer.pack(target); packed > 0)
+      logInfo("Packed %d Trajectories", packed);
+    else
+      logWarning("Could not pack any Trajectories");
+    return true;
+  }
 };
 
 }  // namespace

@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "commands/Events.h"
+#include "commands/markers/MarkerConnections.h"
+#include "host/scene/Database.h"
 
 namespace {
 
-class SetMarkerConnectionCmd final : public PendingCommand<SetMarkerConnectionCmd> {
+class SetMarkerConnectionCmd final : public ScriptCommand<SetMarkerConnectionCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setMarkerConnection",
@@ -12,6 +14,25 @@ class SetMarkerConnectionCmd final : public PendingCommand<SetMarkerConnectionCm
       .args = {"\"sourceNode\" \"targetNode\"", 2, 2, {Variable::String, Variable::String}},
       .options = {{"color", 3, Variable::Int}, {"priorityOnly"}},
       .solo = Solo::no};
+
+  static constexpr int kColor = info.option("color"), kPriorityOnly = info.option("priorityOnly");
+
+  bool execute(Given const& given, Args const& args, Variable&) override {
+    GivenOptions const options(given);
+    Vec3 color = MarkerConnection::getDefaultColor();
+    if (CommandOption const* option = options.find(kColor))
+      for (int i = 0; i < 3; ++i) color[i] = option->getArg(i).getIntValue(-1);
+    Module const* priority = options.has(kPriorityOnly) ? g_db->getPriorityModule() : nullptr;
+    Marker *source, *target;
+    if (!readMarkers(args, "%s is not a valid path to a Marker in the scene.", source, target)) return true;
+    if (priority && !(source->isDescendedFrom(priority) && target->isDescendedFrom(priority))) return true;
+    disconnect(*source, *target);
+    MarkerConnection line(target);
+    line.setConnectingColor(color);
+    source->addConnectingLine(line);
+    g_eventManager->submitImmediate(HConnectionLinesChangedEvent());
+    return true;
+  }
 };
 
 }  // namespace

@@ -1,8 +1,8 @@
-#include "commands/PendingCommand.h"
+#include "host/command/Targets.h"
 
 namespace {
 
-class HideCmd final : public PendingCommand<HideCmd> {
+class HideCmd final : public ScriptCommand<HideCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "hide",
@@ -16,6 +16,45 @@ class HideCmd final : public PendingCommand<HideCmd> {
                   {"primary", 0, Variable::None, 3},
                   {"t"},
                   {"all", 0, Variable::None, 6, true}}};
+
+  static constexpr int kDeprecated = info.option("s"), kUnselected = info.option("u"),
+                       kPrimary = info.option("primary"), kToggle = info.option("t"),
+                       kAll = info.option("all");
+
+  bool execute(Given const& given, Args const& args, Variable&) override {
+    GivenOptions const options(given);
+    if (options.has(kDeprecated))
+      logWarning(
+          "The -s option on the hide command is deprecated. hide now operates on selection by default.");
+    TSimpleArray<Module*> modules;
+    if (args.getCount() == 0) {
+      collect(given, modules);
+    } else {
+      for (Variable const& arg : args) {
+        Module* module = moduleAt(arg.getStringValue(-1));
+        if (!module) return false;
+        modules.add(module);
+      }
+    }
+    for (int i = 0; i < modules.getCount(); ++i)
+      modules[i]->setVisible(options.has(kToggle) && !modules[i]->isVisible(), true);
+    return true;
+  }
+
+ private:
+  // The last of the options that choose decides; without any it is the selection.
+  static void collect(Given const& given, TSimpleArray<Module*>& modules) {
+    int mode = kDeprecated;
+    for (CommandOption const& option : given)
+      if (option.getIndex() != kToggle) mode = option.getIndex();
+    if (mode == kPrimary) {
+      if (Module* primary = g_db->getPrimarySelectedModule()) modules.add(primary);
+      return;
+    }
+    eachModule(mode == kDeprecated ? Among::selected : Among::all, [&](Module& module) {
+      if (mode != kUnselected || !module.isSelected()) modules.add(&module);
+    });
+  }
 };
 
 }  // namespace

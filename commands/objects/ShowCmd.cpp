@@ -1,9 +1,9 @@
-#include "commands/PendingCommand.h"
 #include "host/command/Arguments.h"
+#include "host/command/Targets.h"
 
 namespace {
 
-class ShowCmd final : public PendingCommand<ShowCmd> {
+class ShowCmd final : public ScriptCommand<ShowCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "show",
@@ -15,6 +15,32 @@ class ShowCmd final : public PendingCommand<ShowCmd> {
       .options = {{"s"}}};
 
   bool checkArgSyntax(Args const& args, Given const&) const override { return areTexts(args); }
+
+  static constexpr int kSelected = info.option("s");
+
+  bool execute(Given const& given, Args const& args, Variable&) override {
+    if (args.getCount() > 0 && GivenOptions(given).has(kSelected)) {
+      logError("Cannot specify -s and pass in arguments");
+      return false;
+    }
+    TSimpleArray<Module*> modules;
+    if (!readModules(args, modules)) return false;
+    for (int i = 0; i < modules.getCount(); ++i) modules[i]->setVisible(true, true);
+    return true;
+  }
+
+ private:
+  // The named modules; without names the selected ones.
+  static bool readModules(Args const& args, TSimpleArray<Module*>& modules) {
+    for (Variable const& arg : args)
+      for (int i = 0; i < arg.getNumItems(); ++i) {
+        Module* module = moduleAt(arg.getStringValue(arg.isArray() ? i : -1));
+        if (!module) return false;
+        modules.add(module);
+      }
+    if (args.getCount() == 0) eachModule(Among::selected, [&](Module& module) { modules.add(&module); });
+    return true;
+  }
 };
 
 }  // namespace

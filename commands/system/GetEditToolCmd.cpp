@@ -1,14 +1,20 @@
-#include "commands/PendingCommand.h"
+#include "host/command/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/services/Manipulator.h"
 
 namespace {
 
-class GetEditToolCmd final : public PendingCommand<GetEditToolCmd> {
+class GetEditToolCmd final : public ScriptCommand<GetEditToolCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getEditTool",
                                        .displayName = "Get Current Edit Tool",
                                        .category = "Interface",
                                        .purpose = "The number of the current editing tool.",
                                        .returns = Variable::Int};
+
+  bool execute(Given const&, Args const&, Variable& result) override {
+    return answer(result, static_cast<int>(Manipulator::getCurrentToolType()));
+  }
 };
 
 }  // namespace

@@ -1,14 +1,20 @@
-#include "commands/PendingCommand.h"
+#include "host/command/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/Database.h"
 
 namespace {
 
-class GetSolversFirstCmd final : public PendingCommand<GetSolversFirstCmd> {
+class GetSolversFirstCmd final : public ScriptCommand<GetSolversFirstCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getSolversFirst",
                                        .displayName = "Get Solvers First Status",
                                        .category = "Skeletal Solving",
                                        .purpose = "Tells whether solvers are evaluated before clips.",
                                        .returns = Variable::Bool};
+
+  bool execute(Given const&, Args const&, Variable& result) override {
+    return answer(result, g_db->getUpdateSolversBeforeClips());
+  }
 };
 
 }  // namespace

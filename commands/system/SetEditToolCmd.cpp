@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "host/command/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/services/Manipulator.h"
 
 namespace {
 
-class SetEditToolCmd final : public PendingCommand<SetEditToolCmd> {
+class SetEditToolCmd final : public ScriptCommand<SetEditToolCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "setEditTool",
@@ -12,6 +14,17 @@ class SetEditToolCmd final : public PendingCommand<SetEditToolCmd> {
       .args = {"toolId", 1, 1, {Variable::Int}},
       .returns = Variable::Int,
       .solo = Solo::no};
+
+  bool execute(Given const&, Args const& args, Variable& result) override {
+    int const tool = args[0].getIntValue(-1);
+    if (tool < Manipulator::Select || tool > Manipulator::Pan) {
+      logError("%d is not a valid Edit Tool number", tool);
+      return false;
+    }
+    auto const former = static_cast<int>(Manipulator::getCurrentToolType());
+    Manipulator::setCurrentToolType(static_cast<Manipulator::EToolType>(tool));
+    return answer(result, former);
+  }
 };
 
 }  // namespace

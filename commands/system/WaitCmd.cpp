@@ -1,14 +1,27 @@
-#include "commands/PendingCommand.h"
+#include <chrono>
+#include <thread>
+
+#include "host/command/ScriptCommand.h"
 
 namespace {
 
-class WaitCmd final : public PendingCommand<WaitCmd> {
+class WaitCmd final : public ScriptCommand<WaitCmd> {
  public:
   static constexpr CommandInfo info = {.name = "wait",
                                        .displayName = "Wait",
                                        .category = "Interface",
                                        .purpose = "Pauses for so many milliseconds.",
                                        .args = {"milliseconds", 1, 1, {Variable::Int}}};
+
+  bool execute(Given const&, Args const& args, Variable&) override {
+    int const milliseconds = args[0].getIntValue(-1);
+    if (milliseconds < 0) {
+      logError("Cannot wait a negative amount of time.");
+      return false;
+    }
+    std::this_thread::sleep_for(std::chrono::milliseconds(milliseconds));
+    return true;
+  }
 };
 
 }  // namespace

@@ -1,8 +1,10 @@
-#include "commands/PendingCommand.h"
+#include "host/command/Results.h"
+#include "host/command/ScriptCommand.h"
+#include "host/scene/HTimeManager.h"
 
 namespace {
 
-class GetRateCmd final : public PendingCommand<GetRateCmd> {
+class GetRateCmd final : public ScriptCommand<GetRateCmd> {
  public:
   static constexpr CommandInfo info = {.name = "getRate",
                                        .displayName = "Get Scene Rate",
@@ -10,6 +12,10 @@ class GetRateCmd final : public PendingCommand<GetRateCmd> {
                                        .subCategory = "Data Retrieval",
                                        .purpose = "The frame rate of the scene in frames a second.",
                                        .returns = Variable::Float};
+
+  bool execute(Given const&, Args const&, Variable& result) override {
+    return answer(result, HTimeManager::getInstance()->getFrameRate().getFrameRate());
+  }
 };
 
 }  // namespace

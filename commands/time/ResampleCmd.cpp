@@ -1,9 +1,12 @@
-#include "commands/PendingCommand.h"
+#include <cmath>
+
 #include "host/command/Arguments.h"
+#include "host/scene/HTimeManager.h"
+#include "host/scene/motion/DataResampler.h"
 
 namespace {
 
-class ResampleCmd final : public PendingCommand<ResampleCmd> {
+class ResampleCmd final : public ScriptCommand<ResampleCmd> {
  public:
   static constexpr CommandInfo info = {
       .name = "resample",
@@ -16,6 +19,42 @@ class ResampleCmd final : public PendingCommand<ResampleCmd> {
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     return args.getCount() == 2 && args[0].getType() == Variable::String && isIntOrFloat(args[1]);
+  }
+
+  static constexpr int kSelected = info.option("selected"), kIgnoreGaps = info.option("ignoreGaps"),
+                       kIncludeUnlabeled = info.option("includeUnlabeledMarkers");
+
+  bool execute(Given const& given, Args const& args, Variable&) override {
+    HString name = args[0].getStringValue(-1), lower = name;
+    lower.MakeLower();
+    if (lower == "other" || lower == "custom") name = "Custom";
+    if (!isIntOrFloat(args[1])) {
+      logError("Frame rate should be specified as float or int.");
+      return false;
+    }
+    double const rate = args[1].getFloatValue(-1);
+    ETimecodeStandard standard;
+    if (!HFrameRate::getTimecodeStandardFromString(name, standard)) {
+      logError(
+          "\"%s\" is not a valid timecode standard. Valid standards are \"ntsc\", \"ntscDrop\", \"pal\", "
+          "\"film\", \"filmNtsc\", or \"other\"",
+          name.GetStr());
+      return false;
+    }
+    if (!(rate > 0 && rate <= HFrameRate::kMaximum)) {
+      logError("%f is an unsupported rate", rate);
+      return false;
+    }
+    HFrameRate const& current = HTimeManager::getInstance()->getFrameRate();
+    if (standard == current.getTimecodeStandard() && std::abs(rate - current.getFrameRate()) < 0.01)
+      return true;
+    HFrameRate wanted;
+    wanted.setTimecodeStandard(standard);
+    wanted.setFrameRate(rate);
+    GivenOptions const options(given);
+    DataResampler::resample(wanted, options.has(kSelected), !options.has(kIgnoreGaps),
+                            options.has(kIncludeUnlabeled));
+    return true;
   }
 };
 

@@ -127,7 +127,7 @@ class Database {
   static bool isDevOnlyMode();
   static void setDevOnlyMode(bool on);
   bool getUpdateSolversBeforeClips() const { return m_solversBeforeClips; }
-  void setUpdateSolversBeforeClips(bool on) { m_solversBeforeClips = on; }
+  void setUpdateSolversBeforeClips(bool on);
   // Red, green and blue, 0 to 255.
   static Vec3 const& getDefaultModColor();
   static Vec3 const& getPrimSelModColor();

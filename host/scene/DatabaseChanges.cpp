@@ -116,18 +116,21 @@ struct Database::SettingsChange : UndoChange {
         clip(scene.m_activeClip),
         layer(scene.m_activeLayer),
         upAxis(scene.m_upAxis),
+        solversBeforeClips(scene.m_solversBeforeClips),
         properties(scene.m_activeProperties),
         time(scene.m_time->getSettings()) {}
   void swap() override {
     std::swap(clip, scene.m_activeClip);
     std::swap(layer, scene.m_activeLayer);
     std::swap(upAxis, scene.m_upAxis);
+    std::swap(solversBeforeClips, scene.m_solversBeforeClips);
     std::swap(properties, scene.m_activeProperties);
     scene.m_time->swapSettings(time);
   }
   bool isVoid() const override {
     return clip == scene.m_activeClip && layer == scene.m_activeLayer && upAxis == scene.m_upAxis &&
-           properties == scene.m_activeProperties && time == scene.m_time->getSettings();
+           solversBeforeClips == scene.m_solversBeforeClips && properties == scene.m_activeProperties &&
+           time == scene.m_time->getSettings();
   }
   int64 memoryUse() const override {
     return static_cast<int64>(sizeof *this +
@@ -149,6 +152,8 @@ struct Database::SettingsChange : UndoChange {
                  textOf(scene.m_activeClip), clip != scene.m_activeClip);
     setting("ActiveLayer", std::to_string(clip ? layer : -1), std::to_string(scene.getActiveLayer()));
     setting("ActiveProperties", names(properties), names(scene.m_activeProperties));
+    setting("SolversBeforeClips", solversBeforeClips ? "true" : "false",
+            scene.m_solversBeforeClips ? "true" : "false");
     setting("UpAxis", std::to_string(upAxis), std::to_string(scene.m_upAxis));
     HTimeManager::Settings const now = scene.m_time->getSettings();
     setting("FrameRate", textOf(time.rate.getFrameRate()), textOf(now.rate.getFrameRate()));
@@ -175,9 +180,15 @@ struct Database::SettingsChange : UndoChange {
   NLEClip* clip;
   int layer;
   int upAxis;
+  bool solversBeforeClips;
   std::vector<unsigned> properties;
   HTimeManager::Settings time;
 };
+
+void Database::setUpdateSolversBeforeClips(bool on) {
+  recordSettings();
+  m_solversBeforeClips = on;
+}
 
 void Database::recordSettings() {
   checkThread();

@@ -47,6 +47,8 @@ void UndoJournal::keep(HString const& name) {
   }
 
   m_done.push(m_open, name.GetString());
+  // Steps that are forgotten destroy modules, whose referrers let go: nothing that is to be undone.
+  m_step = 0;
   MustFinish const mustFinish(m_reserve);
   m_undone.clear();
   if (m_done.getMemory() > m_memoryLimit && m_done.getLastMemory() > m_memoryLimit) {

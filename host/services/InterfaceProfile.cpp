@@ -4,6 +4,7 @@
 #include <filesystem>
 #include <string>
 
+#include "host/base/FileLock.h"
 #include "host/base/Log.h"
 #include "host/services/HInterface.h"
 
@@ -149,7 +150,9 @@ bool HInterface::writeProfileString(HString const& section, HString const& entry
   if (file.IsEmpty() && !setIn(m_profile)) return false;
   if (target.empty()) return true;
 
-  // What others have written there meanwhile stays, and a file that cannot be read is not overwritten.
+  // What others have written there meanwhile stays, and a file that cannot be read is not overwritten. Nobody
+  // writes between reading and writing.
+  FileLock const fileLock(target);
   Profile stored;
   std::error_code error;
   if (std::filesystem::exists(target, error) && warned(stored.read(target))) return false;

@@ -19,12 +19,12 @@ class Profile {
   [[nodiscard]] bool set(std::string_view section, std::string_view entry, std::string_view value);
 
   // Both return what went wrong, "FILE, line N: WHAT" or "FILE: WHAT"; empty: nothing. A file that cannot be
-  // read leaves the values as they were. Comments are not kept.
+  // read leaves the values as they were. Writing keeps what was read: entries, their order and comments.
   [[nodiscard]] std::string read(std::string const& file);
   // A temporary file is renamed over the old one; missing folders are made.
   [[nodiscard]] std::string write(std::string const& file) const;
 
  private:
-  struct Tree;
-  std::unique_ptr<Tree> m_tree;
+  struct File;
+  std::unique_ptr<File> m_file;
 };

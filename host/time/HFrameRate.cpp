@@ -47,8 +47,11 @@ bool HFrameRate::setTimecodeStandard(ETimecodeStandard standard) {
 
 void HFrameRate::setFrameRate(double rate) {
   if (!(rate > 0 && rate <= kMaximum)) return;
-  m_rate = rate;
-  m_ticks = ticksPerFrameAt(rate);
+  // 29.97 and 23.976 are how 30000/1001 and 24000/1001 are written.
+  constexpr double kAsWritten = 0.005;
+  double const own = kStandards[m_standard].rate;
+  m_rate = own > 0 && std::abs(rate - own) < kAsWritten ? own : rate;
+  m_ticks = ticksPerFrameAt(m_rate);
 }
 
 HFrameRate HFrameRate::withoutDrop() const {

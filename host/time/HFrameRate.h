@@ -19,7 +19,8 @@ class HFrameRate {
   // Takes on the standard's own rate; a custom standard keeps the rate. False for a number that is no
   // standard.
   bool setTimecodeStandard(ETimecodeStandard standard);
-  // Frames a second, above 0 and at most kMaximum; other rates are not taken.
+  // Frames a second, above 0 and at most kMaximum; other rates are not taken. One within 0.005 of the
+  // standard's own rate stands for that (29.97 for 30000/1001).
   void setFrameRate(double rate);
 
   // This rate with timecode that leaves no number out: what a length of time is counted in.

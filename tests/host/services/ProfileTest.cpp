@@ -1,6 +1,7 @@
 // Settings and their file.
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <thread>
 
 #include "host/base/Log.h"
 #include "host/services/HInterface.h"
@@ -33,13 +34,40 @@ TEST_F(ProfileTest, IsKeptInItsFileBesideWhatOthersWrite) {
   EXPECT_TRUE(other.loadProfile(path));
   EXPECT_TRUE(one.writeProfileDouble("Reduction", "LengthMM", 0.25));
   EXPECT_TRUE(other.writeProfileBool("Demo", "on", true));
-  EXPECT_EQ(contentOf("new/folder/profile.ini"), "[Reduction]\nLengthMM=0.25\n[Demo]\non=true\n");
+  EXPECT_EQ(contentOf("new/folder/profile.ini"), "[Reduction]\nLengthMM=0.25\n\n[Demo]\non=true\n");
 
   HInterface later;
   EXPECT_TRUE(later.loadProfile(path));
   EXPECT_EQ(later.getProfile(profile::kReductionLength), 0.25);
   EXPECT_TRUE(later.getProfileBool("Demo", "on", false));
   EXPECT_EQ(m_log, "");
+}
+
+// Comments and order stay, also those at the ends, and writing again changes no more.
+TEST_F(ProfileTest, WhatItDoesNotSetStaysAsItWas) {
+  put("own.ini", "; whose\n\n[B]\n# of x\nx=1\n\n; of y\ny = 2 ; two\n[A]\nz=3\n\n; the end\n");
+  HInterface face;
+  EXPECT_TRUE(face.writeProfileInt("A", "w", 4, file("own.ini")));
+  std::string const once = contentOf("own.ini");
+  EXPECT_EQ(once, "; whose\n\n[B]\n\n# of x\nx=1\n\n; of y\ny=2 ; two\n\n[A]\nz=3\nw=4\n\n; the end\n");
+  EXPECT_TRUE(face.writeProfileInt("A", "w", 5, file("own.ini")));
+  EXPECT_TRUE(face.writeProfileInt("A", "w", 4, file("own.ini")));
+  EXPECT_EQ(contentOf("own.ini"), once);
+  EXPECT_EQ(m_log, "");
+}
+
+TEST_F(ProfileTest, SeveralWritersLoseNothing) {
+  std::vector<std::thread> writers;
+  for (int w = 0; w < 4; ++w)
+    writers.emplace_back([&, w] {
+      HInterface face;
+      for (int i = 0; i < 25; ++i)
+        face.writeProfileInt("Demo", ("n" + std::to_string(25 * w + i)).c_str(), i, file("shared.ini"));
+    });
+  for (std::thread& writer : writers) writer.join();
+  HInterface face;
+  for (int i = 0; i < 100; ++i)
+    EXPECT_EQ(face.getProfileInt("Demo", ("n" + std::to_string(i)).c_str(), -1, file("shared.ini")), i % 25);
 }
 
 TEST_F(ProfileTest, ABrokenFileIsToldAndLeftAlone) {
