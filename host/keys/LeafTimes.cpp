@@ -5,39 +5,51 @@
 #include <numeric>
 #include <vector>
 
+constexpr int64 kMostMissing = std::numeric_limits<unsigned char>::max();
+
 // With Even the slot, with Full the time.
 int64 LeafTimes::storedOffset(int slot) const {
-  return m_form == Form::Even    ? slot
-         : m_form == Form::Short ? stored<Short>(slot)
-         : m_form == Form::Long  ? stored<Long>(slot)
-                                 : stored<Full>(slot);
+  return m_form == Form::Even      ? slot
+         : m_form == Form::Thinned ? slot + missing()[slot]
+         : m_form == Form::Short   ? stored<Short>(slot)
+         : m_form == Form::Long    ? stored<Long>(slot)
+                                   : stored<Full>(slot);
 }
 
 // How many offsets lie before the value. Halves without branches, which could not be predicted.
-template <class T>
-int LeafTimes::countBefore(T value) const {
+template <class OffsetAt, class T>
+int LeafTimes::countBefore(OffsetAt offsetAt, T value) const {
   int from = 0, n = m_size;
-  for (; n > 1; n -= n / 2) from += stored<T>(from + n / 2 - 1) < value ? n / 2 : 0;
-  return from + (n == 1 && stored<T>(from) < value);
+  for (; n > 1; n -= n / 2) from += offsetAt(from + n / 2 - 1) < value ? n / 2 : 0;
+  return from + (n == 1 && offsetAt(from) < value);
+}
+
+// The units, or with Full the time, must not be more than is stored.
+int LeafTimes::countBefore(int64 units) const {
+  switch (m_form) {
+    case Form::Even:
+      return static_cast<int>(units);
+    case Form::Thinned:
+      return countBefore([all = missing()](int i) { return i + all[i]; }, static_cast<int>(units));
+    case Form::Short:
+      return countBefore([this](int i) { return stored<Short>(i); }, static_cast<Short>(units));
+    case Form::Long:
+      return countBefore([this](int i) { return stored<Long>(i); }, static_cast<Long>(units));
+    case Form::Full:
+      break;
+  }
+  return countBefore([this](int i) { return stored<Full>(i); }, units);
 }
 
 int LeafTimes::lowerBound(int64 time) const {
   if (time > back()) return m_size;
   if (time <= front()) return 0;
-  if (m_form == Form::Full) return countBefore<Full>(time);
-  int64 const units = (time - m_start - 1) / m_unit + 1;
-  return m_form == Form::Even    ? static_cast<int>(units)
-         : m_form == Form::Short ? countBefore(static_cast<Short>(units))
-                                 : countBefore(static_cast<Long>(units));
+  return countBefore(m_form == Form::Full ? time : (time - m_start - 1) / m_unit + 1);
 }
 
 int LeafTimes::lastAtOrBefore(int64 time) const {
   if (time >= back()) return m_size - 1;
-  if (m_form == Form::Full) return countBefore<Full>(time + 1) - 1;
-  int64 const units = (time - m_start) / m_unit;  // less than the last offset
-  return m_form == Form::Even    ? static_cast<int>(units)
-         : m_form == Form::Short ? countBefore(static_cast<Short>(units + 1)) - 1
-                                 : countBefore(static_cast<Long>(units + 1)) - 1;
+  return countBefore(m_form == Form::Full ? time + 1 : (time - m_start) / m_unit + 1) - 1;
 }
 
 void LeafTimes::read(int slot, int n, int64* out) const {
@@ -47,6 +59,8 @@ void LeafTimes::read(int slot, int n, int64* out) const {
   switch (m_form) {
     case Form::Even:
       return decode([](int i) { return i; });
+    case Form::Thinned:
+      return decode([all = missing()](int i) { return i + all[i]; });
     case Form::Short:
       return decode([this](int i) { return stored<Short>(i); });
     case Form::Long:
@@ -84,9 +98,10 @@ bool LeafTimes::continueEvenly(int slot, int64 start, int64 period, int n) {
   return true;
 }
 
-// Whether the form, which is not Even, can hold the time.
+// Whether the form can hold the time wherever it comes.
 bool LeafTimes::holds(int64 time) const {
   if (m_form == Form::Full) return true;
+  if (m_form == Form::Even || m_form == Form::Thinned) return false;
   auto const apart = static_cast<uint64>(time - m_start), unit = static_cast<uint64>(m_unit);
   if (time < m_start || apart % unit != 0) return false;
   return apart / unit <=
@@ -96,7 +111,7 @@ bool LeafTimes::holds(int64 time) const {
 // Makes the form one that can hold n further times, at either end or, when it is one, between.
 void LeafTimes::makeHold(int64 start, int64 period, int n) {
   int64 const end = start + period * (n - 1);
-  if (m_form != Form::Even && holds(start) && (n == 1 || (period % unit() == 0 && holds(end)))) return;
+  if (holds(start) && (n == 1 || (period % unit() == 0 && holds(end)))) return;
   if (m_form == Form::Full) return;
   int64 const first = m_size > 0 ? std::min(front(), start) : start,
               last = m_size > 0 ? std::max(back(), end) : end;
@@ -173,15 +188,35 @@ void LeafTimes::erase(int first, int last) {
       if (m_size < 2) m_unit = 0;
       return;
     }
-    convert(smallestFor(static_cast<uint64>(m_size - 1)), m_start, m_unit);
   }
-  m_column.erase(first * words(), last * words());
+  if (m_form == Form::Thinned && eraseThinned(first, last)) return;
+  if (m_form <= Form::Thinned)
+    convert(smallestFor(static_cast<uint64>(storedOffset(m_size - 1))), m_start, m_unit);
+  m_column.erase(words(first), words(last));
   m_size -= last - first;
   evenOut();
 }
 
+// The times keep their form when they can; at an end they do.
+bool LeafTimes::eraseThinned(int first, int last) {
+  int const gone = last - first, left = m_size - gone;
+  unsigned char* const all = missing();
+  if (first > 0 && last < m_size && all[m_size - 1] + gone > kMostMissing) return false;
+  if (last < m_size) {
+    int const more = first > 0 ? gone : -all[last];
+    if (first == 0) m_start = (*this)[last];
+    for (int slot = first; slot < left; ++slot)
+      all[slot] = static_cast<unsigned char>(all[slot + gone] + more);
+  }
+  m_column.erase(words(left), m_column.size());
+  m_size = left;
+  evenOut();
+  return true;
+}
+
 void LeafTimes::keep(int const* slots, int n) {
-  if (even()) convert(smallestFor(static_cast<uint64>(m_size)), m_start, m_unit);
+  if (m_form <= Form::Thinned)
+    convert(smallestFor(static_cast<uint64>(storedOffset(m_size - 1))), m_start, m_unit);
   m_column.keep(slots, n, words());
   m_size = n;
   evenOut();
@@ -206,18 +241,36 @@ void LeafTimes::evenOut() {
 }
 
 void LeafTimes::pack() noexcept {
-  if (m_form == Form::Long || m_form == Form::Full) {
+  if (m_form > Form::Thinned) {
     // What offsets have in common besides their unit.
     int64 common = 0;
     for (int i = 1; i < m_size && common != 1; ++i)
       common = std::gcd(common, storedOffset(i) - storedOffset(0));
     int64 const divisor = unit() * common;
-    Form const form = smallestFor(static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor));
+    auto const units = static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor);
+    Form const form = smallestFor(units);
     try {
-      if (form < m_form) convert(form, front(), divisor);
+      if (units < static_cast<uint64>(m_size + kMostMissing)) {
+        thinOut(divisor);
+      } else if (form < m_form) {
+        convert(form, front(), divisor);
+      }
     } catch (std::bad_alloc const&) {
       // The form as it is does as well.
     }
   }
   m_column.shrink();
+}
+
+// Each count takes the place of a larger offset at or after it, so that this needs no memory.
+void LeafTimes::thinOut(int64 divisor) {
+  int64 const start = front(), first = storedOffset(0), scale = divisor / unit();
+  for (int i = 0; i < m_size; ++i) {
+    int64 const offset = storedOffset(i) - first;
+    missing()[i] = static_cast<unsigned char>((scale == 1 ? offset : offset / scale) - i);
+  }
+  m_start = start;
+  m_unit = divisor;
+  m_form = Form::Thinned;
+  m_column.erase(words(m_size), m_column.size());
 }

@@ -1,11 +1,12 @@
-// The ascending times of a leaf's keys, in the smallest of four forms that holds them:
+// The ascending times of a leaf's keys, in the smallest of five forms that holds them:
 //  - even: a start and a period;
+//  - thinned: even times of which at most 255 are missing: for each key 8 bits that count those before it;
 //  - short, long: offsets of 16 or 32 bits from a start, in units of a common divisor. Keys that lie on
 //  frames
 //    have the frame as divisor, and then 16 bits reach over minutes and 32 over years;
 //  - full: 64 bits.
-// An edit may leave a larger form than is needed; pack() finds the smallest. Slots count from 0 and must be
-// in range; `limit` bounds the room that is kept for further keys.
+// An edit may leave a larger form than is needed; pack() finds the smallest, and alone makes times thinned.
+// Slots count from 0 and must be in range; `limit` bounds the room that is kept for further keys.
 #pragma once
 
 #include <cstdint>
@@ -19,9 +20,11 @@ class LeafTimes {
   bool even() const { return m_form == Form::Even; }
   int64 period() const { return m_unit; }  // of even times; 0 with one key
   int64 operator[](int slot) const {
+    if (m_form == Form::Even) return m_start + m_unit * slot;
     switch (m_form) {
       case Form::Even:
-        return m_start + m_unit * slot;
+      case Form::Thinned:
+        return m_start + m_unit * (slot + missing()[slot]);
       case Form::Short:
         return m_start + m_unit * stored<Short>(slot);
       case Form::Long:
@@ -49,10 +52,10 @@ class LeafTimes {
   void pack() noexcept;
 
   int64 bytes() const { return m_column.bytes(); }
-  bool isWhole() const { return m_column.size() == (even() ? 0 : m_size * words()); }
+  bool isWhole() const { return m_column.size() == (even() ? 0 : words(m_size)); }
 
  private:
-  enum class Form : unsigned char { Even, Short, Long, Full };
+  enum class Form : unsigned char { Even, Thinned, Short, Long, Full };
   using Short = std::uint16_t;
   using Long = std::uint32_t;
   using Full = int64;
@@ -69,15 +72,26 @@ class LeafTimes {
   void store(int slot, T value) {
     std::memcpy(m_column.data() + slot * static_cast<int>(sizeof(T) / sizeof(Short)), &value, sizeof value);
   }
-  template <class T>
-  int countBefore(T value) const;
+  template <class OffsetAt, class T>
+  int countBefore(OffsetAt offsetAt, T value) const;
+  int countBefore(int64 units) const;
   template <class T>
   void storeRun(int slot, int64 first, int64 step, int n) {
     for (int i = 0; i < n; ++i) store(slot + i, static_cast<T>(first + step * i));
   }
 
+  // With Thinned, by slot.
+  unsigned char* missing() { return reinterpret_cast<unsigned char*>(m_column.data()); }
+  unsigned char const* missing() const { return reinterpret_cast<unsigned char const*>(m_column.data()); }
+
   static Form smallestFor(uint64 units);
-  int words() const { return m_form == Form::Short ? 1 : m_form == Form::Long ? 2 : 4; }
+  // That n times take; for the forms which store each time by itself.
+  int words(int n = 1) const {
+    return m_form == Form::Thinned ? (n + 1) / 2
+           : m_form == Form::Short ? n
+           : m_form == Form::Long  ? 2 * n
+                                   : 4 * n;
+  }
   // Times are base() + unit() * what is stored.
   int64 base() const { return m_form == Form::Full ? 0 : m_start; }
   int64 unit() const { return m_form == Form::Full ? 1 : m_unit; }
@@ -89,6 +103,8 @@ class LeafTimes {
   void convert(Form, int64 start, int64 unit);
   void put(int slot, int64 start, int64 period, int n, int limit);
   void evenOut();
+  bool eraseThinned(int first, int last);
+  void thinOut(int64 divisor);
 
   int64 m_start = 0;  // what periods or offsets count from; unused with Full
   int64 m_unit = 0;   // the period, or what offsets count
