@@ -37,10 +37,9 @@ class KeyLeaf final : public KeyNode {
   // The time must not lie before the first key.
   int lastAtOrBefore(int64 time) const { return m_times.lastAtOrBefore(time); }
   int lastAtOrBefore(int64 time, int guess) const {  // fast when it is the guess or the next slot
-    for (int end = guess + 2; guess < end; ++guess) {
-      if (this->time(guess) > time) break;
-      if (guess + 1 == size() || this->time(guess + 1) > time) return guess;
-    }
+    if (this->time(guess) <= time)
+      for (int end = guess + 2; guess < end; ++guess)
+        if (guess + 1 == size() || this->time(guess + 1) > time) return guess;
     return lastAtOrBefore(time);
   }
 
