@@ -5,40 +5,52 @@
 #include <numeric>
 #include <vector>
 
+namespace {
+
 constexpr int64 kMostMissing = std::numeric_limits<unsigned char>::max();
+constexpr int kMostGaps = 64;
+
+// The first of n slots that is not before what is searched for. Halves without branches, which could not be
+// predicted.
+template <class IsBefore>
+int search(int n, IsBefore isBefore) {
+  int from = 0;
+  for (; n > 1; n -= n / 2) from += isBefore(from + n / 2 - 1) ? n / 2 : 0;
+  return from + (n == 1 && isBefore(from));
+}
+
+}  // namespace
 
 // With Even the slot, with Full the time.
 int64 LeafTimes::storedOffset(int slot) const {
   return m_form == Form::Even      ? slot
+         : m_form == Form::Gaps    ? slot + missingBefore(slot)
          : m_form == Form::Thinned ? slot + missing()[slot]
          : m_form == Form::Short   ? stored<Short>(slot)
          : m_form == Form::Long    ? stored<Long>(slot)
                                    : stored<Full>(slot);
 }
 
-// How many offsets lie before the value. Halves without branches, which could not be predicted.
-template <class OffsetAt, class T>
-int LeafTimes::countBefore(OffsetAt offsetAt, T value) const {
-  int from = 0, n = m_size;
-  for (; n > 1; n -= n / 2) from += offsetAt(from + n / 2 - 1) < value ? n / 2 : 0;
-  return from + (n == 1 && offsetAt(from) < value);
-}
-
-// The units, or with Full the time, must not be more than is stored.
+// How many offsets lie before the units, or with Full times before the time, which must not be more than is
+// stored.
 int LeafTimes::countBefore(int64 units) const {
+  auto const value = static_cast<int>(units);
   switch (m_form) {
     case Form::Even:
-      return static_cast<int>(units);
+      return value;
+    case Form::Gaps:
+      return value -
+             search(missingBefore(m_size - 1), [=, all = gaps()](int i) { return all[i] < value - 1 - i; });
     case Form::Thinned:
-      return countBefore([all = missing()](int i) { return i + all[i]; }, static_cast<int>(units));
+      return search(m_size, [=, all = missing()](int i) { return all[i] < value - i; });
     case Form::Short:
-      return countBefore([this](int i) { return stored<Short>(i); }, static_cast<Short>(units));
+      return search(m_size, [=, this](int i) { return stored<Short>(i) < value; });
     case Form::Long:
-      return countBefore([this](int i) { return stored<Long>(i); }, static_cast<Long>(units));
+      return search(m_size, [=, this](int i) { return stored<Long>(i) < units; });
     case Form::Full:
       break;
   }
-  return countBefore([this](int i) { return stored<Full>(i); }, units);
+  return search(m_size, [=, this](int i) { return stored<Full>(i) < units; });
 }
 
 int LeafTimes::lowerBound(int64 time) const {
@@ -59,6 +71,12 @@ void LeafTimes::read(int slot, int n, int64* out) const {
   switch (m_form) {
     case Form::Even:
       return decode([](int i) { return i; });
+    case Form::Gaps:
+      for (int i = 0, before = missingBefore(slot); i < n; ++before) {
+        int const end = std::min(n, gaps()[before] + 1 - slot);
+        for (; i < end; ++i) out[i] = m_start + m_unit * (slot + i + before);
+      }
+      return;
     case Form::Thinned:
       return decode([all = missing()](int i) { return i + all[i]; });
     case Form::Short:
@@ -101,7 +119,7 @@ bool LeafTimes::continueEvenly(int slot, int64 start, int64 period, int n) {
 // Whether the form can hold the time wherever it comes.
 bool LeafTimes::holds(int64 time) const {
   if (m_form == Form::Full) return true;
-  if (m_form == Form::Even || m_form == Form::Thinned) return false;
+  if (m_form <= Form::Thinned) return false;
   auto const apart = static_cast<uint64>(time - m_start), unit = static_cast<uint64>(m_unit);
   if (time < m_start || apart % unit != 0) return false;
   return apart / unit <=
@@ -132,10 +150,14 @@ void LeafTimes::convert(Form form, int64 start, int64 unit) {
   auto const write = [&]<class T>(T) {
     int const words = static_cast<int>(sizeof(T) / sizeof(Short));
     fresh.m_column.open(0, m_size * words, m_size * words);
+    int before = 0;
     for (int i = 0; i < m_size; ++i) {
-      int64 const offset = form == Form::Full ? (*this)[i]
-                           : scales           ? shift + scale * storedOffset(i)
-                                              : ((*this)[i] - start) / unit;
+      if (m_form == Form::Gaps) before = missingBefore(i, before);
+      int64 const stored = m_form == Form::Gaps ? i + before : storedOffset(i);
+      int64 const time = base() + this->unit() * stored;
+      int64 const offset = form == Form::Full ? time
+                           : scales           ? shift + scale * stored
+                                              : (time - start) / unit;
       fresh.store(i, static_cast<T>(offset));
     }
   };
@@ -189,12 +211,27 @@ void LeafTimes::erase(int first, int last) {
       return;
     }
   }
+  if (m_form == Form::Gaps && eraseGaps(first, last)) return;
   if (m_form == Form::Thinned && eraseThinned(first, last)) return;
   if (m_form <= Form::Thinned)
     convert(smallestFor(static_cast<uint64>(storedOffset(m_size - 1))), m_start, m_unit);
   m_column.erase(words(first), words(last));
   m_size -= last - first;
   evenOut();
+}
+
+// At an end alone: there they keep their form, which needs no memory.
+bool LeafTimes::eraseGaps(int first, int last) {
+  if (first > 0 && last < m_size) return false;
+  int const shift = first == 0 ? last : 0, left = m_size - (last - first);
+  int const before = missingBefore(shift), end = left > 0 ? missingBefore(shift + left - 1) : before;
+  if (left > 0) m_start = (*this)[shift];
+  unsigned char kept[kMostGaps];
+  for (int i = before; i < end; ++i) kept[i - before] = static_cast<unsigned char>(gaps()[i] - shift);
+  m_size = left;
+  putGaps(kept, end - before);
+  evenOut();
+  return true;
 }
 
 // The times keep their form when they can; at an end they do.
@@ -241,19 +278,22 @@ void LeafTimes::evenOut() {
 }
 
 void LeafTimes::pack() noexcept {
-  if (m_form > Form::Thinned) {
+  if (m_form > Form::Gaps) {
     // What offsets have in common besides their unit.
     int64 common = 0;
     for (int i = 1; i < m_size && common != 1; ++i)
       common = std::gcd(common, storedOffset(i) - storedOffset(0));
     int64 const divisor = unit() * common;
     auto const units = static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor);
-    Form const form = smallestFor(units);
+    auto const missing = units - static_cast<uint64>(m_size - 1);
     try {
-      if (units < static_cast<uint64>(m_size + kMostMissing)) {
-        thinOut(divisor);
-      } else if (form < m_form) {
-        convert(form, front(), divisor);
+      if (missing <= kMostGaps && m_size <= kNoSlot + 1 &&
+          gapColumn(m_size, static_cast<int>(missing)) < (m_size + 1) / 2) {
+        becomeGaps(divisor);
+      } else if (missing <= kMostMissing) {
+        if (m_form > Form::Thinned) becomeThinned(divisor);
+      } else if (smallestFor(units) < m_form) {
+        convert(smallestFor(units), front(), divisor);
       }
     } catch (std::bad_alloc const&) {
       // The form as it is does as well.
@@ -262,15 +302,47 @@ void LeafTimes::pack() noexcept {
   m_column.shrink();
 }
 
-// Each count takes the place of a larger offset at or after it, so that this needs no memory.
-void LeafTimes::thinOut(int64 divisor) {
-  int64 const start = front(), first = storedOffset(0), scale = divisor / unit();
+// Calls visit(slot, how many times are missing before it, by a divisor of all distances).
+template <class Visit>
+void LeafTimes::visitMissing(int64 divisor, Visit visit) const {
+  int64 const first = storedOffset(0), scale = divisor / unit();
   for (int i = 0; i < m_size; ++i) {
     int64 const offset = storedOffset(i) - first;
-    missing()[i] = static_cast<unsigned char>((scale == 1 ? offset : offset / scale) - i);
+    visit(i, static_cast<int>((scale == 1 ? offset : offset / scale) - i));
   }
+}
+
+// The form is smaller than the one before, so that this needs no memory.
+void LeafTimes::becomeGaps(int64 divisor) {
+  unsigned char slots[kMostGaps];
+  int count = 0;
+  visitMissing(divisor, [&](int slot, int missing) {
+    while (count < missing) slots[count++] = static_cast<unsigned char>(slot - 1);
+  });
+  int64 const start = front();
+  m_form = Form::Gaps;
   m_start = start;
   m_unit = divisor;
+  putGaps(slots, count);
+}
+
+// The column must have room for them.
+void LeafTimes::putGaps(unsigned char const* slots, int n) {
+  m_column.erase(gapColumn(m_size, n), m_column.size());
+  unsigned char *const all = missing(), *const end = all + 2 * m_column.size();
+  for (int group = 0, before = 0; group < groups(m_size); ++group) {
+    while (before < n && slots[before] < group * kGroup) ++before;
+    all[group] = static_cast<unsigned char>(before);
+  }
+  std::fill(std::copy_n(slots, n, all + groups(m_size)), end, kNoSlot);
+}
+
+// The same: each count takes the place of a larger offset at or after it.
+void LeafTimes::becomeThinned(int64 divisor) {
+  int64 const start = front();
+  visitMissing(divisor, [&](int slot, int count) { missing()[slot] = static_cast<unsigned char>(count); });
   m_form = Form::Thinned;
+  m_start = start;
+  m_unit = divisor;
   m_column.erase(words(m_size), m_column.size());
 }
