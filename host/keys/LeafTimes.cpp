@@ -61,6 +61,7 @@ int LeafTimes::lowerBound(int64 time) const {
 
 int LeafTimes::lastAtOrBefore(int64 time) const {
   if (time >= back()) return m_size - 1;
+  if (even()) return static_cast<int>((time - m_start) / m_unit);
   return countBefore(m_form == Form::Full ? time + 1 : (time - m_start) / m_unit + 1) - 1;
 }
 
