@@ -46,6 +46,25 @@ void KeyLeaf::readValues(int slot, int step, int n, int first, int end, double* 
   }
 }
 
+// Of the values, which are most of a leaf, only those are copied that are needed.
+KeyLeaf::KeyLeaf(KeyLeaf const& o, int first, int last)
+    : KeyNode(o),
+      m_width(o.m_width),
+      m_limit(o.m_limit),
+      m_form(o.m_form),
+      m_times(o.m_times),
+      m_flags(o.m_flags),
+      m_selection(o.m_selection) {
+  int const from = first * m_width, n = (last - first) * m_width;
+  if (m_form == Form::Float) {
+    m_floats = {o.m_floats, from, n};
+  } else {
+    m_doubles = m_form == Form::One ? KeyColumn(o.m_doubles) : KeyColumn(o.m_doubles, from, n);
+  }
+  if (last < size()) eraseAllButValues(last, size());
+  if (first > 0) eraseAllButValues(0, first);
+}
+
 // Lets add() put n keys at a slot, part by part and times last. Where it fails, what the other parts took is
 // taken away again.
 template <class Add>
@@ -105,11 +124,15 @@ void KeyLeaf::write(int slot, double const* values, unsigned mask, KeyFlags cons
   setFlags(slot, flags);
 }
 
-// Times come first: they may need memory for another form, of which there may be none.
 void KeyLeaf::erase(int first, int last) {
-  m_times.erase(first, last);
+  eraseAllButValues(first, last);
   if (m_form == Form::Double) m_doubles.erase(first * m_width, last * m_width);
   if (m_form == Form::Float) m_floats.erase(first * m_width, last * m_width);
+}
+
+// Times come first: they may need memory for another form, of which there may be none.
+void KeyLeaf::eraseAllButValues(int first, int last) {
+  m_times.erase(first, last);
   countRange(*this, first, last, -1);
   m_flags.erase(first, last, size() + last - first);
   if (!m_selection.empty()) m_selection.erase(first, last);

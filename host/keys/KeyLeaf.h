@@ -21,6 +21,7 @@ class KeyLeaf final : public KeyNode {
   // `width` doubles in a key; `limit` keys at most.
   KeyLeaf(int width, int limit) : KeyNode(0), m_width(width), m_limit(limit) {}
   KeyLeaf(KeyLeaf const&) = default;
+  KeyLeaf(KeyLeaf const&, int first, int last);  // some keys, at least one
 
   int size() const { return m_times.size(); }
   int limit() const { return m_limit; }
@@ -131,6 +132,7 @@ class KeyLeaf final : public KeyNode {
   void insertValues(int slot, double const* values, int n);
   void insertFlags(int slot, KeyFlags const& flags, int n);
   void spellOutFlags(KeyFlags const& toBe);
+  void eraseAllButValues(int first, int last);
   void countRange(KeyLeaf const& of, int first, int last, int by);
   void appendSelection(Column const& from, int first, int n);
   void insertSelection(unsigned selected, int slot, int n);
