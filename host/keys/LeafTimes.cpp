@@ -279,28 +279,32 @@ void LeafTimes::evenOut() {
 }
 
 void LeafTimes::pack() noexcept {
-  if (m_form > Form::Gaps) {
-    // What offsets have in common besides their unit.
-    int64 common = 0;
-    for (int i = 1; i < m_size && common != 1; ++i)
-      common = std::gcd(common, storedOffset(i) - storedOffset(0));
-    int64 const divisor = unit() * common;
-    auto const units = static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor);
-    auto const missing = units - static_cast<uint64>(m_size - 1);
-    try {
-      if (missing <= kMostGaps && m_size <= kNoSlot + 1 &&
-          gapColumn(m_size, static_cast<int>(missing)) < (m_size + 1) / 2) {
-        becomeGaps(divisor);
-      } else if (missing <= kMostMissing) {
-        if (m_form > Form::Thinned) becomeThinned(divisor);
-      } else if (smallestFor(units) < m_form) {
-        convert(smallestFor(units), front(), divisor);
-      }
-    } catch (std::bad_alloc const&) {
-      // The form as it is does as well.
-    }
+  try {
+    // Keys may have gone and gaps stayed.
+    if (m_form == Form::Gaps && m_column.size() > (m_size + 1) / 2) convert(Form::Short, m_start, m_unit);
+    if (m_form > Form::Gaps) packOffsets();
+  } catch (std::bad_alloc const&) {
+    // The form as it is does as well.
   }
   m_column.shrink();
+}
+
+void LeafTimes::packOffsets() {
+  // What offsets have in common besides their unit.
+  int64 common = 0;
+  for (int i = 1; i < m_size && common != 1; ++i)
+    common = std::gcd(common, storedOffset(i) - storedOffset(0));
+  int64 const divisor = unit() * common;
+  auto const units = static_cast<uint64>(back() - front()) / static_cast<uint64>(divisor);
+  auto const missing = units - static_cast<uint64>(m_size - 1);
+  if (missing <= kMostGaps && m_size <= kNoSlot + 1 &&
+      gapColumn(m_size, static_cast<int>(missing)) < (m_size + 1) / 2) {
+    becomeGaps(divisor);
+  } else if (missing <= kMostMissing) {
+    if (m_form > Form::Thinned) becomeThinned(divisor);
+  } else if (smallestFor(units) < m_form) {
+    convert(smallestFor(units), front(), divisor);
+  }
 }
 
 // Calls visit(slot, how many times are missing before it, by a divisor of all distances).

@@ -128,6 +128,7 @@ class LeafTimes {
   void convert(Form, int64 start, int64 unit);
   void put(int slot, int64 start, int64 period, int n, int limit);
   void evenOut();
+  void packOffsets();
   bool eraseGaps(int first, int last);
   bool eraseThinned(int first, int last);
   template <class Visit>
