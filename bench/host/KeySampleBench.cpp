@@ -16,14 +16,14 @@ constexpr int64 kCurveKeys = 10'000;
 constexpr int64 kKeyPeriod = 5'880'000;  // ticks in a frame at 120 frames a second
 constexpr int64 kReadBlock = 256;        // samples
 
-// How the keys lie in time.
-enum class Spacing { Even, Thinned };
+// How the keys lie in time: with Thinned half of them were taken out, with Reduced every twelfth one.
+enum class Spacing { Even, Thinned, Reduced };
 
 std::vector<int64> curveTimes(Spacing kind) {
   std::mt19937_64 random(7);
   std::vector<int64> times;
   for (int64 time = 0; static_cast<int64>(times.size()) < kCurveKeys; time += kKeyPeriod)
-    if (kind == Spacing::Even || random() % 2) times.push_back(time);
+    if (kind == Spacing::Even || random() % (kind == Spacing::Thinned ? 2 : 12)) times.push_back(time);
   return times;
 }
 
@@ -40,14 +40,19 @@ KeyTrack makeCurve(Shape shape, Spacing kind) {
   std::vector<int64> const times = curveTimes(kind);
   std::vector<double> const values = curveValues();
   KeyTrack track(shape);
+  std::vector<unsigned char> lost;
   for (size_t i = 0; i < times.size(); ++i) {
     double const v = values[i], half = v / 4000;
-    if (shape == Shape::Rotation) {
-      track.set(times[i], {0, 0, std::sin(half), std::cos(half)});
-    } else {
-      track.set(times[i], {v, v + 1, v + 2});
+    for (int64 time = static_cast<int64>(lost.size()) * kKeyPeriod; time <= times[i]; time += kKeyPeriod) {
+      if (shape == Shape::Rotation) {
+        track.set(time, {0, 0, std::sin(half), std::cos(half)});
+      } else {
+        track.set(time, {v, v + 1, v + 2});
+      }
+      lost.push_back(time < times[i] ? KeyTrack::kAll : 0);
     }
   }
+  track.thin(lost);
   return track;
 }
 
@@ -150,6 +155,7 @@ BENCHMARK_CAPTURE(readPlainArray, cubicAtKeys, Spacing::Even, kKeyPeriod);
 READ_BENCHMARKS(cubicAtKeys, Shape::Scalar, Interpolation::Cubic, Spacing::Even, kKeyPeriod);
 BENCHMARK_CAPTURE(readPlainArray, cubicThinned, Spacing::Thinned, kKeyPeriod);
 READ_BENCHMARKS(cubicThinned, Shape::Scalar, Interpolation::Cubic, Spacing::Thinned, kKeyPeriod);
+READ_BENCHMARKS(cubicReduced, Shape::Scalar, Interpolation::Cubic, Spacing::Reduced, kKeyPeriod);
 READ_BENCHMARKS(linearVector, Shape::Vector, Interpolation::Linear, Spacing::Thinned, kKeyPeriod);
 READ_BENCHMARKS(cubicVector, Shape::Vector, Interpolation::Cubic, Spacing::Thinned, kKeyPeriod);
 READ_BENCHMARKS(vectorAtKeys, Shape::Vector, Interpolation::Linear, Spacing::Even, kKeyPeriod);

@@ -77,8 +77,13 @@ struct DataRanges::Scan {
       add(first / period, leaf.lastTime() / period);
       return pass(leaf.lastTime(), 0);
     }
-    for (int slot = leaf.lowerBound(start); slot < leaf.size() && !stopped; ++slot) {
-      int64 const time = leaf.time(slot);
+    constexpr int kDecoded = 32;
+    int64 times[kDecoded];
+    int const begin = leaf.lowerBound(start);
+    for (int slot = begin; slot < leaf.size() && !stopped; ++slot) {
+      int const i = (slot - begin) % kDecoded;
+      if (i == 0) leaf.readTimes(slot, std::min(kDecoded, leaf.size() - slot), times);
+      int64 const time = times[i];
       unsigned const held = leaf.components(slot);
       reach(time);
       if (time % period == 0 && ranges.counts(bridged | held)) add(time / period, time / period);

@@ -16,7 +16,8 @@ class KeyColumn {
 
  public:
   KeyColumn() = default;
-  KeyColumn(KeyColumn const& o) { insert(0, o.data(), o.m_size, o.m_size); }
+  KeyColumn(KeyColumn const& o) : KeyColumn(o, 0, o.m_size) {}
+  KeyColumn(KeyColumn const& o, int from, int n) { insert(0, o.data() + from, n, n); }
   KeyColumn& operator=(KeyColumn&& o) noexcept = default;
 
   int size() const { return m_size; }

@@ -93,12 +93,13 @@ template <class Point, class Wanted>
 void interpolateKeys(KeyTrack::Shape shape, Interpolation kind, int64 time, Point before, Point const& a,
                      Point const& b, Point after, Wanted wanted, KeyTrack::Values& values) {
   using namespace interpolation;
-  auto const length = static_cast<double>(b.time() - a.time());
-  double const u = static_cast<double>(time - a.time()) / length;
+  int64 const start = a.time(), end = b.time();
+  auto const length = static_cast<double>(end - start);
+  double const u = static_cast<double>(time - start) / length;
   Tangent leaving = Tangent::oneSided(), arriving = leaving;
   if (kind == Interpolation::Cubic) {
-    if (before) leaving = Tangent::between(length, static_cast<double>(a.time() - before.time()));
-    if (after) arriving = Tangent::between(length, static_cast<double>(after.time() - b.time()));
+    if (before) leaving = Tangent::between(length, static_cast<double>(start - before.time()));
+    if (after) arriving = Tangent::between(length, static_cast<double>(after.time() - end));
     if (!before) before = a;
     if (!after) after = b;
   }

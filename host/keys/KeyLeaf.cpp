@@ -46,6 +46,25 @@ void KeyLeaf::readValues(int slot, int step, int n, int first, int end, double* 
   }
 }
 
+// Of the values, which are most of a leaf, only those are copied that are needed.
+KeyLeaf::KeyLeaf(KeyLeaf const& o, int first, int last)
+    : KeyNode(o),
+      m_width(o.m_width),
+      m_limit(o.m_limit),
+      m_form(o.m_form),
+      m_times(o.m_times),
+      m_flags(o.m_flags),
+      m_selection(o.m_selection) {
+  int const from = first * m_width, n = (last - first) * m_width;
+  if (m_form == Form::Float) {
+    m_floats = {o.m_floats, from, n};
+  } else {
+    m_doubles = m_form == Form::One ? KeyColumn(o.m_doubles) : KeyColumn(o.m_doubles, from, n);
+  }
+  if (last < size()) eraseAllButValues(last, size());
+  if (first > 0) eraseAllButValues(0, first);
+}
+
 // Lets add() put n keys at a slot, part by part and times last. Where it fails, what the other parts took is
 // taken away again.
 template <class Add>
@@ -58,7 +77,7 @@ void KeyLeaf::addWholly(int slot, int n, Add add) {
     };
     if (m_form == Form::Double) takeBack(m_doubles, m_width);
     if (m_form == Form::Float) takeBack(m_floats, m_width);
-    takeBack(m_flags, 1);
+    m_flags.takeBack(slot, n, size());
     takeBack(m_selection, 1);
     throw;
   }
@@ -88,8 +107,8 @@ void KeyLeaf::append(KeyLeaf const& from, int first, int last) {
   from.readValues(first, 1, n, 0, m_width, values.data(), m_width);
   addWholly(size(), n, [&] {
     insertValues(size(), values.data(), n);
-    appendBits(m_flags, from.m_flags, kWhole, first, n);
-    appendBits(m_selection, from.m_selection, 0, first, n);
+    m_flags.append(from.m_flags, first, n, size(), m_limit);
+    appendSelection(from.m_selection, first, n);
     m_times.append(from.m_times, first, last);
   });
   countRange(from, first, last, 1);
@@ -105,13 +124,17 @@ void KeyLeaf::write(int slot, double const* values, unsigned mask, KeyFlags cons
   setFlags(slot, flags);
 }
 
-// Times come first: they may need memory for another form, of which there may be none.
 void KeyLeaf::erase(int first, int last) {
-  m_times.erase(first, last);
+  eraseAllButValues(first, last);
   if (m_form == Form::Double) m_doubles.erase(first * m_width, last * m_width);
   if (m_form == Form::Float) m_floats.erase(first * m_width, last * m_width);
+}
+
+// Times come first: they may need memory for another form, of which there may be none.
+void KeyLeaf::eraseAllButValues(int first, int last) {
+  m_times.erase(first, last);
   countRange(*this, first, last, -1);
-  if (!plain()) m_flags.erase(first, last);
+  m_flags.erase(first, last, size() + last - first);
   if (!m_selection.empty()) m_selection.erase(first, last);
   dropIdleFlags();
 }
@@ -124,7 +147,7 @@ void KeyLeaf::keep(int const* slots, int n) {
   counts = left;
   if (m_form == Form::Double) m_doubles.keep(slots, n, m_width);
   if (m_form == Form::Float) m_floats.keep(slots, n, m_width);
-  if (!plain()) m_flags.keep(slots, n, 1);
+  m_flags.keep(slots, n);
   if (!m_selection.empty()) m_selection.keep(slots, n, 1);
   dropIdleFlags();
 }
@@ -137,16 +160,20 @@ void KeyLeaf::countRange(KeyLeaf const& of, int first, int last, int by) {
 
 int KeyLeaf::mark(Mark what, bool on, unsigned mask, int first, int last) {
   bool const bridges = what == Mark::Bridged;
-  int const shift = bridges ? kBridgeShift : 0;
   if (on) spellOutFlags({kWhole, bridges ? mask : 0, bridges ? 0 : mask});
-  Column& column = bridges ? m_flags : m_selection;
-  if (column.empty()) return 0;
+  if (bridges ? plain() : m_selection.empty()) return 0;
+  // A part of a bridge needs another form, whether it comes or goes.
+  if (bridges) m_flags.makeHold({kWhole, mask}, size(), m_limit);
   int touchedKeys = 0, keys = 0, byComponent[3] = {};  // keys that are marked, or no longer are
-  unsigned char* bits = column.data();
   for (int slot = first; slot < last; ++slot) {
-    unsigned const now = bits[slot] >> shift & kWhole, touched = mask & (on ? components(slot) : now);
-    unsigned const then = on ? now | touched : now & ~touched, turned = now ^ then;
-    bits[slot] = static_cast<unsigned char>(bits[slot] ^ turned << shift);
+    unsigned const held = components(slot), now = bridges ? this->bridges(slot) : m_selection[slot];
+    unsigned const touched = mask & (on ? held : now), then = on ? now | touched : now & ~touched;
+    unsigned const turned = now ^ then;
+    if (bridges) {
+      m_flags.set(slot, {held, then});
+    } else {
+      m_selection[slot] = static_cast<unsigned char>(then);
+    }
     touchedKeys += touched != 0;
     keys += (now == 0) != (then == 0);
     for (int c = 0; c < 3; ++c) byComponent[c] += static_cast<int>(turned >> c & 1);
@@ -162,7 +189,7 @@ void KeyLeaf::pack() noexcept {
   m_times.pack();
   m_doubles.shrink();
   m_floats.shrink();
-  m_flags.shrink();
+  m_flags.pack(size());
   m_selection.shrink();
 }
 
@@ -172,14 +199,14 @@ void KeyLeaf::setFlags(int slot, KeyFlags const& fresh) {
   spellOutFlags(fresh);
   counts.count(old, -1);
   counts.count(fresh, 1);
-  if (!plain()) m_flags[slot] = static_cast<unsigned char>(fresh.components | fresh.bridges << kBridgeShift);
+  m_flags.set(slot, fresh);
   if (!m_selection.empty()) m_selection[slot] = static_cast<unsigned char>(fresh.selected);
 }
 
 // Writes out the columns that a key with these flags needs, so that nothing else of its edit can fail.
 void KeyLeaf::spellOutFlags(KeyFlags const& toBe) {
-  if (plain() && (toBe.components != kWhole || toBe.bridges)) insertBits(m_flags, kWhole, kWhole, 0, 0);
-  if (m_selection.empty() && toBe.selected) insertBits(m_selection, 0, 0, 0, 0);
+  m_flags.makeHold(toBe, size(), m_limit);
+  if (toBe.selected) insertSelection(0, 0, 0);
 }
 
 void KeyLeaf::dropIdleFlags() {
@@ -244,25 +271,24 @@ void KeyLeaf::addValues(int slot, double const* values, int n) {
 }
 
 void KeyLeaf::insertFlags(int slot, KeyFlags const& flags, int n) {
-  unsigned const bits = flags.components | flags.bridges << kBridgeShift;
-  if (bits != kWhole || !plain()) insertBits(m_flags, kWhole, bits, slot, n);
-  if (flags.selected || !m_selection.empty()) insertBits(m_selection, 0, flags.selected, slot, n);
+  m_flags.insert(slot, n, flags, size(), m_limit);
+  if (flags.selected || !m_selection.empty()) insertSelection(flags.selected, slot, n);
 }
 
-void KeyLeaf::appendBits(Column& column, Column const& from, unsigned absent, int first, int n) {
-  if (column.empty() && from.empty()) return;
-  if (from.empty()) return insertBits(column, absent, absent, size(), n);
-  insertBits(column, absent, absent, 0, 0);
-  column.insert(column.size(), from.data() + first, n, m_limit);
+void KeyLeaf::appendSelection(Column const& from, int first, int n) {
+  if (m_selection.empty() && from.empty()) return;
+  if (from.empty()) return insertSelection(0, size(), n);
+  insertSelection(0, 0, 0);
+  m_selection.insert(m_selection.size(), from.data() + first, n, m_limit);
 }
 
-// An absent column is written out first: each slot had the bits `absent`.
-void KeyLeaf::insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n) {
+// An absent column is written out first.
+void KeyLeaf::insertSelection(unsigned selected, int slot, int n) {
   auto const fill = [&](int at, int count, unsigned with) {
-    std::memset(column.open(at, count, m_limit), static_cast<int>(with), static_cast<size_t>(count));
+    std::memset(m_selection.open(at, count, m_limit), static_cast<int>(with), static_cast<size_t>(count));
   };
-  if (column.empty() && size() > 0) fill(0, size(), absent);
-  if (n > 0) fill(slot, n, bits);
+  if (m_selection.empty() && size() > 0) fill(0, size(), 0);
+  if (n > 0) fill(slot, n, selected);
 }
 
 void KeyLeaf::putValues(int slot, double const* values) {
@@ -304,7 +330,7 @@ char const* KeyLeaf::checkInvariants() const {
   int const stored = m_form == Form::One ? m_width : size() * m_width;
   if ((m_form == Form::Float ? m_floats.size() : m_doubles.size()) != stored) return "values are missing";
   if (!m_times.isWhole()) return "times are missing";
-  if (!plain() && m_flags.size() != size()) return "flags are missing";
+  if (!m_flags.isWhole(size())) return "flags are missing";
   if (!m_selection.empty() && m_selection.size() != size()) return "selection is missing";
 
   KeyCounts expected;

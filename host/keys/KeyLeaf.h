@@ -1,7 +1,7 @@
 // A leaf of a key track: up to a few hundred keys. Each of its four parts has a compact form and a general
 // one:
 //  - times: LeafTimes;
-//  - components and bridges: none while every key is whole and bridges nothing, else a byte for each key;
+//  - components and bridges: FlagColumn;
 //  - selection: none while no key is selected, else a byte for each key;
 //  - values: one key's while all are equal bit by bit, floats while that loses nothing, else doubles.
 // A leaf with even times and no flags or selection is dense. An edit that breaks a form turns that part of
@@ -9,23 +9,25 @@
 // be in range.
 #pragma once
 
+#include "host/keys/FlagColumn.h"
 #include "host/keys/KeyColumn.h"
 #include "host/keys/KeyNode.h"
 #include "host/keys/LeafTimes.h"
 
 class KeyLeaf final : public KeyNode {
  public:
-  static constexpr unsigned kWhole = 7;
+  static constexpr unsigned kWhole = FlagColumn::kWhole;
 
   // `width` doubles in a key; `limit` keys at most.
   KeyLeaf(int width, int limit) : KeyNode(0), m_width(width), m_limit(limit) {}
   KeyLeaf(KeyLeaf const&) = default;
+  KeyLeaf(KeyLeaf const&, int first, int last);  // some keys, at least one
 
   int size() const { return m_times.size(); }
   int limit() const { return m_limit; }
   bool full() const { return size() >= m_limit; }
   bool evenTimes() const { return m_times.even(); }
-  bool plain() const { return m_flags.empty(); }  // every key is whole and bridges nothing
+  bool plain() const { return m_flags.none(); }  // every key is whole and bridges nothing
   bool dense() const { return evenTimes() && plain() && m_selection.empty(); }
 
   int64 time(int slot) const { return m_times[slot]; }
@@ -36,15 +38,14 @@ class KeyLeaf final : public KeyNode {
   // The time must not lie before the first key.
   int lastAtOrBefore(int64 time) const { return m_times.lastAtOrBefore(time); }
   int lastAtOrBefore(int64 time, int guess) const {  // fast when it is the guess or the next slot
-    for (int end = guess + 2; guess < end; ++guess) {
-      if (this->time(guess) > time) break;
-      if (guess + 1 == size() || this->time(guess + 1) > time) return guess;
-    }
+    if (this->time(guess) <= time)
+      for (int end = guess + 2; guess < end; ++guess)
+        if (guess + 1 == size() || this->time(guess + 1) > time) return guess;
     return lastAtOrBefore(time);
   }
 
-  unsigned components(int slot) const { return plain() ? kWhole : m_flags[slot] & kWhole; }
-  unsigned bridges(int slot) const { return plain() ? 0 : m_flags[slot] >> kBridgeShift; }
+  unsigned components(int slot) const { return m_flags.components(slot); }
+  unsigned bridges(int slot) const { return m_flags.bridges(slot); }
   unsigned selected(int slot) const { return m_selection.empty() ? 0 : m_selection[slot]; }
   KeyFlags flags(int slot) const { return {components(slot), bridges(slot), selected(slot)}; }
   double value(int slot, int component) const {
@@ -63,7 +64,7 @@ class KeyLeaf final : public KeyNode {
 
   // Whether every key holds a component of the mask.
   bool allHold(unsigned mask) const {
-    return plain() || counts.whole == size() || (mask == 1 && counts.held[0] == size()) ||
+    return m_flags.allWhole() || counts.whole == size() || (mask == 1 && counts.held[0] == size()) ||
            (mask == 2 && counts.held[1] == size()) || (mask == 4 && counts.held[2] == size());
   }
   int64 period() const { return evenTimes() ? m_times.period() : 0; }  // 0 with one key too
@@ -77,15 +78,13 @@ class KeyLeaf final : public KeyNode {
 
   // The first slot at or after (last at or before) `slot` that holds, or is selected on, a component of the
   // mask; -1 when there is none.
-  int nextHolding(int slot, unsigned mask) const { return scan<1>(m_flags, kWhole, slot, mask); }
-  int previousHolding(int slot, unsigned mask) const { return scan<-1>(m_flags, kWhole, slot, mask); }
-  int nextSelected(int slot, unsigned mask) const { return scan<1>(m_selection, 0, slot, mask); }
-  int previousSelected(int slot, unsigned mask) const { return scan<-1>(m_selection, 0, slot, mask); }
+  int nextHolding(int slot, unsigned mask) const { return m_flags.scanHolding<1>(slot, size(), mask); }
+  int previousHolding(int slot, unsigned mask) const { return m_flags.scanHolding<-1>(slot, size(), mask); }
+  int nextSelected(int slot, unsigned mask) const { return scanSelection<1>(slot, mask); }
+  int previousSelected(int slot, unsigned mask) const { return scanSelection<-1>(slot, mask); }
   // The same for keys that are selected on no component of the mask.
-  int nextUnselected(int slot, unsigned mask) const { return scan<1, false>(m_selection, 0, slot, mask); }
-  int previousUnselected(int slot, unsigned mask) const {
-    return scan<-1, false>(m_selection, 0, slot, mask);
-  }
+  int nextUnselected(int slot, unsigned mask) const { return scanSelection<1, false>(slot, mask); }
+  int previousUnselected(int slot, unsigned mask) const { return scanSelection<-1, false>(slot, mask); }
 
   // Edits that throw for lack of memory leave the leaf as it was.
   void insert(int slot, int64 time, double const* values, KeyFlags const& flags);
@@ -118,15 +117,13 @@ class KeyLeaf final : public KeyNode {
  private:
   enum class Form : unsigned char { One, Float, Double };
   using Column = KeyColumn<unsigned char>;
-  static constexpr int kBridgeShift = 3;
 
-  // The first slot whose bits have any of the mask, or none of it. Where the column is absent each slot has
-  // the bits `absent`.
+  // The first slot that is selected on any component of the mask, or on none of it.
   template <int Step, bool Any = true>
-  int scan(Column const& bits, unsigned absent, int slot, unsigned mask) const {
-    if (bits.empty()) return slot >= 0 && slot < size() && ((absent & mask) != 0) == Any ? slot : -1;
+  int scanSelection(int slot, unsigned mask) const {
+    if (m_selection.empty()) return slot >= 0 && slot < size() && !Any ? slot : -1;
     for (; slot >= 0 && slot < size(); slot += Step)
-      if (((bits[slot] & mask) != 0) == Any) return slot;
+      if (((m_selection[slot] & mask) != 0) == Any) return slot;
     return -1;
   }
 
@@ -135,9 +132,10 @@ class KeyLeaf final : public KeyNode {
   void insertValues(int slot, double const* values, int n);
   void insertFlags(int slot, KeyFlags const& flags, int n);
   void spellOutFlags(KeyFlags const& toBe);
+  void eraseAllButValues(int first, int last);
   void countRange(KeyLeaf const& of, int first, int last, int by);
-  void appendBits(Column& column, Column const& from, unsigned absent, int first, int n);
-  void insertBits(Column& column, unsigned absent, unsigned bits, int slot, int n);
+  void appendSelection(Column const& from, int first, int n);
+  void insertSelection(unsigned selected, int slot, int n);
   template <class T, class ValueAt>
   void become(Form form, KeyColumn<T>& column, int n, ValueAt valueAt);
   void spellOutValues(bool asFloats);
@@ -152,6 +150,6 @@ class KeyLeaf final : public KeyNode {
   LeafTimes m_times;
   KeyColumn<double> m_doubles;  // with Form::One a single key's
   KeyColumn<float> m_floats;
-  Column m_flags;  // components, and bridges above them
+  FlagColumn m_flags;
   Column m_selection;
 };

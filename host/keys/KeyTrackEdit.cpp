@@ -340,6 +340,16 @@ void KeyTrack::editBelow(KeyNodeRef& node, int64 first, int64 last, LeafEdit& wh
     node.reset();
     return;
   }
+  if (what.dropsWhole() && node->isLeaf() && node->isShared() && (first == 0 || last == node->counts.keys)) {
+    auto const& old = asLeaf(*node.get());
+    bool const toRight = first == 0;
+    auto const cut = static_cast<int>(toRight ? last : first);
+    KeyNodeRef left(new KeyLeaf(old, toRight ? cut : 0, toRight ? old.size() : cut));
+    asLeaf(*left.get()).pack();
+    node = std::move(left);
+    what.affected += last - first;
+    return;
+  }
   node.own();
   if (node->isLeaf()) {
     auto& leaf = asLeaf(*node.get());

@@ -1,6 +1,7 @@
 // Random edits of a leaf's times against a plain list, over distances that need each of the forms.
 #include <algorithm>
 #include <gtest/gtest.h>
+#include <numeric>
 #include <random>
 #include <set>
 #include <vector>
@@ -74,18 +75,32 @@ class KeyTimesEdits : public testing::TestWithParam<int64> {
 
 TEST_P(KeyTimesEdits, MatchThePlainList) {
   std::set<int64> widths;  // bytes for a time
+  int gaps = 0;
   for (int step = 0; step < 20'000; ++step) {
+    if (step >= 10'000 && step % 100 == 0) {  // even times, in which edits make gaps
+      m_times = LeafTimes();
+      m_times.append(0, GetParam(), kLimit, kLimit);
+      m_expected.clear();
+      for (int i = 0; i < kLimit; ++i) m_expected.push_back(i * GetParam());
+    }
     edit();
     compare();
     if (HasFatalFailure()) FAIL() << "step " << step;
     if (size() < 3) continue;
     LeafTimes packed = m_times;
     packed.pack();
+    gaps += packed.bytes() > 0 && packed.bytes() < size() - 1;
     widths.insert(packed.bytes() / size());
     int64 const all = m_expected.back() - m_expected.front();
+    int64 unit = 0;
+    for (int64 const each : m_expected) unit = std::gcd(unit, each - m_expected.front());
+    if (all / unit < size() + 255) {
+      ASSERT_LE(packed.bytes(), size() + 1);
+    }
     int64 const most = all <= 65'535 ? 2 : all <= 4'294'967'295 ? 4 : 8;
     ASSERT_LE(packed.bytes(), most * size());
   }
+  EXPECT_GT(gaps, 100);
   EXPECT_GE(widths.size(), 2u);  // even, and another
 }
 
