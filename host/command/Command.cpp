@@ -47,6 +47,11 @@ CommandOption const& Command::getOption(int i) const {
   return option ? *option : nothing;
 }
 
+HString const& Command::getOptionText(int i) const {
+  static HString const nothing;
+  return i >= 0 && i < getNumOptions() ? m_optionTexts[static_cast<size_t>(i)] : nothing;
+}
+
 bool Command::unref() {
   if (--m_references > 0) return false;
   delete this;
@@ -84,5 +89,8 @@ CommandOption* Command::addOption(CommandOption* option, uint64 mask, bool hidde
   option->m_mask = mask;
   option->m_hidden = hidden;
   m_options.emplace_back(option);
+  m_optionTexts.emplace_back();
   return option;
 }
+
+void Command::setOptionText(HString const& text) { m_optionTexts.back() = text; }

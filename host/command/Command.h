@@ -45,9 +45,14 @@ class Command : public HObject {
   HString const& getSubCategory() const { return m_subCategory; }
   // What it is for, in one line.
   HString const& getPurpose() const { return m_purpose; }
+  // What the arguments are and what the command works on, in a few lines; a script line that shows it at
+  // work.
+  HString const& getArgsText() const { return m_argsText; }
+  HString const& getExample() const { return m_example; }
 
   int getNumOptions() const { return static_cast<int>(m_options.size()); }
   CommandOption const& getOption(int i) const;  // one without a name beyond them
+  HString const& getOptionText(int i) const;    // what it does, in one line; empty beyond them
 
   void ref() { ++m_references; }
   // Lets go of one reference; with the last the command is destroyed, and the result is true.
@@ -61,12 +66,17 @@ class Command : public HObject {
  protected:
   void setCommandCategory(HString category, HString subCategory);
   void setPurpose(HString const& purpose) { m_purpose = purpose; }
+  void setArgsText(HString const& text) { m_argsText = text; }
+  void setExample(HString const& line) { m_example = line; }
+  // Of the option that was declared last.
+  void setOptionText(HString const& text);
   // Declares the next option, which the command owns from then on. mask: bits, by index, of the options it
   // excludes. hidden: accepted, but not shown in help.
   CommandOption* addOption(CommandOption* option, uint64 mask, bool hidden);
 
  private:
-  HString m_name, m_displayName, m_category, m_subCategory, m_purpose;
+  HString m_name, m_displayName, m_category, m_subCategory, m_purpose, m_argsText, m_example;
   std::vector<std::unique_ptr<CommandOption>> m_options;
+  std::vector<HString> m_optionTexts;  // by index
   int m_references = 1;
 };
