@@ -11,9 +11,19 @@ class PackCmd final : public ScriptCommand<PackCmd> {
       .displayName = "Pack Marker Data",
       .category = "Data Editing",
       .purpose = "Joins pieces of unlabeled markers that can belong to one marker.",
-      .options = {{"minGap", 1, Variable::Int},
-                  {"minDistance", 1, Variable::Float},
-                  {"marker", 1, Variable::String}}};
+      .example = "pack -minGap 3 -minDistance 20.0",
+      .argsText =
+          "Joins the selected unlabeled markers in as few as possible, in all clips. The first in time "
+          "stays; the others leave the scene. Locked markers and those with something below them stay, with "
+          "a warning.",
+      .options = {
+          {"minGap", "frames without data between pieces, default 1; after 0 unpack cannot part them again",
+           1, Variable::Int},
+          {"minDistance",
+           "mm between the ends of pieces, default 0; nearer ones may be one marker, to be looked at first",
+           1, Variable::Float},
+          {"marker", "path of the unlabeled marker to join into, instead of as many as are needed", 1,
+           Variable::String}}};
 
   static constexpr int kMinGap = info.option("minGap"), kMinDistance = info.option("minDistance"),
                        kMarker = info.option("marker");

@@ -14,15 +14,19 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
       .displayName = "Select Keys",
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
-      .purpose =
-          "Selects keys of a channel, else of the selected channels, else of all; -frames limits them to a "
-          "range, -none deselects them.",
+      .purpose = "Selects keys of a channel, else of the active channels, else of all, or deselects them.",
+      .example = "selectKeys Translation -frames 0 10 -onMod LFHD",
       .args = {"[CHANNEL[.x]]", 0, 1, {Variable::String}},
-      .options = {{"frames", 2, Variable::Float, 0b0010},
-                  {"all", 0, Variable::None, 0b0101},
-                  {"none", 0, Variable::None, 0b1010},
-                  {"add", 0, Variable::None, 0b0100},
-                  {"onMod", 1, Variable::String}}};
+      .argsText =
+          "A channel, whole or by component; without it the active channels, and where none are, all "
+          "channels. On the selected modules, in the active layer. Their former selected keys, on all "
+          "channels, are deselected.",
+      .options = {
+          {"frames", "first and last frame, both included; default all time", 2, Variable::Float, 0b0010},
+          {"all", "all channels, whatever is active", 0, Variable::None, 0b0101},
+          {"none", "deselects these keys instead, and leaves the others", 0, Variable::None, 0b1010},
+          {"add", "keeps the keys that were selected", 0, Variable::None, 0b0100},
+          {"onMod", "path of the one module instead of the selected ones", 1, Variable::String}}};
   static constexpr int kFrames = info.option("frames"), kAll = info.option("all"),
                        kNone = info.option("none"), kAdd = info.option("add"), kOnMod = info.option("onMod");
 
