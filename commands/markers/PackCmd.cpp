@@ -17,10 +17,12 @@ class PackCmd final : public ScriptCommand<PackCmd> {
           "stays; the others leave the scene. Locked markers and those with something below them stay, with "
           "a warning.",
       .options = {
-          {"minGap", "frames without data between pieces, default 1; after 0 unpack cannot part them again",
-           1, Variable::Int},
+          {"minGap",
+           "frames that must lack data between pieces, default 1; with 0 unpack could not part them again", 1,
+           Variable::Int},
           {"minDistance",
-           "mm between the ends of pieces, default 0; nearer ones may be one marker, to be looked at first",
+           "mm that ends of pieces must be apart, default 0: nearer ones may be one marker, for you to "
+           "decide",
            1, Variable::Float},
           {"marker", "path of the unlabeled marker to join into, instead of as many as are needed", 1,
            Variable::String}}};

@@ -21,14 +21,13 @@ class SetPropertyCmd final : public ScriptCommand<SetPropertyCmd> {
           "propertyName is a channel, a component of one (tx, Translation.x) or an attribute in exact case. "
           "On all selected modules that have it. A channel takes the value on its selected keys, not at the "
           "current time; -d sets its default value. Lengths are mm, angles degrees, times frames. Vector "
-          "channels are written even where they are locked.",
+          "channels are written even where they are locked, others only with -onMod.",
       .options =
           {{"c", "the same as -d", 0, Variable::None, 0, true},
            {"r",
             "adds to the present value; refused for boolean channels, no effect on texts, lists and states"},
            {"all", "every module of the scene that has the property, selected or not"},
-           {"onMod", "path of the one module to change, even where its channel is locked", 1,
-            Variable::String, 16},
+           {"onMod", "path of the one module to change", 1, Variable::String, 16},
            {"type", "class name: of those modules only the ones of exactly this class", 1, Variable::String,
             8},
            {"d",

@@ -18,7 +18,8 @@ class SetPositionCmd final : public ScriptCommand<SetPositionCmd> {
       .argsText =
           "moduleName is the path of a node, posVec <x y z>: the channel's own value unless -ws. Keys the "
           "current time in the active layer; with no active clip it sets the default value. Where the "
-          "channel is locked there is a warning and nothing changes.",
+          "channel is locked there is a warning and nothing changes. A marker's frame is marked as edited by "
+          "hand, whatever the options.",
       .options = {{"ws", "posVec is in the world"},
                   {"preTrans", "sets the pre-translation, the fixed offset before the channels, instead", 0,
                    Variable::None, 4},

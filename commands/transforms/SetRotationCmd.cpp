@@ -16,8 +16,8 @@ class SetRotationCmd final : public ScriptCommand<SetRotationCmd> {
       .argsText =
           "moduleName is the path of a node, rotVec <x y z> in degrees, in XYZ whatever the node's own "
           "order: the channel's own value unless -ws. Keys the current time in the active layer; with no "
-          "active clip it sets the default value. Where the channel is locked there is a warning and nothing "
-          "changes.",
+          "active clip it sets the default value. Where the channel is locked there is a warning, and it "
+          "stays.",
       .options = {{"ws", "rotVec is in the world"},
                   {"preRot", "sets the pre-rotation, the fixed rotation before the channels, as well", 0,
                    Variable::None, 4},
