@@ -16,8 +16,8 @@ class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
       .example = "lockChannel LFHD Translation true",
       .args = {"PATH CHANNEL BOOLEAN", 3, 3, {Variable::String, Variable::String}},
       .argsText =
-          "A module, one of its channels as a whole, and true, false or toggle. Locked channels take no "
-          "keys; default values can be set all the same."};
+          "A module, one of its channels as a whole, and true, false or toggle. Commands that write pass a "
+          "locked channel over, warn or fail; setProperty says which it writes all the same."};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     if (!fits(info.args, args) || !args[2].isNumber()) return false;

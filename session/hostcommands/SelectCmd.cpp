@@ -62,6 +62,7 @@ class SelectCmd final : public ScriptCommand<SelectCmd> {
     for (Module* module : chosen)
       module->setSelected(mode == kToggle ? !module->isSelected() : mode != kRemove);
     if (setPrimary) g_db->setPrimarySelectedModule(primary);
+    if (byClass) logInfo("%d modules are selected", g_db->getNumSelectedModules());
     return true;
   }
 

@@ -49,7 +49,10 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
       logWarning("No keys on Base Clip");
       return true;
     }
-    for (Module* module : modules) selectIn(*module, channels, range, options.has(kNone), options.has(kAdd));
+    Selecting selecting{channels, range, options.has(kNone), options.has(kAdd)};
+    for (Module* module : modules) selecting.workOn(*module);
+    logInfo("%s %d keys on %d channels", selecting.none ? "Deselected" : "Selected", selecting.keys,
+            selecting.channels);
     return true;
   }
 
@@ -87,20 +90,27 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
     return false;
   }
 
-  static void selectIn(Module& module, std::vector<ChannelChoice> const& channels, HTimeRange const& range,
-                       bool none, bool add) {
-    for (int i = 0; i < module.getNumChannels(); ++i) {
-      Controller& channel = *module.getChannel(i);
-      if (!none && !add) channel.deselectKeys(HTimeRange::forever(), 7);
-      if (channels.empty()) change(channel, range, 7, none);
-      for (ChannelChoice const& choice : channels)
-        if (choice.id == channel.getPropertyId()) change(channel, range, choice.mask, none);
-    }
-  }
+  // Works on one module after the other and counts what it touches.
+  struct Selecting {
+    std::vector<ChannelChoice> const& choices;  // none: all channels
+    HTimeRange range;
+    bool none, add;
+    int keys = 0, channels = 0;
 
-  static void change(Controller& channel, HTimeRange const& range, unsigned mask, bool none) {
-    none ? channel.deselectKeys(range, mask) : channel.selectKeys(range, mask);
-  }
+    void workOn(Module& module) {
+      for (int i = 0; i < module.getNumChannels(); ++i) {
+        Controller& channel = *module.getChannel(i);
+        if (!none && !add) channel.deselectKeys(HTimeRange::forever(), 7);
+        unsigned mask = choices.empty() ? 7 : 0;
+        for (ChannelChoice const& choice : choices)
+          if (choice.id == channel.getPropertyId()) mask |= choice.mask;
+        if (mask == 0) continue;
+        int const touched = none ? channel.deselectKeys(range, mask) : channel.selectKeys(range, mask);
+        keys += touched;
+        channels += touched > 0;
+      }
+    }
+  };
 };
 
 }  // namespace
