@@ -93,4 +93,6 @@ CommandOption* Command::addOption(CommandOption* option, uint64 mask, bool hidde
   return option;
 }
 
-void Command::setOptionText(HString const& text) { m_optionTexts.back() = text; }
+void Command::setOptionText(HString const& text) {
+  if (!m_optionTexts.empty()) m_optionTexts.back() = text;
+}

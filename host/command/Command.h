@@ -45,9 +45,9 @@ class Command : public HObject {
   HString const& getSubCategory() const { return m_subCategory; }
   // What it is for, in one line.
   HString const& getPurpose() const { return m_purpose; }
-  // What the arguments are and what the command works on, in a few lines; a script line that shows it at
-  // work.
+  // What the arguments are and what the command works on, in a few lines.
   HString const& getArgsText() const { return m_argsText; }
+  // A script line.
   HString const& getExample() const { return m_example; }
 
   int getNumOptions() const { return static_cast<int>(m_options.size()); }
@@ -68,7 +68,7 @@ class Command : public HObject {
   void setPurpose(HString const& purpose) { m_purpose = purpose; }
   void setArgsText(HString const& text) { m_argsText = text; }
   void setExample(HString const& line) { m_example = line; }
-  // Of the option that was declared last.
+  // Of the option that was declared last; nothing happens before the first.
   void setOptionText(HString const& text);
   // Declares the next option, which the command owns from then on. mask: bits, by index, of the options it
   // excludes. hidden: accepted, but not shown in help.
