@@ -1,6 +1,7 @@
 #include "session/CommandHelp.h"
 
 #include <algorithm>
+#include <sstream>
 
 #include "session/ScriptText.h"
 
@@ -30,23 +31,47 @@ std::vector<CommandOption const*> shownOptions(Command const& command) {
   return shown;
 }
 
-std::string optionLines(std::vector<CommandOption const*> const& options) {
+std::string optionLines(Command const& command, std::vector<CommandOption const*> const& options) {
   size_t width = 0;
   for (auto const* option : options) width = std::max(width, optionSyntax(*option).size());
   std::string lines;
   for (auto const* option : options) {
-    std::string excluded;
+    std::string text = command.getOptionText(option->getIndex()).GetString(), excluded;
     for (auto const* other : options)
       if (excludeEachOther(*option, *other))
-        excluded += (excluded.empty() ? "-" : ", -") + other->getName().GetString();
+        excluded += (excluded.empty() ? "excludes -" : ", -") + other->getName().GetString();
+    if (!excluded.empty()) text += text.empty() ? excluded : " (" + excluded + ")";
     lines += "\n  ";
-    lines += excluded.empty() ? optionSyntax(*option)
-                              : padded(optionSyntax(*option), width + 2) + "excludes " + excluded;
+    lines += text.empty() ? optionSyntax(*option) : padded(optionSyntax(*option), width + 2) + text;
+  }
+  return lines;
+}
+
+// Indented, in lines of 100 characters where words allow it.
+std::string paragraph(std::string const& text) {
+  std::string lines;
+  size_t column = 0;
+  std::istringstream words(text);
+  for (std::string word; words >> word; column += word.size() + 1) {
+    bool const starts = lines.empty() || column + word.size() > 100;
+    if (starts) column = 2;
+    lines += (starts ? "\n  " : " ") + word;
   }
   return lines;
 }
 
 }  // namespace
+
+std::vector<CommandGroup> groupsOf(CommandRegistry const& commands) {
+  std::vector<CommandGroup> groups;
+  for (auto const& entry : commands.entries()) {
+    std::string const category = categoryOf(*entry.command);
+    auto group = std::ranges::find(groups, category, &CommandGroup::category);
+    if (group == groups.end()) group = groups.insert(group, {category, {}});
+    group->entries.push_back(&entry);
+  }
+  return groups;
+}
 
 std::string optionSyntax(CommandOption const& option) {
   std::string text = "-" + option.getName().GetString();
@@ -62,21 +87,14 @@ bool excludeEachOther(CommandOption const& a, CommandOption const& b) {
 }
 
 std::string commandList(CommandRegistry const& commands) {
-  std::vector<std::string> categories;  // in the order of their first commands
   size_t width = 0;
-  for (auto const& entry : commands.entries()) {
-    std::string const category = categoryOf(*entry.command);
-    if (std::find(categories.begin(), categories.end(), category) == categories.end())
-      categories.push_back(category);
+  for (auto const& entry : commands.entries())
     width = std::max(width, entry.command->getName().GetString().size());
-  }
   std::string text;
-  for (std::string const& category : categories) {
-    text += (text.empty() ? "" : "\n\n") + category;
-    for (auto const& entry : commands.entries()) {
-      if (categoryOf(*entry.command) != category) continue;
-      text += "\n  " + padded(entry.command->getName().GetString(), width + 2) + purposeOf(*entry.command);
-    }
+  for (CommandGroup const& group : groupsOf(commands)) {
+    text += (text.empty() ? "" : "\n\n") + group.category;
+    for (auto const* entry : group.entries)
+      text += "\n  " + padded(entry->command->getName().GetString(), width + 2) + purposeOf(*entry->command);
   }
   return text;
 }
@@ -90,8 +108,9 @@ std::string commandPage(CommandRegistry::Entry const& entry) {
 
   std::string text = command.getName().GetString() + ": " + command.getDisplayName().GetString();
   if (!command.getPurpose().IsEmpty()) text += "\n" + command.getPurpose().GetString();
-  text += "\n\nUsage: " + usage;
-  if (!options.empty()) text += "\n\nOptions:" + optionLines(options);
+  text += "\n\nUsage: " + usage + paragraph(command.getArgsText().GetString());
+  if (!options.empty()) text += "\n\nOptions:" + optionLines(command, options);
+  if (!command.getExample().IsEmpty()) text += "\n\nExample: " + command.getExample().GetString();
   text += "\n\nReturns: " + typeName(command.getReturnType());
   text += "\nCategory: " + categoryOf(command);
   return text += "\nSource: " + entry.source;

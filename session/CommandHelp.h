@@ -2,10 +2,19 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "session/CommandRegistry.h"
 
 namespace talix {
+
+// The commands of one category, "Data Editing / Data Retrieval", in the order of the registry.
+struct CommandGroup {
+  std::string category;
+  std::vector<CommandRegistry::Entry const*> entries;
+};
+// In the order of their first commands.
+std::vector<CommandGroup> groupsOf(CommandRegistry const& commands);
 
 // "-color integer integer integer"
 std::string optionSyntax(CommandOption const& option);
@@ -14,7 +23,7 @@ bool excludeEachOther(CommandOption const& a, CommandOption const& b);
 
 // All commands by category, with their purposes. No line break at the end.
 std::string commandList(CommandRegistry const& commands);
-// Syntax, options, result and purpose of one. No line break at the end.
+// All that is said of one. No line break at the end.
 std::string commandPage(CommandRegistry::Entry const& entry);
 
 }  // namespace talix

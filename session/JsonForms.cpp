@@ -56,8 +56,9 @@ size_t characterLength(std::string_view text) {
   return length;
 }
 
-json::object optionJson(CommandOption const& option) {
+json::object optionJson(CommandOption const& option, HString const& text) {
   return {{"name", textJson(option.getName().GetString())},
+          {"text", textJson(text.GetString())},
           {"args", option.getArgCount()},
           {"type", static_cast<int>(option.getType())},
           {"mask", option.getMask()},
@@ -100,13 +101,16 @@ json::object toJson(LineResult const& result) {
 json::object toJson(CommandRegistry::Entry const& entry) {
   Command& command = *entry.command;
   json::array options;
-  for (int i = 0; i < command.getNumOptions(); ++i) options.push_back(optionJson(command.getOption(i)));
+  for (int i = 0; i < command.getNumOptions(); ++i)
+    options.push_back(optionJson(command.getOption(i), command.getOptionText(i)));
   std::string const syntax = argSyntax(command);
   return {{"name", textJson(command.getName().GetString())},
           {"displayName", textJson(command.getDisplayName().GetString())},
           {"category", textJson(command.getCategory().GetString())},
           {"subCategory", textJson(command.getSubCategory().GetString())},
           {"purpose", textJson(command.getPurpose().GetString())},
+          {"argsText", textJson(command.getArgsText().GetString())},
+          {"example", textJson(command.getExample().GetString())},
           {"syntax", syntax.empty() ? json::value(nullptr) : textJson(syntax)},
           {"options", std::move(options)},
           {"returns", static_cast<int>(command.getReturnType())},

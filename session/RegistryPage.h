@@ -8,8 +8,8 @@
 
 namespace talix {
 
-// Markdown, in the order of the registry, with what interfaces and checks of it want to know of each command.
-// No line break at the end.
+// Markdown, by category, with what readers, interfaces and checks of it want to know of each command. No line
+// break at the end.
 std::string registryPage(CommandRegistry const& commands,
                          std::function<bool(std::string const& name)> const& isForDevelopers);
 

@@ -9,12 +9,18 @@ namespace {
 
 class CollapseCmd final : public ScriptCommand<CollapseCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "collapse",
-                                       .displayName = "Collapse Hierarchies",
-                                       .category = "Data Editing",
-                                       .purpose =
-                                           "Copies the motion of one selected hierarchy onto a second one "
-                                           "with the same names, in the active clip."};
+  static constexpr CommandInfo info = {
+      .name = "collapse",
+      .displayName = "Collapse Hierarchies",
+      .category = "Data Editing",
+      .purpose =
+          "Copies the motion of one selected hierarchy onto a second one "
+          "with the same names, in the active clip.",
+      .example = "collapse",
+      .argsText =
+          "Select exactly two modules: the first is the source, the second the target. Overwriting keys asks "
+          "first. Nodes below them pair by name and class; default values and the keys of the active clip "
+          "are copied."};
 
   ~CollapseCmd() override = default;
   bool execute(Given const&, Args const&, Variable&) override;

@@ -11,7 +11,11 @@ class CopyDataCmd final : public ScriptCommand<CopyDataCmd> {
       .displayName = "Copy Data",
       .category = "Data Editing",
       .purpose = "Copies the data of one channel to channels of other modules.",
+      .example = "copyData LFHD.Translation RFHD.Translation",
       .args = {"module1.outputName module2.inputName1 ...", 2, ArgsInfo::kAny, {}, Variable::String},
+      .argsText =
+          "Channels as MODULE.CHANNEL, cut at the last dot: the source, then targets of the same kind. "
+          "Copies the default value, the interpolation and the keys of the active clip, over what was there.",
       .solo = Solo::no};
 
   bool execute(Given const&, Args const& args, Variable&) override;

@@ -17,10 +17,17 @@ class ParentCmd final : public ScriptCommand<ParentCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Hangs the selected modules under the primary selected one.",
-      .options = {{"adjust", 0, Variable::None, 8},
-                  {"showProgress"},
-                  {"ranges"},
-                  {"adjustOnly", 0, Variable::None, 1}}};
+      .example = "parent -adjust",
+      .argsText =
+          "Needs two selected modules or more; the primary one becomes the parent of the others. Characters "
+          "stay roots. Without -adjust local motion stays, so they move in the world.",
+      .options = {
+          {"adjust", "keeps their motion in the world: local keys of the active layer are computed anew", 0,
+           Variable::None, 8},
+          {"showProgress", "shows the progress and lets the user cancel; only with -adjust"},
+          {"ranges", "adjusts in the selected time ranges only; only with -adjust or -adjustOnly"},
+          {"adjustOnly", "computes the motion for the new parent, but leaves the modules where they are", 0,
+           Variable::None, 1}}};
 
   bool execute(Given const& given, Args const&, Variable&) override;
 };

@@ -7,15 +7,22 @@ namespace {
 
 class UnparentCmd final : public ScriptCommand<UnparentCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "unparent",
-                                       .displayName = "Unparent Nodes",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Manipulators",
-                                       .purpose = "Takes the selected modules out from under their parents.",
-                                       .options = {{"adjust", 0, Variable::None, 8},
-                                                   {"showProgress"},
-                                                   {"ranges"},
-                                                   {"adjustOnly", 0, Variable::None, 1}}};
+  static constexpr CommandInfo info = {
+      .name = "unparent",
+      .displayName = "Unparent Nodes",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose = "Takes the selected modules out from under their parents.",
+      .example = "unparent -adjust",
+      .argsText =
+          "All selected modules become roots. Without -adjust local motion stays, so they move in the world.",
+      .options = {
+          {"adjust", "keeps their motion in the world: local keys of the active layer are computed anew", 0,
+           Variable::None, 8},
+          {"showProgress", "shows the progress"},
+          {"ranges", "adjusts in the selected time ranges only; only with -adjust or -adjustOnly"},
+          {"adjustOnly", "computes the motion for the world, but leaves the modules where they are", 0,
+           Variable::None, 1}}};
 
   bool execute(Given const& given, Args const&, Variable&) override;
 };

@@ -14,7 +14,12 @@ class CopyKeysCmd final : public ScriptCommand<CopyKeysCmd> {
       .displayName = "Copy Keys",
       .category = "Data Editing",
       .purpose = "Puts keys of the active channels of one selected module on the key clipboard.",
-      .options = {{"all", 0, Variable::None, 2}, {"ranges", 0, Variable::None, 1}},
+      .example = "copyKeys -all",
+      .argsText =
+          "Needs exactly one selected module and one active channel (selectChannels), whole or by component. "
+          "Takes keys of the active layer, the selected ones without an option, and returns how many.",
+      .options = {{"all", "every key of the channel, selected or not", 0, Variable::None, 2},
+                  {"ranges", "the keys in the selected time ranges, selected or not", 0, Variable::None, 1}},
       .returns = Variable::Int};
 
   bool execute(Given const& given, Args const&, Variable& result) override;

@@ -8,12 +8,17 @@ namespace {
 
 class CreateKeyCmd final : public ScriptCommand<CreateKeyCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "createKey",
-                                       .displayName = "Create Key",
-                                       .category = "Data Editing",
-                                       .purpose =
-                                           "Keys every active channel of the selected modules at the current "
-                                           "time, with the values they have there."};
+  static constexpr CommandInfo info = {
+      .name = "createKey",
+      .displayName = "Create Key",
+      .category = "Data Editing",
+      .purpose =
+          "Keys every active channel of the selected modules at the current "
+          "time, with the values they have there.",
+      .example = "createKey",
+      .argsText =
+          "In the active layer of the active clip. New keys are whole and become selected. A channel that "
+          "has a key there, or is locked, is passed over; with no active channel nothing happens."};
 
   bool execute(Given const&, Args const&, Variable&) override;
 };

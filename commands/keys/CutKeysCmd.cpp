@@ -6,16 +6,23 @@ namespace {
 
 class CutKeysCmd final : public ScriptCommand<CutKeysCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "cutKeys",
-                                       .displayName = "Cut Keys",
-                                       .category = "Data Editing",
-                                       .purpose =
-                                           "Removes keys from the active channels: the selected ones, those "
-                                           "in the selected time ranges, or all.",
-                                       .options = {{"all", 0, Variable::None, 2},
-                                                   {"ranges", 0, Variable::None, 1},
-                                                   {"allLayers"},
-                                                   {"onMod", 1, Variable::String}}};
+  static constexpr CommandInfo info = {
+      .name = "cutKeys",
+      .displayName = "Cut Keys",
+      .category = "Data Editing",
+      .purpose =
+          "Removes keys from the active channels: the selected ones, those "
+          "in the selected time ranges, or all.",
+      .example = "cutKeys -ranges -allLayers",
+      .argsText =
+          "On the selected modules, in the active layer; without an option the selected keys only. Only the "
+          "active components go; rotations lose the whole key. What lay between removed keys is a gap.",
+      .options = {
+          {"all", "every key of the active channels, selected or not", 0, Variable::None, 2},
+          {"ranges", "the keys in the selected time ranges, selected or not", 0, Variable::None, 1},
+          {"allLayers", "in every layer of the active clip; ignored without -all or -ranges"},
+          {"onMod", "path of the one module to cut from instead; something must be selected all the same", 1,
+           Variable::String}}};
 
   bool execute(Given const& given, Args const&, Variable&) override;
 };

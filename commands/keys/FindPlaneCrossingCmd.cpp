@@ -11,14 +11,21 @@ namespace {
 
 class FindPlaneCrossingCmd final : public ScriptCommand<FindPlaneCrossingCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "findPlaneCrossing",
-                                       .displayName = "Find Plane Crossings",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Retrieval",
-                                       .purpose =
-                                           "Selects the keys at which the selected nodes pass behind a "
-                                           "plane, given by a point and a direction.",
-                                       .args = {"xPoint yPoint zPoint xDirection yDirection zDirection"}};
+  static constexpr CommandInfo info = {
+      .name = "findPlaneCrossing",
+      .displayName = "Find Plane Crossings",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose =
+          "Selects the keys at which the selected nodes pass behind a "
+          "plane, given by a point and a direction.",
+      .example = "findPlaneCrossing 0 0 5 0 0 1",
+      .args = {"xPoint yPoint zPoint xDirection yDirection zDirection"},
+      .argsText =
+          "A point of the plane in mm and the direction it faces, in the world; behind is opposite to that. "
+          "Looks at the selected nodes at each frame of the play range and selects keys of their Translation "
+          "only. Former selected keys there are deselected; who stays behind to the end of the range is left "
+          "out."};
 
   // Numbers of any kind will do.
   bool checkArgSyntax(Args const& args, Given const&) const override {

@@ -13,7 +13,12 @@ class FindSelectedKeysCmd final : public ScriptCommand<FindSelectedKeysCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Moves the current time to the next selected key of the selected nodes.",
-      .options = {{"b"}}};
+      .example = "findSelectedKeys -b",
+      .argsText =
+          "On the active channels of the selected nodes, within the animation range, and around at its end. "
+          "Selected keys in a row count as one find. The node that has it becomes the primary selected "
+          "module.",
+      .options = {{"b", "searches backwards"}}};
 
   bool execute(Given const& given, Args const&, Variable&) override;
 };

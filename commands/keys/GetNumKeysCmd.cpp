@@ -4,15 +4,21 @@ namespace {
 
 class GetNumKeysCmd final : public ScriptCommand<GetNumKeysCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "getNumKeys",
-                                       .displayName = "Get Number of Keys",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Retrieval",
-                                       .purpose = "Counts the keys of a channel, or only the selected ones.",
-                                       .args = {"propertyName", 1, 1, {Variable::String}},
-                                       .options = {{"s"}, {"onMod", 1, Variable::String}},
-                                       .returns = Variable::Int,
-                                       .solo = Solo::no};
+  static constexpr CommandInfo info = {
+      .name = "getNumKeys",
+      .displayName = "Get Number of Keys",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Counts the keys of a channel, or only the selected ones.",
+      .example = "getNumKeys Translation -s -onMod LFHD",
+      .args = {"propertyName", 1, 1, {Variable::String}},
+      .argsText =
+          "propertyName is a channel, or a component of one (tx, Translation.x) that the keys must hold. In "
+          "the active layer; with no active clip a warning and no result.",
+      .options = {{"s", "only the selected keys"},
+                  {"onMod", "path of the module; else the primary selected one", 1, Variable::String}},
+      .returns = Variable::Int,
+      .solo = Solo::no};
 
   bool execute(Given const& given, Args const& args, Variable& result) override;
 };

@@ -4,15 +4,20 @@ namespace {
 
 class GetSelectedKeysCmd final : public ScriptCommand<GetSelectedKeysCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "getSelectedKeys",
-                                       .displayName = "Get Selected Key Times",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Retrieval",
-                                       .purpose = "Lists the frames of the selected keys of a channel.",
-                                       .args = {"propertyName", 1, 1, {Variable::String}},
-                                       .options = {{"onMod", 1, Variable::String}},
-                                       .returns = Variable::IntArray,
-                                       .solo = Solo::no};
+  static constexpr CommandInfo info = {
+      .name = "getSelectedKeys",
+      .displayName = "Get Selected Key Times",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "Lists the frames of the selected keys of a channel.",
+      .example = "getSelectedKeys Translation -onMod LFHD",
+      .args = {"propertyName", 1, 1, {Variable::String}},
+      .argsText =
+          "propertyName is a channel, or a component of one (tx, Translation.x) that must be selected. In "
+          "the active layer; with no active clip a warning and no result.",
+      .options = {{"onMod", "path of the module; else the primary selected one", 1, Variable::String}},
+      .returns = Variable::IntArray,
+      .solo = Solo::no};
 
   bool execute(Given const& given, Args const& args, Variable& result) override;
 };

@@ -12,12 +12,19 @@ class HasKeysCmd final : public ScriptCommand<HasKeysCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Tells whether a channel has a key at the current time, at a frame, or anywhere.",
+      .example = "hasKey LFHD Translation -frame 10 -selected",
       .args = {"\"moduleName\" \"propertyName\"", 2, 2, {Variable::String, Variable::String}},
-      .options = {{"selected", 0, Variable::None, 8},
-                  {"seconds", 1, Variable::Int, 12},
-                  {"frame", 1, Variable::Int, 10},
-                  {"allTime", 0, Variable::None, 6},
-                  {"any"}},
+      .argsText =
+          "moduleName is a path, propertyName a channel, or a component of one that the key must hold. In "
+          "the active layer; without an option at the current time.",
+      .options = {{"selected", "the key must be selected too", 0, Variable::None, 8},
+                  {"seconds", "a number of frames, not seconds, from the start of the animation range", 1,
+                   Variable::Int, 12},
+                  {"frame", "the frame to look at; default the current time", 1, Variable::Int, 10},
+                  {"allTime",
+                   "at any time; without -any only keys a whole number of frames after the first one count",
+                   0, Variable::None, 6},
+                  {"any", "a key on any component will do"}},
       .returns = Variable::Bool,
       .solo = Solo::no};
 

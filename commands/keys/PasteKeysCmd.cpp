@@ -15,7 +15,11 @@ class PasteKeysCmd final : public ScriptCommand<PasteKeysCmd> {
       .category = "Data Editing",
       .purpose =
           "Writes the keys on the clipboard to the selected module, from the current time or a frame on.",
-      .options = {{"useFrame", 1, Variable::Int}}};
+      .example = "pasteKeys -useFrame 100",
+      .argsText =
+          "Needs exactly one selected module and one active channel of the kind that was copied. Writes into "
+          "the active layer. Keys between the pasted ones stay; the message counts one key less.",
+      .options = {{"useFrame", "frame of the first pasted key; default the current time", 1, Variable::Int}}};
 
   bool execute(Given const& given, Args const&, Variable&) override;
 };

@@ -11,8 +11,14 @@ class SetInterpTypeCmd final : public ScriptCommand<SetInterpTypeCmd> {
       .subCategory = "Data Manipulators",
       .purpose =
           "Chooses how a channel runs from one key to the next: \"Constant\", \"Linear\" or \"Cubic\".",
+      .example = "setInterpType Translation Linear -onMod LFHD",
       .args = {"propertyName interpType", 2, 2, {Variable::String, Variable::String}},
-      .options = {{"onMod", 1, Variable::String}},
+      .argsText =
+          "propertyName is a whole channel, both words in exact case; not every kind of channel has all "
+          "three. On all selected modules, each of which must have the channel; it holds for all its clips "
+          "and layers.",
+      .options = {{"onMod", "path of the one module to change instead of the selected ones", 1,
+                   Variable::String}},
       .solo = Solo::no};
 
   bool execute(Given const& given, Args const& args, Variable&) override;

@@ -17,12 +17,20 @@ class SetKeyCmd final : public ScriptCommand<SetKeyCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Writes a key on a channel, at the current time or at a frame.",
+      .example = "setKey Translation 1 2.5 3 -t 10 -onMod LFHD",
       .args = {"\"propertyType\" value1 ...", 2, 4, {Variable::String}},
-      .options = {{"t", 1, Variable::Int},
-                  {"r"},
-                  {"all"},
-                  {"onMod", 1, Variable::String, 16},
-                  {"type", 1, Variable::String, 8}},
+      .argsText =
+          "propertyType is a channel, or a component of one (tx, Translation.x). Lengths are mm, angles "
+          "degrees. Vectors and rotations take <x y z> or three numbers; angles count in XYZ, with -onMod in "
+          "the node's order. Keys every selected module that has the channel, in the active layer of the "
+          "active clip. What is locked is passed over.",
+      .options = {{"t", "frame of the key; default the current time", 1, Variable::Int},
+                  {"r", "adds to the value of the active layer there; refused for booleans"},
+                  {"all", "every module of the scene that has the channel, selected or not"},
+                  {"onMod", "path of the one module to key; an error when it lacks the channel or is locked",
+                   1, Variable::String, 16},
+                  {"type", "class name: of those modules only the ones of exactly this class", 1,
+                   Variable::String, 8}},
       .solo = Solo::no};
   static constexpr int kFrame = info.option("t"), kRelative = info.option("r");
   static constexpr Candidates::Options kCandidates = {info.option("all"), info.option("onMod"),

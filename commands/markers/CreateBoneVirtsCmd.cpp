@@ -7,12 +7,20 @@ namespace {
 
 class CreateBoneVirtsCmd final : public ScriptCommand<CreateBoneVirtsCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "createBoneVirts",
-                                       .displayName = "Create Bone Virtual Markers",
-                                       .category = "Data Editing",
-                                       .purpose = "Creates virtual markers for the selected bones.",
-                                       .options = {{"joint"}},
-                                       .returns = Variable::StringArray};
+  static constexpr CommandInfo info = {
+      .name = "createBoneVirts",
+      .displayName = "Create Bone Virtual Markers",
+      .category = "Data Editing",
+      .purpose = "Creates virtual markers for the selected bones.",
+      .example = "createBoneVirts -joint",
+      .argsText =
+          "For each selected SolvingBone with a child bone: BONE_virtA and BONE_virtB on either side of the "
+          "child joint, a quarter of the bone's length from it. Of several child bones the last counts. They "
+          "are tied by solving constraints and keyed over the animation range in the active clip.",
+      .options =
+          {{"joint",
+            "adds BONE_virt in the bone's own joint, so that the three tell the whole pose of the bone"}},
+      .returns = Variable::StringArray};
   static constexpr int kJoint = info.option("joint");
 
   bool execute(Given const& given, Args const&, Variable& result) override {

@@ -12,7 +12,10 @@ class GetColorCmd final : public ScriptCommand<GetColorCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "A display colour of the scene as red, green and blue, 0 to 255.",
+      .example = "getColor markerLines",
       .args = {"selected | primarySelected | default | markerLines", 1, 1, {Variable::String}},
+      .argsText =
+          "Which one: of the selected modules, the primary one, all others, or new lines between markers.",
       .returns = Variable::IntArray,
       .solo = Solo::no};
 

@@ -10,7 +10,11 @@ class GetMarkerConnectionCmd final : public ScriptCommand<GetMarkerConnectionCmd
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Tells whether a line connects two markers.",
+      .example = "getMarkerConnection LFHD RFHD",
       .args = {"\"sourceMarker\" \"targetMarker\"", 2, 2, {Variable::String, Variable::String}},
+      .argsText =
+          "Paths of two markers, in either order; one that is not there is a warning, and there is no "
+          "result.",
       .returns = Variable::Bool,
       .solo = Solo::no};
 

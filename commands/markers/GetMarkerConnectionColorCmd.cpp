@@ -10,7 +10,10 @@ class GetMarkerConnectionColorCmd final : public ScriptCommand<GetMarkerConnecti
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "The colour of the line between two markers as red, green and blue, 0 to 255.",
+      .example = "getMarkerConnectionColor LFHD RFHD",
       .args = {"\"sourceMarker\" \"targetMarker\"", 2, 2, {Variable::String, Variable::String}},
+      .argsText =
+          "Paths of two markers, in either order; without a line between them a warning and no result.",
       .returns = Variable::IntArray,
       .solo = Solo::no};
 

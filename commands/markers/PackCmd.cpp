@@ -11,9 +11,21 @@ class PackCmd final : public ScriptCommand<PackCmd> {
       .displayName = "Pack Marker Data",
       .category = "Data Editing",
       .purpose = "Joins pieces of unlabeled markers that can belong to one marker.",
-      .options = {{"minGap", 1, Variable::Int},
-                  {"minDistance", 1, Variable::Float},
-                  {"marker", 1, Variable::String}}};
+      .example = "pack -minGap 3 -minDistance 20.0",
+      .argsText =
+          "Joins the selected unlabeled markers in as few as possible, in all clips. The first in time "
+          "stays; the others leave the scene. Locked markers and those with something below them stay, with "
+          "a warning.",
+      .options = {
+          {"minGap",
+           "frames that must lack data between pieces, default 1; with 0 unpack could not part them again", 1,
+           Variable::Int},
+          {"minDistance",
+           "mm that ends of pieces must be apart, default 0: nearer ones may be one marker, for you to "
+           "decide",
+           1, Variable::Float},
+          {"marker", "path of the unlabeled marker to join into, instead of as many as are needed", 1,
+           Variable::String}}};
 
   static constexpr int kMinGap = info.option("minGap"), kMinDistance = info.option("minDistance"),
                        kMarker = info.option("marker");

@@ -10,8 +10,12 @@ class RemoveMarkerConnectionCmd final : public ScriptCommand<RemoveMarkerConnect
       .displayName = "Remove Marker Connecting Line",
       .category = "Data Editing",
       .purpose = "Removes the lines between a marker and others, or all of its lines.",
+      .example = "removeMarkerConnection LFHD RFHD",
       .args =
           {"\"sourceNode\" [\"targetNode1\" \"targetNode2\"...]", 1, ArgsInfo::kAny, {}, Variable::String},
+      .argsText =
+          "Paths of nodes. With targets the lines to them, in either direction; without targets all lines "
+          "that the source holds. A path that names no node is a warning.",
       .solo = Solo::no};
 
   bool execute(Given const&, Args const& args, Variable&) override {

@@ -11,8 +11,12 @@ class SetMarkerConnectionCmd final : public ScriptCommand<SetMarkerConnectionCmd
       .displayName = "Set Marker Connecting Line",
       .category = "Data Editing",
       .purpose = "Draws a connecting line between two markers.",
+      .example = "setMarkerConnection LFHD RFHD -color 255 0 0",
       .args = {"\"sourceNode\" \"targetNode\"", 2, 2, {Variable::String, Variable::String}},
-      .options = {{"color", 3, Variable::Int}, {"priorityOnly"}},
+      .argsText = "Paths of two markers. A line between them, in either direction, is replaced.",
+      .options = {{"color", "red, green and blue, 0 to 255; default that of \"getColor markerLines\"", 3,
+                   Variable::Int},
+                  {"priorityOnly", "only when both are below the priority module; else nothing happens"}},
       .solo = Solo::no};
 
   static constexpr int kColor = info.option("color"), kPriorityOnly = info.option("priorityOnly");

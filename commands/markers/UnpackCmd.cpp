@@ -10,7 +10,11 @@ class UnpackCmd final : public ScriptCommand<UnpackCmd> {
       .name = "unpack",
       .displayName = "Unpack Marker Data",
       .category = "Data Editing",
-      .purpose = "Splits markers at their gaps into one marker for each piece."};
+      .purpose = "Splits markers at their gaps into one marker for each piece.",
+      .example = "unpack",
+      .argsText =
+          "Of the selected unlabeled markers; with no marker selected of every marker, labelled ones too. "
+          "Gaps are those of the active clip. The first piece stays; each further one gets a new marker."};
 
   bool execute(Given const&, Args const&, Variable&) override {
     MarkerPacker packer;

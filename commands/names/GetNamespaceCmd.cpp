@@ -5,13 +5,16 @@ namespace {
 
 class GetNamespaceCmd final : public ScriptCommand<GetNamespaceCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "getNamespace",
-                                       .displayName = "Get Namespace",
-                                       .category = "Namespace",
-                                       .purpose = "The whole namespace of a module.",
-                                       .options = {{"onMod", 1, Variable::String}},
-                                       .returns = Variable::String,
-                                       .solo = Solo::no};
+  static constexpr CommandInfo info = {
+      .name = "getNamespace",
+      .displayName = "Get Namespace",
+      .category = "Namespace",
+      .purpose = "The whole namespace of a module.",
+      .example = "getNamespace -onMod LFHD",
+      .argsText = "The parts are joined by \":\"; empty when it has none.",
+      .options = {{"onMod", "path of the module; else the primary selected one", 1, Variable::String}},
+      .returns = Variable::String,
+      .solo = Solo::no};
   static constexpr int kOnMod = info.option("onMod");
 
   bool execute(Given const& given, Args const&, Variable& result) override {

@@ -5,13 +5,16 @@ namespace {
 
 class GetNamespacesCmd final : public ScriptCommand<GetNamespacesCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "getNamespaces",
-                                       .displayName = "Get Namespace",
-                                       .category = "Namespace",
-                                       .purpose = "Lists the namespaces of a module, the outermost first.",
-                                       .options = {{"onMod", 1, Variable::String}},
-                                       .returns = Variable::StringArray,
-                                       .solo = Solo::no};
+  static constexpr CommandInfo info = {
+      .name = "getNamespaces",
+      .displayName = "Get Namespace",
+      .category = "Namespace",
+      .purpose = "Lists the namespaces of a module, the outermost first.",
+      .example = "getNamespaces -onMod LFHD",
+      .argsText = "The parts are those between \":\"; none when it has no namespace.",
+      .options = {{"onMod", "path of the module; else the primary selected one", 1, Variable::String}},
+      .returns = Variable::StringArray,
+      .solo = Solo::no};
   static constexpr int kOnMod = info.option("onMod");
 
   bool execute(Given const& given, Args const&, Variable& result) override {

@@ -146,10 +146,15 @@ class PathNumbers {
 
 class MakeUniqueCmd final : public ScriptCommand<MakeUniqueCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "makeUnique",
-                                       .displayName = "Make Module Paths Unique",
-                                       .category = "Data Editing",
-                                       .purpose = "Renames modules so that no two have the same full path."};
+  static constexpr CommandInfo info = {
+      .name = "makeUnique",
+      .displayName = "Make Module Paths Unique",
+      .category = "Data Editing",
+      .purpose = "Renames modules so that no two have the same full path.",
+      .example = "makeUnique",
+      .argsText =
+          "Looks at every module of the scene, selected or not, in order of creation. The first with a path "
+          "keeps its name; each further one gets a number, such as _1."};
 
   bool execute(Given const&, Args const&, Variable&) override {
     std::unordered_set<size_t> seen;

@@ -9,8 +9,13 @@ class ReplaceNamespaceCmd final : public ScriptCommand<ReplaceNamespaceCmd> {
       .displayName = "Replace Namespace",
       .category = "Namespace",
       .purpose = "Puts one namespace in the place of another in the names of modules.",
+      .example = "replaceNamespace take1 take2",
       .args = {"oldNamespace newNamespace", 2, 2, {Variable::String, Variable::String}},
-      .options = {{"onMod", 1, Variable::String}},
+      .argsText =
+          "On all selected modules. A name without the old one ends the line as failed; modules before it "
+          "stay changed.",
+      .options = {{"onMod", "only checks that this path names a module; nothing is changed then", 1,
+                   Variable::String}},
       .solo = Solo::no};
   static constexpr int kOnMod = info.option("onMod");
 

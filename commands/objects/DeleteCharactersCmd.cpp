@@ -11,7 +11,14 @@ class DeleteCharactersCmd final : public ScriptCommand<DeleteCharactersCmd> {
       .displayName = "Delete Characters",
       .category = "Data Editing",
       .purpose = "Deletes the selected characters, or all, with their setups.",
-      .options = {{"all"}, {"keepLabels"}}};
+      .example = "deleteCharacters -keepLabels",
+      .argsText =
+          "The selected characters go with all below them, but for the markers: these become unlabeled roots "
+          "that move in the world as before.",
+      .options = {{"all", "every character of the scene, selected or not"},
+                  {"keepLabels",
+                   "markers keep their names, prefixed by the character's; without it, and with -all, they "
+                   "lose them"}}};
   static constexpr int kAll = info.option("all"), kKeepLabels = info.option("keepLabels");
 
   bool execute(Given const& given, Args const&, Variable&) override {

@@ -11,7 +11,12 @@ class DeleteCmd final : public ScriptCommand<DeleteCmd> {
       .displayName = "Delete",
       .category = "Data Editing",
       .purpose = "Deletes the selected modules, or all, with everything below them.",
-      .options = {{"all", 0, Variable::None, 2}, {"primary", 0, Variable::None, 1}}};
+      .example = "delete -primary",
+      .argsText = "Without an option every selected module goes. References to what is deleted are cleared.",
+      .options = {
+          {"all", "every module of the scene, selected or not: clips, characters and cameras too", 0,
+           Variable::None, 2},
+          {"primary", "only the primary selected module and what is below it", 0, Variable::None, 1}}};
   static constexpr int kAll = info.option("all"), kPrimary = info.option("primary");
 
   bool execute(Given const& given, Args const&, Variable&) override {

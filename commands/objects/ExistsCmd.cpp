@@ -11,8 +11,13 @@ class ExistsCmd final : public ScriptCommand<ExistsCmd> {
       .displayName = "Exists",
       .category = "Data Editing",
       .purpose = "Tells whether a path names a module, of any type or of a given one.",
+      .example = "exists Anna\\LFHD -type Marker",
       .args = {"modPath", 1, 1, {Variable::String}},
-      .options = {{"type", 1, Variable::String}, {"priorityOnly"}},
+      .argsText =
+          "modPath is a full path or the end of one; an end that fits several modules counts only below the "
+          "priority module.",
+      .options = {{"type", "class name; modules of its subclasses count too", 1, Variable::String},
+                  {"priorityOnly", "looks only below the priority module; everywhere when there is none"}},
       .returns = Variable::Bool,
       .solo = Solo::no};
   static constexpr int kType = info.option("type"), kPriorityOnly = info.option("priorityOnly");

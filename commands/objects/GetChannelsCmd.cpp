@@ -13,6 +13,8 @@ class GetChannelsCmd final : public ScriptCommand<GetChannelsCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Lists the active channels, with \".X\", \".Y\" or \".Z\" where one component is active.",
+      .example = "getChannels",
+      .argsText = "The channels are those of selectChannels, whatever modules are selected.",
       .returns = Variable::StringArray};
 
   bool execute(Given const&, Args const&, Variable& result) override;

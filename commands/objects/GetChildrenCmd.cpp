@@ -11,8 +11,13 @@ class GetChildrenCmd final : public ScriptCommand<GetChildrenCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Lists the paths of the modules right below a module.",
+      .example = "getChildren Anna -nameOnly",
       .args = {"parentName", 1, 1, {Variable::String}},
-      .options = {{"nodesOnly"}, {"fullPath", 0, Variable::None, 4}, {"nameOnly", 0, Variable::None, 2}},
+      .argsText = "parentName is the path of a module.",
+      .options = {{"nodesOnly", "only children that are nodes, which have a place in space"},
+                  {"fullPath", "paths from the root; default the shortest that are unique", 0, Variable::None,
+                   4},
+                  {"nameOnly", "names without paths", 0, Variable::None, 2}},
       .returns = Variable::StringArray,
       .solo = Solo::no};
   static constexpr int kNodesOnly = info.option("nodesOnly");

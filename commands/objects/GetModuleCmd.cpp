@@ -11,7 +11,11 @@ class GetModuleCmd final : public ScriptCommand<GetModuleCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "The path of the primary selected module.",
-      .options = {{"fullPath", 0, Variable::None, 2}, {"nameOnly", 0, Variable::None, 1}},
+      .example = "getModule -fullPath",
+      .argsText = "Fails when no module is primary.",
+      .options = {{"fullPath", "path from the root; default the shortest that is unique", 0, Variable::None,
+                   2},
+                  {"nameOnly", "name without a path", 0, Variable::None, 1}},
       .returns = Variable::String};
 
   bool execute(Given const& given, Args const&, Variable& result) override;

@@ -11,7 +11,9 @@ class GetModuleTypeCmd final : public ScriptCommand<GetModuleTypeCmd> {
                                        .category = "Data Editing",
                                        .subCategory = "Data Retrieval",
                                        .purpose = "The type of a module, such as Marker.",
+                                       .example = "getModuleType LFHD",
                                        .args = {"moduleName", 1, 1, {Variable::String}},
+                                       .argsText = "moduleName is a path.",
                                        .returns = Variable::String,
                                        .solo = Solo::no};
 

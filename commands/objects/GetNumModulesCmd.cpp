@@ -12,7 +12,10 @@ class GetNumModulesCmd final : public ScriptCommand<GetNumModulesCmd> {
       .subCategory = "Data Retrieval",
       .purpose =
           "Counts the modules of the scene, or the selected ones, of any type or of one and its subtypes.",
-      .options = {{"type", 1, Variable::String}, {"selected"}},
+      .example = "getNumModules -type Marker",
+      .argsText = "Without an option every module of the scene counts.",
+      .options = {{"type", "class name; modules of its subclasses count too", 1, Variable::String},
+                  {"selected", "only the selected modules"}},
       .returns = Variable::Int};
   static constexpr int kType = info.option("type"), kSelected = info.option("selected");
 

@@ -11,8 +11,12 @@ class GetParentCmd final : public ScriptCommand<GetParentCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "The path of the parent of a module; nothing when it has none.",
+      .example = "getParent Knee -nameOnly",
       .args = {"module", 1, 1, {Variable::String}},
-      .options = {{"fullPath", 0, Variable::None, 2}, {"nameOnly", 0, Variable::None, 1}},
+      .argsText = "module is a path.",
+      .options = {{"fullPath", "path from the root; default the shortest that is unique", 0, Variable::None,
+                   2},
+                  {"nameOnly", "name without a path", 0, Variable::None, 1}},
       .returns = Variable::String,
       .solo = Solo::no};
 

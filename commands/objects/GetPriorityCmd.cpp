@@ -12,6 +12,8 @@ class GetPriorityCmd final : public ScriptCommand<GetPriorityCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "The name of the priority module, below which short paths are looked for first.",
+      .example = "getPriority",
+      .argsText = "Empty when there is none.",
       .returns = Variable::String};
 
   bool execute(Given const&, Args const&, Variable& result) override;

@@ -10,12 +10,17 @@ class HideCmd final : public ScriptCommand<HideCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Hides modules: the named ones, the selected ones, or all.",
+      .example = "hide LFHD RFHD -t",
       .args = {"[\"name1\" \"name2\" ...]", 0, ArgsInfo::kAny, {}, Variable::String},
-      .options = {{"s", 0, Variable::None, 6, true},
-                  {"u", 0, Variable::None, 5},
-                  {"primary", 0, Variable::None, 3},
-                  {"t"},
-                  {"all", 0, Variable::None, 6, true}}};
+      .argsText =
+          "Hides the named modules; without names the selected ones, or those of an option (the last one "
+          "counts). -u hides the unselected, -all everything, -t toggles instead of hiding.",
+      .options = {
+          {"s", "deprecated: the selection is what is hidden without an option", 0, Variable::None, 6, true},
+          {"u", "every module that is not selected; no effect with names", 0, Variable::None, 5},
+          {"primary", "only the primary selected module; no effect with names", 0, Variable::None, 3},
+          {"t", "shows those of them that are hidden"},
+          {"all", "every module of the scene; no effect with names", 0, Variable::None, 6, true}}};
 
   static constexpr int kDeprecated = info.option("s"), kUnselected = info.option("u"),
                        kPrimary = info.option("primary"), kToggle = info.option("t"),

@@ -11,7 +11,9 @@ class IsSelectedCmd final : public ScriptCommand<IsSelectedCmd> {
                                        .category = "Data Editing",
                                        .subCategory = "Data Retrieval",
                                        .purpose = "Tells whether a module is selected.",
+                                       .example = "isSelected LFHD",
                                        .args = {"module", 1, 1, {Variable::String}},
+                                       .argsText = "module is a path.",
                                        .returns = Variable::Bool,
                                        .solo = Solo::no};
 

@@ -10,7 +10,9 @@ class SetPriorityCmd final : public ScriptCommand<SetPriorityCmd> {
       .displayName = "Set Priority Node",
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
-      .purpose = "Makes the primary selected module the one below which short paths are looked for first."};
+      .purpose = "Makes the primary selected module the one below which short paths are looked for first.",
+      .example = "setPriority",
+      .argsText = "Without a primary selected module the priority is given up."};
 
   bool execute(Given const&, Args const&, Variable&) override;
 };

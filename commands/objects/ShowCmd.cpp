@@ -11,8 +11,10 @@ class ShowCmd final : public ScriptCommand<ShowCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Shows hidden modules: the named ones, or the selected ones.",
+      .example = "show LFHD RFHD",
       .args = {"name1 name2 ..."},
-      .options = {{"s"}}};
+      .argsText = "Shows the named modules; without names the selected ones. Arrays of paths will do.",
+      .options = {{"s", "the selected modules, as without names; refused beside names"}}};
 
   bool checkArgSyntax(Args const& args, Given const&) const override { return areTexts(args); }
 

@@ -11,7 +11,9 @@ class GetBooleanArrayPropertyCmd final : public ScriptCommand<GetBooleanArrayPro
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Reads a bit field of a module: true or false for each of its labels.",
+      .example = "getBooleanArrayProperty LFHD Sides",
       .args = {"moduleName propertyName", 2, 2, {Variable::String, Variable::String}},
+      .argsText = "moduleName is a path, propertyName a bit field in exact case.",
       .returns = Variable::BoolArray,
       .solo = Solo::no};
 

@@ -12,8 +12,13 @@ class GetBooleanPropertyCmd final : public ScriptCommand<GetBooleanPropertyCmd> 
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Reads a property of a module as true or false; of a bit field, the one with a label.",
+      .example = "getBooleanProperty LFHD Occluded",
       .args = {"moduleName propertyName", 2, ArgsInfo::kAny, {}, Variable::String},
-      .options = {{"c"}, {"d"}},
+      .argsText =
+          "moduleName is a path, propertyName a channel or an attribute in exact case, a bit field followed "
+          "by a label. A channel is read at the current time.",
+      .options = {{"c", "the default value of the channel instead; no effect on attributes"},
+                  {"d", "the same as -c"}},
       .returns = Variable::Bool,
       .solo = Solo::no};
 

@@ -10,7 +10,9 @@ class GetCountCmd final : public ScriptCommand<GetCountCmd> {
                                        .category = "Data Editing",
                                        .subCategory = "Data Retrieval",
                                        .purpose = "Counts the items of an array.",
+                                       .example = "getCount [LFHD RFHD]",
                                        .args = {"array", 1, 1},
+                                       .argsText = "A value that is no array counts 1.",
                                        .returns = Variable::Int,
                                        .solo = Solo::no};
 

@@ -11,7 +11,9 @@ class GetIntArrayPropertyCmd final : public ScriptCommand<GetIntArrayPropertyCmd
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Reads a colour of a module as red, green and blue, 0 to 255.",
+      .example = "getIntArrayProperty LFHD Color",
       .args = {"moduleName propertyName", 2, 2, {Variable::String, Variable::String}},
+      .argsText = "moduleName is a path, propertyName a colour in exact case. Fractions are cut.",
       .returns = Variable::IntArray,
       .solo = Solo::no};
 

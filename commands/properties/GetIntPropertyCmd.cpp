@@ -11,8 +11,13 @@ class GetIntPropertyCmd final : public ScriptCommand<GetIntPropertyCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Reads a property of a module as a whole number.",
+      .example = "getIntProperty LFHD FillType",
       .args = {"moduleName propertyName", 2, 2, {Variable::String, Variable::String}},
-      .options = {{"c"}, {"d"}},
+      .argsText =
+          "moduleName is a path, propertyName a channel or an attribute in exact case. Fractions are cut. A "
+          "channel is read at the current time, a time attribute in frames, an enumeration as its index.",
+      .options = {{"c", "the default value of the channel instead; no effect on attributes"},
+                  {"d", "the same as -c"}},
       .returns = Variable::Int,
       .solo = Solo::no};
 

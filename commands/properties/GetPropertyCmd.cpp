@@ -10,8 +10,14 @@ class GetPropertyCmd final : public ScriptCommand<GetPropertyCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Reads a property of a module as a number, as getFloatProperty does.",
+      .example = "getProperty LFHD Translation.y -d",
       .args = {"moduleName propertyName", 2, 2, {Variable::String, Variable::String}},
-      .options = {{"c"}, {"d"}},
+      .argsText =
+          "moduleName is a path, propertyName a channel, a component of one (Translation.x) or an attribute, "
+          "in exact case. A channel is read at the current time: lengths in mm, angles in degrees in the "
+          "node's own order.",
+      .options = {{"c", "the default value of the channel instead; no effect on attributes"},
+                  {"d", "the same as -c"}},
       .returns = Variable::Float,
       .solo = Solo::no};
 

@@ -11,7 +11,9 @@ class GetStringArrayPropertyCmd final : public ScriptCommand<GetStringArrayPrope
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Reads a list of modules that a module refers to, as their shortest paths.",
+      .example = "getStringArrayProperty Cluster Markers",
       .args = {"moduleName propertyName", 2, 2, {Variable::String, Variable::String}},
+      .argsText = "moduleName is a path, propertyName an attribute that lists modules, in exact case.",
       .returns = Variable::StringArray,
       .solo = Solo::no};
 

@@ -11,8 +11,12 @@ class GetStringPropertyCmd final : public ScriptCommand<GetStringPropertyCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Reads an attribute of a module as text.",
+      .example = "getStringProperty LFHD Name",
       .args = {"moduleName propertyName", 2, 2, {Variable::String, Variable::String}},
-      .options = {{"fullPath"}},
+      .argsText =
+          "moduleName is a path, propertyName an attribute in exact case: a text, an enumeration, a time or "
+          "a module.",
+      .options = {{"fullPath", "of a module the path from the root; default the shortest that is unique"}},
       .returns = Variable::String,
       .solo = Solo::no};
   static constexpr int kFullPath = info.option("fullPath");

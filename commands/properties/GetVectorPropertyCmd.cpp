@@ -12,8 +12,14 @@ class GetVectorPropertyCmd final : public ScriptCommand<GetVectorPropertyCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Reads a property of a module as a vector: lengths in millimetres, angles in degrees.",
+      .example = "getVectorProperty LFHD Translation",
       .args = {"moduleName propertyName", 2, 2, {Variable::String, Variable::String}},
-      .options = {{"c"}, {"d"}},
+      .argsText =
+          "moduleName is a path, propertyName a channel or an attribute in exact case: a vector, a colour, a "
+          "rotation. A channel is read at the current time, angles in the node's own order; one without "
+          "vectors reads as <0 0 0>.",
+      .options = {{"c", "the default value of the channel instead; no effect on attributes"},
+                  {"d", "the same as -c"}},
       .returns = Variable::Vector,
       .solo = Solo::no};
 

@@ -15,13 +15,23 @@ class SetPropertyCmd final : public ScriptCommand<SetPropertyCmd> {
       .subCategory = "Data Manipulators",
       .purpose =
           "Sets a property of modules: an attribute, or the selected keys or the default of a channel.",
+      .example = "setProperty Color 255 0 0 -onMod LFHD",
       .args = {"propertyName propertyVal1 propertyVal2 ...", 2, ArgsInfo::kAny, {Variable::String}},
-      .options = {{"c", 0, Variable::None, 0, true},
-                  {"r"},
-                  {"all"},
-                  {"onMod", 1, Variable::String, 16},
-                  {"type", 1, Variable::String, 8},
-                  {"d"}},
+      .argsText =
+          "propertyName is a channel, a component of one (tx, Translation.x) or an attribute in exact case. "
+          "On all selected modules that have it. A channel takes the value on its selected keys, not at the "
+          "current time; -d sets its default value. Lengths are mm, angles degrees, times frames. Vector "
+          "channels are written even where they are locked, others only with -onMod.",
+      .options =
+          {{"c", "the same as -d", 0, Variable::None, 0, true},
+           {"r",
+            "adds to the present value; refused for boolean channels, no effect on texts, lists and states"},
+           {"all", "every module of the scene that has the property, selected or not"},
+           {"onMod", "path of the one module to change", 1, Variable::String, 16},
+           {"type", "class name: of those modules only the ones of exactly this class", 1, Variable::String,
+            8},
+           {"d",
+            "sets the default value of a channel instead of its selected keys; no effect on attributes"}},
       .solo = Solo::no};
   static constexpr int kConst = info.option("c"), kRelative = info.option("r"), kDefault = info.option("d");
   static constexpr Candidates::Options kCandidates = {info.option("all"), info.option("onMod"),

@@ -10,8 +10,14 @@ class UnSetPropertyCmd final : public ScriptCommand<UnSetPropertyCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Returns an attribute of modules to its default value.",
+      .example = "unsetProperty Color -onMod LFHD",
       .args = {"propertyName", 1, 1, {Variable::String}},
-      .options = {{"all"}, {"onMod", 1, Variable::String, 4}, {"type", 1, Variable::String, 2}},
+      .argsText =
+          "propertyName is an attribute in exact case, not a channel. On all selected modules that have it.",
+      .options = {{"all", "every module of the scene that has the attribute, selected or not"},
+                  {"onMod", "path of the one module to change", 1, Variable::String, 4},
+                  {"type", "class name: of those modules only the ones of exactly this class", 1,
+                   Variable::String, 2}},
       .solo = Solo::no};
   static constexpr Candidates::Options kCandidates = {info.option("all"), info.option("onMod"),
                                                       info.option("type")};

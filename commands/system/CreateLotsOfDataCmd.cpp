@@ -16,7 +16,12 @@ class CreateLotsOfDataCmd final : public ScriptCommand<CreateLotsOfDataCmd> {
       .displayName = "Create lots of data for test purposes",
       .category = "Testing",
       .purpose = "Fills the scene with markers that move, to test with.",
+      .example = "createLotsOfData 10 100",
       .args = {"'numMarkers, NumFrames'", 2, 2, {Variable::Int, Variable::Int}},
+      .argsText =
+          "How many markers (0 or more) and frames (1 or more), at most 500 million positions in all. They "
+          "are keyed in the active clip, else the first, else a new one; the animation and play ranges "
+          "follow.",
       .solo = Solo::no};
 
   bool execute(Given const&, Args const& args, Variable&) override {

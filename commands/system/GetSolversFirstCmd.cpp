@@ -10,6 +10,7 @@ class GetSolversFirstCmd final : public ScriptCommand<GetSolversFirstCmd> {
                                        .displayName = "Get Solvers First Status",
                                        .category = "Skeletal Solving",
                                        .purpose = "Tells whether solvers are evaluated before clips.",
+                                       .example = "getSolversFirst",
                                        .returns = Variable::Bool};
 
   bool execute(Given const&, Args const&, Variable& result) override {

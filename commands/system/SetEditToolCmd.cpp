@@ -11,7 +11,9 @@ class SetEditToolCmd final : public ScriptCommand<SetEditToolCmd> {
       .displayName = "Set Editing Tool",
       .category = "Interface",
       .purpose = "Switches to an editing tool by number, 0 to 5, and returns the one before.",
+      .example = "setEditTool 2",
       .args = {"toolId", 1, 1, {Variable::Int}},
+      .argsText = "0 select, 1 translate, 2 rotate, 3 scale, 4 orbit, 5 pan.",
       .returns = Variable::Int,
       .solo = Solo::no};
 

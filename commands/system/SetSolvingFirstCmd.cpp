@@ -9,7 +9,9 @@ class SetSolvingFirstCmd final : public ScriptCommand<SetSolvingFirstCmd> {
                                        .displayName = "Set Solvers First Status",
                                        .category = "Interface",
                                        .purpose = "Has solvers evaluated before clips, or after them.",
-                                       .args = {"boolean", 1, 1, {Variable::Bool}}};
+                                       .example = "setSolversFirst true",
+                                       .args = {"boolean", 1, 1, {Variable::Bool}},
+                                       .argsText = "true, false or toggle."};
 
   bool execute(Given const&, Args const& args, Variable&) override {
     Variable::BoolType const wanted = args[0].getBoolValue(-1);

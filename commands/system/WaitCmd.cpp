@@ -11,7 +11,9 @@ class WaitCmd final : public ScriptCommand<WaitCmd> {
                                        .displayName = "Wait",
                                        .category = "Interface",
                                        .purpose = "Pauses for so many milliseconds.",
-                                       .args = {"milliseconds", 1, 1, {Variable::Int}}};
+                                       .example = "wait 10",
+                                       .args = {"milliseconds", 1, 1, {Variable::Int}},
+                                       .argsText = "0 or more; the scene does not change."};
 
   bool execute(Given const&, Args const& args, Variable&) override {
     int const milliseconds = args[0].getIntValue(-1);

@@ -12,10 +12,14 @@ namespace {
 
 class testSceneReadPerformanceCmd final : public ScriptCommand<testSceneReadPerformanceCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "testSceneReadPerformance",
-                                       .displayName = "Tests Scene Read Performance",
-                                       .category = "Testing",
-                                       .purpose = "Measures how fast the scene can be read."};
+  static constexpr CommandInfo info = {
+      .name = "testSceneReadPerformance",
+      .displayName = "Tests Scene Read Performance",
+      .category = "Testing",
+      .purpose = "Measures how fast the scene can be read.",
+      .example = "testSceneReadPerformance",
+      .argsText =
+          "Reads the world positions of every marker at the frames of the play range; logs frames a second."};
 
   // The world positions of all markers at all frames of the play range.
   bool execute(Given const&, Args const&, Variable&) override {

@@ -13,8 +13,12 @@ class GetModuleRangeCmd final : public ScriptCommand<GetModuleRangeCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "The first and last frame of the keys of one or several modules.",
+      .example = "getModuleRange [LFHD RFHD] -i",
       .args = {"module or moduleArray"},
-      .options = {{"i"}},
+      .argsText =
+          "A path, or an array of paths whose ranges are joined. Counts all channels, in the active clip. "
+          "Frames are cut to whole ones; [1 -1] means no keys.",
+      .options = {{"i", "with an array: the range that all of them share"}},
       .returns = Variable::IntArray,
       .solo = Solo::no};
 

@@ -11,6 +11,7 @@ class GetRateCmd final : public ScriptCommand<GetRateCmd> {
                                        .category = "Data Editing",
                                        .subCategory = "Data Retrieval",
                                        .purpose = "The frame rate of the scene in frames a second.",
+                                       .example = "getRate",
                                        .returns = Variable::Float};
 
   bool execute(Given const&, Args const&, Variable& result) override {

@@ -14,7 +14,10 @@ class GetSelectedTimeRangesCmd final : public ScriptCommand<GetSelectedTimeRange
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Lists the first and last frames of the time ranges selected in the time bar.",
-      .options = {{"noFeedback"}},
+      .example = "getSelectedTimeRanges -noFeedback",
+      .argsText =
+          "Whole frames inside the ranges, first and last in turn. Without a range a warning and no result.",
+      .options = {{"noFeedback", "no warning when no range is selected"}},
       .returns = Variable::IntArray};
 
   static constexpr int kNoFeedback = info.option("noFeedback");

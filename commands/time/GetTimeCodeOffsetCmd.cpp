@@ -11,6 +11,8 @@ class GetTimeCodeOffsetCmd final : public ScriptCommand<GetTimeCodeOffsetCmd> {
                                        .displayName = "Get Time Code Offset",
                                        .category = "Data Editing",
                                        .purpose = "The timecode offset of the active clip in frames.",
+                                       .example = "getTimeCodeOffset",
+                                       .argsText = "0 with no active clip.",
                                        .returns = Variable::Int};
 
   bool execute(Given const&, Args const&, Variable& result) override {

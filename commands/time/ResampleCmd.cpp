@@ -13,8 +13,16 @@ class ResampleCmd final : public ScriptCommand<ResampleCmd> {
       .displayName = "Resample Data",
       .category = "System",
       .purpose = "Changes the frame rate of the scene and computes its keys anew at the new frames.",
+      .example = "resample custom 60",
       .args = {"\"rateType\" fps"},
-      .options = {{"selected", 0, Variable::None, 0, true}, {"ignoreGaps"}, {"includeUnlabeledMarkers"}},
+      .argsText =
+          "rateType is ntsc, ntscDrop, pal, film, filmNtsc or other (custom); fps is above 0 and at most "
+          "2000. Every module in all clips, but for unlabeled markers; times stay, frames change, locked "
+          "keys stay. Nothing is filtered: detail faster than half the new rate shows as slower motion.",
+      .options = {{"selected", "only the selected modules; the others keep their keys", 0, Variable::None, 0,
+                   true},
+                  {"ignoreGaps", "fills gaps: curves go through; without it data stays missing where it was"},
+                  {"includeUnlabeledMarkers", "unlabeled markers too; without it they keep their keys"}},
       .solo = Solo::no};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {

@@ -10,8 +10,10 @@ class SetTimeCodeOffsetCmd final : public ScriptCommand<SetTimeCodeOffsetCmd> {
       .displayName = "Set Time Code Offset",
       .category = "Data Editing",
       .purpose = "Sets the timecode offset of the active clip, or of a named one, in frames.",
+      .example = "setTimeCodeOffset 100 -onClip walk",
       .args = {"offset", 1, 1, {Variable::Int}},
-      .options = {{"onClip", 1, Variable::String}}};
+      .argsText = "offset is a whole number of frames.",
+      .options = {{"onClip", "path of the clip; else the active one", 1, Variable::String}}};
 
   static constexpr int kOnClip = info.option("onClip");
 

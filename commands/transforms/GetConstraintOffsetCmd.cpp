@@ -14,8 +14,10 @@ class GetConstraintOffsetCmd final : public ScriptCommand<GetConstraintOffsetCmd
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "The offset of a constraint in millimetres, in its own space or in the world.",
+      .example = "getConstraintOffset Pull -ws",
       .args = {"'constraintName'", 1, 1, {Variable::String}},
-      .options = {{"ws"}},
+      .argsText = "Path of a SolvingConstraint or LabelingConstraint; where both have it, the solving one.",
+      .options = {{"ws", "the place in the world at the current time instead of the offset from the bone"}},
       .returns = Variable::Vector,
       .solo = Solo::no};
 

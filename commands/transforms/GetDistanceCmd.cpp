@@ -15,14 +15,21 @@ class GetDistanceCmd final : public ScriptCommand<GetDistanceCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "The distance of two nodes in millimetres, now or as a statistic over time.",
+      .example = "getDistance LFHD RFHD -max",
       .args = {"node1 node2", 0, ArgsInfo::kAny, {}, Variable::String},
-      .options = {{"avg", 0, Variable::None, 1},
-                  {"min", 0, Variable::None, 2},
-                  {"max", 0, Variable::None, 4},
-                  {"range", 0, Variable::None, 8},
-                  {"sd", 0, Variable::None, 16},
-                  {"rangesOnly", 0, Variable::None, 32},
-                  {"mustHaveKeys", 0, Variable::None, 64}},
+      .argsText =
+          "Paths of two nodes, measured in the world; without them the first two selected nodes. Without a "
+          "statistic at the current time. Of several statistics the last counts; over nothing they are 0.",
+      .options = {{"avg", "the mean over the frames of the play range", 0, Variable::None, 1},
+                  {"min", "the least distance over the play range", 0, Variable::None, 2},
+                  {"max", "the greatest distance over the play range", 0, Variable::None, 4},
+                  {"range", "the greatest less the least distance over the play range", 0, Variable::None, 8},
+                  {"sd", "the standard deviation over the play range", 0, Variable::None, 16},
+                  {"rangesOnly", "over the selected time ranges instead of the play range; needs a statistic",
+                   0, Variable::None, 32},
+                  {"mustHaveKeys",
+                   "only at frames where both nodes have a key, in any layer; needs a statistic", 0,
+                   Variable::None, 64}},
       .returns = Variable::Float,
       .solo = Solo::no};
   static constexpr int kRangesOnly = info.option("rangesOnly"), kMustHaveKeys = info.option("mustHaveKeys");

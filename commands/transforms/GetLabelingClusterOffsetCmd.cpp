@@ -12,7 +12,10 @@ class GetLabelingClusterOffsetCmd final : public ScriptCommand<GetLabelingCluste
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Lists the offsets of the markers of a labelling cluster in millimetres.",
+      .example = "getLabelingClusterOffsets Cluster",
       .args = {"'LabelingCluster name'", 1, 1, {Variable::String}},
+      .argsText =
+          "Path of a LabelingCluster. The offsets are its markers' default positions in its own space.",
       .returns = Variable::VectorArray,
       .solo = Solo::no};
 

@@ -6,18 +6,25 @@ namespace {
 
 class GetRotationCmd final : public ScriptCommand<GetRotationCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "getRotation",
-                                       .displayName = "Get Node Rotation",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Retrieval",
-                                       .purpose = "The rotation of a node as three angles in degrees.",
-                                       .args = {"\"moduleName\"", 1, 1, {Variable::String}},
-                                       .options = {{"ws", 0, Variable::None, 2},
-                                                   {"inSpaceOf", 1, Variable::String, 1},
-                                                   {"preRot", 0, Variable::None, 8},
-                                                   {"def", 0, Variable::None, 4}},
-                                       .returns = Variable::Vector,
-                                       .solo = Solo::no};
+  static constexpr CommandInfo info = {
+      .name = "getRotation",
+      .displayName = "Get Node Rotation",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "The rotation of a node as three angles in degrees.",
+      .example = "getRotation Hips -ws",
+      .args = {"\"moduleName\"", 1, 1, {Variable::String}},
+      .argsText =
+          "moduleName is the path of a node; angles count in its own rotation order. Without an option the "
+          "channel's own value at the current time.",
+      .options = {{"ws", "in the world; goes before -inSpaceOf", 0, Variable::None, 2},
+                  {"inSpaceOf", "path of the node in whose space to tell it", 1, Variable::String, 1},
+                  {"preRot", "the pre-rotation: the fixed rotation that comes before the channels", 0,
+                   Variable::None, 8},
+                  {"def", "the default value of the channel instead of that at the current time", 0,
+                   Variable::None, 4}},
+      .returns = Variable::Vector,
+      .solo = Solo::no};
   static constexpr QueryOptions kOptions = {info.option("ws"), info.option("inSpaceOf"), info.option("def"),
                                             info.option("preRot")};
 

@@ -13,6 +13,8 @@ class GetRotationHardyCmd final : public ScriptCommand<GetRotationHardyCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Logs the two joint angles of the first selected labelling bone.",
+      .example = "getRotationHardy",
+      .argsText = "About its major and minor axis at the current time, in radians.",
       .solo = Solo::no};
 
   bool execute(Given const&, Args const&, Variable&) override;

@@ -13,6 +13,8 @@ class GetRotationHingeCmd final : public ScriptCommand<GetRotationHingeCmd> {
       .category = "Data Editing",
       .subCategory = "Data Retrieval",
       .purpose = "Logs the hinge angle of the first selected labelling bone.",
+      .example = "getRotationHinge",
+      .argsText = "About its major axis at the current time, in radians.",
       .solo = Solo::no};
 
   bool execute(Given const&, Args const&, Variable&) override;

@@ -5,15 +5,21 @@ namespace {
 
 class GetScaleCmd final : public ScriptCommand<GetScaleCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "getScale",
-                                       .displayName = "Get Node Scale",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Retrieval",
-                                       .purpose = "The scale of a node along its three axes.",
-                                       .args = {"\"moduleName\"", 1, 1, {Variable::String}},
-                                       .options = {{"ws"}, {"inSpaceOf", 1, Variable::String, 1}, {"def"}},
-                                       .returns = Variable::Vector,
-                                       .solo = Solo::no};
+  static constexpr CommandInfo info = {
+      .name = "getScale",
+      .displayName = "Get Node Scale",
+      .category = "Data Editing",
+      .subCategory = "Data Retrieval",
+      .purpose = "The scale of a node along its three axes.",
+      .example = "getScale Hips -ws",
+      .args = {"\"moduleName\"", 1, 1, {Variable::String}},
+      .argsText =
+          "moduleName is the path of a node. Without an option the channel's own value at the current time.",
+      .options = {{"ws", "in the world; goes before -inSpaceOf"},
+                  {"inSpaceOf", "path of the node in whose space to tell it", 1, Variable::String, 1},
+                  {"def", "the default value of the channel instead of that at the current time"}},
+      .returns = Variable::Vector,
+      .solo = Solo::no};
   static constexpr QueryOptions kOptions = {info.option("ws"), info.option("inSpaceOf"), info.option("def")};
 
   bool execute(Given const& given, Args const& args, Variable& result) override;

@@ -13,8 +13,11 @@ class SetBoneLengthCmd final : public ScriptCommand<SetBoneLengthCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Gives the primary selected bone a length in millimetres by moving its children.",
+      .example = "setBoneLength 420 -adjustChildren",
       .args = {"length"},
-      .options = {{"relative"}, {"adjustChildren"}}};
+      .argsText = "The length in mm, 0 or more. Sets the pre-translations of all node children; keys stay.",
+      .options = {{"relative", "length is a factor of the present length"},
+                  {"adjustChildren", "shifts the children's own children back by what the bone gained"}}};
 
   // A whole number will do as well.
   bool checkArgSyntax(Args const& args, Given const&) const override {

@@ -13,8 +13,17 @@ class SetPositionCmd final : public ScriptCommand<SetPositionCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Moves a node to a position in millimetres, local or in the world.",
+      .example = "setPosition LFHD <100 200 1500> -ws",
       .args = {"\"moduleName\" posVec", 2, 2, {Variable::String, Variable::Vector}},
-      .options = {{"ws"}, {"preTrans", 0, Variable::None, 4}, {"default", 0, Variable::None, 2}},
+      .argsText =
+          "moduleName is the path of a node, posVec <x y z>: the channel's own value unless -ws. Keys the "
+          "current time in the active layer; with no active clip it sets the default value. Where the "
+          "channel is locked there is a warning and nothing changes. A marker's frame is marked as edited by "
+          "hand, whatever the options.",
+      .options = {{"ws", "posVec is in the world"},
+                  {"preTrans", "sets the pre-translation, the fixed offset before the channels, instead", 0,
+                   Variable::None, 4},
+                  {"default", "sets the default value of the channel instead", 0, Variable::None, 2}},
       .solo = Solo::no};
   static constexpr WriteOptions kOptions = {info.option("ws"), info.option("default"),
                                             info.option("preTrans")};

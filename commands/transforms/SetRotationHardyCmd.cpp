@@ -12,7 +12,10 @@ class SetRotationHardyCmd final : public ScriptCommand<SetRotationHardyCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Sets the two joint angles of the first selected labelling bone, in radians.",
+      .example = "setRotationHardy 0.5 0.25",
       .args = {nullptr, 2, 2, {Variable::Float, Variable::Float}},
+      .argsText =
+          "The angles about the bone's major and minor axis, with a point: 1.0. Keys the current time.",
       .solo = Solo::no};
 
   bool execute(Given const&, Args const& args, Variable&) override;

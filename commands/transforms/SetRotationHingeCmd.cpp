@@ -12,7 +12,9 @@ class SetRotationHingeCmd final : public ScriptCommand<SetRotationHingeCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Sets the hinge angle of the first selected labelling bone, in radians.",
+      .example = "setRotationHinge 0.5",
       .args = {nullptr, 1, 1, {Variable::Float}},
+      .argsText = "The angle about the bone's major axis, with a point: 1.0. Keys the current time.",
       .solo = Solo::no};
 
   bool execute(Given const&, Args const& args, Variable&) override;

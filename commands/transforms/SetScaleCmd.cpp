@@ -12,8 +12,14 @@ class SetScaleCmd final : public ScriptCommand<SetScaleCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Scales a node along its three axes, local or in the world.",
+      .example = "setScale Hips <1 1 2>",
       .args = {"\"moduleName\" scaleVec", 2, 2, {Variable::String, Variable::Vector}},
-      .options = {{"ws"}, {"def"}},
+      .argsText =
+          "moduleName is the path of a node, scaleVec <x y z>: the channel's own value unless -ws. Keys the "
+          "current time in the active layer; with no active clip it sets the default value. Where the "
+          "channel is locked there is a warning and nothing changes.",
+      .options = {{"ws", "scaleVec is in the world"},
+                  {"def", "sets the default value of the channel instead of a key"}},
       .solo = Solo::no};
   static constexpr WriteOptions kOptions = {info.option("ws"), info.option("def")};
 

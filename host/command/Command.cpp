@@ -45,6 +45,11 @@ CommandOption const& Command::noOption() {
   return nothing;
 }
 
+HString const& Command::getOptionText(int i) const {
+  static HString const nothing;
+  return i >= 0 && i < getNumOptions() ? m_optionTexts[static_cast<size_t>(i)] : nothing;
+}
+
 bool Command::unref() {
   if (--m_references > 0) return false;
   delete this;
@@ -82,5 +87,10 @@ CommandOption* Command::addOption(CommandOption* option, uint64 mask, bool hidde
   option->m_mask = mask;
   option->m_hidden = hidden;
   m_options.emplace_back(option);
+  m_optionTexts.emplace_back();
   return option;
+}
+
+void Command::setOptionText(HString const& text) {
+  if (!m_optionTexts.empty()) m_optionTexts.back() = text;
 }

@@ -46,6 +46,10 @@ class Command : public HObject {
   HString const& getSubCategory() const { return m_subCategory; }
   // What it is for, in one line.
   HString const& getPurpose() const { return m_purpose; }
+  // What the arguments are and what the command works on, in a few lines.
+  HString const& getArgsText() const { return m_argsText; }
+  // A script line.
+  HString const& getExample() const { return m_example; }
 
   int getNumOptions() const { return static_cast<int>(m_options.size()); }
   // One without a name beyond them.
@@ -53,6 +57,8 @@ class Command : public HObject {
     CommandOption const* option = itemAt(m_options, i);
     return option ? *option : noOption();
   }
+  // What it does, in one line; empty beyond them.
+  HString const& getOptionText(int i) const;
 
   void ref() { ++m_references; }
   // Lets go of one reference; with the last the command is destroyed, and the result is true.
@@ -66,14 +72,19 @@ class Command : public HObject {
  protected:
   void setCommandCategory(HString category, HString subCategory);
   void setPurpose(HString const& purpose) { m_purpose = purpose; }
+  void setArgsText(HString const& text) { m_argsText = text; }
+  void setExample(HString const& line) { m_example = line; }
+  // Of the option that was declared last; nothing happens before the first.
+  void setOptionText(HString const& text);
   // Declares the next option, which the command owns from then on. mask: bits, by index, of the options it
   // excludes. hidden: accepted, but not shown in help.
   CommandOption* addOption(CommandOption* option, uint64 mask, bool hidden);
 
  private:
-  HString m_name, m_displayName, m_category, m_subCategory, m_purpose;
   static CommandOption const& noOption();
 
+  HString m_name, m_displayName, m_category, m_subCategory, m_purpose, m_argsText, m_example;
   std::vector<std::unique_ptr<CommandOption>> m_options;
+  std::vector<HString> m_optionTexts;  // by index
   int m_references = 1;
 };

@@ -1,5 +1,5 @@
-// Commands by declaration. A command's names, options, arguments, result and purpose are one constant record
-// at the top of its file; ScriptCommand turns the record into what the host asks for.
+// Commands by declaration. A command's names, options, arguments, result and help are one constant record at
+// the top of its file; ScriptCommand turns the record into what the host asks for.
 //
 //   class GetNumKeysCmd final : public ScriptCommand<GetNumKeysCmd> {
 //    public:
@@ -7,8 +7,11 @@
 //         .name = "getNumKeys", .displayName = "Get Number of Keys",
 //         .category = "Data Editing", .subCategory = "Data Retrieval",
 //         .purpose = "Counts the keys of a channel.",
+//         .example = "getNumKeys Translation -s",
 //         .args = {"propertyName", 1, 1, {Variable::String}},
-//         .options = {{"s"}, {"onMod", 1, Variable::String}},
+//         .argsText = "propertyName is a channel, or a component of one such as tx.",
+//         .options = {{"s", "only the selected keys"},
+//                     {"onMod", "path of the module; else the primary selected one", 1, Variable::String}},
 //         .returns = Variable::Int, .solo = Solo::no};
 //     static constexpr int kSelected = info.option("s"), kOnMod = info.option("onMod");
 //     bool execute(Given const& given, Args const& args, Variable& result) override;
@@ -22,10 +25,20 @@
 
 struct OptionInfo {
   char const* name = nullptr;
+  char const* text = "";  // what it does, in one line
   int argCount = 0;
   Variable::VarType type = Variable::None;
   uint64 mask = 0;      // bits of the options that it excludes, by index
   bool hidden = false;  // accepted, but not shown in help
+
+  constexpr OptionInfo() = default;
+  constexpr OptionInfo(char const* itsName, char const* itsText, int count = 0,
+                       Variable::VarType itsType = Variable::None, uint64 excluded = 0, bool isHidden = false)
+      : name(itsName), text(itsText), argCount(count), type(itsType), mask(excluded), hidden(isHidden) {}
+  // Without a text.
+  constexpr OptionInfo(char const* itsName, int count = 0, Variable::VarType itsType = Variable::None,
+                       uint64 excluded = 0, bool isHidden = false)
+      : OptionInfo(itsName, "", count, itsType, excluded, isHidden) {}
 };
 
 // The positional arguments: the text for help, how many, and the types of the first ones.
@@ -51,7 +64,9 @@ struct CommandInfo {
   char const* category;
   char const* subCategory = "";
   char const* purpose = "";
+  char const* example = "";  // a script line
   ArgsInfo args = {};
+  char const* argsText = "";                 // what they are and what the command works on, in a few lines
   OptionInfo options[kMaxOptions + 1] = {};  // in declaration order; the first without a name ends them
   Variable::VarType returns = kHostDefault;
   Solo solo = Solo::hostDefault;
@@ -102,8 +117,12 @@ class ScriptCommand : public Command {
   ScriptCommand() : Command(Self::info.name, Self::info.displayName, "") {
     setCommandCategory(Self::info.category, Self::info.subCategory);
     setPurpose(Self::info.purpose);
-    for (OptionInfo const* o = Self::info.options; o->name; ++o)
+    setArgsText(Self::info.argsText);
+    setExample(Self::info.example);
+    for (OptionInfo const* o = Self::info.options; o->name; ++o) {
       addOption(CommandOption::createInstance(o->name, o->argCount, o->type, false), o->mask, o->hidden);
+      setOptionText(o->text);
+    }
   }
 };
 

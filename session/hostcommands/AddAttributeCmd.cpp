@@ -9,18 +9,24 @@ namespace {
 
 class AddAttributeCmd final : public ScriptCommand<AddAttributeCmd> {
  public:
-  static constexpr CommandInfo info = {.name = "addAttribute",
-                                       .displayName = "Add Attribute",
-                                       .category = "Data Editing",
-                                       .subCategory = "Data Manipulators",
-                                       .purpose =
-                                           "Adds an attribute of any kind to a module. The values are its "
-                                           "first and default ones; those of enum "
-                                           "and bitField are the labels.",
-                                       .args = {"PATH NAME KIND [VALUE...]",
-                                                3,
-                                                ArgsInfo::kAny,
-                                                {Variable::String, Variable::String, Variable::String}}};
+  static constexpr CommandInfo info = {
+      .name = "addAttribute",
+      .displayName = "Add Attribute",
+      .category = "Data Editing",
+      .subCategory = "Data Manipulators",
+      .purpose =
+          "Adds an attribute of any kind to a module. The values are its "
+          "first and default ones; those of enum "
+          "and bitField are the labels.",
+      .example = "addAttribute LFHD Height float 2.5",
+      .args = {"PATH NAME KIND [VALUE...]",
+               3,
+               ArgsInfo::kAny,
+               {Variable::String, Variable::String, Variable::String}},
+      .argsText =
+          "KIND is int, enum, float, string, multiString, bool, vector, bitField, rotation (degrees), time "
+          "(frames), color (0 to 255), event, module, none, matrix, multiModule or temperature. NAME must be "
+          "new on the module."};
 
   bool execute(Given const&, Args const& args, Variable&) override {
     Module* module = moduleAt(args[0].getStringValue(-1));

@@ -21,7 +21,9 @@ class AddChannelCmd final : public ScriptCommand<AddChannelCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Adds a channel to a module; KIND is vector, rotation, float, int or bool.",
-      .args = {"PATH NAME KIND", 3, 3, {Variable::String, Variable::String, Variable::String}}};
+      .example = "addChannel LFHD Speed float",
+      .args = {"PATH NAME KIND", 3, 3, {Variable::String, Variable::String, Variable::String}},
+      .argsText = "NAME must be new on the module. A channel name has one kind in the whole scene."};
 
   bool execute(Given const&, Args const& args, Variable&) override {
     Module* module = moduleAt(args[0].getStringValue(-1));

@@ -11,7 +11,11 @@ class AddLayerCmd final : public ScriptCommand<AddLayerCmd> {
                                        .displayName = "Add Layer",
                                        .category = "Data Editing",
                                        .subCategory = "Data Manipulators",
-                                       .purpose = "Adds a layer to the active clip and makes it active."};
+                                       .purpose = "Adds a layer to the active clip and makes it active.",
+                                       .example = "addLayer",
+                                       .argsText =
+                                           "Above those that are there. What is keyed in it adds to the "
+                                           "layers below. Refused with no active clip."};
 
   bool execute(Given const&, Args const&, Variable&) override {
     NLEClip* clip = g_db->getActiveClip();

@@ -12,6 +12,7 @@ class GetTimeCmd final : public ScriptCommand<GetTimeCmd> {
                                        .displayName = "Get Current Time",
                                        .category = "Interface",
                                        .purpose = "The current time in frames.",
+                                       .example = "getTime",
                                        .returns = Variable::Float};
 
   bool execute(Given const&, Args const&, Variable& result) override {

@@ -12,7 +12,9 @@ class HelpCmd final : public ScriptCommand<HelpCmd> {
                                        .displayName = "Help",
                                        .category = "System",
                                        .purpose = "Lists all commands, or tells all about one.",
+                                       .example = "help setKey",
                                        .args = {"[NAME]", 0, 1, {Variable::String}},
+                                       .argsText = "NAME is that of a command, in exact case.",
                                        .returns = Variable::String};
 
   explicit HelpCmd(CommandRegistry const& registry) : m_registry(registry) {}

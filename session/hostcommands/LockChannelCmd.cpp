@@ -13,7 +13,11 @@ class LockChannelCmd final : public ScriptCommand<LockChannelCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Locks a channel of a module against editing, or unlocks it.",
-      .args = {"PATH CHANNEL BOOLEAN", 3, 3, {Variable::String, Variable::String}}};
+      .example = "lockChannel LFHD Translation true",
+      .args = {"PATH CHANNEL BOOLEAN", 3, 3, {Variable::String, Variable::String}},
+      .argsText =
+          "A module, one of its channels as a whole, and true, false or toggle. Commands that write pass a "
+          "locked channel over, warn or fail; setProperty says which it writes all the same."};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     if (!fits(info.args, args) || !args[2].isNumber()) return false;

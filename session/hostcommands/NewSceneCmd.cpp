@@ -10,7 +10,9 @@ class NewSceneCmd final : public ScriptCommand<NewSceneCmd> {
   static constexpr CommandInfo info = {.name = "newScene",
                                        .displayName = "New Scene",
                                        .category = "System",
-                                       .purpose = "Empties the scene and sets rate, time and ranges back."};
+                                       .purpose = "Empties the scene and sets rate, time and ranges back.",
+                                       .example = "newScene",
+                                       .argsText = "Cannot be undone, and does not ask."};
 
   bool execute(Given const&, Args const&, Variable&) override {
     g_db->newScene();

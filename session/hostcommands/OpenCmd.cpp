@@ -17,12 +17,17 @@ class OpenCmd final : public ScriptCommand<OpenCmd> {
       .name = "open",
       .displayName = "Open Take",
       .category = "System",
-      .purpose =
-          "Adds a take (C3D, BVH, TRC) to the scene as a new clip; -up (x, y, z) and -units (mm, cm, m, in, "
-          "ft) "
-          "set what the file leaves open.",
+      .purpose = "Adds a take (C3D, BVH, TRC) to the scene as a new clip.",
+      .example = "open walk.c3d",
       .args = {"FILE", 1, 1, {Variable::String}},
-      .options = {{"up", 1, Variable::String}, {"units", 1, Variable::String}}};
+      .argsText =
+          "The clip becomes active. A subject, marker or bone that is there under its name gets the motion "
+          "instead of a double. The first take sets the rate, the ranges and the up axis; others are turned "
+          "to fit.",
+      .options = {{"up", "x, y or z: sets the scene's up axis, to which the take is turned; default as it is",
+                   1, Variable::String},
+                  {"units", "mm, cm, m, in or ft: the file's length unit, over what the file says", 1,
+                   Variable::String}}};
   static constexpr int kUp = info.option("up"), kUnits = info.option("units");
 
   // Throws FileError: the runner makes it the error line, and a failure of the file rather than of the

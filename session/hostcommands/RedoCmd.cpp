@@ -11,7 +11,9 @@ class RedoCmd final : public ScriptCommand<RedoCmd> {
       .displayName = "Redo",
       .category = "System",
       .purpose = "Does again what was undone last, COUNT times (1 without COUNT).",
-      .args = {"[COUNT]", 0, 1}};
+      .example = "redo",
+      .args = {"[COUNT]", 0, 1},
+      .argsText = "Only until something else is changed."};
 
   bool checkArgSyntax(Args const& args, Given const&) const override { return isStepCount(args); }
 

@@ -16,7 +16,11 @@ class SaveCmd final : public ScriptCommand<SaveCmd> {
                                        .purpose =
                                            "Writes the active clip over the animation range to a file; the "
                                            "suffix (.c3d, .bvh) names the format.",
-                                       .args = {"FILE", 1, 1, {Variable::String}}};
+                                       .example = "save clean.c3d",
+                                       .args = {"FILE", 1, 1, {Variable::String}},
+                                       .argsText =
+                                           "A file that is there is replaced. A clip from a file keeps its "
+                                           "own frames unless setAnimRange was used."};
 
   // Throws FileError: the runner makes it the error line, and a failure of the file rather than of the
   // command.

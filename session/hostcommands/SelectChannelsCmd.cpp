@@ -14,8 +14,12 @@ class SelectChannelsCmd final : public ScriptCommand<SelectChannelsCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Sets the channels and components that key commands work on, in order.",
+      .example = "selectChannels Translation rz",
       .args = {"[NAME[.x|.y|.z]...]", 0, ArgsInfo::kAny, {}, Variable::String},
-      .options = {{"none"}}};
+      .argsText =
+          "Channels, whole or by component (Translation, tx, Rotation.z), in the order to work on. They "
+          "replace those that were active, on whatever modules are selected later.",
+      .options = {{"none", "leaves no channel active"}}};
 
   bool checkArgSyntax(Args const& args, Given const& options) const override {
     return (args.getCount() > 0 || options.getCount() > 0) && fits(info.args, args);

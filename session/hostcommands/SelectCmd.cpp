@@ -13,14 +13,22 @@ class SelectCmd final : public ScriptCommand<SelectCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Selects modules by path, by class or all; -primary names the primary one.",
+      .example = "select LFHD RFHD -add",
       .args = {"[PATH...]", 0, ArgsInfo::kAny},
-      .options = {{"add", 0, Variable::None, 0b110},
-                  {"remove", 0, Variable::None, 0b101},
-                  {"toggle", 0, Variable::None, 0b011},
-                  {"all", 0, Variable::None, 0b10000},
-                  {"none", 0, Variable::None, 0b01000},
-                  {"type", 1, Variable::String},
-                  {"primary", 1, Variable::String}}};
+      .argsText =
+          "Paths, or arrays of them. They become the selection in this order, and the last the primary "
+          "module. Paths that are not there, or fit several modules, are refused, and nothing changes.",
+      .options = {
+          {"add", "keeps the selection and adds to it", 0, Variable::None, 0b110},
+          {"remove", "takes them out of the selection", 0, Variable::None, 0b101},
+          {"toggle", "selects those that are not selected, and deselects the others", 0, Variable::None,
+           0b011},
+          {"all", "every module of the scene, or of the class of -type", 0, Variable::None, 0b10000},
+          {"none", "empties the selection first", 0, Variable::None, 0b01000},
+          {"type", "class name, subclasses too: paths must name such; without paths all of them are meant", 1,
+           Variable::String},
+          {"primary", "path of the module to make primary, which is selected too; \"\" for none", 1,
+           Variable::String}}};
   static constexpr int kAdd = info.option("add"), kRemove = info.option("remove"),
                        kToggle = info.option("toggle"), kAll = info.option("all"),
                        kNone = info.option("none"), kType = info.option("type"),
@@ -54,6 +62,7 @@ class SelectCmd final : public ScriptCommand<SelectCmd> {
     for (Module* module : chosen)
       module->setSelected(mode == kToggle ? !module->isSelected() : mode != kRemove);
     if (setPrimary) g_db->setPrimarySelectedModule(primary);
+    if (byClass) logInfo("%d modules are selected", g_db->getNumSelectedModules());
     return true;
   }
 

@@ -14,15 +14,19 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
       .displayName = "Select Keys",
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
-      .purpose =
-          "Selects keys of a channel, else of the selected channels, else of all; -frames limits them to a "
-          "range, -none deselects them.",
+      .purpose = "Selects keys of a channel, else of the active channels, else of all, or deselects them.",
+      .example = "selectKeys Translation -frames 0 10 -onMod LFHD",
       .args = {"[CHANNEL[.x]]", 0, 1, {Variable::String}},
-      .options = {{"frames", 2, Variable::Float, 0b0010},
-                  {"all", 0, Variable::None, 0b0101},
-                  {"none", 0, Variable::None, 0b1010},
-                  {"add", 0, Variable::None, 0b0100},
-                  {"onMod", 1, Variable::String}}};
+      .argsText =
+          "A channel, whole or by component; without it the active channels, and where none are, all "
+          "channels. On the selected modules, in the active layer. Their former selected keys, on all "
+          "channels, are deselected.",
+      .options = {
+          {"frames", "first and last frame, both included; default all time", 2, Variable::Float, 0b0010},
+          {"all", "all channels, whatever is active", 0, Variable::None, 0b0101},
+          {"none", "deselects these keys instead, and leaves the others", 0, Variable::None, 0b1010},
+          {"add", "keeps the keys that were selected", 0, Variable::None, 0b0100},
+          {"onMod", "path of the one module instead of the selected ones", 1, Variable::String}}};
   static constexpr int kFrames = info.option("frames"), kAll = info.option("all"),
                        kNone = info.option("none"), kAdd = info.option("add"), kOnMod = info.option("onMod");
 
@@ -45,7 +49,10 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
       logWarning("No keys on Base Clip");
       return true;
     }
-    for (Module* module : modules) selectIn(*module, channels, range, options.has(kNone), options.has(kAdd));
+    Selecting selecting{channels, range, options.has(kNone), options.has(kAdd)};
+    for (Module* module : modules) selecting.workOn(*module);
+    logInfo("%s %d keys on %d channels", selecting.none ? "Deselected" : "Selected", selecting.keys,
+            selecting.channels);
     return true;
   }
 
@@ -83,20 +90,27 @@ class SelectKeysCmd final : public ScriptCommand<SelectKeysCmd> {
     return false;
   }
 
-  static void selectIn(Module& module, std::vector<ChannelChoice> const& channels, HTimeRange const& range,
-                       bool none, bool add) {
-    for (int i = 0; i < module.getNumChannels(); ++i) {
-      Controller& channel = *module.getChannel(i);
-      if (!none && !add) channel.deselectKeys(HTimeRange::forever(), 7);
-      if (channels.empty()) change(channel, range, 7, none);
-      for (ChannelChoice const& choice : channels)
-        if (choice.id == channel.getPropertyId()) change(channel, range, choice.mask, none);
-    }
-  }
+  // Works on one module after the other and counts what it touches.
+  struct Selecting {
+    std::vector<ChannelChoice> const& choices;  // none: all channels
+    HTimeRange range;
+    bool none, add;
+    int keys = 0, channels = 0;
 
-  static void change(Controller& channel, HTimeRange const& range, unsigned mask, bool none) {
-    none ? channel.deselectKeys(range, mask) : channel.selectKeys(range, mask);
-  }
+    void workOn(Module& module) {
+      for (int i = 0; i < module.getNumChannels(); ++i) {
+        Controller& channel = *module.getChannel(i);
+        if (!none && !add) channel.deselectKeys(HTimeRange::forever(), 7);
+        unsigned mask = choices.empty() ? 7 : 0;
+        for (ChannelChoice const& choice : choices)
+          if (choice.id == channel.getPropertyId()) mask |= choice.mask;
+        if (mask == 0) continue;
+        int const touched = none ? channel.deselectKeys(range, mask) : channel.selectKeys(range, mask);
+        keys += touched;
+        channels += touched > 0;
+      }
+    }
+  };
 };
 
 }  // namespace

@@ -14,8 +14,12 @@ class SelectTimeCmd final : public ScriptCommand<SelectTimeCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Selects a range of frames, or adds one to those selected.",
+      .example = "selectTime 10 20 -add",
       .args = {"[START END]", 0, 2},
-      .options = {{"add", 0, Variable::None, 0b10}, {"none", 0, Variable::None, 0b01}}};
+      .argsText =
+          "First and last frame, both included; fractions will do. Replaces the ranges that were selected.",
+      .options = {{"add", "keeps the ranges that were selected", 0, Variable::None, 0b10},
+                  {"none", "selects no range; with START and END this one alone", 0, Variable::None, 0b01}}};
   static constexpr int kAdd = info.option("add"), kNone = info.option("none");
 
   bool checkArgSyntax(Args const& args, Given const& options) const override {

@@ -12,8 +12,10 @@ class SetActiveClipCmd final : public ScriptCommand<SetActiveClipCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Makes a clip the active one; -none goes back to the base clip.",
+      .example = "setActiveClip walk",
       .args = {"[PATH]", 0, 1, {Variable::String}},
-      .options = {{"none"}}};
+      .argsText = "The path of a clip; its lowest layer becomes active.",
+      .options = {{"none", "no clip is active: values are the default ones, and no keys are there"}}};
 
   // A path or -none, not both.
   bool checkArgSyntax(Args const& args, Given const& options) const override {

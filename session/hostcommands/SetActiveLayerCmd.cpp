@@ -13,7 +13,9 @@ class SetActiveLayerCmd final : public ScriptCommand<SetActiveLayerCmd> {
       .category = "Data Editing",
       .subCategory = "Data Manipulators",
       .purpose = "Makes a layer of the active clip the one that is edited, from 0.",
-      .args = {"N", 1, 1, {Variable::Int}}};
+      .example = "setActiveLayer 0",
+      .args = {"N", 1, 1, {Variable::Int}},
+      .argsText = "N counts from 0, the base layer."};
 
   bool execute(Given const&, Args const& args, Variable&) override {
     if (!g_db->getActiveClip()) {

@@ -12,7 +12,11 @@ class SetAnimRangeCmd final : public ScriptCommand<SetAnimRangeCmd> {
                                        .displayName = "Set Animation Range",
                                        .category = "Interface",
                                        .purpose = "Sets the range of frames that the scene has.",
-                                       .args = {"START END", 2, 2}};
+                                       .example = "setAnimRange 0 10",
+                                       .args = {"START END", 2, 2},
+                                       .argsText =
+                                           "First and last frame, both included; fractions will do. From "
+                                           "then on takes are saved over this range."};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     return args.getCount() == 2 && areIntsOrFloats(args);

@@ -13,7 +13,9 @@ class SetPlayRangeCmd final : public ScriptCommand<SetPlayRangeCmd> {
       .displayName = "Set Play Range",
       .category = "Interface",
       .purpose = "Sets the range of frames that is played; the current time stays.",
-      .args = {"START END", 2, 2}};
+      .example = "setPlayRange 0 10",
+      .args = {"START END", 2, 2},
+      .argsText = "First and last frame, both included; fractions will do."};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     return args.getCount() == 2 && areIntsOrFloats(args);

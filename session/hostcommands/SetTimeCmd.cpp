@@ -13,7 +13,9 @@ class SetTimeCmd final : public ScriptCommand<SetTimeCmd> {
       .displayName = "Set Current Time",
       .category = "Interface",
       .purpose = "Moves the current time to a frame, which may be a fraction.",
-      .args = {"FRAME", 1, 1}};
+      .example = "setTime 12.5",
+      .args = {"FRAME", 1, 1},
+      .argsText = "The time need not lie in a range."};
 
   bool checkArgSyntax(Args const& args, Given const&) const override {
     return args.getCount() == 1 && areIntsOrFloats(args);

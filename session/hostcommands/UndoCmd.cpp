@@ -11,7 +11,10 @@ class UndoCmd final : public ScriptCommand<UndoCmd> {
       .displayName = "Undo",
       .category = "System",
       .purpose = "Takes back what the last COUNT lines changed (1 without COUNT).",
-      .args = {"[COUNT]", 0, 1}};
+      .example = "undo 2",
+      .args = {"[COUNT]", 0, 1},
+      .argsText =
+          "A line that changed something is a step. Current time, files and settings are not taken back."};
 
   bool checkArgSyntax(Args const& args, Given const&) const override { return isStepCount(args); }
 

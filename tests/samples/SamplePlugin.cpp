@@ -122,7 +122,7 @@ class FailCmd final : public ScriptCommand<FailCmd> {
   static constexpr CommandInfo info = {.name = "fail",
                                        .displayName = "Fail",
                                        .category = "Testing",
-                                       .options = {{"text"}, {"memory"}, {"deselect"}}};
+                                       .options = {{"text"}, {"memory", "runs out of memory"}, {"deselect"}}};
 
   bool execute(Given const& given, Args const&, Variable& result) override {
     result.setValue(1, -1);

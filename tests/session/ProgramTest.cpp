@@ -176,9 +176,10 @@ TEST_F(ProgramTest, CommandsAreDescribed) {
   ASSERT_EQ(run("talix commands $sample --json fail"), 0);
   EXPECT_EQ(boost::json::parse(m_out), boost::json::parse(R"([{
       "name": "fail", "displayName": "Fail", "category": "Testing", "subCategory": "", "purpose": "",
-      "syntax": null, "options": [{"name": "text", "args": 0, "type": 0, "mask": 0, "hidden": false},
-                                  {"name": "memory", "args": 0, "type": 0, "mask": 0, "hidden": false},
-                                  {"name": "deselect", "args": 0, "type": 0, "mask": 0, "hidden": false}],
+      "argsText": "", "example": "", "syntax": null, "options": [
+          {"name": "text", "text": "", "args": 0, "type": 0, "mask": 0, "hidden": false},
+          {"name": "memory", "text": "runs out of memory", "args": 0, "type": 0, "mask": 0, "hidden": false},
+          {"name": "deselect", "text": "", "args": 0, "type": 0, "mask": 0, "hidden": false}],
       "returns": 0, "solo": true, "source": "Sample Commands"}])"));
   ASSERT_EQ(run("talix commands $sample echo"), 0);
   std::string const page = m_out;
