@@ -61,8 +61,8 @@ class Controller : public DataSource {
   inline Database* getDatabase() const;  // its module's
   ControlID getID() const { return m_id; }
 
-  // --- editing
-  // ------------------------------------------------------------------------------------------------- When a
+  // --- editing ---
+  // When a
   // clip is active that holds keys, and neither the clip, nor the layer, nor the module, nor the channel is
   // locked.
   bool isEditable() const override;
@@ -125,8 +125,8 @@ class Controller : public DataSource {
   virtual void setInterpType(int i);                   // a number that is none of the channel's is not taken
   Interpolation getInterpolation() const { return m_interpolation; }
 
-  // --- clips and layers
-  // ---------------------------------------------------------------------------------------- The keys in a
+  // --- clips and layers ---
+  // The keys in a
   // clip and layer; null when it has none there.
   KeyTrack const* findTrack(NLEClip const* clip, int layer) const;
   KeyTrack const* findActiveTrack() const;

@@ -42,8 +42,8 @@ class Database {
   // An empty scene, with a new time manager's settings and the built-in channels only.
   void newScene();
 
-  // --- modules
-  // ------------------------------------------------------------------------------------------------- A
+  // --- modules ---
+  // A
   // module of a class, with a name that its siblings do not have ("a", then "a_1"; empty: the class name), in
   // the scene. The first clip becomes active. Null for an abstract class or one that is no module class, a
   // name that cannot stand, a 32nd clip, a second module of a single-instance class, a parent that refuses.
