@@ -63,7 +63,8 @@ void setPreset(AVCodecContext& encoder, std::string const& payload) {
     throw VideoError(std::string(encoder.codec->name) + " has no preset \"" + preset + "\"");
 }
 
-std::string formatsFor(AVCodec const& codec, int width, int height) {
+std::string formatsFor(AVCodec const& codec, int width, int height, bool playable) {
+  if (playable && isH264(codec) && width % 2 == 0 && height % 2 == 0) return "yuv420p|yuvj420p";
   std::string names;
   for (AVPixelFormat const* format = codec.pix_fmts; format && *format != AV_PIX_FMT_NONE; ++format) {
     AVPixFmtDescriptor const* about = av_pix_fmt_desc_get(*format);

@@ -14,8 +14,9 @@ void setQuality(AVCodecContext& encoder, int quality);
 // That of the payload, if any.
 void setPreset(AVCodecContext& encoder, std::string const& payload);
 
-// The formats that an encoder takes for pictures of a size, as the filter "format" takes them.
-std::string formatsFor(AVCodec const& codec, int width, int height);
+// The formats that an encoder takes for pictures of a size, as the filter "format" takes them; `playable`:
+// only those that players know.
+std::string formatsFor(AVCodec const& codec, int width, int height, bool playable);
 // The unit of time of an encoder for pictures that come at a rate, or at any time (`anyTime`) in the units of
 // the stream that they are from.
 AVRational timeBaseFor(AVCodec const& codec, AVRational rate, bool anyTime, AVRational from);

@@ -73,7 +73,7 @@ void VideoTrack::makeFilters(int width, int height, int format) {
   if (m_job.burnIn) addTimecode(graph, width, height);
   // What the encoder was opened with stays.
   graph.add("format", {{"pix_fmts", m_encoder ? av_get_pix_fmt_name(m_encoder->pix_fmt)
-                                              : formatsFor(*m_codec, width, height)}});
+                                              : formatsFor(*m_codec, width, height, m_job.payload[0] == 0)}});
   graph.finish("buffersink");
   m_filters = std::move(graph);
   m_width = width, m_height = height, m_format = format;
