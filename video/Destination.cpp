@@ -1,7 +1,10 @@
 #include "video/Destination.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstring>
+#include <iterator>
+#include <string_view>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -44,14 +47,32 @@ void Destination::release() {
   avformat_free_context(m_format);
 }
 
+bool Destination::hasTimes() const {
+  if (getKind().flags & AVFMT_NOTIMESTAMPS) return false;
+  if (getKind().flags & AVFMT_VARIABLE_FPS) return true;
+  // The containers of one family do not say so.
+  for (std::string_view const name : {"mov", "mp4", "ipod", "psp", "3gp", "3g2", "f4v"})
+    if (name == getKind().name) return true;
+  return false;
+}
+
 bool Destination::canHold(AVCodecID codec) const {
-  int const answer = avformat_query_codec(&getKind(), codec, FF_COMPLIANCE_NORMAL);
-  if (answer >= 0) return answer == 1;
-  // Some containers keep no list.
-  for (AVCodecID const usual : {AV_CODEC_ID_H264, AV_CODEC_ID_MPEG4, AV_CODEC_ID_MPEG2VIDEO, AV_CODEC_ID_AAC,
-                                AV_CODEC_ID_MP2, AV_CODEC_ID_MP3, AV_CODEC_ID_AC3})
-    if (codec == usual) return true;
-  return codec == getKind().video_codec || codec == getKind().audio_codec;
+  // Some keep no list, and the list of one promises too much.
+  static constexpr struct {
+    std::string_view container;
+    AVCodecID codecs[6];
+  } kKnown[] = {
+      {"mpegts",
+       {AV_CODEC_ID_H264, AV_CODEC_ID_MPEG4, AV_CODEC_ID_AAC, AV_CODEC_ID_MP2, AV_CODEC_ID_MP3,
+        AV_CODEC_ID_AC3}},
+      {"mpeg", {AV_CODEC_ID_H264, AV_CODEC_ID_MPEG4, AV_CODEC_ID_MP2, AV_CODEC_ID_MP3, AV_CODEC_ID_AC3}},
+      {"vob", {AV_CODEC_ID_H264, AV_CODEC_ID_MPEG4, AV_CODEC_ID_MP2, AV_CODEC_ID_MP3, AV_CODEC_ID_AC3}},
+      {"flv", {AV_CODEC_ID_H264, AV_CODEC_ID_AAC, AV_CODEC_ID_MP3}}};
+  if (codec == getKind().video_codec || codec == getKind().audio_codec) return true;
+  for (auto const& known : kKnown)
+    if (known.container == getKind().name)
+      return std::find(std::begin(known.codecs), std::end(known.codecs), codec) != std::end(known.codecs);
+  return avformat_query_codec(&getKind(), codec, FF_COMPLIANCE_NORMAL) == 1;
 }
 
 AVStream& Destination::addStream() {

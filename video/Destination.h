@@ -21,7 +21,7 @@ class Destination {
   AVOutputFormat const& getKind() const { return *m_format->oformat; }
   std::string const& getSuffix() const { return m_suffix; }
   // Whether its pictures may stand at any time; else they come at their rate.
-  bool hasTimes() const { return getKind().flags & AVFMT_VARIABLE_FPS; }
+  bool hasTimes() const;
   bool canHold(AVCodecID codec) const;
 
   AVStream& addStream();

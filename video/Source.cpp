@@ -91,6 +91,16 @@ std::optional<std::string> Source::getTimecode() const {
   return found->value;
 }
 
+AVRational Source::getTimecodeRate() const {
+  for (unsigned i = 0; i < m_format->nb_streams; ++i) {
+    AVStream const& stream = *m_format->streams[i];
+    bool const counts = stream.codecpar->codec_tag == MKTAG('t', 'm', 'c', 'd');
+    if (counts && stream.avg_frame_rate.num > 0 && stream.avg_frame_rate.den > 0)
+      return stream.avg_frame_rate;
+  }
+  return m_rate;
+}
+
 int64_t Source::getStart(AVStream const& stream) const {
   if (m_format->start_time == AV_NOPTS_VALUE) return 0;
   return av_rescale_q(m_format->start_time, AV_TIME_BASE_Q, stream.time_base);

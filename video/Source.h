@@ -22,6 +22,7 @@ class Source {
   AVRational getRate() const { return m_rate; }  // frames a second, above 0
   // The file's own one, of its first picture.
   std::optional<std::string> getTimecode() const;
+  AVRational getTimecodeRate() const;  // in which it counts
   // The least time of any stream, in a stream's units.
   int64_t getStart(AVStream const& stream) const;
 

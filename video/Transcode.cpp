@@ -19,7 +19,8 @@ void copyMetadata(Source const& source, Destination const& destination, VideoJob
   if (!timecode) return;
   // Containers keep it by stream or by file. They refuse to be written with one that they cannot count.
   AVTimecode code;
-  bool const counts = av_timecode_init_from_string(&code, source.getRate(), timecode->c_str(), nullptr) >= 0;
+  bool const counts =
+      av_timecode_init_from_string(&code, source.getTimecodeRate(), timecode->c_str(), nullptr) >= 0;
   if (!counts)
     job.warn(("the timecode " + *timecode + " does not go with the file's rate and is not kept").c_str());
   char const* kept = counts ? timecode->c_str() : nullptr;
@@ -28,6 +29,8 @@ void copyMetadata(Source const& source, Destination const& destination, VideoJob
     AVStream& stream = *destination.getFormat().streams[i];
     bool const video = stream.codecpar->codec_type == AVMEDIA_TYPE_VIDEO;
     av_dict_set(&stream.metadata, "timecode", video ? kept : nullptr, 0);
+    // Containers count it by that.
+    if (video && kept) stream.avg_frame_rate = source.getTimecodeRate();
   }
 }
 

@@ -45,8 +45,9 @@ VideoTrack::VideoTrack(VideoJob const& job, Source const& source, Destination& d
       m_codec(findEncoder(job.payload, destination)),
       m_turn(quarterTurns(m_in)) {
   if (job.burnIn) {
-    if (auto const start = source.getTimecode()) m_timecode = Timecode::parse(*start, source.getRate());
-    if (!m_timecode) m_timecode.emplace(source.getRate());
+    if (auto const start = source.getTimecode())
+      m_timecode = Timecode::parse(*start, source.getTimecodeRate());
+    if (!m_timecode) m_timecode.emplace(source.getTimecodeRate());
   }
   AVCodecParameters const& picture = *m_in.codecpar;
   if (picture.format < 0) throw VideoError("not a whole video: none of its pictures can be decoded");
@@ -199,7 +200,8 @@ void VideoTrack::filter(AVFrame& frame) {
   m_lastIn = frame.pts;
   if (m_firstIn == AV_NOPTS_VALUE) m_firstIn = frame.pts;
   if (m_timecode) {
-    int64_t const number = av_rescale_q(frame.pts - m_firstIn, m_in.time_base, unit);
+    int64_t const number =
+        av_rescale_q(frame.pts - m_firstIn, m_in.time_base, av_inv_q(m_source.getTimecodeRate()));
     check(av_dict_set(&frame.metadata, kTimecodeKey, m_timecode->at(number).c_str(), 0), "the timecode");
   }
   FramePtr const straight = m_job.lens ? corrected(frame) : nullptr;

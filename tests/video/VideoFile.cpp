@@ -60,7 +60,9 @@ void VideoFile::write(std::string const& path) const {
   AVCodec const* codec = avcodec_find_encoder(AV_CODEC_ID_MPEG4);
   AVCodecContext* encoder = avcodec_alloc_context3(codec);
   encoder->width = kWidth, encoder->height = kHeight, encoder->pix_fmt = AV_PIX_FMT_YUV420P;
-  encoder->time_base = {perSeconds, rate}, encoder->framerate = {rate, perSeconds};
+  // Pictures may begin between two frames, but not in this container.
+  int const parts = format->oformat->name == std::string("avi") ? 1 : 2;
+  encoder->time_base = {perSeconds, rate * parts}, encoder->framerate = {rate, perSeconds};
   encoder->sample_aspect_ratio = {aspect, 1};
   encoder->flags |=
       AV_CODEC_FLAG_QSCALE | (format->oformat->flags & AVFMT_GLOBALHEADER ? AV_CODEC_FLAG_GLOBAL_HEADER : 0);
@@ -93,10 +95,10 @@ void VideoFile::write(std::string const& path) const {
     copyPlane(picture.y, *frame, 0, kWidth);
     copyPlane(picture.u, *frame, 1, kWidth / 2);
     copyPlane(picture.v, *frame, 2, kWidth / 2);
-    frame->pts = static_cast<int64_t>(picture.time * rate / perSeconds + 0.5);
+    frame->pts = static_cast<int64_t>(picture.time * rate * parts / perSeconds + 0.5);
     must(avcodec_send_frame(encoder, frame));
     while (avcodec_receive_packet(encoder, packet) >= 0) {
-      packet->duration = 1;
+      packet->duration = parts;
       av_packet_rescale_ts(packet, encoder->time_base, video->time_base);
       must(av_interleaved_write_frame(format, packet));
     }
@@ -104,7 +106,7 @@ void VideoFile::write(std::string const& path) const {
     must(av_new_packet(packet, 4 * kSoundRate * perSeconds / rate));
     std::memset(packet->data, static_cast<int>(frame->pts), static_cast<size_t>(packet->size));
     packet->stream_index = audio->index;
-    packet->pts = packet->dts = frame->pts * kSoundRate * perSeconds / rate;
+    packet->pts = packet->dts = static_cast<int64_t>(picture.time * kSoundRate + 0.5);
     packet->duration = packet->size / 4;
     av_packet_rescale_ts(packet, {1, kSoundRate}, audio->time_base);
     must(av_interleaved_write_frame(format, packet));

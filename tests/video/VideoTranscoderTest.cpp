@@ -90,9 +90,9 @@ std::pair<double, double> brightSpot(VideoFile::Picture const& picture, int leve
 TEST_F(Videos, KeepPicturesTimesTimecodeAndSound) {
   VideoFile file = VideoFile::plain(25);
   file.rate = 30000, file.perSeconds = 1001;
-  // A second in the middle has no pictures.
+  // From the tenth on they come late, and between the frames.
   for (size_t i = 0; i < 25; ++i)
-    file.pictures[i].time = static_cast<double>(i + (i < 10 ? 0 : 30)) * 1001 / 30000;
+    file.pictures[i].time = static_cast<double>(i) * (i < 10 ? 1 : 2.5) * 1001 / 30000;
   file.timecode = "01:00:59;28", file.sound = "pcm_s16le", file.turned = true, file.aspect = 2;
   for (char const* payload : {"mpeg4", "libx264:ultrafast", ""}) {
     for (char const* to : {"to.mov", "to.mp4"}) {
