@@ -241,6 +241,8 @@ void VideoTrack::encode(AVFrame* frame) {
     m_durations[frame->pts] = length;
   }
   encodeInto(*m_encoder, frame, [&](AVPacket& packet) {
+    // Encoders keep many pictures until the end.
+    if (!m_job.goOn(m_source.getDone())) throw Cancelled();
     if (auto const length = m_durations.extract(packet.pts)) packet.duration = length.mapped();
     if (packet.duration <= 0)
       packet.duration =

@@ -4,11 +4,11 @@
 #include <QFile>
 #include <QFileInfo>
 
-HString backUpFile(HString const& path) {
-  QString const source = QFile::decodeName(path.GetStr());
+extern "C" __attribute__((visibility("default"))) void talixBackUpFile(char const* path, std::string& copy) {
+  QString const source = QFile::decodeName(path);
   QFileInfo const info(source);
   QString const backup = info.canonicalPath() + "/" + info.baseName() + "_Original." + info.completeSuffix();
   QFile::remove(backup);
   QFile::copy(source, backup);
-  return QFile::encodeName(backup).constData();
+  copy = QFile::encodeName(backup).toStdString();
 }

@@ -3,6 +3,7 @@
 #include <optional>
 
 #include "commands/video/BackupFile.h"
+#include "host/base/EngineLibrary.h"
 #include "host/command/ScriptCommand.h"
 #include "host/services/VideoTranscoder.h"
 
@@ -61,7 +62,7 @@ class TranscodeVideoCmd final : public ScriptCommand<TranscodeVideoCmd> {
     CommandOption const* quality = options.find(kQuality);
     std::optional<float> const saturation = number(options, kSaturation), gamma = number(options, kGamma);
     HString source = args[0].getStringValue(-1);
-    if (options.has(kBackup)) source = backUpFile(source);
+    if (options.has(kBackup) && !backUp(source)) return false;
     return VideoTranscoder().process(source, args[1].getStringValue(-1), options.textOr(kVideoPayload, ""),
                                      quality ? quality->getArg(0).getIntValue(-1) : 85,
                                      options.has(kRemoveAudio),
@@ -85,6 +86,19 @@ class TranscodeVideoCmd final : public ScriptCommand<TranscodeVideoCmd> {
         std::find_if(names, names + kCount, [&](char const* name) { return value == name; });
     code = static_cast<int>(found - names);
     return found != names + kCount;
+  }
+  // The copy takes the source's place.
+  static bool backUp(HString& source) {
+    std::string copy, problem;
+    auto* const backUpFile =
+        reinterpret_cast<BackUpFile*>(findInEngineLibrary("libTalixBackup.so", kBackUpFile, problem));
+    if (!backUpFile) {
+      logError("No backup can be made: %s", problem.c_str());
+      return false;
+    }
+    backUpFile(source, copy);
+    source = copy;
+    return true;
   }
   static std::optional<float> number(GivenOptions const& options, int option) {
     CommandOption const* given = options.find(option);

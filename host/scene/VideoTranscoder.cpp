@@ -1,12 +1,10 @@
 // Stands here and not beside its header because cameras are modules.
 #include "host/services/VideoTranscoder.h"
 
-#include <cmath>
-#include <dlfcn.h>
-#include <mutex>
 #include <sys/stat.h>
 #include <system_error>
 
+#include "host/base/EngineLibrary.h"
 #include "host/base/Log.h"
 #include "host/base/ReplaceFile.h"
 #include "host/scene/Database.h"
@@ -15,34 +13,9 @@
 
 namespace {
 
-constexpr char const kLibrary[] = "libTalixVideo.so";
-
 bool fail(std::string const& problem) {
   writeLog(LogLevel::Error, problem);
   return false;
-}
-
-// The library stays loaded. Null, with `problem`, when it cannot be had; the next call tries again.
-TranscodeVideo* findTranscoder(std::string& problem) {
-  static std::mutex mutex;
-  static TranscodeVideo* found = nullptr;
-  std::lock_guard const lock(mutex);
-  if (found) return found;
-  // Beside the engine, so that no other library of that name is taken.
-  Dl_info engine{};
-  std::string path = kLibrary;
-  static char const here = 0;
-  if (dladdr(&here, &engine) != 0 && engine.dli_fname) {
-    std::string const own = engine.dli_fname;
-    path = own.substr(0, own.rfind('/') + 1) + kLibrary;
-  }
-  if (void* library = dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL))
-    found = reinterpret_cast<TranscodeVideo*>(dlsym(library, kTranscodeVideo));
-  if (!found) {
-    char const* text = dlerror();
-    problem = "Videos cannot be transcoded: " + std::string(text ? text : path + " has no transcoder");
-  }
-  return found;
 }
 
 // An attribute that is missing, or of another kind, is no distortion.
@@ -102,8 +75,9 @@ bool VideoTranscoder::process(HString source, HString destination, HString video
   if (::stat(destination, &former) == 0 && !S_ISREG(former.st_mode))
     return fail(destination.GetString() + ": not a file that can be replaced");
   std::string problem;
-  TranscodeVideo* transcode = findTranscoder(problem);
-  if (!transcode) return fail(problem);
+  auto* const transcode =
+      reinterpret_cast<TranscodeVideo*>(findInEngineLibrary("libTalixVideo.so", kTranscodeVideo, problem));
+  if (!transcode) return fail("Videos cannot be transcoded: " + problem);
 
   VideoJob job{.source = source,
                .destination = destination,
