@@ -11,8 +11,6 @@ namespace {
 constexpr std::string_view kX26Presets[] = {"ultrafast", "superfast", "veryfast", "faster",   "fast",
                                             "medium",    "slow",      "slower",   "veryslow", "placebo"};
 
-bool isH264(AVCodec const& codec) { return codec.id == AV_CODEC_ID_H264; }
-
 }  // namespace
 
 AVCodec const* findEncoder(std::string const& payload, Destination const& destination) {
@@ -51,6 +49,11 @@ void setQuality(AVCodecContext& encoder, int quality) {
   encoder.global_quality = static_cast<int>(std::lround(FF_QP2LAMBDA * (31 - (quality - 1) * 30 / 99.0)));
 }
 
+void silence(AVCodecContext& encoder) {
+  if (std::string_view(encoder.codec->name) == "libx265")
+    av_opt_set(encoder.priv_data, "x265-params", "log-level=none", 0);
+}
+
 void setPreset(AVCodecContext& encoder, std::string const& payload) {
   size_t const colon = payload.find(':');
   if (colon == std::string::npos) return;
@@ -64,26 +67,30 @@ void setPreset(AVCodecContext& encoder, std::string const& payload) {
 }
 
 std::string formatsFor(AVCodec const& codec, int width, int height, bool playable) {
-  if (playable && isH264(codec) && width % 2 == 0 && height % 2 == 0) return "yuv420p|yuvj420p";
-  std::string names;
+  std::string names, plain;
+  auto const add = [](std::string& list, char const* name) {
+    list += (list.empty() ? "" : "|") + std::string(name);
+  };
   for (AVPixelFormat const* format = codec.pix_fmts; format && *format != AV_PIX_FMT_NONE; ++format) {
     AVPixFmtDescriptor const* about = av_pix_fmt_desc_get(*format);
     if (!about || about->flags & AV_PIX_FMT_FLAG_HWACCEL) continue;
     // H.264 holds whole pixels of colour only.
     bool const whole = width % (1 << about->log2_chroma_w) == 0 && height % (1 << about->log2_chroma_h) == 0;
-    if (isH264(codec) && !whole) continue;
+    if (codec.id == AV_CODEC_ID_H264 && !whole) continue;
     // JPEGs use the full range.
     if (codec.id == AV_CODEC_ID_MJPEG && !std::string_view(about->name).starts_with("yuvj")) continue;
-    names += (names.empty() ? "" : "|") + std::string(about->name);
+    add(names, about->name);
+    if (*format == AV_PIX_FMT_YUV420P || *format == AV_PIX_FMT_YUVJ420P) add(plain, about->name);
   }
+  if (playable && !plain.empty()) return plain;
   return names.empty() ? "yuv420p" : names;
 }
 
 AVRational timeBaseFor(AVCodec const& codec, AVRational rate, bool anyTime, AVRational from) {
-  if (!anyTime || codec.supported_framerates) return av_inv_q(rate);
+  if (!anyTime || codec.supported_framerates || av_cmp_q(from, av_inv_q(rate)) == 0) return av_inv_q(rate);
   // MPEG-4 counts the parts of a second in 16 bits.
   bool const narrow = codec.id == AV_CODEC_ID_MPEG4 || codec.id == AV_CODEC_ID_H263;
-  int const most = narrow ? 65535 : 1'000'000;
+  int const most = narrow ? 65535 : 120'000;
   bool const fits = from.num == 1 && from.den > 1000 && from.den <= most;
   if (fits && int64_t{from.den} * rate.den % rate.num == 0) return from;
   // The finest one in which frames of the rate begin at whole units.

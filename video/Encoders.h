@@ -11,6 +11,8 @@ namespace talix_video {
 AVCodec const* findEncoder(std::string const& payload, Destination const& destination);
 // Before it is opened. Quality: 1 to 100.
 void setQuality(AVCodecContext& encoder, int quality);
+// One that would tell about itself on standard error.
+void silence(AVCodecContext& encoder);
 // That of the payload, if any.
 void setPreset(AVCodecContext& encoder, std::string const& payload);
 

@@ -130,18 +130,22 @@ void VideoTrack::makeStream() {
   AVPixFmtDescriptor const* format = av_pix_fmt_desc_get(m_encoder->pix_fmt);
   AVCodecParameters const& picture = *m_in.codecpar;
   AVPixFmtDescriptor const* former = av_pix_fmt_desc_get(static_cast<AVPixelFormat>(picture.format));
-  if (former && (former->flags & AV_PIX_FMT_FLAG_RGB) == (format->flags & AV_PIX_FMT_FLAG_RGB)) {
+  auto const isRgb = [](AVPixFmtDescriptor const* kind) { return kind && kind->flags & AV_PIX_FMT_FLAG_RGB; };
+  if (isRgb(former) == isRgb(format)) {
     m_encoder->color_range = picture.color_range;
     m_encoder->colorspace = picture.color_space;
-    m_encoder->color_primaries = picture.color_primaries;
-    m_encoder->color_trc = picture.color_trc;
-    m_encoder->chroma_sample_location = picture.chroma_location;
+  } else if (isRgb(former)) {
+    m_encoder->colorspace = AVCOL_SPC_SMPTE170M;  // what the filters make of it
   }
+  m_encoder->color_primaries = picture.color_primaries;
+  m_encoder->color_trc = picture.color_trc;
+  m_encoder->chroma_sample_location = picture.chroma_location;
   m_encoder->thread_count = 0;
   // Such containers hold no times of display.
   if (!m_destination.hasTimes()) m_encoder->max_b_frames = 0;
   if (m_destination.getKind().flags & AVFMT_GLOBALHEADER) m_encoder->flags |= AV_CODEC_FLAG_GLOBAL_HEADER;
   setQuality(*m_encoder, m_job.quality);
+  silence(*m_encoder);
   setPreset(*m_encoder, m_job.payload);
   check(avcodec_open2(m_encoder.get(), m_codec, nullptr),
         std::string("the encoder ") + m_codec->name + " does not start");
