@@ -88,7 +88,14 @@ void AudioTrack::take(AVPacket& packet) {
   int64_t const start = m_source.getStart(m_in);
   if (packet.pts != AV_NOPTS_VALUE) packet.pts -= start;
   if (packet.dts != AV_NOPTS_VALUE) packet.dts -= start;
-  m_encoder ? decode(&packet) : m_destination.write(packet, m_out, m_in.time_base);
+  if (m_encoder) return decode(&packet);
+  // Containers take only times that rise.
+  if (packet.dts != AV_NOPTS_VALUE) {
+    if (m_lastTime != AV_NOPTS_VALUE) packet.dts = std::max(packet.dts, m_lastTime + 1);
+    if (packet.pts != AV_NOPTS_VALUE) packet.pts = std::max(packet.pts, packet.dts);
+    m_lastTime = packet.dts;
+  }
+  m_destination.write(packet, m_out, m_in.time_base);
 }
 
 void AudioTrack::finish() {

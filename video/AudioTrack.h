@@ -29,7 +29,8 @@ class AudioTrack {
   AVStream const& m_in;
   Destination& m_destination;
   AVStream& m_out;
-  CodecPtr m_decoder, m_encoder;  // null: copied
+  int64_t m_lastTime = AV_NOPTS_VALUE;  // of copied packets
+  CodecPtr m_decoder, m_encoder;        // null: copied
   std::optional<FilterGraph> m_filter;
 };
 

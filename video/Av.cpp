@@ -29,8 +29,9 @@ std::string takeLastError() {
   // Addresses differ from run to run.
   if (size_t const at = text.find(" @ 0x"), end = text.find(']'); at < end && end != std::string::npos)
     text.erase(at, end - at);
+  // It may quote what a damaged file holds.
   for (char& c : text)
-    if (c == '\n') c = ' ';
+    if (c < ' ' || c > '~') c = c == '\n' ? ' ' : '?';
   return text;
 }
 

@@ -80,6 +80,7 @@ void Source::findVideo() {
     throw VideoError("not a whole video: its pictures have no size");
   AVRational const rate = av_guess_frame_rate(m_format, &getVideo(), nullptr);
   if (rate.num > 0 && rate.den > 0) m_rate = rate;
+  m_tracks[m_video];  // some headers do not name it
 }
 
 std::optional<std::string> Source::getTimecode() const {

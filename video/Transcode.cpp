@@ -21,8 +21,7 @@ void copyMetadata(Source const& source, Destination const& destination, VideoJob
   AVTimecode code;
   bool const counts =
       av_timecode_init_from_string(&code, source.getTimecodeRate(), timecode->c_str(), nullptr) >= 0;
-  if (!counts)
-    job.warn(("the timecode " + *timecode + " does not go with the file's rate and is not kept").c_str());
+  if (!counts) job.warn("The file's timecode does not go with its rate and is not kept.");
   char const* kept = counts ? timecode->c_str() : nullptr;
   av_dict_set(&to, "timecode", kept, 0);
   for (unsigned i = 0; i < destination.getFormat().nb_streams; ++i) {
@@ -83,6 +82,8 @@ VideoOutcome talixTranscodeVideo(VideoJob const& job, std::string& problem) {
     problem = std::string(job.source) + ": " + error.what();
   } catch (std::bad_alloc const&) {
     problem = std::string(job.source) + ": not enough memory";
+  } catch (std::exception const& error) {
+    problem = std::string(job.source) + ": cannot be transcoded: " + error.what();
   }
   return VideoOutcome::failed;
 }
