@@ -116,18 +116,22 @@ struct Fresh : Descriptor {
 }  // namespace
 
 void replaceFile(std::string const& path, std::function<void(std::ostream&)> const& write) {
+  replaceFileThrough(path, [&](int file) {
+    DescriptorBuffer buffer(file);
+    std::ostream out(&buffer);
+    write(out);
+    out.flush();
+    if (!out) fail(buffer.error() ? buffer.error() : EIO);
+  });
+}
+
+void replaceFileThrough(std::string const& path, std::function<void(int)> const& write) {
   std::string const target = targetOf(path);
   struct stat former {};
   bool const exists = ::stat(target.c_str(), &former) == 0;
   if (exists && ::access(target.c_str(), W_OK) != 0) fail();
   Fresh file(folderOf(target));
-  {
-    DescriptorBuffer buffer(file.fd);
-    std::ostream out(&buffer);
-    write(out);
-    out.flush();
-    if (!out) fail(buffer.error() ? buffer.error() : EIO);
-  }
+  write(file.fd);
   if (exists && ::fchmod(file.fd, former.st_mode & 07777) != 0) fail();
   if (::fsync(file.fd) != 0) fail();
   file.moveTo(target);

@@ -10,3 +10,6 @@
 // an existing file are kept; one that may not be written is refused. Throws std::system_error, and what
 // `write` throws; then what stood at `path` is untouched. The stream only goes forward.
 void replaceFile(std::string const& path, std::function<void(std::ostream&)> const& write);
+
+// The same for who writes to a descriptor, at any place of the file; `write` leaves it open.
+void replaceFileThrough(std::string const& path, std::function<void(int)> const& write);

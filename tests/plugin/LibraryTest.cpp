@@ -46,6 +46,10 @@ TEST(PluginLibrary, NeedsTheEngineButNoOtherLayer) {
   EXPECT_THAT(needed, Contains(HasSubstr("[libTalixCore.so")));
   EXPECT_THAT(needed, Not(Contains(HasSubstr("TalixIO"))));
   EXPECT_THAT(needed, Not(Contains(HasSubstr("TalixSession"))));
+  // Loading these would be felt at each start.
+  EXPECT_THAT(needed, Not(Contains(HasSubstr("TalixVideo"))));
+  EXPECT_THAT(needed, Not(Contains(HasSubstr("[libav"))));
+  EXPECT_THAT(needed, Not(Contains(HasSubstr("Qt"))));
 }
 
 TEST(PluginLibrary, AnswersItsHost) {

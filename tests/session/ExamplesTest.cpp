@@ -34,6 +34,7 @@ constexpr std::string_view kBefore[] = {
 TEST(Examples, OfEveryCommandRun) {
   talix_tests::TempFolder const folder;
   std::filesystem::copy(TALIX_TEST_DATA "/walkset_a_le_int.c3d", folder.path("walk.c3d"));
+  std::filesystem::copy(TALIX_TEST_DATA "/person_01.mp4", folder.path("walk.mp4"));
   std::filesystem::current_path(folder.path(""));
   Database::setDevOnlyMode(true);
   talix::Session session(TALIX_BIN "/TalixDataCommands.so");
@@ -49,9 +50,8 @@ TEST(Examples, OfEveryCommandRun) {
     std::istringstream script(lines + ";" + example);
     for (std::string line; std::getline(script, line, ';');) {
       talix::LineResult const& result = session.run(line);
-      bool const pending = name == "transcodeVideo" && line == example;
-      bool const remarks = pending || name == "open" || name == "save";
-      EXPECT_EQ(result.failed(), pending) << line;
+      bool const remarks = name == "open" || name == "save";
+      EXPECT_FALSE(result.failed()) << line;
       for (auto const& said : result.log) EXPECT_TRUE(said.level == LogLevel::Info || remarks) << said.text;
     }
   }

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "host/keys/DataRanges.h"
+#include "host/keys/SampleTimes.h"
 #include "host/scene/DataEdit.h"
 #include "host/scene/Database.h"
 #include "host/scene/Editability.h"
