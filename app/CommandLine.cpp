@@ -3,6 +3,7 @@
 #include <CLI/CLI.hpp>
 #include <csignal>
 
+#include "app/Completion.h"
 #include "app/Info.h"
 #include "app/Run.h"
 #include "host/base/OutOfMemory.h"
@@ -91,6 +92,18 @@ CLI::App* addRun(CLI::App& app, RunArguments& run) {
   return sub;
 }
 
+talix::Subcommands subcommandsOf(CLI::App& app) {
+  talix::Subcommands all;
+  for (CLI::App const* sub : app.get_subcommands({})) {
+    std::vector<std::string>& options = all[sub->get_name()];
+    for (CLI::Option const* option : sub->get_options()) {
+      for (std::string const& name : option->get_lnames()) options.push_back("--" + name);
+      for (std::string const& name : option->get_snames()) options.push_back("-" + name);
+    }
+  }
+  return all;
+}
+
 }  // namespace
 
 int main(int argc, char** argv) {
@@ -115,6 +128,11 @@ int main(int argc, char** argv) {
   bool markdown = false;
   commandsApp->add_flag("--markdown", markdown, "Print all about all of them, as docs/commands.md has it")
       ->excludes(asJson);
+  bool man = false, completion = false;
+  commandsApp->add_flag("--man", man, "Print the manual page of the program, with all commands")
+      ->excludes(asJson);
+  commandsApp->add_flag("--bash-completion", completion, "Print the completion of the program for bash")
+      ->excludes(asJson);
   addPluginOptions(*commandsApp, plugin);
 
   std::vector<std::string> infoFiles;
@@ -132,6 +150,9 @@ int main(int argc, char** argv) {
   }
   if (infoApp->parsed()) return talix::runInfo(infoFiles, infoJson);
   if (markdown) return talix::showRegistryPage(plugin);
+  if (man)
+    return talix::showManPage(plugin, app.get_formatter()->make_help(&app, "talix", CLI::AppFormatMode::All));
+  if (completion) return talix::showCompletion(plugin, subcommandsOf(app));
   if (commandsApp->parsed()) return talix::showCommands(plugin, name, json);
   run.putInOrder(*runApp);
   return talix::runScripts(run.request);

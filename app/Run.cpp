@@ -19,6 +19,7 @@
 #include "session/CommandHelp.h"
 #include "session/JsonForms.h"
 #include "session/JsonText.h"
+#include "session/ManPage.h"
 #include "session/RegistryPage.h"
 #include "session/ScriptRunner.h"
 #include "session/ScriptText.h"
@@ -182,6 +183,27 @@ int showCommands(PluginChoice const& plugin, std::string const& name, bool json)
     text = entry ? commandPage(*entry) : commandList(commands);
   }
   bool const written = std::puts(text.c_str()) >= 0 && std::fflush(stdout) == 0;
+  return finished(status, written);
+}
+
+int showManPage(PluginChoice const& plugin, std::string const& help) {
+  int status = 0;
+  std::unique_ptr<Session> const session = makeSession(plugin, status);
+  if (!session) return status;
+  std::string const page = ".TH TALIX 1 \"\" \"talix " TALIX_VERSION
+                           "\"\n.SH NAME\ntalix \\- edits motion capture takes by script\n"
+                           ".SH SYNOPSIS\n.B talix\n.I SUBCOMMAND\n[...]\n.SH DESCRIPTION\n.nf\n" +
+                           roffText(help) + "\n.fi\n" + manCommands(session->commands());
+  bool const written = std::fputs(page.c_str(), stdout) >= 0 && std::fflush(stdout) == 0;
+  return finished(status, written);
+}
+
+int showCompletion(PluginChoice const& plugin, Subcommands const& subcommands) {
+  int status = 0;
+  std::unique_ptr<Session> const session = makeSession(plugin, status);
+  if (!session) return status;
+  std::string const script = bashCompletion(subcommands, session->commands());
+  bool const written = std::fputs(script.c_str(), stdout) >= 0 && std::fflush(stdout) == 0;
   return finished(status, written);
 }
 

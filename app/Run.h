@@ -4,6 +4,8 @@
 #include <string>
 #include <vector>
 
+#include "app/Completion.h"
+
 namespace talix {
 
 // The library whose commands are used: `file` when it is given, else the one that belongs to the program.
@@ -29,5 +31,8 @@ int runScripts(RunRequest const& request);
 int showCommands(PluginChoice const& plugin, std::string const& name, bool json);
 // All commands, those for developers too, as the page that is checked in (session/RegistryPage.h).
 int showRegistryPage(PluginChoice plugin);
+// The manual page, talix(1). help: what the program says of its subcommands and options.
+int showManPage(PluginChoice const& plugin, std::string const& help);
+int showCompletion(PluginChoice const& plugin, Subcommands const& subcommands);
 
 }  // namespace talix

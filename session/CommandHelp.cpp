@@ -86,6 +86,13 @@ bool excludeEachOther(CommandOption const& a, CommandOption const& b) {
   return a.getIndex() != b.getIndex() && excludes(a, b) && excludes(b, a);
 }
 
+std::string usageOf(Command const& command) {
+  std::string usage = command.getName().GetString();
+  if (std::string const syntax = argSyntax(command); !syntax.empty()) usage += " " + syntax;
+  for (auto const* option : shownOptions(command)) usage += " [" + optionSyntax(*option) + "]";
+  return usage;
+}
+
 std::string commandList(CommandRegistry const& commands) {
   size_t width = 0;
   for (auto const& entry : commands.entries())
@@ -102,13 +109,10 @@ std::string commandList(CommandRegistry const& commands) {
 std::string commandPage(CommandRegistry::Entry const& entry) {
   Command& command = *entry.command;
   auto const options = shownOptions(command);
-  std::string usage = command.getName().GetString();
-  if (std::string const syntax = argSyntax(command); !syntax.empty()) usage += " " + syntax;
-  for (auto const* option : options) usage += " [" + optionSyntax(*option) + "]";
 
   std::string text = command.getName().GetString() + ": " + command.getDisplayName().GetString();
   if (!command.getPurpose().IsEmpty()) text += "\n" + command.getPurpose().GetString();
-  text += "\n\nUsage: " + usage + paragraph(command.getArgsText().GetString());
+  text += "\n\nUsage: " + usageOf(command) + paragraph(command.getArgsText().GetString());
   if (!options.empty()) text += "\n\nOptions:" + optionLines(command, options);
   if (!command.getExample().IsEmpty()) text += "\n\nExample: " + command.getExample().GetString();
   text += "\n\nReturns: " + typeName(command.getReturnType());

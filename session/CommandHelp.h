@@ -21,6 +21,9 @@ std::string optionSyntax(CommandOption const& option);
 // Whether each of two options says in its mask that it excludes the other: one side alone is not enough.
 bool excludeEachOther(CommandOption const& a, CommandOption const& b);
 
+// "setKey "propertyType" value1 ... [-t integer] [-r]"
+std::string usageOf(Command const& command);
+
 // All commands by category, with their purposes. No line break at the end.
 std::string commandList(CommandRegistry const& commands);
 // All that is said of one. No line break at the end.

@@ -63,7 +63,7 @@ class CreateLotsOfDataCmd final : public ScriptCommand<CreateLotsOfDataCmd> {
   }
 
   // A subject that walks in a circle of 2 m once in 10 s, with the marker at a place of its own on the body
-  // and swinging twice a second. Rounded to floats, as recorded positions are.
+  // and swinging twice a second. Rounded to 1/64 mm, which floats hold, as recorded positions are.
   static KeyTrack motion(int marker, int frames, int64 period) {
     double const turn =
         2 * std::numbers::pi * static_cast<double>(period) / kTicksPerSecond;  // a second's, by frame
@@ -78,7 +78,7 @@ class CreateLotsOfDataCmd final : public ScriptCommand<CreateLotsOfDataCmd> {
                              2000 * std::sin(way / 10) + reach * std::sin(phase + way / 10),
                              height + 20 * std::cos(4 * way + phase)};
         for (int axis = 0; axis < 3; ++axis)
-          values[static_cast<size_t>(3 * i + axis)] = static_cast<float>(at[axis]);
+          values[static_cast<size_t>(3 * i + axis)] = std::round(at[axis] * 64) / 64;
       }
       track.append(first * period, period, values.data(), count);
     }
