@@ -18,6 +18,9 @@ static thread_local long s_allocationsLeft = -1;
   void* block = s_allocationsLeft >= 0 && s_allocationsLeft-- == 0 ? nullptr : std::malloc(size ? size : 1);
   return block ? block : throw std::bad_alloc();
 }
+[[gnu::noinline]] void* operator new(size_t size, std::nothrow_t const&) noexcept {
+  return std::malloc(size ? size : 1);
+}
 [[gnu::noinline]] void operator delete(void* block) noexcept { std::free(block); }
 [[gnu::noinline]] void operator delete(void* block, size_t) noexcept { std::free(block); }
 
