@@ -113,6 +113,12 @@ void runParts(ScriptRunner& runner, std::vector<RunRequest::Part> const& parts,
   }
 }
 
+// The exit status after a text that is all that is asked for.
+int printed(std::string const& text) {
+  bool const written = std::fputs(text.c_str(), stdout) >= 0 && std::fflush(stdout) == 0;
+  return finished(0, written);
+}
+
 }  // namespace
 
 int runScripts(RunRequest const& request) {
@@ -164,8 +170,7 @@ int showRegistryPage(PluginChoice plugin) {
   if (!session) return status;
   std::string const page =
       registryPage(session->commands(), [&](std::string const& name) { return !forUsers.contains(name); });
-  bool const written = std::puts(page.c_str()) >= 0 && std::fflush(stdout) == 0;
-  return finished(status, written);
+  return printed(page + "\n");
 }
 
 int showCommands(PluginChoice const& plugin, std::string const& name, bool json) {
@@ -182,8 +187,7 @@ int showCommands(PluginChoice const& plugin, std::string const& name, bool json)
   } else {
     text = entry ? commandPage(*entry) : commandList(commands);
   }
-  bool const written = std::puts(text.c_str()) >= 0 && std::fflush(stdout) == 0;
-  return finished(status, written);
+  return printed(text + "\n");
 }
 
 int showManPage(PluginChoice const& plugin, std::string const& help) {
@@ -194,17 +198,14 @@ int showManPage(PluginChoice const& plugin, std::string const& help) {
                            "\"\n.SH NAME\ntalix \\- edits motion capture takes by script\n"
                            ".SH SYNOPSIS\n.B talix\n.I SUBCOMMAND\n[...]\n.SH DESCRIPTION\n.nf\n" +
                            roffText(help) + "\n.fi\n" + manCommands(session->commands());
-  bool const written = std::fputs(page.c_str(), stdout) >= 0 && std::fflush(stdout) == 0;
-  return finished(status, written);
+  return printed(page);
 }
 
 int showCompletion(PluginChoice const& plugin, Subcommands const& subcommands) {
   int status = 0;
   std::unique_ptr<Session> const session = makeSession(plugin, status);
   if (!session) return status;
-  std::string const script = bashCompletion(subcommands, session->commands());
-  bool const written = std::fputs(script.c_str(), stdout) >= 0 && std::fflush(stdout) == 0;
-  return finished(status, written);
+  return printed(bashCompletion(subcommands, session->commands()));
 }
 
 }  // namespace talix

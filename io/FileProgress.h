@@ -2,9 +2,10 @@
 // makes none.
 #pragma once
 
+#include <optional>
 #include <string>
 
-#include "host/base/Types.h"
+#include "host/services/OperationStack.h"
 
 namespace talix {
 
@@ -12,9 +13,6 @@ class FileProgress {
  public:
   // doing: "Opening" or "Saving".
   FileProgress(char const* doing, std::string const& path) : m_doing(doing), m_path(path) {}
-  ~FileProgress();
-  FileProgress(FileProgress const&) = delete;
-  FileProgress& operator=(FileProgress const&) = delete;
 
   // So much is done of the whole. Throws FileError when the user has cancelled.
   void tell(uint64 done, uint64 whole);
@@ -22,7 +20,7 @@ class FileProgress {
  private:
   char const* m_doing;
   std::string const& m_path;
-  bool m_begun = false;
+  std::optional<OperationTask> m_task;
 };
 
 }  // namespace talix

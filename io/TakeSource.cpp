@@ -27,20 +27,7 @@ class KeySource final : public SampleSource {
     }
   }
 
-  LeftOut leftOut(SampleTimes const& times) const override {
-    LeftOut left;
-    int64 const count = times.count(), period = times.period();
-    m_track.forEach(0, m_track.count(), [&](KeyTrack::Key const& key) {
-      int64 const fromStart = key.time - times[0];
-      if (fromStart % period != 0)
-        ++left.between;
-      else if (fromStart < 0 || fromStart / period >= count)
-        ++left.outside;
-      else if (!isWhole(key))
-        ++left.partial;
-    });
-    return left;
-  }
+  LeftOut leftOut(SampleTimes const& times) const override { return keysLeftOut(m_track, times); }
 
  private:
   KeyTrack const& m_track;
@@ -55,7 +42,7 @@ class CurveSource final : public SampleSource {
     m_track.sample(times, Interpolation::Linear, {}, KeyTrack::kAll, values, m_track.width());
     std::fill_n(known, times.count(), true);
   }
-  LeftOut leftOut(SampleTimes const& times) const override { return KeySource(m_track).leftOut(times); }
+  LeftOut leftOut(SampleTimes const& times) const override { return keysLeftOut(m_track, times); }
 
  private:
   KeyTrack const& m_track;
@@ -86,6 +73,21 @@ SampleSourcePtr curveOrNone(KeyTrack const& track) {
 }
 
 }  // namespace
+
+SampleSource::LeftOut keysLeftOut(KeyTrack const& track, SampleTimes const& times) {
+  SampleSource::LeftOut left;
+  int64 const count = times.count(), period = times.period();
+  track.forEach(0, track.count(), [&](KeyTrack::Key const& key) {
+    int64 const fromStart = key.time - times[0];
+    if (fromStart % period != 0)
+      ++left.between;
+    else if (fromStart < 0 || fromStart / period >= count)
+      ++left.outside;
+    else if (!isWhole(key))
+      ++left.partial;
+  });
+  return left;
+}
 
 SampleTimes TakeSource::frameTimes() const {
   int64 const period = ticksPerFrameAt(rate);

@@ -25,9 +25,14 @@ class SampleSource {
     int64 between = 0;  // at none of the times
     int64 outside = 0;  // before the first or after the last
     int64 partial = 0;  // at one of the times, without a value on every axis
+
+    int64 off() const { return between + outside; }
   };
   virtual LeftOut leftOut(SampleTimes const&) const { return {}; }
 };
+// Of a track whose keys stand for themselves.
+SampleSource::LeftOut keysLeftOut(KeyTrack const& track, SampleTimes const& times);
+
 using SampleSourcePtr = std::unique_ptr<SampleSource>;
 
 struct PointSource : TakePointInfo {

@@ -31,7 +31,7 @@ class testSceneReadPerformanceCmd final : public ScriptCommand<testSceneReadPerf
     int64 const last = frameAtOrBefore(times.getPlayRange().getEnd(), period);
     int64 const frames = last < first ? 0 : last - first + 1;
 
-    g_theOperationStack.pushTask(0, 1000, 0, 1, true, "Reading the scene");
+    OperationTask const task("Reading the scene");
     auto const start = std::chrono::steady_clock::now();
     SceneReader const reader(nodes, g_db->getActiveClip());
     std::vector<double> positions(3 * nodes.size() * kBlock);
@@ -40,11 +40,9 @@ class testSceneReadPerformanceCmd final : public ScriptCommand<testSceneReadPerf
       int64 const count = std::min(kBlock, frames - done);
       reader.readWorld(SampleTimes((first + done) * period, period, count), {.positions = positions.data()});
       done += count;
-      g_theOperationStack.setTaskPos(
-          static_cast<int>(1000.0 * static_cast<double>(done) / static_cast<double>(frames)));
+      task.tell(static_cast<double>(done), static_cast<double>(frames));
     }
     std::chrono::duration<double> const seconds = std::chrono::steady_clock::now() - start;
-    g_theOperationStack.popTask();
     logInfo("FPS: %f", done > 0 ? static_cast<double>(done) / seconds.count() : 0.0);
     return done == frames;
   }

@@ -42,14 +42,6 @@ bool readLens(VideoLens& lens) {
   return true;
 }
 
-class Task {
- public:
-  explicit Task(HString const& caption) { g_theOperationStack.pushTask(0, 1000, 0, 1, true, caption); }
-  ~Task() { g_theOperationStack.popTask(); }
-  Task(Task const&) = delete;
-  Task& operator=(Task const&) = delete;
-};
-
 // Leaves the writing of a file that then is none.
 struct Unfinished {};
 
@@ -96,7 +88,7 @@ bool VideoTranscoder::process(HString source, HString destination, HString video
                      return !g_theOperationStack.isCancelled();
                    },
                .warn = [](char const* text) { writeLog(LogLevel::Warning, text); }};
-  Task const task("Transcoding " + source.GetString());
+  OperationTask const task("Transcoding " + source.GetString());
   VideoOutcome outcome = VideoOutcome::failed;
   try {
     replaceFileThrough(destination.GetString(), [&](int file) {

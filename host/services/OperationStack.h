@@ -50,3 +50,22 @@ class OperationStack {
 
 // That of the thread's current scene; of the default scene on a thread that has none.
 extern OperationStack g_theOperationStack;
+
+// A task of which parts are done, as long as the object lives; the user may cancel it.
+class OperationTask {
+ public:
+  explicit OperationTask(HString const& caption) {
+    g_theOperationStack.pushTask(0, kSteps, 0, 1, true, caption);
+  }
+  ~OperationTask() { g_theOperationStack.popTask(); }
+  OperationTask(OperationTask const&) = delete;
+  OperationTask& operator=(OperationTask const&) = delete;
+
+  // So much is done of the whole.
+  static void tell(double done, double whole) {
+    g_theOperationStack.setTaskPos(static_cast<int>(whole > 0 ? kSteps * (done / whole) : kSteps));
+  }
+
+ private:
+  static constexpr int kSteps = 1000;
+};

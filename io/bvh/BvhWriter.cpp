@@ -2,8 +2,8 @@
 #include <algorithm>
 #include <charconv>
 #include <cmath>
-#include <numbers>
 
+#include "host/math/Degrees.h"
 #include "io/FileBytes.h"
 #include "io/FileError.h"
 #include "io/FileProgress.h"
@@ -96,7 +96,7 @@ class JointWriter {
     for (BvhChannel const& channel : m_channels) {
       if (!row.empty()) row += ' ';
       appendNumber(row, channel.isRotation
-                            ? angles[channel.axis] * (180 / std::numbers::pi)
+                            ? angles[channel.axis] * kDegreesPerRadian
                             : (place ? place : &m_joint.offset.x)[channel.axis] / m_millimetres);
     }
   }
@@ -254,9 +254,7 @@ class BvhWriter {
   }
 
   int64 keysOffFrames(SampleSourcePtr const& source) const {
-    if (!source) return 0;
-    SampleSource::LeftOut const left = source->leftOut(m_take.frameTimes());
-    return left.between + left.outside;
+    return source ? source->leftOut(m_take.frameTimes()).off() : 0;
   }
 
   void warnOfLostTurns() {

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "host/keys/DataRanges.h"
+#include "io/TakeSource.h"
 
 namespace talix {
 
@@ -67,13 +68,7 @@ void FrameSampler::sample(Controller const& channel, SampleTimes const& times, d
 
 int64 FrameSampler::keysOff(Controller const& channel, SampleTimes const& times) const {
   KeyTrack const* track = dataTrack(channel);
-  if (!track) return 0;
-  int64 off = 0;
-  track->forEach(0, track->count(), [&](KeyTrack::Key const& key) {
-    int64 const fromStart = key.time - times[0];
-    off += fromStart < 0 || fromStart % times.period() != 0 || fromStart / times.period() >= times.count();
-  });
-  return off;
+  return track ? keysLeftOut(*track, times).off() : 0;
 }
 
 }  // namespace talix

@@ -48,8 +48,9 @@ class WorldSources::Block {
 
   FrameSampler const& sampler() const { return *m_sampler; }
 
-  size_t add(Node const& node) {
-    m_nodes.push_back(&node);
+  size_t add(Node const& node, bool turns) {
+    m_turns = m_turns || turns;
+    if (m_nodes.empty() || m_nodes.back() != &node) m_nodes.push_back(&node);
     return m_nodes.size() - 1;
   }
 
@@ -58,8 +59,9 @@ class WorldSources::Block {
     if (!m_reader) m_reader.emplace(m_nodes, m_sampler->shown());
     auto const values = static_cast<size_t>(times.count()) * m_nodes.size();
     m_positions.resize(3 * values);
-    m_rotations.resize(4 * values);
-    m_reader->readWorld(times, {.positions = m_positions.data(), .rotations = m_rotations.data()});
+    if (m_turns) m_rotations.resize(4 * values);
+    m_reader->readWorld(
+        times, {.positions = m_positions.data(), .rotations = m_turns ? m_rotations.data() : nullptr});
     m_start = times[0];
     m_period = times.period();
     m_count = times.count();
@@ -75,6 +77,7 @@ class WorldSources::Block {
  private:
   FrameSamplerPtr m_sampler;
   std::vector<Node const*> m_nodes;
+  bool m_turns = false;  // whether anybody asks for rotations
   std::optional<SceneReader> m_reader;
   std::vector<double> m_positions, m_rotations;
   int64 m_start = 0, m_period = 0, m_count = 0;  // the times that they hold
@@ -102,11 +105,11 @@ class WorldSources::Source final : public SampleSource {
 WorldSources::WorldSources(FrameSamplerPtr sampler) : m_block(std::make_shared<Block>(std::move(sampler))) {}
 
 SampleSourcePtr WorldSources::positions(Node const& node, Controller const* measured) {
-  return std::make_unique<Source>(m_block, m_block->add(node), 3, measured);
+  return std::make_unique<Source>(m_block, m_block->add(node, false), 3, measured);
 }
 
 SampleSourcePtr WorldSources::rotations(Node const& node) {
-  return std::make_unique<Source>(m_block, m_block->add(node), 4, nullptr);
+  return std::make_unique<Source>(m_block, m_block->add(node, true), 4, nullptr);
 }
 
 }  // namespace talix
